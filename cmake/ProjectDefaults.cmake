@@ -1,0 +1,42 @@
+# What every target of this project is built with.
+
+set(CMAKE_C_STANDARD 99)
+set(CMAKE_C_STANDARD_REQUIRED ON)
+set(CMAKE_C_EXTENSIONS OFF)
+set(CMAKE_CXX_STANDARD 17)
+set(CMAKE_CXX_STANDARD_REQUIRED ON)
+set(CMAKE_CXX_EXTENSIONS OFF)
+
+# Everything may end in a shared library, and a shared library exports only what it names.
+set(CMAKE_POSITION_INDEPENDENT_CODE ON)
+set(CMAKE_C_VISIBILITY_PRESET hidden)
+set(CMAKE_CXX_VISIBILITY_PRESET hidden)
+set(CMAKE_VISIBILITY_INLINES_HIDDEN ON)
+
+set(CMAKE_RUNTIME_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/bin")
+set(CMAKE_LIBRARY_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/lib")
+
+find_program(QITRMC_CCACHE ccache)
+if(QITRMC_CCACHE)
+  set(CMAKE_C_COMPILER_LAUNCHER "${QITRMC_CCACHE}")
+  set(CMAKE_CXX_COMPILER_LAUNCHER "${QITRMC_CCACHE}")
+endif()
+
+add_compile_options(-Wall -Wextra -Werror)
+# The control program runs from debug-free paths: file names in error reports are relative to the
+# project, the same on every machine that builds it.
+add_compile_options("-fmacro-prefix-map=${PROJECT_SOURCE_DIR}/=")
+
+set(QITRMC_SANITIZE "" CACHE STRING "Sanitizers to build with, for example address,undefined")
+if(QITRMC_SANITIZE)
+  add_compile_options("-fsanitize=${QITRMC_SANITIZE}" -fno-sanitize-recover=all
+                      -fno-omit-frame-pointer)
+  add_link_options("-fsanitize=${QITRMC_SANITIZE}")
+endif()
+
+# qitrmc_library(NAME sources...): one folder of the plug-in as a static library whose headers are
+# included as <folder>/<header>.
+function(qitrmc_library name)
+  add_library(${name} STATIC ${ARGN})
+  target_include_directories(${name} PUBLIC "${PROJECT_SOURCE_DIR}/src")
+endfunction()

@@ -1,0 +1,28 @@
+/*
+ * The optional relocation library, libqirelocations.so.0, by which a packaged system moves the
+ * standard installation directories.
+ */
+#ifndef QIRELOCATIONS_H
+#define QIRELOCATIONS_H
+
+#include <stdint.h>
+
+#ifdef __cplusplus
+extern "C" {
+#endif
+
+/*
+ * Looked up by the name "get_relocated_dir".
+ *
+ * key: the name of a standard directory, such as "bindir". buffer: receives the relocated
+ * directory as NUL-terminated text; bufferSize bytes, at most 255 of them used.
+ * Returns a positive count when a directory was written, 0 to keep the default, a negative number
+ * on failure. May be called from any thread.
+ */
+typedef int32_t (*get_relocated_dir_fn)(const char* key, char* buffer, uint32_t bufferSize);
+
+#ifdef __cplusplus
+}
+#endif
+
+#endif
