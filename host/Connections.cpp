@@ -1,0 +1,68 @@
+#include "host/Connections.h"
+
+#include <sys/socket.h>
+
+#include <algorithm>
+#include <chrono>
+#include <new>
+
+namespace host {
+
+namespace {
+
+constexpr uint32_t kPatienceWhenFull = 2;
+constexpr uint32_t kNotWaiting = 0;
+
+uint32_t secondsNow() noexcept {
+    using namespace std::chrono;
+    const auto now = duration_cast<seconds>(steady_clock::now().time_since_epoch());
+    return static_cast<uint32_t>(now.count()) + 1;  // never kNotWaiting
+}
+
+}  // namespace
+
+Connection::Connection(int socket) noexcept : socket(socket), waitingSince(secondsNow()) {}
+
+void Connection::waitForClient() noexcept {
+    waitingSince.store(secondsNow(), std::memory_order_relaxed);
+}
+
+void Connection::workForClient() noexcept {
+    waitingSince.store(kNotWaiting, std::memory_order_relaxed);
+}
+
+Connections::Connections(uint32_t most, uint32_t patience) noexcept
+    : most(most), patience(patience) {}
+
+Connection* Connections::add(int socket) noexcept {
+    try {
+        const std::lock_guard<std::mutex> lock(mutex);
+        Connection& connection = open.emplace_front(socket);
+        connection.self = open.begin();
+        return &connection;
+    } catch (const std::bad_alloc&) {
+        shutdown(socket, SHUT_RDWR);
+        return nullptr;
+    }
+}
+
+void Connections::remove(Connection* connection) noexcept {
+    if (connection == nullptr)
+        return;
+    const std::lock_guard<std::mutex> lock(mutex);
+    open.erase(connection->self);
+}
+
+void Connections::shutOverdue() noexcept {
+    const std::lock_guard<std::mutex> lock(mutex);
+    const bool full = open.size() >= most;
+    const uint32_t limit = full ? std::min(patience, kPatienceWhenFull) : patience;
+    const uint32_t now = secondsNow();
+    for (const Connection& connection : open) {
+        const uint32_t since = connection.waitingSince.load(std::memory_order_relaxed);
+        if (since != kNotWaiting && now - since > limit && since <= now)
+            shutdown(connection.socket, SHUT_RDWR);
+    }
+}
+
+}  // namespace host

@@ -1,0 +1,53 @@
+#pragma once
+
+#include <atomic>
+#include <cstdint>
+#include <list>
+#include <mutex>
+
+namespace host {
+
+// One connection of a client, as far as its use of time goes.
+class Connection {
+  public:
+    explicit Connection(int socket) noexcept;
+
+    // The client's next step begins: to send a request's head, its body, to fetch the response.
+    void waitForClient() noexcept;
+
+    // The plug-in works on the request; the client is owed an answer however long that takes.
+    void workForClient() noexcept;
+
+  private:
+    friend class Connections;
+    const int socket;
+    std::atomic<uint32_t> waitingSince;  // in seconds of the steady clock; 0 while the host works
+    std::list<Connection>::iterator self;
+};
+
+// The open connections. Every connection has a thread of its own, so one that keeps the host
+// waiting costs a place; this is where it loses it. All functions may be called from any thread.
+class Connections {
+  public:
+    // most: how many connections the host takes at once. patience: how many seconds it waits for a
+    // client's step.
+    Connections(uint32_t most, uint32_t patience) noexcept;
+
+    // Remembers a connection until remove(). Null when memory runs out; the socket is then shut.
+    Connection* add(int socket) noexcept;
+
+    // To be called before the socket is closed.
+    void remove(Connection* connection) noexcept;
+
+    // Shuts each connection whose client has taken too long: longer than the patience or, when all
+    // places are taken, longer than two seconds. To be called about once a second.
+    void shutOverdue() noexcept;
+
+  private:
+    const uint32_t most;
+    const uint32_t patience;
+    std::mutex mutex;
+    std::list<Connection> open;
+};
+
+}  // namespace host

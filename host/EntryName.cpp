@@ -1,0 +1,85 @@
+#include "host/EntryName.h"
+
+#include <utf8proc.h>
+
+#include <string>
+
+namespace host {
+
+namespace {
+
+constexpr std::string_view kPrefix = "/qitrmc/";
+constexpr uint32_t kReplacementCharacter = 0xFFFD;
+
+std::string_view withoutAuthority(std::string_view target) {
+    const std::size_t scheme = target.find("://");
+    if (target.empty() || target.front() == '/' || scheme == std::string_view::npos)
+        return target;
+    const std::size_t path = target.find('/', scheme + 3);
+    return path == std::string_view::npos ? std::string_view("/") : target.substr(path);
+}
+
+int hexDigit(char c) {
+    if (c >= '0' && c <= '9')
+        return c - '0';
+    if (c >= 'a' && c <= 'f')
+        return c - 'a' + 10;
+    if (c >= 'A' && c <= 'F')
+        return c - 'A' + 10;
+    return -1;
+}
+
+std::string percentDecoded(std::string_view text) {
+    std::string decoded;
+    for (std::size_t i = 0; i < text.size(); ++i) {
+        const bool escape = text[i] == '%' && i + 2 < text.size() && hexDigit(text[i + 1]) >= 0 &&
+                            hexDigit(text[i + 2]) >= 0;
+        if (!escape) {
+            decoded += text[i];
+            continue;
+        }
+        decoded += static_cast<char>(hexDigit(text[i + 1]) * 16 + hexDigit(text[i + 2]));
+        i += 2;
+    }
+    return decoded;
+}
+
+std::vector<uint32_t> charactersOf(const std::string& text) {
+    std::vector<uint32_t> characters;
+    const auto* next = reinterpret_cast<const utf8proc_uint8_t*>(text.data());
+    const auto* end = next + text.size();
+    while (next != end) {
+        utf8proc_int32_t character = 0;
+        const utf8proc_ssize_t length = utf8proc_iterate(next, end - next, &character);
+        const bool valid = length > 0;
+        characters.push_back(valid ? static_cast<uint32_t>(character) : kReplacementCharacter);
+        next += valid ? length : 1;
+    }
+    return characters;
+}
+
+void reservedOperation(ws_Entry*) {}
+
+ws_WideString entryName(const ws_Entry* entry) {
+    const std::vector<uint32_t>& name = static_cast<const Entry*>(entry)->name;
+    return {name.data(), name.data() + name.size()};
+}
+
+constexpr ws_EntryOperations kOperations = {reservedOperation, reservedOperation, reservedOperation,
+                                            entryName};
+
+}  // namespace
+
+std::optional<std::vector<uint32_t>> entryNameOfPath(std::string_view path) {
+    path = withoutAuthority(path);
+    if (path.substr(0, kPrefix.size()) != kPrefix)
+        return std::nullopt;
+    path.remove_prefix(kPrefix.size());
+    if (path.empty() || path.find('/') != std::string_view::npos)
+        return std::nullopt;
+    return charactersOf(percentDecoded(path));
+}
+
+Entry::Entry(const std::vector<uint32_t>& name) : ws_Entry{&kOperations}, name(name) {}
+
+}  // namespace host

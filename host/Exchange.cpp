@@ -1,0 +1,83 @@
+#include "host/Exchange.h"
+
+#include <cstdlib>
+#include <new>
+
+#include "host/EntryName.h"
+
+namespace host {
+
+namespace {
+
+// Far more than a client has under way by mistake.
+constexpr std::size_t kMostDiscarded = 64 * 1024 * 1024;
+
+bool isSendable(const ws_Request& response) {
+    return !response.incomplete && response.code >= 200 && response.code <= 599 &&
+           response.type.find_first_of("\r\n\t") == std::string::npos;
+}
+
+}  // namespace
+
+Exchange::Exchange(Gate& gate, uint32_t maxBody) noexcept
+    : gate(gate), admitted(gate.enter()), maxBody(maxBody) {}
+
+Exchange::~Exchange() {
+    if (admitted)
+        gate.leave();
+}
+
+void Exchange::begin(const char* transport, const char* method, std::string_view path,
+                     const char* declaredLength) {
+    if (!admitted)
+        return refuse(503, "The server is stopping.\n");
+    std::optional<std::vector<uint32_t>> name = entryNameOfPath(path);
+    if (!name)
+        return refuse(404, "There is nothing here. The service is at /qitrmc/Call.\n");
+    if (declaredLength != nullptr && std::strtoull(declaredLength, nullptr, 10) > maxBody)
+        return refuseBody();
+    entryName = std::move(*name);
+    request.transport = transport;
+    request.method = method;
+}
+
+bool Exchange::take(const char* data, std::size_t size) {
+    if (!refused && size > maxBody - request.body.size())
+        refuseBody();
+    if (refused) {
+        discarded += size;
+        return discarded <= kMostDiscarded;
+    }
+    try {
+        request.body.append(data, size);
+    } catch (const std::bad_alloc&) {
+        fail();
+    }
+    return true;
+}
+
+void Exchange::run(const Plugin& plugin) {
+    if (refused)
+        return;
+    Entry entry(entryName);
+    if (!plugin.run(entry, request) || !isSendable(request))
+        fail();
+}
+
+void Exchange::refuse(int code, std::string_view text) {
+    refused = true;
+    request = ws_Request();
+    request.code = code;
+    request.output = text;
+}
+
+void Exchange::refuseBody() {
+    refuse(413, "The request body is too large: at most " + std::to_string(maxBody) +
+                    " bytes are taken.\n");
+}
+
+void Exchange::fail() {
+    refuse(500, "The service failed on this request.\n");
+}
+
+}  // namespace host

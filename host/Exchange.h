@@ -1,0 +1,59 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "host/Gate.h"
+#include "host/Plugin.h"
+#include "host/Request.h"
+
+namespace host {
+
+// One request on its way through the host: its head, its body piece by piece, the work of the
+// plug-in, the response. Used by one thread at a time. Any function may throw std::bad_alloc.
+//
+// A request that the host refuses still has its body read, and thrown away: a client that is cut
+// off while it writes would often never see the response.
+class Exchange {
+  public:
+    // maxBody: the most bytes of body that are kept.
+    Exchange(Gate& gate, uint32_t maxBody) noexcept;
+    ~Exchange();
+    Exchange(const Exchange&) = delete;
+    Exchange& operator=(const Exchange&) = delete;
+
+    // Takes in the head. declaredLength: the value of the header "Content-Length", null without it.
+    void begin(const char* transport, const char* method, std::string_view path,
+               const char* declaredLength);
+
+    // Takes in the next piece of the body. False when the client has sent so much beyond the limit
+    // that the connection is to be dropped.
+    bool take(const char* data, std::size_t size);
+
+    // Has the plug-in serve the request, unless the host has refused it.
+    void run(const Plugin& plugin);
+
+    // Whether the host has its response already, without the plug-in.
+    bool isRefused() const { return refused; }
+
+    // The response; complete after run(), or once the request is refused.
+    const ws_Request& response() const { return request; }
+
+  private:
+    void refuse(int code, std::string_view text);
+    void refuseBody();
+    void fail();
+
+    Gate& gate;
+    const bool admitted;
+    const uint32_t maxBody;
+    ws_Request request;
+    std::vector<uint32_t> entryName;
+    std::size_t discarded = 0;
+    bool refused = false;
+};
+
+}  // namespace host

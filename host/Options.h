@@ -1,0 +1,35 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+namespace host {
+
+enum class Action { Serve, ShowHelp, ShowVersion };
+
+// What the command line asks for.
+struct Options {
+    Action action = Action::Serve;
+    std::string address = "127.0.0.1";    // a name or number, IPv6 without its brackets
+    std::string port = "8080";            // decimal; "0" takes a free one
+    std::string plugin;                   // path; empty: look beside the program
+    std::string chassis;                  // path; empty: leave the driver's own choice
+    std::string state;                    // path; empty: leave the driver's own choice
+    uint32_t threads = 512;               // 1 to kMostThreads
+    uint32_t maxBody = 16 * 1024 * 1024;  // bytes, 1 and more
+    uint32_t timeout = 30;                // seconds, 1 to kLongestTimeout
+    std::string tlsCertificate;           // path; both or neither of the two
+    std::string tlsKey;
+};
+
+// Every connection takes a thread and a file descriptor, of which a process has 1024.
+constexpr uint32_t kMostThreads = 900;
+constexpr uint32_t kLongestTimeout = 86400;
+
+// Reads the arguments of the program, its own name not among them. Options are written as
+// "--name value" or "--name=value"; the last one of a name holds. --help and --version end the
+// reading. Throws UsageError.
+Options parseOptions(const std::vector<std::string>& arguments);
+
+}  // namespace host

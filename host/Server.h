@@ -1,0 +1,57 @@
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+#include <memory>
+#include <string>
+
+#include "host/Connections.h"
+#include "host/Gate.h"
+#include "host/ListenSocket.h"
+#include "host/Plugin.h"
+
+struct MHD_Daemon;
+
+namespace host {
+
+struct ServerSettings {
+    uint32_t threads = 0;  // most connections at once
+    uint32_t maxBody = 0;  // bytes
+    uint32_t timeout = 0;  // seconds
+    bool tls = false;      // HTTPS with these two, both PEM text
+    std::string tlsCertificate;
+    std::string tlsKey;
+};
+
+// The HTTP server. Each connection has a thread, which also runs the plug-in, so no client waits
+// for another one's request.
+class Server {
+  public:
+    // Starts to serve. The plug-in and the socket must outlive the server. Throws Failure.
+    Server(const Plugin& plugin, ListenSocket& socket, ServerSettings settings);
+
+    // Cuts the connections that are left. Returns when no request is in the plug-in any more.
+    ~Server();
+    Server(const Server&) = delete;
+    Server& operator=(const Server&) = delete;
+
+    // Shuts connections whose clients take too long. To be called about once a second.
+    void shutOverdueConnections() noexcept;
+
+    // Takes no more connections and no more requests on those that are open.
+    void stopAccepting();
+
+    // Waits for the requests in flight to end; false when the time runs out before that.
+    bool waitForRequests(std::chrono::milliseconds time);
+
+  private:
+    struct Callbacks;
+
+    const Plugin& plugin;
+    const ServerSettings settings;
+    Connections connections;
+    Gate gate;
+    MHD_Daemon* daemon;
+};
+
+}  // namespace host

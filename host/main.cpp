@@ -1,0 +1,149 @@
+#include <signal.h>
+#include <stdlib.h>
+
+#include <cerrno>
+#include <cstdio>
+#include <cstring>
+#include <exception>
+#include <memory>
+#include <string>
+
+#include "host/Failure.h"
+#include "host/ListenSocket.h"
+#include "host/Options.h"
+#include "host/Plugin.h"
+#include "host/Server.h"
+#include "host/Usage.h"
+
+namespace {
+
+using host::Failure;
+using host::Options;
+
+// How often overdue connections are looked for.
+constexpr timespec kTick = {1, 0};
+
+// `what` names the file in the failure, `option` says where its path came from.
+std::string readFile(const std::string& path, const std::string& what, const std::string& option) {
+    const std::unique_ptr<FILE, decltype(&std::fclose)> file(std::fopen(path.c_str(), "rb"),
+                                                             std::fclose);
+    std::string text;
+    char piece[4096];
+    while (file && !std::feof(file.get()) && !std::ferror(file.get()))
+        text.append(piece, std::fread(piece, 1, sizeof piece, file.get()));
+    if (!file || std::ferror(file.get())) {
+        throw Failure("The " + what + " " + path + " cannot be read: " + std::strerror(errno) +
+                      ". Name a readable file with " + option + ".");
+    }
+    return text;
+}
+
+void setEnvironment(const char* name, const std::string& value) {
+    if (!value.empty())
+        setenv(name, value.c_str(), 1);
+}
+
+// The simulated driver, which the plug-in loads, reads these.
+void configureDriver(const Options& options) {
+    if (!options.chassis.empty())
+        readFile(options.chassis, "chassis file", "--chassis");
+    setEnvironment("QITRMC_SIM_CHASSIS", options.chassis);
+    setEnvironment("QITRMC_SIM_STATE", options.state);
+}
+
+host::ServerSettings settingsOf(const Options& options) {
+    host::ServerSettings settings;
+    settings.threads = options.threads;
+    settings.maxBody = options.maxBody;
+    settings.timeout = options.timeout;
+    settings.tls = !options.tlsKey.empty();
+    if (settings.tls) {
+        settings.tlsCertificate = readFile(options.tlsCertificate, "certificate", "--tls-cert");
+        settings.tlsKey = readFile(options.tlsKey, "private key", "--tls-key");
+    }
+    return settings;
+}
+
+sigset_t endSignals() {
+    sigset_t signals;
+    sigemptyset(&signals);
+    sigaddset(&signals, SIGTERM);
+    sigaddset(&signals, SIGINT);
+    return signals;
+}
+
+// The threads that are started later inherit the mask: the signals that end the host wait until it
+// looks for them.
+void takeChargeOfSignals() {
+    const sigset_t signals = endSignals();
+    pthread_sigmask(SIG_BLOCK, &signals, nullptr);
+    // A shell starts its background jobs with SIGINT ignored.
+    signal(SIGINT, SIG_DFL);
+    signal(SIGTERM, SIG_DFL);
+    signal(SIGPIPE, SIG_IGN);
+}
+
+void serveUntilSignal(host::Server& server) {
+    const sigset_t signals = endSignals();
+    while (sigtimedwait(&signals, nullptr, &kTick) < 0)
+        server.shutOverdueConnections();
+}
+
+// From here on a signal has its default effect: it ends the process.
+void finishRequests(host::Server& server) {
+    const sigset_t signals = endSignals();
+    pthread_sigmask(SIG_UNBLOCK, &signals, nullptr);
+    server.stopAccepting();
+    while (!server.waitForRequests(std::chrono::seconds(kTick.tv_sec)))
+        server.shutOverdueConnections();
+}
+
+void serve(const host::Plugin& plugin, host::ListenSocket& socket,
+           const host::ServerSettings& settings) {
+    host::Server server(plugin, socket, settings);
+    std::printf("Listening on %s://%s/qitrmc/Call\n", settings.tls ? "https" : "http",
+                socket.authority().c_str());
+    std::fflush(stdout);
+    serveUntilSignal(server);
+    finishRequests(server);
+}
+
+void runHost(const Options& options) {
+    takeChargeOfSignals();
+    configureDriver(options);
+    const host::ServerSettings settings = settingsOf(options);
+    host::ListenSocket socket(options.address, options.port);
+    const host::Plugin plugin(options.plugin.empty() ? host::findPlugin() : options.plugin);
+    plugin.initialize();
+    try {
+        serve(plugin, socket, settings);
+    } catch (...) {
+        plugin.finalize();
+        throw;
+    }
+    plugin.finalize();
+}
+
+void perform(const Options& options) {
+    if (options.action == host::Action::ShowHelp)
+        std::fputs(host::kHelpText, stdout);
+    else if (options.action == host::Action::ShowVersion)
+        std::fputs(host::kVersionText, stdout);
+    else
+        runHost(options);
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    try {
+        perform(host::parseOptions({argv + 1, argv + argc}));
+        return 0;
+    } catch (const host::UsageError& error) {
+        std::fprintf(stderr, "qitrmc-host: %s\n", error.what());
+        return 2;
+    } catch (const std::exception& error) {
+        std::fprintf(stderr, "qitrmc-host: %s\n", error.what());
+        return 1;
+    }
+}

@@ -1,0 +1,6 @@
+extern "C" {
+void qitrmcInit() {}
+void qitrmcPause() {}
+void qitrmcResume() {}
+void qitrmcFinalize() {}
+}
