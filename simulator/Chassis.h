@@ -1,0 +1,76 @@
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace simulator {
+
+enum class Kind { device, physChan, nvmemArea };
+
+struct Device;
+
+// Something that clients name. Resources live as long as the chassis; their addresses identify
+// them, while their names may change.
+struct Resource {
+    Resource(Kind kind, std::string name, Device& device)
+        : kind(kind), name(std::move(name)), device(&device) {}
+    Resource(const Resource&) = delete;
+    Resource& operator=(const Resource&) = delete;
+
+    // "Mod1" for a device, "Mod1/ch0" for what belongs to one.
+    std::string fullName() const;
+
+    Kind kind;
+    // The part of the name behind the slash, or the whole name of a device.
+    std::string name;
+    // The device that this belongs to; a device belongs to itself.
+    Device* device;
+};
+
+struct Device : Resource {
+    explicit Device(std::string name) : Resource(Kind::device, std::move(name), *this) {}
+
+    uint32_t slot = 0;
+    int32_t category = 0;
+    std::vector<std::unique_ptr<Resource>> physChans;
+    std::vector<std::unique_ptr<Resource>> nvmemAreas;
+    // What stands in the slots of a chassis, owned by the chassis.
+    std::vector<Device*> modules;
+    // The channels and areas by their folded names, without the device's.
+    std::map<std::string, Resource*, std::less<>> parts;
+};
+
+// All resources of the system. Names are looked up without regard to letter case.
+class Chassis {
+  public:
+    // Adds a device behind those present. The name must be free.
+    Device& addDevice(const std::string& name);
+    // Adds a channel or an area to a device. The name must be free on that device.
+    Resource& addPart(Device& device, Kind kind, const std::string& name);
+
+    // Return null when there is no such resource.
+    Device* findDevice(std::string_view name) const;
+    Resource* findPart(const Device& device, std::string_view name) const;
+    // Finds a resource of any kind by its full name.
+    Resource* find(std::string_view fullName) const;
+
+    // Find a resource of one kind, or refuse with a status of that kind.
+    Device& device(std::string_view name) const;
+    Resource& physChan(std::string_view fullName) const;
+    Resource& nvmemArea(std::string_view fullName) const;
+
+    const std::vector<std::unique_ptr<Device>>& devices() const { return all; }
+
+    // The handle of the first session that is opened.
+    uint32_t firstSessionHandle = 1;
+
+  private:
+    std::vector<std::unique_ptr<Device>> all;
+    std::map<std::string, Device*, std::less<>> byName;
+};
+
+}  // namespace simulator

@@ -1,0 +1,101 @@
+#pragma once
+
+#include <cstdint>
+#include <cstdlib>
+#include <initializer_list>
+#include <new>
+#include <string>
+#include <string_view>
+
+#include <rapidjson/document.h>
+
+namespace simulator {
+
+// Memory for the JSON library, which does not look for null itself.
+class ThrowingAllocator {
+  public:
+    static const bool kNeedFree = true;
+    void* Malloc(size_t size) { return size == 0 ? nullptr : checked(std::malloc(size)); }
+    void* Realloc(void* old, size_t, size_t size) {
+        if (size == 0) {
+            std::free(old);
+            return nullptr;
+        }
+        return checked(std::realloc(old, size));
+    }
+    static void Free(void* memory) { std::free(memory); }
+
+  private:
+    static void* checked(void* memory) {
+        if (memory == nullptr) {
+            throw std::bad_alloc();
+        }
+        return memory;
+    }
+};
+
+using JsonAllocator = rapidjson::MemoryPoolAllocator<ThrowingAllocator>;
+using JsonValue = rapidjson::GenericValue<rapidjson::UTF8<>, JsonAllocator>;
+using JsonDocument =
+    rapidjson::GenericDocument<rapidjson::UTF8<>, JsonAllocator, ThrowingAllocator>;
+
+// Thrown where a description is not as it should be.
+struct DescriptionFault {
+    // Where, as a JSON pointer; empty for the whole text.
+    std::string pointer;
+    std::string wrong;
+    std::string right;
+};
+
+// Parses a text, or throws a fault.
+void parseDescription(std::string_view text, JsonDocument& document);
+
+// One value of a description together with its place, for reading it with plain words about what
+// is wrong. The reading functions throw DescriptionFault.
+class Node {
+  public:
+    explicit Node(const JsonValue& value, std::string pointer = "")
+        : value(&value), pointer(std::move(pointer)) {}
+
+    // Makes sure that this is an object with no members but these.
+    void expectMembers(std::initializer_list<std::string_view> allowed) const;
+    bool has(const char* member) const;
+    // The member, which must be there. `right` says what it has to be.
+    Node member(const char* name, const char* right) const;
+
+    std::string text() const;
+    uint32_t unsignedNumber(uint32_t least, uint32_t most) const;
+    int32_t signedNumber() const;
+
+    // Calls visit(Node) for the elements of an array, in order.
+    template <typename Visit>
+    void forEachElement(Visit visit) const {
+        expect(value->IsArray(), "an array");
+        for (rapidjson::SizeType i = 0; i < value->Size(); ++i) {
+            visit(Node((*value)[i], pointer + "/" + std::to_string(i)));
+        }
+    }
+    // Calls visit(name, Node) for the members of an object, in order.
+    template <typename Visit>
+    void forEachMember(Visit visit) const {
+        expect(value->IsObject(), "an object");
+        for (const auto& entry : value->GetObject()) {
+            const std::string name(entry.name.GetString(), entry.name.GetStringLength());
+            visit(name, Node(entry.value, childPointer(name)));
+        }
+    }
+
+    const JsonValue& json() const { return *value; }
+
+    [[noreturn]] void fail(std::string wrong, std::string right) const;
+    // Fails with "has the wrong type" unless the condition holds.
+    void expect(bool condition, const char* right) const;
+
+  private:
+    std::string childPointer(std::string_view name) const;
+
+    const JsonValue* value;
+    std::string pointer;
+};
+
+}  // namespace simulator

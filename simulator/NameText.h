@@ -1,0 +1,24 @@
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace simulator {
+
+// Names are compared without regard to letter case, by full Unicode case folding. Two names are
+// the same exactly when their folded forms are equal bytes. A text that is not UTF-8 folds to
+// itself.
+std::string foldName(std::string_view name);
+
+// Splits a joined text of resources at its commas and writes out the ranges: "Mod1/ch0:2,Mod2"
+// gives "Mod1/ch0", "Mod1/ch1", "Mod1/ch2", "Mod2". An empty text gives no names. Only a name with
+// a slash can be a range. Throws a refusal for a range that is backwards or longer than 1024.
+std::vector<std::string> splitNames(std::string_view joined);
+
+// Says why a text cannot be the name of a device, or returns an empty text when it can.
+std::string nameFault(std::string_view name);
+// The same for the part of a channel's or area's name that stands behind the slash.
+std::string partNameFault(std::string_view name);
+
+}  // namespace simulator

@@ -1,0 +1,15 @@
+#pragma once
+
+#include <cstdint>
+#include <string_view>
+
+#include "qierr_status.h"
+
+namespace simulator {
+
+// Sets the code of a status that is not negative yet, unless it is a warning that would replace a
+// warning, and puts the details into its text. The room for the text is made by the record's own
+// reallocJson; where that fails the code is set and the details are lost.
+void fillStatus(qierr_Status& status, int32_t code, std::string_view text) noexcept;
+
+}  // namespace simulator
