@@ -146,7 +146,8 @@ std::unique_ptr<Chassis> loadChassis() {
         return parseChassis(fromFile ? readFile(path) : std::string(embedded::bench));
     } catch (const DescriptionFault& fault) {
         const std::string name = fromFile ? path : "(built-in chassis)";
-        std::fprintf(stderr, "qitrmcapi: %s: %s %s; %s\n", name.c_str(), fault.pointer.c_str(),
+        const std::string place = fault.pointer.empty() ? "" : fault.pointer + " ";
+        std::fprintf(stderr, "qitrmcapi: %s: %s%s; %s\n", name.c_str(), place.c_str(),
                      fault.wrong.c_str(), fault.right.c_str());
         throw Refusal(code::chassisNotLoaded)
             .usage(tag::fileName, name)

@@ -1,0 +1,228 @@
+#include <array>
+#include <atomic>
+#include <chrono>
+#include <functional>
+#include <future>
+#include <mutex>
+#include <thread>
+
+#include "Driver.h"
+
+using namespace drivertest;
+
+namespace {
+
+constexpr double longTime = 60.0;
+
+std::future<int32_t> reserveLater(Session& session, const char* devices, int32_t access = 3,
+                                  double timeout = longTime) {
+    return std::async(std::launch::async, [&session, devices, access, timeout] {
+        return session.reserve(devices, access, "", timeout);
+    });
+}
+
+bool isReady(const std::future<int32_t>& result) {
+    return result.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
+}
+
+// Acts again and again until the call that it is meant for has come back.
+int32_t resultAfter(std::future<int32_t>& result, const std::function<void()>& act) {
+    while (!isReady(result)) {
+        act();
+        std::this_thread::yield();
+    }
+    return result.get();
+}
+
+// Returns when a call waits to write to a device that another session reads: from then on a
+// reader that is ready to wait has to stand behind it.
+void awaitWriterInQueue(const char* device) {
+    constexpr double patience = 0.05;
+    Session reader;
+    int inARow = 0;
+    while (inARow < 3) {
+        const auto start = std::chrono::steady_clock::now();
+        ASSERT_EQ(reader.reserve(device, 1, "", patience), 0);
+        const std::chrono::duration<double> took = std::chrono::steady_clock::now() - start;
+        inARow = took.count() >= patience ? inARow + 1 : 0;
+        ASSERT_EQ(reader.unreserve(device), 0);
+    }
+}
+
+TEST(WaitTest, AReservationWaitsUntilTheDeviceIsFree) {
+    Session holder("Mod1", 1);
+    Session other;
+    auto result = reserveLater(other, "Mod1");
+    awaitWriterInQueue("Mod1");
+    EXPECT_FALSE(isReady(result));
+    holder.close();
+    EXPECT_EQ(result.get(), 0);
+    EXPECT_EQ(other.list("Session.ReservedDevices"), Names{"Mod1"});
+}
+
+TEST(WaitTest, AnOpeningWaitsUntilTheDeviceIsFree) {
+    Session holder("Mod1", 1);
+    auto opening = std::async(std::launch::async, [] {
+        Status status;
+        Handle handle = 0;
+        nQITRMCAPI100_initializeSessionWithDevices(&handle, "Mod1", 60.0, 3, "", longTime, &status);
+        Status closing;
+        nQITRMCAPI100_closeSession(handle, &closing);
+        return status.code;
+    });
+    awaitWriterInQueue("Mod1");
+    EXPECT_FALSE(isReady(opening));
+    EXPECT_EQ(holder.unreserve("Mod1"), 0);
+    EXPECT_EQ(opening.get(), 0);
+}
+
+TEST(WaitTest, AReservationWaitsForAllItsDevices) {
+    Session first("Mod1", 1);
+    Session second("Mod2");
+    Session other;
+    auto result = reserveLater(other, "Mod1,Mod2");
+    awaitWriterInQueue("Mod1");
+    first.close();
+    EXPECT_FALSE(isReady(result));
+    second.close();
+    EXPECT_EQ(result.get(), 0);
+}
+
+TEST(WaitTest, GivingUpWriteAccessLetsWaitingReadersIn) {
+    Session holder("Mod1", 3);
+    Session other;
+    auto result = reserveLater(other, "Mod1", 1);
+    EXPECT_EQ(holder.reserve("Mod1", 1), 0);
+    EXPECT_EQ(result.get(), 0);
+}
+
+TEST(WaitTest, AbortEndsTheWaitsOfItsSessionOnly) {
+    Session holder("Mod1,Mod2");
+    Session aborted;
+    Session patient;
+    auto endsEarly = reserveLater(aborted, "Mod1");
+    auto goesOn = reserveLater(patient, "Mod2");
+    EXPECT_EQ(resultAfter(endsEarly, [&] { aborted.abort(); }), -250963);
+    EXPECT_FALSE(isReady(goesOn));
+    holder.close();
+    EXPECT_EQ(goesOn.get(), 0);
+    EXPECT_EQ(aborted.reserve("Mod1"), 0);
+}
+
+TEST(WaitTest, AbortEndsAllWaitsOfASession) {
+    Session holder("Mod1,Mod2");
+    Session session;
+    auto first = reserveLater(session, "Mod1");
+    auto second = reserveLater(session, "Mod2");
+    EXPECT_EQ(resultAfter(first, [&] { session.abort(); }), -250963);
+    EXPECT_EQ(resultAfter(second, [&] { session.abort(); }), -250963);
+}
+
+TEST(WaitTest, ClosingEndsTheWaitsOfTheSession) {
+    Session holder("Mod1", 1);
+    Session session;
+    auto result = reserveLater(session, "Mod1");
+    awaitWriterInQueue("Mod1");
+    Status status;
+    nQITRMCAPI100_closeSession(session, &status);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(result.get(), -250955);
+    session.handle = 0;
+    EXPECT_EQ(holder.reserve("Mod1", 3), 0);
+}
+
+TEST(WaitTest, WaitsAreServedInTheOrderOfArrival) {
+    Session holder("Mod1,Mod2,Mod4,Mod5", 1);
+    // Each wants the same device, and one more by which its arrival is seen.
+    const std::array<const char*, 3> wanted{"Mod1,Mod2", "Mod1,Mod4", "Mod1,Mod5"};
+    const std::array<const char*, 3> signs{"Mod2", "Mod4", "Mod5"};
+    std::mutex mutex;
+    std::vector<size_t> order;
+    std::vector<std::future<int32_t>> results;
+    for (size_t i = 0; i < wanted.size(); ++i) {
+        results.push_back(std::async(std::launch::async, [&, i] {
+            Session session;
+            const int32_t code = session.reserve(wanted[i], 3, "", longTime);
+            const std::lock_guard<std::mutex> lock(mutex);
+            order.push_back(i);
+            return code;
+        }));
+        awaitWriterInQueue(signs[i]);
+    }
+    holder.close();
+    for (auto& result : results) {
+        EXPECT_EQ(result.get(), 0);
+    }
+    EXPECT_EQ(order, (std::vector<size_t>{0, 1, 2}));
+}
+
+TEST(WaitTest, WhoeverGivesUpWaitingDoesNotHoldUpThoseBehind) {
+    Session holder("Mod1", 1);
+    Session writer;
+    Session reader;
+    auto writing = reserveLater(writer, "Mod1", 3);
+    awaitWriterInQueue("Mod1");
+    auto reading = reserveLater(reader, "Mod1", 1);
+    EXPECT_EQ(resultAfter(writing, [&] { writer.abort(); }), -250963);
+    EXPECT_EQ(reading.get(), 0);
+}
+
+TEST(WaitTest, OtherSessionsGoOnWhileOneWaits) {
+    Session holder("Mod1", 1);
+    Session waiting;
+    auto result = reserveLater(waiting, "Mod1");
+    awaitWriterInQueue("Mod1");
+    Session other("Mod2");
+    EXPECT_EQ(other.systemList("Sys.Devices").size(), 5u);
+    EXPECT_EQ(waiting.list("Session.ReservedDevices"), Names());
+    holder.close();
+    EXPECT_EQ(result.get(), 0);
+}
+
+// Hundreds of sessions take turns; a device has one writer at any time.
+TEST(WaitTest, ADeviceHasOneHolderAtATime) {
+    constexpr int threads = 16;
+    constexpr int rounds = 25;
+    const std::array<const char*, 4> devices{"Mod1", "Mod2", "Mod4", "Mod5"};
+    std::array<std::atomic<int>, 4> holders{};
+    std::atomic<int> failures{0};
+    std::vector<std::thread> workers;
+    for (int worker = 0; worker < threads; ++worker) {
+        workers.emplace_back([&, worker] {
+            for (int round = 0; round < rounds; ++round) {
+                const size_t index = static_cast<size_t>(worker + round) % devices.size();
+                Status status;
+                Handle handle = 0;
+                nQITRMCAPI100_initializeSessionWithDevices(&handle, devices[index], 60.0, 3, "",
+                                                           longTime, &status);
+                failures += status.code != 0;
+                failures += holders[index]++ != 0;
+                holders[index]--;
+                Status closing;
+                nQITRMCAPI100_closeSession(handle, &closing);
+                failures += closing.code != 0;
+            }
+        });
+    }
+    for (std::thread& worker : workers) {
+        worker.join();
+    }
+    EXPECT_EQ(failures, 0);
+}
+
+TEST(WaitTest, HundredsOfThreadsWaitForOneDevice) {
+    Session holder("Mod4");
+    std::vector<std::future<int32_t>> results;
+    for (int i = 0; i < 200; ++i) {
+        results.push_back(std::async(std::launch::async, [] {
+            Session session;
+            return session.reserve("Mod4", 3, "", longTime);
+        }));
+    }
+    holder.close();
+    for (auto& result : results) {
+        EXPECT_EQ(result.get(), 0);
+    }
+}
+
+}  // namespace

@@ -1,0 +1,29 @@
+#!/usr/bin/python3
+"""Fails unless a shared library exports exactly the functions of a C header.
+
+usage: check_exports.py NM LIBRARY HEADER
+"""
+
+import re
+import subprocess
+import sys
+from pathlib import Path
+
+
+def main():
+    nm, library, header = sys.argv[1:]
+    text = re.sub(r"/\*.*?\*/", "", Path(header).read_text(encoding="utf-8"), flags=re.S)
+    declared = set(re.findall(r"\b(nQITRMCAPI100_\w+)\(", text))
+    table = subprocess.run(
+        [nm, "-D", "--defined-only", library], check=True, capture_output=True, text=True
+    )
+    exported = {line.split()[-1] for line in table.stdout.splitlines()}
+    for name in sorted(declared - exported):
+        print(f"declared but not exported: {name}")
+    for name in sorted(exported - declared):
+        print(f"exported but not declared: {name}")
+    sys.exit(1 if declared != exported or not declared else 0)
+
+
+if __name__ == "__main__":
+    main()
