@@ -1,0 +1,145 @@
+#include "jsonz/scan.h"
+
+#include <cstring>
+
+namespace jsonz {
+
+const char* skipWhiteSpace(const char* position) {
+    while (*position == ' ' || *position == '\t' || *position == '\r' || *position == '\n') {
+        ++position;
+    }
+    return position;
+}
+
+int hexDigit(char c) {
+    if (isDigit(c)) {
+        return c - '0';
+    }
+    if (c >= 'a' && c <= 'f') {
+        return c - 'a' + 10;
+    }
+    if (c >= 'A' && c <= 'F') {
+        return c - 'A' + 10;
+    }
+    return -1;
+}
+
+const char* fail(jsonz_value* value, const char* position, jsonz_error error) {
+    *value = jsonz_value{};
+    value->position = position;
+    value->error = error;
+    return nullptr;
+}
+
+namespace {
+
+const char* skipDigits(const char* position) {
+    while (isDigit(*position)) {
+        ++position;
+    }
+    return position;
+}
+
+// Passes one escape sequence, from the character behind the backslash on. On a fault *valid turns
+// false and the result is the first character that does not fit.
+const char* skipEscape(const char* position, bool* valid) {
+    if (*position != 'u') {
+        *valid = *position != '\0' && std::strchr("\"/\\bfnrt", *position) != nullptr;
+        return *valid ? position + 1 : position;
+    }
+    ++position;
+    for (int digits = 0; digits < 4; ++digits, ++position) {
+        if (hexDigit(*position) < 0) {
+            *valid = false;
+            return position;
+        }
+    }
+    return position;
+}
+
+const char* readNumber(const char* position, jsonz_value* value) {
+    const char* p = skipDigits(*position == '-' ? position + 1 : position);
+    bool isReal = false;
+    if (*p == '.') {
+        isReal = true;
+        p = skipDigits(p + 1);
+    }
+    if (*p == 'e' || *p == 'E') {
+        isReal = true;
+        ++p;
+        if (*p != '+' && *p != '-' && !isDigit(*p)) {
+            return fail(value, p, jsonz_errorNone);
+        }
+        p = skipDigits(p + 1);
+    }
+    *value = jsonz_value{};
+    value->type = jsonz_typeNumber;
+    value->isReal = isReal;
+    value->text = position;
+    value->length = static_cast<std::size_t>(p - position);
+    return p;
+}
+
+const char* readKeyword(const char* position, jsonz_value* value) {
+    static constexpr struct {
+        const char* text;
+        std::size_t length;
+        jsonz_type type;
+        bool boolValue;
+    } keywords[] = {
+        {"true", 4, jsonz_typeBoolean, true},
+        {"false", 5, jsonz_typeBoolean, false},
+        {"null", 4, jsonz_typeNull, false},
+    };
+    for (const auto& keyword : keywords) {
+        if (std::strncmp(position, keyword.text, keyword.length) == 0) {
+            *value = jsonz_value{};
+            value->type = keyword.type;
+            value->boolValue = keyword.boolValue;
+            return position + keyword.length;
+        }
+    }
+    // The string is the first kind of value that is looked for, so its fault is the one reported
+    // where no value begins.
+    return fail(value, position, jsonz_errorDoubleQuoteExpected);
+}
+
+}  // namespace
+
+const char* readString(const char* position, jsonz_value* value) {
+    if (*position != '"') {
+        return fail(value, position, jsonz_errorDoubleQuoteExpected);
+    }
+    const char* p = position + 1;
+    while (*p != '"') {
+        if (static_cast<unsigned char>(*p) < 0x20) {
+            return fail(value, p, jsonz_errorDoubleQuoteExpected);
+        }
+        if (*p != '\\') {
+            ++p;
+            continue;
+        }
+        bool valid = true;
+        p = skipEscape(p + 1, &valid);
+        if (!valid) {
+            return fail(value, p, jsonz_errorInvalidStringSequence);
+        }
+    }
+    *value = jsonz_value{};
+    value->type = jsonz_typeString;
+    value->text = position + 1;
+    value->length = static_cast<std::size_t>(p - value->text);
+    return p + 1;
+}
+
+const char* readScalar(const char* position, jsonz_value* value) {
+    if (*position == '"') {
+        return readString(position, value);
+    }
+    if (*position == '-' || isDigit(*position)) {
+        return readNumber(position, value);
+    }
+    return readKeyword(position, value);
+}
+
+}  // namespace jsonz

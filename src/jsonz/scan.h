@@ -1,0 +1,28 @@
+#pragma once
+
+#include "jsonz/jsonz.h"
+
+// The readers of single tokens, shared by the sources of this folder.
+namespace jsonz {
+
+const char* skipWhiteSpace(const char* position);
+
+inline bool isDigit(char c) {
+    return c >= '0' && c <= '9';
+}
+
+// The value of a hexadecimal digit, or -1.
+int hexDigit(char c);
+
+// Reads a string, number or keyword at `position`, which stands on no white space. Always fills
+// `value`; returns the position behind the token, or null.
+const char* readScalar(const char* position, jsonz_value* value);
+const char* readString(const char* position, jsonz_value* value);
+
+// Fills `value` with a failure; returns null.
+const char* fail(jsonz_value* value, const char* position, jsonz_error error);
+
+// Reads the container whose opening bracket is at `position`. As readScalar.
+const char* readContainer(const char* position, jsonz_value* value);
+
+}  // namespace jsonz
