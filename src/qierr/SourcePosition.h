@@ -11,8 +11,7 @@ struct qierr_SourcePosition {
 };
 
 // The position of this line in the service.
-#define QITRMC_HERE \
-    (qierr_SourcePosition{__FILE__, __LINE__, "qitrmcsvc", nullptr})
+#define QITRMC_HERE (qierr_SourcePosition{__FILE__, __LINE__, "qitrmcsvc", nullptr})
 
 // The position of this line, with the symbolic name of the code that is about to be set.
 #define QIERR_HERE_NAMED(errorConstant) \
