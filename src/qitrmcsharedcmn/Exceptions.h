@@ -38,6 +38,9 @@ class InternalError : virtual public qierr::ExceptionBase, virtual public std::e
     const char* what() const noexcept override;
 };
 
+// What a captured exception without a status is reported at. Its own place is unknown.
+inline constexpr qierr_SourcePosition capturePosition = QITRMC_HERE;
+
 // Turns the exception in flight into a status, from inside a handler: a status that it carries is
 // taken over; an allocation failure becomes -250801 and any other std::exception -250800 with its
 // text. Any other kind of exception passes through.

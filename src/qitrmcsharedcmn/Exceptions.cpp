@@ -1,0 +1,58 @@
+#include "qitrmcsharedcmn/Exceptions.h"
+
+#include <new>
+
+namespace nQITRMCSHAREDCMN100 {
+
+BasicError::BasicError(std::int32_t code, const qierr_SourcePosition& position) noexcept {
+    qierr_Status_setCodeAt(status(), code, position);
+}
+
+BasicError::BasicError(const qierr_SourcePosition& position) noexcept
+    : BasicError(internalErrorCode, position) {}
+
+BasicError::BasicError(const BasicError& source) noexcept
+    : ExceptionBase(source), std::exception(source) {}
+
+BasicError::~BasicError() = default;
+
+const char* BasicError::what() const noexcept {
+    return status()->json;
+}
+
+InternalError::InternalError(const char* comment, const qierr_SourcePosition& position) noexcept {
+    qierr_Status_setCodeAt(status(), internalErrorCode, position);
+    addComment(qierr_orderedData(translatorName, status()), comment);
+}
+
+InternalError::InternalError(const InternalError& source) noexcept
+    : ExceptionBase(source), std::exception(source) {}
+
+InternalError::~InternalError() = default;
+
+const char* InternalError::what() const noexcept {
+    return status()->json;
+}
+
+void captureCurrentException(qierr_Status* status) {
+    try {
+        throw;
+    } catch (qierr::ExceptionBase& error) {
+        qierr_Status_take(status, error.status());
+    } catch (const std::bad_alloc&) {
+        qierr_Status_setCodeAt(status, outOfMemoryCode, capturePosition);
+    } catch (const std::exception& error) {
+        if (qierr_Status_setCodeAt(status, internalErrorCode, capturePosition) != 0) {
+            qierr_Writer_addString(qierr_Status_writerAtEnd(status), "std_exception_what",
+                                   error.what());
+        }
+    }
+}
+
+ThrowingStatus::~ThrowingStatus() noexcept(false) {
+    if (code < 0 && std::uncaught_exceptions() == 0) {
+        throw qierr::Exception(this);
+    }
+}
+
+}  // namespace nQITRMCSHAREDCMN100
