@@ -1,0 +1,55 @@
+#!/usr/bin/python3
+"""Writes the table of embedded files as one C++ source: embed.py OUTPUT FILE..."""
+
+import sys
+from pathlib import Path
+
+# Characters that stand for themselves in a C++ string literal. A question mark is left out, since
+# older language levels read two of them as the start of another character.
+PLAIN = frozenset(range(0x20, 0x7F)) - frozenset(b'"\\?')
+
+
+def escaped(line: bytes) -> str:
+    # Always three octal digits, so that a digit after the escape is not taken for a part of it.
+    return "".join(chr(byte) if byte in PLAIN else f"\\{byte:03o}" for byte in line)
+
+
+def literal(data: bytes) -> str:
+    lines = data.splitlines(keepends=True) or [b""]
+    return "\n".join(f'    "{escaped(line)}"' for line in lines)
+
+
+def definition(index: int, data: bytes) -> str:
+    return (
+        f"constexpr char data{index}[] =\n{literal(data)};\n"
+        f"constexpr std::uint32_t size{index} = {len(data)};\n"
+        f"static_assert(sizeof(data{index}) == size{index} + 1u);\n"
+    )
+
+
+def table(paths: list[Path]) -> str:
+    definitions = "\n".join(
+        definition(index, path.read_bytes()) for index, path in enumerate(paths)
+    )
+    rows = "\n".join(
+        f'    {{"{escaped(path.name.encode())}", data{index}, size{index}}},'
+        for index, path in enumerate(paths)
+    )
+    return (
+        '#include "embedded/EmbeddedFiles.h"\n\n'
+        f"namespace {{\n\n{definitions}\n"
+        f"constexpr EmbeddedFile files[] = {{\n{rows}\n}};\n\n"
+        "}  // namespace\n\n"
+        "EmbeddedFiles embeddedFiles() noexcept {\n"
+        f"    return {{files, files + {len(paths)}}};\n"
+        "}\n"
+    )
+
+
+def main() -> None:
+    output, *inputs = map(Path, sys.argv[1:])
+    output.write_text(table(inputs), encoding="ascii")
+
+
+if __name__ == "__main__":
+    main()
