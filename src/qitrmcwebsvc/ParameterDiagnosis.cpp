@@ -1,0 +1,121 @@
+#include "qitrmcwebsvc/ParameterDiagnosis.h"
+
+#include <boost/format.hpp>
+
+#include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/JsonRpcCodes.h"
+#include "qitrmcwebsvcerr/ErrorDescriptions.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+using nQITRMCSHAREDCMN100::BasicError;
+using nQITRMCSHAREDCMN100::InternalError;
+
+const JsonValue* resolve(const JsonValue& schema, const std::string& pointerText) {
+    const JsonPointer pointer(pointerText.data(), pointerText.size());
+    return pointer.IsValid() ? pointer.Get(schema) : nullptr;
+}
+
+const JsonValue* findMember(const JsonValue* object, const std::string& name) {
+    if (!object || !object->IsObject())
+        return nullptr;
+    const auto member = object->FindMember(name.c_str());
+    return member == object->MemberEnd() ? nullptr : &member->value;
+}
+
+std::string filledIn(const char* descriptionName, const std::string& value) {
+    return (boost::format(getErrorDescription(descriptionName)) % value).str();
+}
+
+// The value of a keyword, by the pointer to the schema that has it.
+const JsonValue& keywordValue(const JsonValue& schema, const SchemaFailure& failure) {
+    const JsonValue* const value = resolve(schema, failure.schemaPointer + "/" + failure.keyword);
+    if (!value)
+        throw InternalError("Invalid schema format.", QITRMC_HERE);
+    return *value;
+}
+
+std::string stringOf(const JsonValue& value) {
+    if (!value.IsString())
+        throw InternalError("Invalid schema format.", QITRMC_HERE);
+    return value.GetString();
+}
+
+std::string enumEntry(const JsonValue& entry) {
+    if (entry.IsInt())
+        return std::to_string(entry.GetInt());
+    if (entry.IsString())
+        return entry.GetString();
+    throw InternalError("Unsupported data type for enums.", QITRMC_HERE);
+}
+
+std::string joined(const JsonValue& array, std::string (*textOf)(const JsonValue&)) {
+    if (!array.IsArray())
+        throw InternalError("Invalid schema format.", QITRMC_HERE);
+    std::string text;
+    for (const JsonValue& entry : array.GetArray()) {
+        if (&entry != array.Begin())
+            text += ", ";
+        text += textOf(entry);
+    }
+    return text;
+}
+
+std::string compactJson(const JsonValue& value) {
+    JsonBuffer text;
+    JsonWriter writer(text);
+    value.Accept(writer);
+    return std::string(text.GetString(), text.GetSize());
+}
+
+std::string describeKeyword(const JsonValue& schema, const SchemaFailure& failure) {
+    const std::string& keyword = failure.keyword;
+    const auto value = [&]() -> const JsonValue& { return keywordValue(schema, failure); };
+
+    if (keyword == "type")
+        return filledIn("WrongParameterType", stringOf(value()));
+    if (keyword == "required")
+        return filledIn("ParameterRequired", joined(value(), stringOf));
+    if (keyword == "enum")
+        return filledIn("InvalidEnumItem", joined(value(), enumEntry));
+    if (keyword == "additionalProperties")
+        return getErrorDescription("UnsupportedParams");
+    if (keyword == "minimum")
+        return filledIn("LessThanMinValue", compactJson(value()));
+    if (keyword == "maximum")
+        return filledIn("GreaterThanMaxValue", compactJson(value()));
+    return "";
+}
+
+}  // namespace
+
+std::string describeFailure(const JsonValue& schema, const SchemaFailure& failure) {
+    const JsonValue* const broken = resolve(schema, failure.schemaPointer);
+    if (!findMember(broken, failure.keyword))
+        return "";
+
+    const JsonValue* const name = findMember(broken, failure.keyword + "ErrorDescription");
+    if (name && name->IsString())
+        return getErrorDescription(name->GetString());
+    return describeKeyword(schema, failure);
+}
+
+void throwInvalidParams(const JsonValue& schema, const SchemaFailure& failure) {
+    const std::string details = describeFailure(schema, failure);
+    const char* const documentPointer = failure.documentPointer.c_str();
+
+    BasicError error(invalidParamsCode, QITRMC_HERE);
+    qierr_Writer writer = error.details();
+    if (!details.empty()) {
+        writer = addUsageString(writer, "kUsageTypeParameter", documentPointer);
+        addUsageString(writer, "kUsageTypeDetails", details.c_str());
+    } else {
+        writer = addUsageString(writer, "kUsageTypeJsonDocPointer", documentPointer);
+        writer = addUsageString(writer, "kUsageTypeJsonSchemaKeyword", failure.keyword.c_str());
+        addUsageString(writer, "kUsageTypeJsonSchemaPointer", failure.schemaPointer.c_str());
+    }
+    throw error;
+}
+
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,56 @@
+#include "qitrmcwebsvc/SingleRequest.h"
+
+#include <cstring>
+#include <utility>
+
+#include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/JsonRpcCodes.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+using nQITRMCSHAREDCMN100::BasicError;
+
+const JsonValue* findMember(const JsonValue& object, const char* name) {
+    const auto member = object.FindMember(name);
+    return member == object.MemberEnd() ? nullptr : &member->value;
+}
+
+[[noreturn]] void throwInvalidMember(const char* name, const qierr_SourcePosition& position) {
+    BasicError error(invalidRequestCode, position);
+    addUsageString(error.details(), "kUsageTypeInvalidMember", name);
+    throw error;
+}
+
+void checkEnvelope(const JsonValue& value) {
+    if (!value.IsObject() || value.ObjectEmpty())
+        throw BasicError(invalidRequestCode, QITRMC_HERE);
+
+    const JsonValue* const id = findMember(value, "id");
+    if (!id || !(id->IsInt() || id->IsString()))
+        throwInvalidMember("id", QITRMC_HERE);
+
+    const JsonValue* const version = findMember(value, "jsonrpc");
+    if (!version || !version->IsString() || std::strcmp(version->GetString(), "2.0") != 0)
+        throwInvalidMember("jsonrpc", QITRMC_HERE);
+
+    const JsonValue* const method = findMember(value, "method");
+    if (!method || !method->IsString())
+        throwInvalidMember("method", QITRMC_HERE);
+}
+
+}  // namespace
+
+SingleRequest::SingleRequest(JsonValue& value) {
+    checkEnvelope(value);
+    method = value["method"].GetString();
+    request = std::move(value);
+}
+
+const JsonValue& SingleRequest::getParams() const {
+    static const JsonValue absent;
+    const JsonValue* const params = findMember(request, "params");
+    return params ? *params : absent;
+}
+
+}  // namespace nQITRMCWEBSVC100
