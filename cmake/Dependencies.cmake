@@ -12,3 +12,4 @@ target_include_directories(rapidjson SYSTEM INTERFACE "${RAPIDJSON_INCLUDE_DIR}"
 # The library's own choice aligns to 4 bytes on a 32-bit target, where doubles and 64-bit integers
 # need 8.
 target_compile_options(rapidjson INTERFACE "-DRAPIDJSON_ALIGN(x)=(((x)+7u)&~7u)")
+target_compile_definitions(rapidjson INTERFACE RAPIDJSON_HAS_STDSTRING=1)

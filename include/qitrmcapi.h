@@ -76,9 +76,9 @@ void nQITRMCAPI100_initializeSessionWithoutResources(nQITRMCAPI100_Session* sess
  * session holds; 0 does not wait.
  * Fails with -250811 when a device is still held by another session at the end of the wait.
  */
-void nQITRMCAPI100_initializeSessionWithDevices(nQITRMCAPI100_Session* session,
-                                                const char* devices, double timeout,
-                                                int32_t access, const char* reservationGroup,
+void nQITRMCAPI100_initializeSessionWithDevices(nQITRMCAPI100_Session* session, const char* devices,
+                                                double timeout, int32_t access,
+                                                const char* reservationGroup,
                                                 double reservationTimeout, qierr_Status* status);
 void nQITRMCAPI100_initializeSessionWithPhysChans(nQITRMCAPI100_Session* session,
                                                   const char* physicalChannels, double timeout,
@@ -87,8 +87,7 @@ void nQITRMCAPI100_initializeSessionWithPhysChans(nQITRMCAPI100_Session* session
 void nQITRMCAPI100_initializeSessionWithNvmemAreas(nQITRMCAPI100_Session* session,
                                                    const char* nvmemAreas, double timeout,
                                                    int32_t access, const char* reservationGroup,
-                                                   double reservationTimeout,
-                                                   qierr_Status* status);
+                                                   double reservationTimeout, qierr_Status* status);
 
 /* Closes a session and gives up its reservations, connections, open properties and commands. */
 void nQITRMCAPI100_closeSession(nQITRMCAPI100_Session session, qierr_Status* status);
@@ -131,9 +130,9 @@ void nQITRMCAPI100_getSystemPropertyDouble(nQITRMCAPI100_Session session, const 
                                            double* value, qierr_Status* status);
 void nQITRMCAPI100_getSystemPropertyUInt64(nQITRMCAPI100_Session session, const char* property,
                                            uint64_t* value, qierr_Status* status);
-void nQITRMCAPI100_getSystemPropertyStringArray(nQITRMCAPI100_Session session,
-                                                const char* property, char*** array,
-                                                uint32_t* count, qierr_Status* status);
+void nQITRMCAPI100_getSystemPropertyStringArray(nQITRMCAPI100_Session session, const char* property,
+                                                char*** array, uint32_t* count,
+                                                qierr_Status* status);
 void nQITRMCAPI100_setSystemPropertyBool(nQITRMCAPI100_Session session, const char* property,
                                          uint8_t value, qierr_Status* status);
 void nQITRMCAPI100_setSystemPropertyDouble(nQITRMCAPI100_Session session, const char* property,
@@ -180,10 +179,9 @@ void nQITRMCAPI100_getGenericPropertyUInt32(nQITRMCAPI100_Session session, const
 void nQITRMCAPI100_getGenericPropertyUInt64(nQITRMCAPI100_Session session, const char* resources,
                                             const char* property, uint64_t* value,
                                             qierr_Status* status);
-void nQITRMCAPI100_getGenericPropertyBoolArray(nQITRMCAPI100_Session session,
-                                               const char* resources, const char* property,
-                                               uint8_t** array, uint32_t* count,
-                                               qierr_Status* status);
+void nQITRMCAPI100_getGenericPropertyBoolArray(nQITRMCAPI100_Session session, const char* resources,
+                                               const char* property, uint8_t** array,
+                                               uint32_t* count, qierr_Status* status);
 void nQITRMCAPI100_getGenericPropertyDoubleArray(nQITRMCAPI100_Session session,
                                                  const char* resources, const char* property,
                                                  double** array, uint32_t* count,
@@ -229,10 +227,9 @@ void nQITRMCAPI100_setGenericPropertyUInt32(nQITRMCAPI100_Session session, const
 void nQITRMCAPI100_setGenericPropertyUInt64(nQITRMCAPI100_Session session, const char* resources,
                                             const char* property, uint64_t value,
                                             qierr_Status* status);
-void nQITRMCAPI100_setGenericPropertyBoolArray(nQITRMCAPI100_Session session,
-                                               const char* resources, const char* property,
-                                               const uint8_t* array, uint32_t count,
-                                               qierr_Status* status);
+void nQITRMCAPI100_setGenericPropertyBoolArray(nQITRMCAPI100_Session session, const char* resources,
+                                               const char* property, const uint8_t* array,
+                                               uint32_t count, qierr_Status* status);
 void nQITRMCAPI100_setGenericPropertyDoubleArray(nQITRMCAPI100_Session session,
                                                  const char* resources, const char* property,
                                                  const double* array, uint32_t count,
@@ -267,8 +264,7 @@ void nQITRMCAPI100_commitPropertiesGeneric(nQITRMCAPI100_Session session, const 
 /* Opens a property of the system or of the session, or one that the driver defines for a kind of
  * resource. */
 void nQITRMCAPI100_openDriverDefinedProperty(nQITRMCAPI100_Session session, const char* property,
-                                             nQITRMCAPI100_Property* handle,
-                                             qierr_Status* status);
+                                             nQITRMCAPI100_Property* handle, qierr_Status* status);
 /* Opens a property that one resource defines for itself. */
 void nQITRMCAPI100_openGenericProperty(nQITRMCAPI100_Session session, const char* resource,
                                        const char* property, nQITRMCAPI100_Property* handle,
@@ -298,8 +294,7 @@ void nQITRMCAPI100_getPropertyPropertyStringArray(nQITRMCAPI100_Property handle,
 
 /* Runs a command on resources. timeout: how long it may take. */
 void nQITRMCAPI100_executeGenericCommand(nQITRMCAPI100_Session session, const char* resources,
-                                         const char* command, double timeout,
-                                         qierr_Status* status);
+                                         const char* command, double timeout, qierr_Status* status);
 /* Opens a command to read its attributes. */
 void nQITRMCAPI100_openGenericCommand(nQITRMCAPI100_Session session, const char* resources,
                                       const char* command, nQITRMCAPI100_Command* handle,

@@ -56,8 +56,7 @@ typedef qixlatormgr_Session* (*qixlatormgr_createSession_fn)(qierr_Status* statu
 typedef void (*qixlatormgr_destroySession_fn)(qixlatormgr_Session* session);
 typedef XlatorInterface* (*qixlatormgr_createXlator_fn)(qixlatormgr_Session* session,
                                                         const char* name, qierr_Status* status);
-typedef void (*qixlatormgr_destroyXlator_fn)(qixlatormgr_Session* session,
-                                             XlatorInterface* xlator);
+typedef void (*qixlatormgr_destroyXlator_fn)(qixlatormgr_Session* session, XlatorInterface* xlator);
 
 /*
  * Exported by a program that lends its translators, for the manager to call: makes the translator

@@ -1,3 +1,5 @@
 #include "qisysq/installRoot.h"
 
-const char* qisysq_installRoot() { return QITRMC_ROOT; }
+const char* qisysq_installRoot() {
+    return QITRMC_ROOT;
+}

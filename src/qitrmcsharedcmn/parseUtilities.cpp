@@ -123,19 +123,27 @@ ParsedName parseName(const std::string& name, NameKind kind) {
     return colon != std::string::npos ? parseRange(name, kind, colon) : parseSingle(name);
 }
 
-std::vector<std::string> expandNames(const std::string& names, NameKind kind) {
-    std::vector<std::string> result;
+void appendExpanded(std::vector<std::string>& list, const std::string& names, NameKind kind) {
     forEachPart(names, [&](std::string part) {
         const ParsedName parsed = parseName(part, kind);
         if (!parsed.hasNumber) {
-            result.push_back(std::move(part));
+            list.push_back(std::move(part));
             return;
         }
-        for (std::uint32_t i = 0; i <= parsed.end - parsed.start; ++i) {
-            result.push_back(parsed.prefix + std::to_string(parsed.start + i));
+        const std::size_t count = parsed.end - parsed.start + std::size_t{1};
+        if (count > 1 && list.size() + count > maxNamesWithRanges) {
+            refuse(part, QITRMC_HERE);
+        }
+        for (std::uint32_t i = 0; i < count; ++i) {
+            list.push_back(parsed.prefix + std::to_string(parsed.start + i));
         }
     });
-    return result;
+}
+
+std::vector<std::string> expandNames(const std::string& names, NameKind kind) {
+    std::vector<std::string> list;
+    appendExpanded(list, names, kind);
+    return list;
 }
 
 std::string compressNames(const std::vector<std::string>& names, NameKind kind) {

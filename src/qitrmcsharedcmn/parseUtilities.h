@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <vector>
@@ -29,9 +30,15 @@ struct ParsedName {
 // Takes one name apart. A range holds 1024 names at most and does not run backwards.
 ParsedName parseName(const std::string& name, NameKind kind);
 
+// How many names a list may hold when a range adds to it. A short text can ask for a thousand names
+// many times over; this keeps a request from filling the controller's memory with them.
+constexpr std::size_t maxNamesWithRanges = 65536;
+
 // The names of a list in order, ranges written out. Numbers lose leading zeros, single ones too.
 // Empty parts are kept: an empty text is a list of one empty name.
 std::vector<std::string> expandNames(const std::string& names, NameKind kind);
+// The same, behind the names that `list` holds already.
+void appendExpanded(std::vector<std::string>& list, const std::string& names, NameKind kind);
 
 // The shortest list of single names: each run of consecutive numbers becomes a range. A name that
 // is a range itself and continues a run adds one to it only.

@@ -1,0 +1,33 @@
+#include "qitrmcwebsvc/ProcedureFactory.h"
+
+#include <utility>
+
+#include "embedded/EmbeddedFiles.h"
+#include "qitrmcwebsvc/SchemaValidator.h"
+#include "qitrmcwebsvc/SessionManager.h"
+#include "qitrmcwebsvc/procedure/AbortSession.h"
+#include "qitrmcwebsvc/procedure/CloseSession.h"
+#include "qitrmcwebsvc/procedure/InitializeSession.h"
+
+namespace nQITRMCWEBSVC100 {
+
+ProcedureFactory::ProcedureFactory() : sessionManager(std::make_shared<SessionManager>()) {}
+
+template <typename Class>
+std::shared_ptr<IProcedure> ProcedureFactory::makeProcedure(const char* schemaFile) const {
+    std::shared_ptr<ISchemaValidator> validator =
+        std::make_shared<SchemaValidator>(embeddedText(schemaFile));
+    return std::make_shared<Class>(sessionManager, std::move(validator));
+}
+
+#define QITRMC_METHOD(name, Class, schema)                        \
+    std::shared_ptr<IProcedure> ProcedureFactory::make##Class() { \
+        return makeProcedure<Class>(schema);                      \
+    }
+#define QITRMC_METHOD_TO_COME(name, Class, schema)                \
+    std::shared_ptr<IProcedure> ProcedureFactory::make##Class() { \
+        return nullptr;                                           \
+    }
+#include "qitrmcwebsvc/methods.def"
+
+}  // namespace nQITRMCWEBSVC100

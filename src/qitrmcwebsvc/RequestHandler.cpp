@@ -1,0 +1,136 @@
+#include "qitrmcwebsvc/RequestHandler.h"
+
+#include <exception>
+
+#include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/requestText.h"
+
+namespace nQITRMCWEBSVC100 {
+
+using namespace nQITRMCSHAREDCMN100;
+
+namespace {
+
+constexpr std::int32_t invalidRequestCode = -32600;
+constexpr std::int32_t unknownMethodCode = -32601;
+constexpr std::int32_t skippedCode = -32001;
+
+void addDefaultParamsToObject(JsonValue& value, JsonPool& allocator) {
+    if (value.IsObject() && !value.HasMember("params"))
+        value.AddMember("params", JsonValue(rapidjson::kObjectType), allocator);
+}
+
+// The id as it was sent, whatever its type; null where there is none.
+JsonValue copyId(const JsonValue& requestValue, JsonPool& allocator) {
+    if (!requestValue.IsObject())
+        return JsonValue();
+    const auto id = requestValue.FindMember("id");
+    return id == requestValue.MemberEnd() ? JsonValue() : JsonValue(id->value, allocator);
+}
+
+// To be called from inside a handler.
+void setErrorFromCurrentException(SingleResponse& response) {
+    qierr::Status status;
+    captureCurrentException(&status);
+    response.setError(status);
+}
+
+JsonValue skippedResponse(const JsonValue& requestValue, JsonPool& allocator) {
+    SingleResponse response(copyId(requestValue, allocator), &allocator);
+    response.setError(*BasicError(skippedCode, QITRMC_HERE).status());
+    return std::move(response.getValue());
+}
+
+std::string compactText(const JsonDocument& document) {
+    JsonBuffer buffer;
+    JsonWriter writer(buffer);
+    document.Accept(writer);
+    return std::string(buffer.GetString(), buffer.GetSize());
+}
+
+}  // namespace
+
+RequestHandler::RequestHandler() {
+    for (const Method& method : methodTable) {
+        std::shared_ptr<IProcedure> procedure = (procedureFactory.*method.make)();
+        if (procedure)
+            procedures.emplace(method.name, std::move(procedure));
+    }
+}
+
+std::string RequestHandler::handleRequest(const std::string& body) {
+    JsonDocument responseDocument;
+    try {
+        answer(body, responseDocument);
+    } catch (const std::exception&) {
+        SingleResponse response(&responseDocument.GetAllocator());
+        setErrorFromCurrentException(response);
+        static_cast<JsonValue&>(responseDocument) = response.getValue();
+    }
+    return compactText(responseDocument);
+}
+
+void RequestHandler::answer(const std::string& body, JsonDocument& responseDocument) {
+    JsonDocument requestDocument;
+    parseRequestText(body, requestDocument);
+    addDefaultParams(requestDocument, requestDocument.GetAllocator());
+    if (requestDocument.IsObject()) {
+        SharedAccess access(accessLock);
+        handleSingleRequest(requestDocument, responseDocument, responseDocument.GetAllocator());
+    } else if (requestDocument.IsArray() && !requestDocument.Empty()) {
+        ExclusiveAccess access(accessLock);
+        handleBatchRequest(requestDocument, responseDocument, responseDocument.GetAllocator());
+    } else {
+        throw BasicError(invalidRequestCode, QITRMC_HERE);
+    }
+}
+
+void RequestHandler::addDefaultParams(JsonValue& value, JsonPool& allocator) const {
+    if (value.IsArray())
+        for (JsonValue& element : value.GetArray())
+            addDefaultParamsToObject(element, allocator);
+    else
+        addDefaultParamsToObject(value, allocator);
+}
+
+bool RequestHandler::handleSingleRequest(JsonValue& requestValue, JsonValue& responseValue,
+                                         JsonPool& allocator) {
+    SingleResponse response(copyId(requestValue, allocator), &allocator);
+    bool succeeded = true;
+    try {
+        SingleRequest request(requestValue);
+        getProcedure(request.getMethod())->execute(request, response);
+    } catch (const std::exception&) {
+        setErrorFromCurrentException(response);
+        succeeded = false;
+    }
+    responseValue = response.getValue();
+    return succeeded;
+}
+
+// What follows the first failure is answered but not run.
+void RequestHandler::handleBatchRequest(JsonValue& requests, JsonValue& responseValue,
+                                        JsonPool& allocator) {
+    responseValue.SetArray();
+    bool carryOn = true;
+    for (JsonValue& element : requests.GetArray()) {
+        JsonValue elementResponse;
+        if (carryOn)
+            carryOn = handleSingleRequest(element, elementResponse, allocator);
+        else
+            elementResponse = skippedResponse(element, allocator);
+        responseValue.PushBack(elementResponse, allocator);
+    }
+}
+
+std::shared_ptr<IProcedure> RequestHandler::getProcedure(const std::string& method) const {
+    const auto found = procedures.find(method);
+    if (found == procedures.end()) {
+        BasicError error(unknownMethodCode, QITRMC_HERE);
+        addUsageString(error.details(), "kUsageTypeMethod", method.c_str());
+        throw error;
+    }
+    return found->second;
+}
+
+}  // namespace nQITRMCWEBSVC100

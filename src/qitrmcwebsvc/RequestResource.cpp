@@ -1,0 +1,144 @@
+#include "qitrmcwebsvc/RequestResource.h"
+
+#include <algorithm>
+#include <array>
+#include <optional>
+#include <utility>
+
+#include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcsharedcmn/parseUtilities.h"
+#include "qitrmcwebsvc/DriverOwners.h"
+#include "qitrmcwebsvc/foldedText.h"
+
+namespace nQITRMCWEBSVC100 {
+
+using namespace nQITRMCSHAREDCMN100;
+
+namespace {
+
+constexpr std::int32_t unknownResourceCode = -250828;
+
+// The first member that a request has decides.
+constexpr std::pair<const char*, ResourceKind> resourceMembers[] = {
+    {"devices", ResourceKind::Device},
+    {"physical_channels", ResourceKind::PhysicalChannel},
+    {"nvmem_areas", ResourceKind::NvmemArea},
+    {"device", ResourceKind::Device},
+    {"physical_channel", ResourceKind::PhysicalChannel},
+    {"nvmem_area", ResourceKind::NvmemArea},
+};
+
+// Stand for lists that the driver keeps, and so are never looked up.
+constexpr std::array<const char*, 5> tokens = {"$ConnectedDevices", "$DefaultDevices",
+                                               "$DefaultNVMEMAreas", "$DefaultPhysChans",
+                                               "$ReservedDevices"};
+
+bool isToken(const std::string& name) {
+    return std::find(tokens.begin(), tokens.end(), name) != tokens.end();
+}
+
+[[noreturn]] void refuseName(const std::string& name) {
+    BasicError error(unknownResourceCode, QITRMC_HERE);
+    addUsageString(error.details(), "kUsageTypeRequestedValue", name.c_str());
+    throw error;
+}
+
+// One list of the driver's names, read when made.
+class KnownNames {
+  public:
+    explicit KnownNames(nQITRMCAPI100_Session session) {
+        nQITRMCAPI100_getSystemPropertyStringArray(session, "Sys.Devices", names.outArray(),
+                                                   names.outCount(), &status);
+    }
+    KnownNames(nQITRMCAPI100_Session session, const std::string& device, const char* property) {
+        nQITRMCAPI100_getGenericPropertyStringArray(session, device.c_str(), property,
+                                                    names.outArray(), names.outCount(), &status);
+    }
+
+    // A list that could not be read knows no name.
+    bool contains(const std::string& name) const {
+        return status.code >= 0 && std::any_of(names.begin(), names.end(), [&](const char* known) {
+                   return equalFolded(name, known);
+               });
+    }
+
+  private:
+    qierr::Status status;
+    DriverStringArray names;
+};
+
+}  // namespace
+
+RequestResource::RequestResource(const JsonValue& params) {
+    for (const auto& [member, kind] : resourceMembers) {
+        const auto found = params.FindMember(member);
+        if (found == params.MemberEnd())
+            continue;
+        readNames(found->value);
+        resourceKind = kind;
+        return;
+    }
+}
+
+RequestResource::RequestResource(const JsonValue& params, nQITRMCAPI100_Session driverSession,
+                                 ResourceKind defaultKind)
+    : RequestResource(params) {
+    if (resourceKind != ResourceKind::None)
+        validateResourceNames(driverSession);
+    else
+        applyDefault(defaultKind);
+}
+
+std::string RequestResource::joinedNames() const {
+    return compressNames(resourceNames, NameKind::Path);
+}
+
+void RequestResource::readNames(const JsonValue& value) {
+    const auto append = [&](const JsonValue& text) {
+        appendExpanded(resourceNames, std::string(text.GetString(), text.GetStringLength()),
+                       NameKind::Path);
+    };
+    if (value.IsString())
+        append(value);
+    else if (value.IsArray())
+        for (const JsonValue& element : value.GetArray())
+            append(element);
+    else
+        throw InternalError("Invalid data type for the name of resource(s)", QITRMC_HERE);
+}
+
+void RequestResource::validateResourceNames(nQITRMCAPI100_Session driverSession) const {
+    const bool areDevices = resourceKind == ResourceKind::Device;
+    const char* property =
+        resourceKind == ResourceKind::PhysicalChannel ? "Dev.PhysChans" : "Dev.NVMEM.Areas";
+    std::optional<KnownNames> known;
+    if (areDevices)
+        known.emplace(driverSession);
+    for (const std::string& name : resourceNames) {
+        if (isToken(name))
+            continue;
+        if (!areDevices)
+            known.emplace(driverSession, name.substr(0, name.find('/')), property);
+        if (!known->contains(name))
+            refuseName(name);
+    }
+}
+
+void RequestResource::applyDefault(ResourceKind defaultKind) {
+    resourceKind = defaultKind;
+    switch (defaultKind) {
+        case ResourceKind::Device:
+            resourceNames.push_back("$DefaultDevices");
+            break;
+        case ResourceKind::PhysicalChannel:
+            resourceNames.push_back("$DefaultPhysChans");
+            break;
+        case ResourceKind::NvmemArea:
+            resourceNames.push_back("$DefaultNVMEMAreas");
+            break;
+        case ResourceKind::None:
+            break;
+    }
+}
+
+}  // namespace nQITRMCWEBSVC100

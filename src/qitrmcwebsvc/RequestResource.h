@@ -1,0 +1,43 @@
+#pragma once
+
+#include <qitrmcapi.h>
+
+#include <string>
+#include <vector>
+
+#include "qitrmcwebsvc/Json.h"
+#include "qitrmcwebsvc/ResourceKind.h"
+
+namespace nQITRMCWEBSVC100 {
+
+// The resources that a request names: their kind and their expanded names, in request order.
+//
+// Relies on a request that passed its schema. Failures are thrown: BasicError -250828 with the name
+// that is unknown to the driver or cannot be parsed.
+class RequestResource {
+  public:
+    // Reads the request's members only.
+    explicit RequestResource(const JsonValue& params);
+
+    // Reads the members and has the driver confirm each name; without any, takes the session's own
+    // default resources of `defaultKind`.
+    RequestResource(const JsonValue& params, nQITRMCAPI100_Session driverSession,
+                    ResourceKind defaultKind);
+
+    virtual ~RequestResource() = default;
+
+    ResourceKind kind() const { return resourceKind; }
+    const std::vector<std::string>& names() const { return resourceNames; }
+    // The names as the one text that driver calls take.
+    std::string joinedNames() const;
+
+  private:
+    void readNames(const JsonValue& value);
+    void validateResourceNames(nQITRMCAPI100_Session driverSession) const;
+    void applyDefault(ResourceKind defaultKind);
+
+    ResourceKind resourceKind = ResourceKind::None;
+    std::vector<std::string> resourceNames;
+};
+
+}  // namespace nQITRMCWEBSVC100

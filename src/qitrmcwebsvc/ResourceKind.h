@@ -1,0 +1,15 @@
+#pragma once
+
+#include <cstdint>
+
+namespace nQITRMCWEBSVC100 {
+
+// What a request or a session acts on.
+enum class ResourceKind : std::int32_t {
+    None = 0,
+    Device = 1,
+    PhysicalChannel = 2,
+    NvmemArea = 3,
+};
+
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,67 @@
+#include "qitrmcwebsvc/SingleResponse.h"
+
+#include <algorithm>
+#include <array>
+#include <string>
+
+#include "qierr/Status.h"
+#include "qitrmcwebsvc/describeStatus.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+constexpr std::int32_t serverErrorCode = -32000;
+
+// The codes of JSON-RPC itself, which stand bare; every other failure is a server error whose own
+// code and text travel in "data".
+constexpr std::array<std::int32_t, 6> standingCodes = {-32700, -32603, -32602,
+                                                       -32601, -32600, serverErrorCode};
+
+bool isStandingCode(std::int32_t code) {
+    return std::find(standingCodes.begin(), standingCodes.end(), code) != standingCodes.end();
+}
+
+std::string describeServerError() {
+    qierr::Status status;
+    qierr_Status_setCode(&status, serverErrorCode);
+    return describeStatus(status);
+}
+
+}  // namespace
+
+SingleResponse::SingleResponse(JsonPool* allocator) : SingleResponse(JsonValue(), allocator) {}
+
+SingleResponse::SingleResponse(const JsonValue& id, JsonPool* allocator)
+    : response(rapidjson::kObjectType), allocator(allocator) {
+    response.AddMember("jsonrpc", "2.0", *allocator);
+    JsonValue copiedId(id, *allocator);
+    response.AddMember("id", copiedId, *allocator);
+}
+
+void SingleResponse::setResult(JsonValue& value) {
+    response.AddMember("result", value, *allocator);
+}
+
+void SingleResponse::setEmptyResult() {
+    JsonValue empty(rapidjson::kObjectType);
+    setResult(empty);
+}
+
+void SingleResponse::setError(const qierr_Status& status) {
+    JsonValue error(rapidjson::kObjectType);
+    JsonValue data(rapidjson::kObjectType);
+    const std::string text = describeStatus(status);
+    if (isStandingCode(status.code)) {
+        error.AddMember("code", status.code, *allocator);
+        error.AddMember("message", JsonValue(text, *allocator), *allocator);
+    } else {
+        error.AddMember("code", serverErrorCode, *allocator);
+        error.AddMember("message", JsonValue(describeServerError(), *allocator), *allocator);
+        data.AddMember("qitrmc_code", status.code, *allocator);
+        data.AddMember("qitrmc_message", JsonValue(text, *allocator), *allocator);
+        error.AddMember("data", data, *allocator);
+    }
+    response.AddMember("error", error, *allocator);
+}
+
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,74 @@
+#include "qitrmcwebsvc/exponentGuard.h"
+
+#include <cstddef>
+#include <cstring>
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+// An exponent with more digits than this, leading zeros apart, is lowered.
+constexpr std::size_t safeDigits = 9;
+
+bool isDigit(char c) {
+    return c >= '0' && c <= '9';
+}
+
+// Where the digits of an exponent part such as "e-0123" stand, from the first that is not zero.
+struct ExponentDigits {
+    std::size_t begin = 0;
+    std::size_t end = 0;
+
+    bool tooMany() const { return end - begin > safeDigits; }
+};
+
+ExponentDigits negativeExponentAt(const char* text) {
+    if ((text[0] != 'e' && text[0] != 'E') || text[1] != '-')
+        return {};
+    ExponentDigits digits{2, 2};
+    while (text[digits.begin] == '0')
+        ++digits.begin;
+    digits.end = digits.begin;
+    while (isDigit(text[digits.end]))
+        ++digits.end;
+    return digits;
+}
+
+// Every exponent has its minus sign, and few texts hold many of those.
+bool mayHoldLongExponent(const char* text) {
+    for (const char* minus = text; (minus = std::strchr(minus, '-')) != nullptr; ++minus)
+        if (minus != text && negativeExponentAt(minus - 1).tooMany())
+            return true;
+    return false;
+}
+
+// The position behind the string whose opening quote is at `position`.
+std::size_t behindString(const std::string& text, std::size_t position) {
+    for (++position; position < text.size() && text[position] != '"'; ++position)
+        if (text[position] == '\\')
+            ++position;
+    return position + 1;
+}
+
+}  // namespace
+
+std::optional<std::string> withSafeExponents(const char* text) {
+    if (!mayHoldLongExponent(text))
+        return std::nullopt;
+    std::string safe(text);
+    for (std::size_t position = 0; position < safe.size();) {
+        if (safe[position] == '"') {
+            position = behindString(safe, position);
+            continue;
+        }
+        const ExponentDigits digits = negativeExponentAt(safe.c_str() + position);
+        if (digits.tooMany()) {
+            safe.replace(position + digits.begin, digits.end - digits.begin - safeDigits,
+                         digits.end - digits.begin - safeDigits, '0');
+            safe.replace(position + digits.end - safeDigits, safeDigits, safeDigits, '9');
+        }
+        position += digits.end != 0 ? digits.end : 1;
+    }
+    return safe;
+}
+
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,66 @@
+#include "qitrmcwebsvc/foldedText.h"
+
+#include <utf8proc.h>
+
+#include <array>
+#include <cstddef>
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+// The folded code points of a text, one at a time.
+class FoldedCodePoints {
+  public:
+    explicit FoldedCodePoints(std::string_view source) : text(source) {}
+
+    bool atEnd() const { return next == count && text.empty(); }
+
+    utf8proc_int32_t take() {
+        if (next == count)
+            foldOne();
+        return folded[next++];
+    }
+
+  private:
+    // Beyond Unicode's last code point, so that a stray byte equals no letter.
+    static constexpr utf8proc_int32_t strayByteBase = 0x110000;
+
+    void foldOne() {
+        next = 0;
+        count = 1;
+        utf8proc_int32_t codePoint = 0;
+        const auto length =
+            utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(text.data()),
+                             static_cast<utf8proc_ssize_t>(text.size()), &codePoint);
+        if (length <= 0) {
+            folded[0] = strayByteBase + static_cast<unsigned char>(text.front());
+            text.remove_prefix(1);
+            return;
+        }
+        text.remove_prefix(static_cast<std::size_t>(length));
+        int boundary = 0;
+        count = static_cast<std::size_t>(utf8proc_decompose_char(
+            codePoint, folded.data(), static_cast<utf8proc_ssize_t>(folded.size()),
+            UTF8PROC_CASEFOLD, &boundary));
+    }
+
+    std::string_view text;
+    std::array<utf8proc_int32_t, 4> folded{};
+    std::size_t next = 0;
+    std::size_t count = 0;
+};
+
+}  // namespace
+
+bool equalFolded(std::string_view left, std::string_view right) {
+    if (left == right)
+        return true;
+    FoldedCodePoints leftPoints(left);
+    FoldedCodePoints rightPoints(right);
+    while (!leftPoints.atEnd() && !rightPoints.atEnd())
+        if (leftPoints.take() != rightPoints.take())
+            return false;
+    return leftPoints.atEnd() && rightPoints.atEnd();
+}
+
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,46 @@
+#include "qitrmcwebsvc/httpRequest.h"
+
+#include <algorithm>
+#include <cstdint>
+#include <utility>
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+constexpr std::uint32_t firstVariableSize = 32;
+constexpr std::uint32_t firstBodySize = 256;
+
+// `read` takes a buffer and a pointer to its size. A buffer that is filled to its end has no NUL.
+template <typename Read>
+int readText(std::uint32_t firstSize, std::string& out, Read read) {
+    std::string buffer(firstSize, '\0');
+    std::uint32_t size = firstSize;
+    int result = read(buffer.data(), &size);
+    if (result != 0 && size == 0)
+        return result;
+    if (result != 0) {
+        buffer.resize(size);
+        result = read(buffer.data(), &size);
+        if (result != 0)
+            return result;
+    }
+    buffer.erase(std::find(buffer.begin(), buffer.end(), '\0'), buffer.end());
+    out = std::move(buffer);
+    return 0;
+}
+
+}  // namespace
+
+int readRequestVariable(ws_Request* request, const char* name, std::string& out) {
+    return readText(firstVariableSize, out, [&](char* buffer, std::uint32_t* size) {
+        return ReadRequestVariable_C_REST_QI_QVWS_(request, name, buffer, size);
+    });
+}
+
+int readPostBody(ws_Request* request, std::string& out) {
+    return readText(firstBodySize, out, [&](char* buffer, std::uint32_t* size) {
+        return ReadPostData_C_REST_QI_QVWS_(request, buffer, size);
+    });
+}
+
+}  // namespace nQITRMCWEBSVC100

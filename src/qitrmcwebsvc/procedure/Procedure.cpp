@@ -1,0 +1,20 @@
+#include "qitrmcwebsvc/procedure/Procedure.h"
+
+#include <utility>
+
+namespace nQITRMCWEBSVC100 {
+
+Procedure::Procedure(std::shared_ptr<ISessionManager> manager,
+                     std::shared_ptr<ISchemaValidator> validator)
+    : sessionManager(std::move(manager)), schemaValidator(std::move(validator)) {}
+
+void Procedure::execute(const SingleRequest& request, SingleResponse& response) {
+    schemaValidator->validate(request);
+    run(request.getParams(), response);
+}
+
+void SessionProcedure::run(const JsonValue& params, SingleResponse& response) {
+    run(params, sessionManager->getSessionContext(sessionIdOf(params)), response);
+}
+
+}  // namespace nQITRMCWEBSVC100

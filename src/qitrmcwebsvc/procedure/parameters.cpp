@@ -1,0 +1,56 @@
+#include "qitrmcwebsvc/procedure/parameters.h"
+
+#include "qitrmcwebsvc/EnumType.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+constexpr std::int32_t readWriteAccess = 3;
+
+const JsonValue* findParam(const JsonValue& params, const char* name) {
+    const auto found = params.FindMember(name);
+    return found == params.MemberEnd() ? nullptr : &found->value;
+}
+
+std::string textOf(const JsonValue& value) {
+    return std::string(value.GetString(), value.GetStringLength());
+}
+
+std::int32_t accessParam(const JsonValue& params) {
+    const JsonValue* access = findParam(params, "access");
+    return access == nullptr ? readWriteAccess : EnumType(*access, "ReservationAccess").value();
+}
+
+}  // namespace
+
+std::string textParam(const JsonValue& params, const char* name) {
+    return textOf(params[name]);
+}
+
+std::string textParam(const JsonValue& params, const char* name, const char* absent) {
+    const JsonValue* value = findParam(params, name);
+    return value == nullptr ? std::string(absent) : textOf(*value);
+}
+
+double doubleParam(const JsonValue& params, const char* name, double absent) {
+    const JsonValue* value = findParam(params, name);
+    return value == nullptr ? absent : value->GetDouble();
+}
+
+bool boolParam(const JsonValue& params, const char* name, bool absent) {
+    const JsonValue* value = findParam(params, name);
+    return value == nullptr ? absent : value->IsTrue();
+}
+
+std::string sessionIdOf(const JsonValue& params) {
+    return textParam(params, "session_id");
+}
+
+ReservationParams reservationParams(const JsonValue& params) {
+    // In the order in which a fault would be met.
+    const std::int32_t access = accessParam(params);
+    return {access, textParam(params, "reservation_group", ""),
+            doubleParam(params, "reservation_timeout", 0.0)};
+}
+
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,19 @@
+#pragma once
+
+#include <string>
+
+// A tree in a temporary folder that takes the place of the target's file system for the code under
+// test, which must be linked with this library in place of qisysq_root. One at a time.
+class TestRoot {
+  public:
+    TestRoot();
+    ~TestRoot();
+    TestRoot(const TestRoot&) = delete;
+    TestRoot& operator=(const TestRoot&) = delete;
+
+    // Writes a file under its absolute path on the target, folders included.
+    void write(const std::string& path, const std::string& content) const;
+    void remove(const std::string& path) const;
+    // Where a path of the target lies.
+    std::string locate(const std::string& path) const;
+};

@@ -1,0 +1,43 @@
+#include "qitrmcwebsvc/foldedText.h"
+
+#include <gtest/gtest.h>
+
+using nQITRMCWEBSVC100::equalFolded;
+
+namespace {
+
+TEST(EqualFolded, ComparesLettersWithoutCase) {
+    EXPECT_TRUE(equalFolded("Mod1/CH0", "mod1/ch0"));
+    EXPECT_TRUE(equalFolded("\u00c4pfel", "\u00e4PFEL"));
+    EXPECT_TRUE(equalFolded("\u0394\u03a3", "\u03b4\u03c2"));  // final sigma folds to sigma
+    EXPECT_FALSE(equalFolded("Mod1", "Mod2"));
+}
+
+TEST(EqualFolded, LetsOneLetterStandForSeveral) {
+    EXPECT_TRUE(equalFolded("Stra\u00dfe", "STRASSE"));
+    EXPECT_TRUE(equalFolded("\ufb03", "ffi"));
+    EXPECT_TRUE(equalFolded("\u0390", "\u03b9\u0308\u0301"));
+    EXPECT_FALSE(equalFolded("\ufb03", "ff"));
+    EXPECT_FALSE(equalFolded("ff", "\ufb03"));
+}
+
+TEST(EqualFolded, DoesNotFoldAccentsOrWidths) {
+    EXPECT_FALSE(equalFolded("e", "\u00e9"));
+    EXPECT_FALSE(equalFolded("A", "\uff21"));
+    EXPECT_FALSE(equalFolded("\u00e9", "e\u0301"));
+}
+
+TEST(EqualFolded, TellsAPrefixFromTheWhole) {
+    EXPECT_FALSE(equalFolded("Mod1", "Mod"));
+    EXPECT_FALSE(equalFolded("", "M"));
+    EXPECT_TRUE(equalFolded("", ""));
+}
+
+TEST(EqualFolded, TakesBytesThatAreNoUtf8AsThemselves) {
+    EXPECT_TRUE(equalFolded("a\xff", "A\xff"));
+    EXPECT_FALSE(equalFolded("a\xff", "A\xfe"));
+    EXPECT_FALSE(equalFolded("\xc3", "\u00c3"));
+    EXPECT_TRUE(equalFolded("\xc3X", "\xc3x"));
+}
+
+}  // namespace
