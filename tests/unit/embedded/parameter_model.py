@@ -226,3 +226,113 @@ METHODS = [
     ),
     Method("GetChassisIpOrHostname", "get_chassis_ip_or_hostname", "session_id", "device"),
 ]
+
+
+# ---- What becomes of a request -------------------------------------------------------------------
+
+
+def is_number(value) -> bool:
+    return isinstance(value, (int, float)) and not isinstance(value, bool)
+
+
+def is_integer(value) -> bool:
+    return isinstance(value, int) and not isinstance(value, bool)
+
+
+def is_session_id(text: str) -> bool:
+    digits = text.removeprefix("_session")
+    return digits != text and digits.isascii() and digits.isdigit()
+
+
+def wrong_type(name: str) -> str:
+    return f"Wrong parameter data type. The data type must be {name}."
+
+
+def number_fault(shape: Number, value) -> str | None:
+    fits = is_integer if shape.integer else is_number
+    if not fits(value):
+        return wrong_type("integer" if shape.integer else "number")
+    if shape.minimum is not None and value < shape.minimum:
+        return f"The number must be greater than or equal to {shape.minimum}"
+    if shape.maximum is not None and value > shape.maximum:
+        return f"The number must be less than or equal to {shape.maximum}"
+    return None
+
+
+def text_fault(shape: Text, value) -> str | None:
+    if not isinstance(value, str):
+        return wrong_type("string")
+    if shape.session_id and not is_session_id(value):
+        return (
+            "Wrong session ID format. The format of a session ID must be _session<number>. "
+            "For example, a session ID can be _session1."
+        )
+    return None
+
+
+def is_text_or_texts(value) -> bool:
+    elements = value if isinstance(value, list) else [value]
+    return all(isinstance(element, str) for element in elements)
+
+
+def is_property_value(value) -> bool:
+    elements = value if isinstance(value, list) else [value]
+    kinds = {
+        "boolean" if isinstance(e, bool) else "number" if is_number(e) else type(e).__name__
+        for e in elements
+    }
+    return len(kinds) == 1 and kinds <= {"boolean", "number", "str"}
+
+
+def is_among(value, items) -> bool:
+    if isinstance(value, bool) or isinstance(value, (list, dict)):
+        return False
+    return value in items
+
+
+def value_failure(shape, value, pointer: str, texts: dict) -> tuple[str, str] | None:
+    """The pointer to what is wrong with a value, and the sentence that says what is."""
+    fault = None
+    match shape:
+        case Text():
+            fault = text_fault(shape, value)
+        case Number():
+            fault = number_fault(shape, value)
+        case Choice() if not is_among(value, shape.items):
+            items = ", ".join(map(str, shape.items))
+            fault = f"Wrong enum item. The enum item must be one of the following items: {items}"
+        case Flag() if not isinstance(value, bool):
+            fault = wrong_type("boolean")
+        case OneOrMore() if not is_text_or_texts(value):
+            fault = texts[shape.description]
+        case PropertyValue() if not is_property_value(value):
+            fault = texts["WrongPropertyType"]
+        case Bytes():
+            return bytes_failure(value, pointer)
+    return (pointer, fault) if fault else None
+
+
+def bytes_failure(value, pointer: str) -> tuple[str, str] | None:
+    if not isinstance(value, list):
+        return pointer, wrong_type("array")
+    for index, element in enumerate(value):
+        if fault := number_fault(Number(integer=True, minimum=0, maximum=255), element):
+            return f"{pointer}/{index}", fault
+    return None if value else (pointer, "The parameter must not be empty array.")
+
+
+def first_failure(method: Method, params: list, texts: dict) -> tuple[str, str] | None:
+    """`params` are pairs in the order of the request; `texts` the sentences by their names."""
+    for name, value in params:
+        pointer = f"#/params/{name}"
+        if name not in method.members:
+            return pointer, "This parameter you specified is unsupported."
+        if failure := value_failure(method.shape(name), value, pointer, texts):
+            return failure
+    given = {name for name, _ in params}
+    if not given.issuperset(method.required):
+        required = ", ".join(method.required)
+        return "#/params", f"The following parameter(s) is required: {required}."
+    if method.rule and len(given.intersection(method.rule.members)) > 1:
+        return "#/params", texts[method.rule.description]
+    return None

@@ -1,6 +1,7 @@
-#include "qitrmcwebsvc/Json.h"
+#include "qitrmcwebsvc/ThrowingAllocator.h"
 
 #include <cstdlib>
+#include <new>
 
 namespace nQITRMCWEBSVC100 {
 namespace {

@@ -1,0 +1,58 @@
+#include "qitrmcwebsvc/RunMemory.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <cstring>
+#include <limits>
+#include <new>
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+// That the blocks left behind are freed is for the leak checker to see.
+
+TEST(RunMemory, FreesWhatIsLeftBehindAndWhatIsGivenBack) {
+    RunMemory memory;
+    void* const first = memory.Malloc(10);
+    void* const second = memory.Malloc(20);
+    void* const third = memory.Malloc(30);
+    std::memset(first, 1, 10);
+    std::memset(third, 3, 30);
+    RunMemory::Free(second);
+    RunMemory::Free(nullptr);
+    EXPECT_EQ(3, static_cast<char*>(third)[29]);
+}
+
+TEST(RunMemory, KeepsTheContentOfABlockThatGrows) {
+    RunMemory memory;
+    memory.Malloc(8);
+    void* block = memory.Malloc(8);
+    std::memcpy(block, "12345678", 8);
+    memory.Malloc(8);
+    block = memory.Realloc(block, 8, 100000);
+    EXPECT_EQ(0, std::memcmp(block, "12345678", 8));
+    block = memory.Realloc(block, 100000, 4);
+    EXPECT_EQ(0, std::memcmp(block, "1234", 4));
+}
+
+TEST(RunMemory, GivesNullForNoBytes) {
+    RunMemory memory;
+    EXPECT_EQ(nullptr, memory.Malloc(0));
+    EXPECT_EQ(nullptr, memory.Realloc(memory.Malloc(5), 5, 0));
+}
+
+TEST(RunMemory, AlignsBlocksForAnyType) {
+    RunMemory memory;
+    for (std::size_t size : {1, 3, 17})
+        EXPECT_EQ(
+            0u, reinterpret_cast<std::uintptr_t>(memory.Malloc(size)) % alignof(std::max_align_t));
+}
+
+TEST(RunMemory, RefusesASizeBeyondTheAddressSpace) {
+    RunMemory memory;
+    EXPECT_THROW(memory.Malloc(std::numeric_limits<std::size_t>::max()), std::bad_alloc);
+}
+
+}  // namespace
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,347 @@
+#include "qitrmcwebsvc/SchemaValidator.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "embedded/EmbeddedFiles.h"
+#include "requests.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+const std::string session = R"("session_id":"_session1")";
+
+std::optional<Refusal> refusalOfRequest(const std::string& schema, const std::string& text) {
+    SchemaValidator validator(embeddedText(("procedure_" + schema + ".json").c_str()));
+    const ParsedRequest request(text);
+    return refusalOf([&] { validator.validate(*request); });
+}
+
+std::optional<Refusal> initializeSession(const std::string& params) {
+    return refusalOfRequest("initialize_session", requestText("initializeSession", params));
+}
+
+std::optional<Refusal> closeSession(const std::string& params) {
+    return refusalOfRequest("close_session", requestText("closeSession", params));
+}
+
+std::optional<Refusal> readRegister(const std::string& members) {
+    return refusalOfRequest("read_register",
+                            requestText("readRegister", "{" + session + "," + members + "}"));
+}
+
+std::optional<Refusal> setProperty(const std::string& members) {
+    return refusalOfRequest(
+        "set_property",
+        requestText("setProperty", "{" + session + R"(,"property":"p",)" + members + "}"));
+}
+
+std::optional<Refusal> setNvmemBytes(const std::string& data) {
+    return refusalOfRequest(
+        "set_nvmem_bytes",
+        requestText("setNvmemBytes", "{" + session + R"(,"address":0,"data":)" + data + "}"));
+}
+
+std::string enumDetails(const std::string& items) {
+    return "Wrong enum item. The enum item must be one of the following items: " + items;
+}
+
+const std::string unsupported = "This parameter you specified is unsupported.";
+
+// ---- Requests that conform ----------------------------------------------------------------------
+
+TEST(SchemaValidator, AcceptsAConformingRequest) {
+    EXPECT_EQ(std::nullopt, closeSession("{" + session + "}"));
+    EXPECT_EQ(std::nullopt, readRegister(R"("address":4294967295,"size":64)"));
+    EXPECT_EQ(std::nullopt, setNvmemBytes("[0,255]"));
+}
+
+TEST(SchemaValidator, AcceptsEmptyParamsForInitializeSession) {
+    EXPECT_EQ(std::nullopt, initializeSession("{}"));
+}
+
+TEST(SchemaValidator, LeavesOtherMembersOfTheRequestAlone) {
+    EXPECT_EQ(std::nullopt,
+              refusalOfRequest("close_session",
+                               R"({"x":{"y":[{"z":[[]]}]},"jsonrpc":"2.0","id":"","\u0000":null,)"
+                               R"("method":"closeSession","params":{"session_id":"_session0"}})"));
+}
+
+TEST(SchemaValidator, AcceptsAnEnumItemInAnyNotation) {
+    EXPECT_EQ(std::nullopt, readRegister(R"("address":0,"size":8.0)"));
+    EXPECT_EQ(std::nullopt, readRegister(R"("address":0,"size":8e0)"));
+    EXPECT_EQ(std::nullopt, initializeSession(R"({"access":1.0})"));
+}
+
+// ---- An invalid request -------------------------------------------------------------------------
+
+TEST(SchemaValidator, RefusesParamsThatAreNotAnObjectAsAnInvalidRequest) {
+    for (const char* params : {"null", "true", "5", "\"text\"", "[]", "[{}]"})
+        EXPECT_EQ(invalidMember("params"), closeSession(params)) << params;
+}
+
+TEST(SchemaValidator, ReadsAbsentParamsAsNull) {
+    EXPECT_EQ(invalidMember("params"),
+              refusalOfRequest("close_session",
+                               R"({"jsonrpc":"2.0","id":1,"method":"closeSession","Params":{}})"));
+}
+
+TEST(SchemaValidator, LooksAtTheTypeOfParamsBeforeAnythingElse) {
+    EXPECT_EQ(invalidMember("params"),
+              refusalOfRequest("close_session",
+                               R"({"jsonrpc":"2.0","id":1,"method":"other","params":[]})"));
+}
+
+TEST(SchemaValidator, ChecksASecondParamsMemberAgainstTheSchemaToo) {
+    EXPECT_EQ(
+        invalidParameter("#/params", "Wrong parameter data type. The data type must be object."),
+        refusalOfRequest("close_session",
+                         R"({"jsonrpc":"2.0","id":1,"method":"closeSession","params":{)" + session +
+                             R"(},"params":5})"));
+}
+
+// ---- Each keyword -------------------------------------------------------------------------------
+
+TEST(SchemaValidator, NamesAllRequiredMembersWhenOneIsMissing) {
+    EXPECT_EQ(invalidParameter("#/params", "The following parameter(s) is required: session_id."),
+              closeSession("{}"));
+    EXPECT_EQ(invalidParameter(
+                  "#/params", "The following parameter(s) is required: session_id, address, size."),
+              readRegister(R"("address":1)"));
+}
+
+TEST(SchemaValidator, RefusesAnUnknownMember) {
+    EXPECT_EQ(invalidParameter("#/params/foo", unsupported),
+              closeSession("{" + session + R"(,"foo":1})"));
+    EXPECT_EQ(invalidParameter("#/params/foo", unsupported), closeSession(R"({"foo":[[[]]]})"));
+    EXPECT_EQ(invalidParameter("#/params/SESSION_ID", unsupported),
+              closeSession(R"({"SESSION_ID":"_session1"})"));
+}
+
+TEST(SchemaValidator, RefusesASessionIdOfAnotherForm) {
+    const Refusal expected = invalidParameter(
+        "#/params/session_id",
+        "Wrong session ID format. The format of a session ID must be _session<number>. For "
+        "example, a session ID can be _session1.");
+    for (const char* id : {"session1", "_session", "_session1 ", " _session1", "_Session1",
+                           "_session-1", "_session1x", ""})
+        EXPECT_EQ(expected, closeSession(std::string(R"({"session_id":")") + id + "\"}")) << id;
+}
+
+TEST(SchemaValidator, ReadsASessionIdUpToItsFirstNul) {
+    EXPECT_EQ(std::nullopt, closeSession(R"({"session_id":"_session1\u0000x"})"));
+}
+
+TEST(SchemaValidator, ChecksTheTypeBeforeThePattern) {
+    for (const char* value : {"5", "null", "true", "[]", "{}"}) {
+        EXPECT_EQ(invalidParameter("#/params/session_id",
+                                   "Wrong parameter data type. The data type must be string."),
+                  closeSession(std::string(R"({"session_id":)") + value + "}"))
+            << value;
+    }
+}
+
+TEST(SchemaValidator, RefusesANumberBelowItsMinimum) {
+    EXPECT_EQ(
+        invalidParameter("#/params/slot_number", "The number must be greater than or equal to 1"),
+        refusalOfRequest("get_module_name",
+                         requestText("getModuleName", "{" + session + R"(,"slot_number":0})")));
+    EXPECT_EQ(invalidParameter("#/params/timeout", "The number must be greater than or equal to 0"),
+              refusalOfRequest("execute_command",
+                               requestText("executeCommand",
+                                           "{" + session + R"(,"command":"c","timeout":-1})")));
+}
+
+TEST(SchemaValidator, RefusesANumberAboveItsMaximum) {
+    EXPECT_EQ(
+        invalidParameter("#/params/address", "The number must be less than or equal to 4294967295"),
+        readRegister(R"("address":4294967296,"size":8)"));
+}
+
+TEST(SchemaValidator, RefusesANumberThatIsNotAnInteger) {
+    for (const char* address : {"1.5", "1.0", "1e1", "18446744073709551616"}) {
+        EXPECT_EQ(invalidParameter("#/params/address",
+                                   "Wrong parameter data type. The data type must be integer."),
+                  readRegister(std::string(R"("size":8,"address":)") + address))
+            << address;
+    }
+}
+
+TEST(SchemaValidator, NamesAllItemsOfAnEnumThatAValueIsNotIn) {
+    for (const char* size : {"7", "\"8\"", "null", "[8]", "{}", "8.5"}) {
+        EXPECT_EQ(invalidParameter("#/params/size", enumDetails("8, 16, 32, 64")),
+                  readRegister(std::string(R"("address":0,"size":)") + size))
+            << size;
+    }
+    for (const char* access : {"2", "\"readOnly\"", "\"1\"", "true"}) {
+        EXPECT_EQ(invalidParameter("#/params/access", enumDetails("1, 3, ReadOnly, ReadWrite")),
+                  initializeSession(std::string(R"({"access":)") + access + "}"))
+            << access;
+    }
+}
+
+TEST(SchemaValidator, RefusesDevicesThatAreNeitherATextNorAnArrayOfTexts) {
+    for (const char* devices : {"5", "[\"a\",1]", "null", "{}", "[[\"a\"]]", "[null]"}) {
+        EXPECT_EQ(invalidParameter("#/params/devices",
+                                   "Wrong data type for parameter devices. The data type must be "
+                                   "string or array of string."),
+                  initializeSession(std::string(R"({"devices":)") + devices + "}"))
+            << devices;
+    }
+    EXPECT_EQ(std::nullopt, initializeSession(R"({"devices":[]})"));
+}
+
+TEST(SchemaValidator, RefusesAPropertyValueOfNoOneType) {
+    // An empty array fits three of the types at once.
+    for (const char* value : {"[]", "[1,true]", "null", "{}", "[[1]]", "[null]", "[{}]"}) {
+        EXPECT_EQ(invalidParameter(
+                      "#/params/value",
+                      "Wrong data type for parameter property. The data type must be one of the "
+                      "following data types: boolean, string, number, array of boolean, array of "
+                      "string, or array of number."),
+                  setProperty(std::string(R"("value":)") + value))
+            << value;
+    }
+    for (const char* value : {"true", "1.5", "\"\"", "[true]", "[1,2.5]", "[\"\"]"})
+        EXPECT_EQ(std::nullopt, setProperty(std::string(R"("value":)") + value)) << value;
+}
+
+TEST(SchemaValidator, RefusesMembersOfWhichOnlyOneMayBeGiven) {
+    EXPECT_EQ(invalidParameter("#/params",
+                               "You must specify none or only one of the following parameters: "
+                               "devices, physical_channels."),
+              refusalOfRequest(
+                  "commit_properties",
+                  requestText("commitProperties",
+                              "{" + session + R"(,"devices":"a","physical_channels":"b"})")));
+}
+
+TEST(SchemaValidator, ReportsAMissingMemberBeforeAOneOfRule) {
+    EXPECT_EQ(invalidParameter("#/params", "The following parameter(s) is required: session_id."),
+              refusalOfRequest(
+                  "commit_properties",
+                  requestText("commitProperties", R"({"devices":"a","physical_channels":"b"})")));
+}
+
+TEST(SchemaValidator, RefusesBadBytes) {
+    EXPECT_EQ(invalidParameter("#/params/data", "The parameter must not be empty array."),
+              setNvmemBytes("[]"));
+    EXPECT_EQ(invalidParameter("#/params/data/0", "The number must be less than or equal to 255"),
+              setNvmemBytes("[256]"));
+    EXPECT_EQ(invalidParameter("#/params/data/2", "The number must be greater than or equal to 0"),
+              setNvmemBytes("[0,1,-1,256]"));
+    for (const char* element : {"[]", "{}", "null", "1.0", "[[[]]]"}) {
+        EXPECT_EQ(invalidParameter("#/params/data/1",
+                                   "Wrong parameter data type. The data type must be integer."),
+                  setNvmemBytes(std::string("[0,") + element + "]"))
+            << element;
+    }
+}
+
+TEST(SchemaValidator, GivesTheRawFactsWhereItKnowsNoSentence) {
+    EXPECT_EQ(
+        (Refusal{-32602, "[" + usage("kUsageTypeJsonDocPointer", "#/method") + "," +
+                             usage("kUsageTypeJsonSchemaKeyword", "pattern") + "," +
+                             usage("kUsageTypeJsonSchemaPointer", "#/properties/method") + "]"}),
+        refusalOfRequest("close_session", requestText("abortSession", "{" + session + "}")));
+}
+
+TEST(SchemaValidator, ReportsTheFirstFailureInTheOrderOfTheRequest) {
+    EXPECT_EQ(invalidParameter("#/params/zzz", unsupported),
+              closeSession(R"({"zzz":1,"session_id":5})"));
+    EXPECT_EQ(invalidParameter("#/params/session_id",
+                               "Wrong parameter data type. The data type must be string."),
+              closeSession(R"({"session_id":5,"zzz":1})"));
+}
+
+// ---- Odd names ----------------------------------------------------------------------------------
+
+TEST(SchemaValidator, WritesOddMemberNamesInUriFragmentForm) {
+    EXPECT_EQ(invalidParameter("#/params/a~1b%20%C3%A9", unsupported),
+              closeSession("{\"a/b \xc3\xa9\":1}"));
+    EXPECT_EQ(invalidParameter("#/params/~0", unsupported), closeSession(R"({"~":1})"));
+    EXPECT_EQ(invalidParameter("#/params/~01", unsupported), closeSession(R"({"~1":1})"));
+    EXPECT_EQ(invalidParameter("#/params/", unsupported), closeSession(R"({"":1})"));
+    EXPECT_EQ(invalidParameter("#/params/%00", unsupported), closeSession(R"({"\u0000":1})"));
+    EXPECT_EQ(invalidParameter("#/params/a%00b", unsupported), closeSession(R"({"a\u0000b":1})"));
+    EXPECT_EQ(invalidParameter("#/params/%23%25%22%5C", unsupported),
+              closeSession(R"({"#%\"\\":1})"));
+    EXPECT_EQ(invalidParameter("#/params/0", unsupported), closeSession(R"({"0":1})"));
+}
+
+TEST(SchemaValidator, CutsAPointerOffAtBytesThatAreNotUtf8) {
+    const auto refusal = closeSession("{\"ab\xff\xfe\":1}");
+    ASSERT_TRUE(refusal);
+    EXPECT_EQ(-32602, refusal->code);
+    EXPECT_NE(std::string::npos, refusal->orderedData.find("#/params/ab")) << *refusal;
+    EXPECT_NE(std::string::npos, refusal->orderedData.find(unsupported)) << *refusal;
+}
+
+// ---- The validator itself -----------------------------------------------------------------------
+
+TEST(SchemaValidator, StaysUsableAfterAFailure) {
+    SchemaValidator validator(embeddedText("procedure_close_session.json"));
+    const ParsedRequest bad(requestText("closeSession", R"({"session_id":"x"})"));
+    const ParsedRequest good(requestText("closeSession", "{" + session + "}"));
+    for (int i = 0; i < 3; ++i) {
+        EXPECT_TRUE(refusalOf([&] { validator.validate(*bad); }));
+        EXPECT_FALSE(refusalOf([&] { validator.validate(*good); }));
+    }
+}
+
+TEST(SchemaValidator, RefusesASchemaTextItCannotParse) {
+    for (const char* text : {"", "{", "{} {}", "[]", "5"}) {
+        EXPECT_EQ(internalFault("Fail to parse schema."),
+                  refusalOf([&] { SchemaValidator validator(text); }))
+            << text;
+    }
+}
+
+TEST(SchemaValidator, RefusesDefinitionsItCannotUse) {
+    for (const char* text : {"", "{", "[]", "{}", R"({"Definitions":{}})"}) {
+        EXPECT_EQ(internalFault("Fail to parse definition schema."),
+                  refusalOf([&] { SchemaValidator validator("{}", text); }))
+            << text;
+    }
+}
+
+TEST(SchemaValidator, ComplainsOfTheSchemaBeforeTheDefinitions) {
+    EXPECT_EQ(internalFault("Fail to parse schema."),
+              refusalOf([] { SchemaValidator validator("{", "{"); }));
+}
+
+std::optional<Refusal> refusalByOwnSchema(const std::string& paramsSchema,
+                                          const std::string& params) {
+    SchemaValidator validator((R"({"properties":{"params":)" + paramsSchema + "}}").c_str(),
+                              R"({"definitions":{"small":{"maximum":2.5}}})");
+    const ParsedRequest request(requestText("m", params));
+    return refusalOf([&] { validator.validate(*request); });
+}
+
+TEST(SchemaValidator, JoinsTheSchemaWithTheDefinitions) {
+    EXPECT_EQ(
+        invalidParameter("#/params/n", "The number must be less than or equal to 2.5"),
+        refusalByOwnSchema(R"({"properties":{"n":{"$ref":"#/definitions/small"}}})", R"({"n":3})"));
+}
+
+TEST(SchemaValidator, FindsAFaultOfTheSchemaInAnEnumOfOtherTypes) {
+    EXPECT_EQ(internalFault("Unsupported data type for enums."),
+              refusalByOwnSchema(R"({"properties":{"n":{"enum":[1,2.5]}}})", R"({"n":3})"));
+}
+
+TEST(SchemaValidator, FindsAFaultOfTheSchemaInAnUnknownDescription) {
+    EXPECT_EQ(
+        internalFault("Fail to get error description"),
+        refusalByOwnSchema(R"({"properties":{"n":{"maximum":1,"maximumErrorDescription":"None"}}})",
+                           R"({"n":3})"));
+}
+
+TEST(SchemaValidator, FindsAFaultOfTheSchemaInTypesThatAreNotOneName) {
+    EXPECT_EQ(
+        internalFault("Invalid schema format."),
+        refusalByOwnSchema(R"({"properties":{"n":{"type":["string","null"]}}})", R"({"n":3})"));
+}
+
+}  // namespace
+}  // namespace nQITRMCWEBSVC100

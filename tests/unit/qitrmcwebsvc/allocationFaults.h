@@ -1,0 +1,18 @@
+#pragma once
+
+// Makes allocations of this thread fail: of malloc and realloc where the test program's own code
+// calls them (it is linked with --wrap for both), and of operator new everywhere.
+class AllocationFault {
+  public:
+    enum class Extent { one, allFromThere };
+
+    // The first `successes` allocations from now on work, the next fails.
+    AllocationFault(int successes, Extent extent);
+    // Allocations work again.
+    ~AllocationFault();
+    AllocationFault(const AllocationFault&) = delete;
+    AllocationFault& operator=(const AllocationFault&) = delete;
+
+    // Whether an allocation has failed.
+    bool hasStruck() const;
+};
