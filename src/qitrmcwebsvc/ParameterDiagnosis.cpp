@@ -1,6 +1,6 @@
 #include "qitrmcwebsvc/ParameterDiagnosis.h"
 
-#include <boost/format.hpp>
+#include <boost/algorithm/string/replace.hpp>
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/JsonRpcCodes.h"
@@ -24,8 +24,9 @@ const JsonValue* findMember(const JsonValue* object, const std::string& name) {
     return member == object->MemberEnd() ? nullptr : &member->value;
 }
 
+// Formatting through a stream would share the global locale's caches, which threads fill unguarded.
 std::string filledIn(const char* descriptionName, const std::string& value) {
-    return (boost::format(getErrorDescription(descriptionName)) % value).str();
+    return boost::algorithm::replace_first_copy(getErrorDescription(descriptionName), "%s", value);
 }
 
 // The value of a keyword, by the pointer to the schema that has it.
