@@ -1,5 +1,12 @@
 #include "Records.h"
 #include "jsonz/jsonz.h"
+#include "unit/FailingAllocation.h"
+
+extern "C" void* __real_calloc(std::size_t count, std::size_t size);
+
+extern "C" void* __wrap_calloc(std::size_t count, std::size_t size) {
+    return FailingAllocation::active ? nullptr : __real_calloc(count, size);
+}
 
 using qierr_test::MeteredStatus;
 using qierr_test::textOf;
@@ -37,4 +44,28 @@ TEST(Allocation, FailureAtAnyGrowthLosesDetailsOnly) {
         EXPECT_EQ(jsonz_readValue(status.json, nullptr), status.json + text.size());
         qierr_test::expectBuffer(status, 256u << growths, text);
     }
+}
+
+TEST(Allocation, DefaultReallocFailsAndLeavesTheRecord) {
+    qierr::Status status;
+    qierr_Status_setJson(&status, "[1]");
+    const char* buffer = status.json;
+    {
+        const FailingAllocation failing;
+        EXPECT_EQ(qierr_Status_defaultRealloc(&status, 513), 0);
+    }
+    EXPECT_EQ(status.json, buffer);
+    qierr_test::expectBuffer(status, 512, "[1]");
+}
+
+TEST(Allocation, CodeIsReportedWithoutAnyMemory) {
+    qierr::Status status;
+    {
+        const FailingAllocation failing;
+        qierr_Status_setCodeAt(&status, -250801, qierr_test::somewhere);
+        addComment(qierr_orderedData("T", &status), "lost");
+    }
+    EXPECT_EQ(status.code, -250801);
+    EXPECT_EQ(status.json, nullptr);
+    EXPECT_EQ(status.capacity, 0u);
 }
