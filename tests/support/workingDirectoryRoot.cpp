@@ -1,0 +1,5 @@
+#include "qisysq/installRoot.h"
+
+const char* qisysq_installRoot() {
+    return ".";
+}

@@ -1,0 +1,71 @@
+"""The written rules about which folder may know which."""
+
+import pathlib
+import re
+
+ROOT = pathlib.Path(__file__).resolve().parents[3]
+SOURCES = (".h", ".c", ".cpp", ".def")
+
+# A folder of src/ may include headers of its own floor or of one further down.
+FLOORS = [
+    {"qihtl", "jsonz", "ini", "qi/dsc", "stdint", "embedded"},
+    {"qierr"},
+    {"qisysq"},
+    {"qixlator"},
+    {"qixlatorlua", "qimxl"},
+    {"qitrmcsharedcmn", "qitrmcwebsvcerr"},
+    {"qitrmcwebsvc"},
+    {"qitrmcwebsvc/procedure"},
+]
+# The factory makes the procedures, so it alone looks up.
+ALLOWED_UPWARDS = {("qitrmcwebsvc/ProcedureFactory.cpp", "qitrmcwebsvc/procedure")}
+
+
+def sources(folder):
+    return [path for path in sorted((ROOT / folder).rglob("*")) if path.suffix in SOURCES]
+
+
+def includes(path):
+    return re.findall(r'^\s*#\s*include\s*["<]([^">]+)[">]', path.read_text(), re.MULTILINE)
+
+
+def floor_of(folder):
+    for number, folders in enumerate(FLOORS):
+        if folder in folders:
+            return number
+    return None
+
+
+def test_every_folder_of_the_plug_in_has_a_floor():
+    folders = {path.parent.relative_to(ROOT / "src").as_posix() for path in sources("src")}
+    assert folders - set().union(*FLOORS) == set()
+
+
+def test_includes_of_the_plug_in_point_downwards():
+    faults = []
+    for path in sources("src"):
+        name = path.relative_to(ROOT / "src").as_posix()
+        own_floor = floor_of(path.parent.relative_to(ROOT / "src").as_posix())
+        for header in includes(path):
+            folder = str(pathlib.PurePosixPath(header).parent)
+            floor = floor_of(folder)
+            if floor is not None and floor > own_floor and (name, folder) not in ALLOWED_UPWARDS:
+                faults.append(f"{name} includes {header}")
+    assert faults == []
+
+
+def test_the_plug_in_does_not_know_the_simulator_or_the_host():
+    known = {path.name for folder in ("simulator", "host") for path in sources(folder)}
+    own = {path.name for path in sources("src")}
+    for path in sources("src"):
+        for header in includes(path):
+            assert not header.startswith(("simulator/", "host/")), path
+            assert header in own or header not in known - own, f"{path} includes {header}"
+
+
+def test_the_simulator_and_the_host_know_the_plug_in_through_the_c_headers_only():
+    folders = set().union(*FLOORS)
+    for folder in ("simulator", "host"):
+        for path in sources(folder):
+            for header in includes(path):
+                assert str(pathlib.PurePosixPath(header).parent) not in folders, f"{path}: {header}"
