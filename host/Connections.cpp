@@ -34,6 +34,18 @@ void Connection::workForClient() noexcept {
 Connections::Connections(uint32_t most, uint32_t patience) noexcept
     : most(most), patience(patience) {}
 
+bool Connections::waitForPlace() noexcept {
+    std::unique_lock<std::mutex> lock(mutex);
+    changed.wait(lock, [this] { return closed || open.size() < most; });
+    return !closed;
+}
+
+void Connections::close() noexcept {
+    const std::lock_guard<std::mutex> lock(mutex);
+    closed = true;
+    changed.notify_all();
+}
+
 Connection* Connections::add(int socket) noexcept {
     try {
         const std::lock_guard<std::mutex> lock(mutex);
@@ -51,6 +63,7 @@ void Connections::remove(Connection* connection) noexcept {
         return;
     const std::lock_guard<std::mutex> lock(mutex);
     open.erase(connection->self);
+    changed.notify_one();
 }
 
 void Connections::shutOverdue() noexcept {

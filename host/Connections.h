@@ -1,6 +1,7 @@
 #pragma once
 
 #include <atomic>
+#include <condition_variable>
 #include <cstdint>
 #include <list>
 #include <mutex>
@@ -33,6 +34,12 @@ class Connections {
     // client's step.
     Connections(uint32_t most, uint32_t patience) noexcept;
 
+    // Waits until fewer connections are open than the host takes. False once close() was called.
+    bool waitForPlace() noexcept;
+
+    // Ends every waitForPlace().
+    void close() noexcept;
+
     // Remembers a connection until remove(). Null when memory runs out; the socket is then shut.
     Connection* add(int socket) noexcept;
 
@@ -47,6 +54,8 @@ class Connections {
     const uint32_t most;
     const uint32_t patience;
     std::mutex mutex;
+    std::condition_variable changed;
+    bool closed = false;
     std::list<Connection> open;
 };
 

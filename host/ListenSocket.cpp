@@ -1,7 +1,6 @@
 #include "host/ListenSocket.h"
 
 #include <netdb.h>
-#include <sys/socket.h>
 #include <unistd.h>
 
 #include <cerrno>
@@ -49,7 +48,7 @@ AddressList resolve(const std::string& address, const std::string& port, const s
 ListenSocket::ListenSocket(const std::string& address, const std::string& port)
     : where(urlAuthority(address, port)) {
     const AddressList found = resolve(address, port, where);
-    socket = ::socket(found->ai_family, SOCK_STREAM | SOCK_NONBLOCK | SOCK_CLOEXEC, 0);
+    socket = ::socket(found->ai_family, SOCK_STREAM | SOCK_CLOEXEC, 0);
     if (socket < 0)
         failToListen(where, errno);
     // A host that is started again need not wait for connections of the last one to fade.
@@ -69,6 +68,16 @@ ListenSocket::~ListenSocket() {
 void ListenSocket::listen() {
     if (::listen(socket, SOMAXCONN) != 0)
         failToListen(where, errno);
+}
+
+int ListenSocket::accept(sockaddr_storage& address, socklen_t& length) noexcept {
+    length = sizeof address;
+    return accept4(socket, reinterpret_cast<sockaddr*>(&address), &length,
+                   SOCK_NONBLOCK | SOCK_CLOEXEC);
+}
+
+void ListenSocket::stopListening() noexcept {
+    shutdown(socket, SHUT_RDWR);
 }
 
 std::string ListenSocket::authority() const {

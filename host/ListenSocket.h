@@ -1,5 +1,7 @@
 #pragma once
 
+#include <sys/socket.h>
+
 #include <string>
 
 namespace host {
@@ -17,7 +19,12 @@ class ListenSocket {
     // Lets clients connect. Throws Failure.
     void listen();
 
-    int descriptor() const { return socket; }
+    // Lets nobody connect any more, and ends an accept() that waits.
+    void stopListening() noexcept;
+
+    // Waits for a client. Gives its non-blocking socket, which the caller owns, and its address;
+    // -1 when there is none, for want of file descriptors for example.
+    int accept(sockaddr_storage& address, socklen_t& length) noexcept;
 
     // The address and port as a URL has them, such as 127.0.0.1:8080 or [::1]:8080.
     std::string authority() const;

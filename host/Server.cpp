@@ -3,7 +3,8 @@
 #include <microhttpd.h>
 
 #include <cstring>
-#include <memory>
+#include <exception>
+#include <utility>
 
 #include "host/Exchange.h"
 #include "host/Failure.h"
@@ -14,6 +15,14 @@ namespace {
 
 // Holds the service's deepest recursion with much room; 512 of them fit a 32-bit address space.
 constexpr std::size_t kStackSize = 2 * 1024 * 1024;
+
+// The library closes a connection beyond its limit at once, so its limit stays above ours: a client
+// that finds all places taken waits with the system. That is why this server accepts by itself.
+constexpr unsigned kPlacesInPassing = 64;
+
+// How long to wait when a client cannot be accepted, so that a lasting reason does not keep a core
+// busy.
+constexpr std::chrono::milliseconds kPauseAfterFailure(10);
 
 Connection* connectionOf(MHD_Connection* connection) {
     const auto* info = MHD_get_connection_info(connection, MHD_CONNECTION_INFO_SOCKET_CONTEXT);
@@ -118,37 +127,56 @@ struct Server::Callbacks {
 };
 
 Server::Server(const Plugin& plugin, ListenSocket& socket, ServerSettings wanted)
-    : plugin(plugin), settings(std::move(wanted)), connections(settings.threads, settings.timeout) {
+    : plugin(plugin),
+      socket(socket),
+      settings(std::move(wanted)),
+      connections(settings.threads, settings.timeout),
+      daemon(startDaemon(), MHD_stop_daemon) {
+    if (!daemon) {
+        throw Failure(
+            settings.tls ? "HTTPS cannot be served with these files. Name a certificate in PEM "
+                           "form with --tls-cert and the private key that belongs to it with "
+                           "--tls-key."
+                         : "The HTTP server cannot start. Free memory or threads of this machine.");
+    }
+    socket.listen();
+    acceptor = std::thread([this] { acceptClients(); });
+}
+
+MHD_Daemon* Server::startDaemon() {
     const unsigned flags = MHD_USE_INTERNAL_POLLING_THREAD | MHD_USE_THREAD_PER_CONNECTION |
-                           MHD_USE_POLL | MHD_USE_ITC | (settings.tls ? MHD_USE_TLS : 0);
+                           MHD_USE_POLL | MHD_USE_ITC | MHD_USE_NO_LISTEN_SOCKET |
+                           (settings.tls ? MHD_USE_TLS : 0);
     MHD_OptionItem tlsOptions[] = {
         {MHD_OPTION_HTTPS_MEM_CERT, 0, const_cast<char*>(settings.tlsCertificate.c_str())},
         {MHD_OPTION_HTTPS_MEM_KEY, 0, const_cast<char*>(settings.tlsKey.c_str())},
         {MHD_OPTION_END, 0, nullptr}};
-    socket.listen();
-    daemon = MHD_start_daemon(
-        flags, 0, nullptr, nullptr, Callbacks::onRequest, this,                //
-        MHD_OPTION_LISTEN_SOCKET, socket.descriptor(),                         //
-        MHD_OPTION_CONNECTION_LIMIT, static_cast<unsigned>(settings.threads),  //
-        MHD_OPTION_THREAD_STACK_SIZE, kStackSize,                              //
-        MHD_OPTION_SIGPIPE_HANDLED_BY_APP, 1,                                  //
-        MHD_OPTION_NOTIFY_CONNECTION, Callbacks::onConnection, this,           //
-        MHD_OPTION_URI_LOG_CALLBACK, Callbacks::onRequestLine, this,           //
-        MHD_OPTION_UNESCAPE_CALLBACK, Callbacks::keepEscapes, this,            //
-        MHD_OPTION_NOTIFY_COMPLETED, Callbacks::onEnd, this,                   //
-        MHD_OPTION_ARRAY, settings.tls ? tlsOptions : &tlsOptions[2], MHD_OPTION_END);
-    if (daemon == nullptr) {
-        throw Failure(
-            settings.tls
-                ? "HTTPS cannot be served with these files. Name a certificate in PEM form "
-                  "with --tls-cert and the private key that belongs to it with --tls-key."
-                : "The HTTP server cannot start. Free memory or threads of this machine.");
-    }
+    return MHD_start_daemon(flags, 0, nullptr, nullptr, Callbacks::onRequest, this,            //
+                            MHD_OPTION_CONNECTION_LIMIT, settings.threads + kPlacesInPassing,  //
+                            MHD_OPTION_THREAD_STACK_SIZE, kStackSize,                          //
+                            MHD_OPTION_SIGPIPE_HANDLED_BY_APP, 1,                              //
+                            MHD_OPTION_NOTIFY_CONNECTION, Callbacks::onConnection, this,       //
+                            MHD_OPTION_URI_LOG_CALLBACK, Callbacks::onRequestLine, this,       //
+                            MHD_OPTION_UNESCAPE_CALLBACK, Callbacks::keepEscapes, this,        //
+                            MHD_OPTION_NOTIFY_COMPLETED, Callbacks::onEnd, this,               //
+                            MHD_OPTION_ARRAY, settings.tls ? tlsOptions : &tlsOptions[2],
+                            MHD_OPTION_END);
 }
 
 Server::~Server() {
     stopAccepting();
-    MHD_stop_daemon(daemon);
+}
+
+void Server::acceptClients() noexcept {
+    while (connections.waitForPlace()) {
+        sockaddr_storage address;
+        socklen_t length;
+        const int client = socket.accept(address, length);
+        if (client >= 0)
+            MHD_add_connection(daemon.get(), client, reinterpret_cast<sockaddr*>(&address), length);
+        else
+            std::this_thread::sleep_for(kPauseAfterFailure);
+    }
 }
 
 void Server::shutOverdueConnections() noexcept {
@@ -157,7 +185,10 @@ void Server::shutOverdueConnections() noexcept {
 
 void Server::stopAccepting() {
     gate.close();
-    MHD_quiesce_daemon(daemon);
+    connections.close();
+    socket.stopListening();
+    if (acceptor.joinable())
+        acceptor.join();
 }
 
 bool Server::waitForRequests(std::chrono::milliseconds time) {

@@ -4,6 +4,7 @@
 #include <cstdint>
 #include <memory>
 #include <string>
+#include <thread>
 
 #include "host/Connections.h"
 #include "host/Gate.h"
@@ -47,11 +48,16 @@ class Server {
   private:
     struct Callbacks;
 
+    MHD_Daemon* startDaemon();
+    void acceptClients() noexcept;
+
     const Plugin& plugin;
+    ListenSocket& socket;
     const ServerSettings settings;
     Connections connections;
     Gate gate;
-    MHD_Daemon* daemon;
+    std::unique_ptr<MHD_Daemon, void (*)(MHD_Daemon*)> daemon;
+    std::thread acceptor;
 };
 
 }  // namespace host

@@ -1,0 +1,105 @@
+#include "host/Connections.h"
+
+#include <gtest/gtest.h>
+#include <poll.h>
+#include <sys/socket.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <functional>
+
+namespace {
+
+using host::Connection;
+using host::Connections;
+
+constexpr int kMomentInMilliseconds = 20;
+
+// Two connected sockets: the host's and its client's.
+class Pair {
+  public:
+    Pair() { socketpair(AF_UNIX, SOCK_STREAM, 0, ends); }
+    ~Pair() {
+        close(ends[0]);
+        close(ends[1]);
+    }
+    int host() const { return ends[0]; }
+
+    // Whether the client sees the end of the connection within a moment.
+    bool isShut() const {
+        pollfd client = {ends[1], POLLIN, 0};
+        return poll(&client, 1, kMomentInMilliseconds) == 1;
+    }
+
+  private:
+    int ends[2] = {-1, -1};
+};
+
+// Looks for overdue connections, as the host does all the time, until `condition` holds. Returns
+// how many seconds that took.
+double shutOverdueUntil(Connections& connections, const std::function<bool()>& condition) {
+    using Clock = std::chrono::steady_clock;
+    const Clock::time_point begin = Clock::now();
+    const Clock::time_point giveUp = begin + std::chrono::minutes(1);
+    while (!condition() && Clock::now() < giveUp)
+        connections.shutOverdue();
+    EXPECT_TRUE(condition());
+    return std::chrono::duration<double>(Clock::now() - begin).count();
+}
+
+TEST(Connections, ShutAConnectionThatWaitsLongerThanThePatience) {
+    const Pair pair;
+    Connections connections(10, 1);
+    connections.add(pair.host());
+    connections.shutOverdue();
+    EXPECT_FALSE(pair.isShut());
+    const double seconds = shutOverdueUntil(connections, [&] { return pair.isShut(); });
+    EXPECT_GE(seconds, 1.0);
+}
+
+TEST(Connections, LeaveAConnectionThatTheHostWorksForAlone) {
+    const Pair working;
+    const Pair waiting;
+    Connections connections(10, 1);
+    connections.add(working.host())->workForClient();
+    connections.add(waiting.host());
+    shutOverdueUntil(connections, [&] { return waiting.isShut(); });
+    EXPECT_FALSE(working.isShut());
+}
+
+TEST(Connections, CountThePatienceFromTheLastStep) {
+    const Pair first;
+    const Pair second;
+    Connections connections(10, 1);
+    connections.add(first.host());
+    Connection* patient = connections.add(second.host());
+    shutOverdueUntil(connections, [&] {
+        patient->waitForClient();
+        return first.isShut();
+    });
+    EXPECT_FALSE(second.isShut());
+}
+
+TEST(Connections, ShutAWaitingConnectionSoonerWhenAllPlacesAreTaken) {
+    const Pair first;
+    const Pair second;
+    Connections connections(2, 86400);
+    connections.add(first.host());
+    connections.add(second.host())->workForClient();
+    const double seconds = shutOverdueUntil(connections, [&] { return first.isShut(); });
+    EXPECT_GE(seconds, 2.0);
+    EXPECT_FALSE(second.isShut());
+}
+
+TEST(Connections, ForgetAConnectionThatIsRemoved) {
+    const Pair removed;
+    const Pair other;
+    Connections connections(2, 1);
+    connections.remove(connections.add(removed.host()));
+    connections.add(other.host());
+    shutOverdueUntil(connections, [&] { return other.isShut(); });
+    EXPECT_FALSE(removed.isShut());
+    connections.remove(nullptr);
+}
+
+}  // namespace

@@ -1,0 +1,85 @@
+#include "host/Exchange.h"
+
+#include <gtest/gtest.h>
+
+namespace {
+
+using host::Exchange;
+using host::Gate;
+
+constexpr uint32_t kMaxBody = 10;
+constexpr std::size_t kMebibyte = 1024 * 1024;
+
+TEST(Exchange, IsInFlightAsLongAsItLives) {
+    Gate gate;
+    {
+        const Exchange exchange(gate, kMaxBody);
+        EXPECT_FALSE(gate.waitUntilEmpty(std::chrono::milliseconds(0)));
+    }
+    EXPECT_TRUE(gate.waitUntilEmpty(std::chrono::milliseconds(0)));
+}
+
+TEST(Exchange, KeepsABodyUpToTheLimit) {
+    Gate gate;
+    Exchange exchange(gate, kMaxBody);
+    exchange.begin("http", "POST", "/qitrmc/Call", "10");
+    EXPECT_TRUE(exchange.take("01234", 5));
+    EXPECT_TRUE(exchange.take("56789", 5));
+    EXPECT_FALSE(exchange.isRefused());
+    EXPECT_EQ(exchange.response().body, "0123456789");
+}
+
+TEST(Exchange, RefusesADeclaredLengthAboveTheLimit) {
+    Gate gate;
+    for (const char* length : {"11", "4294967306", "99999999999999999999999999"}) {
+        Exchange exchange(gate, kMaxBody);
+        exchange.begin("http", "POST", "/qitrmc/Call", length);
+        EXPECT_TRUE(exchange.isRefused()) << length;
+        EXPECT_EQ(exchange.response().code, 413);
+        EXPECT_EQ(exchange.response().output,
+                  "The request body is too large: at most 10 bytes are taken.\n");
+    }
+}
+
+TEST(Exchange, RefusesABodyThatGrowsAboveTheLimitAndForgetsIt) {
+    Gate gate;
+    Exchange exchange(gate, kMaxBody);
+    exchange.begin("http", "POST", "/qitrmc/Call", nullptr);
+    EXPECT_TRUE(exchange.take("0123456789", 10));
+    EXPECT_TRUE(exchange.take("x", 1));
+    EXPECT_EQ(exchange.response().code, 413);
+    EXPECT_EQ(exchange.response().body, "");
+}
+
+TEST(Exchange, DropsAClientThatSendsFarMoreThanTheLimit) {
+    Gate gate;
+    Exchange exchange(gate, kMaxBody);
+    exchange.begin("http", "POST", "/qitrmc/Call", nullptr);
+    const std::string piece(kMebibyte, 'x');
+    for (int i = 0; i < 64; ++i)
+        EXPECT_TRUE(exchange.take(piece.data(), piece.size()));
+    EXPECT_FALSE(exchange.take("x", 1));
+}
+
+TEST(Exchange, RefusesPathsOutsideTheService) {
+    Gate gate;
+    Exchange exchange(gate, kMaxBody);
+    exchange.begin("http", "POST", "/elsewhere", nullptr);
+    EXPECT_TRUE(exchange.isRefused());
+    EXPECT_EQ(exchange.response().code, 404);
+    EXPECT_EQ(exchange.response().type, "text/plain");
+    EXPECT_EQ(exchange.response().output,
+              "There is nothing here. The service is at /qitrmc/Call.\n");
+}
+
+TEST(Exchange, RefusesEveryRequestOnceTheGateIsClosed) {
+    Gate gate;
+    gate.close();
+    Exchange exchange(gate, kMaxBody);
+    exchange.begin("http", "POST", "/qitrmc/Call", nullptr);
+    EXPECT_TRUE(exchange.isRefused());
+    EXPECT_EQ(exchange.response().code, 503);
+    EXPECT_EQ(exchange.response().output, "The server is stopping.\n");
+}
+
+}  // namespace

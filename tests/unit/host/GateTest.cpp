@@ -1,0 +1,45 @@
+#include "host/Gate.h"
+
+#include <gtest/gtest.h>
+
+#include <thread>
+
+namespace {
+
+using host::Gate;
+using std::chrono::milliseconds;
+using std::chrono::minutes;
+
+TEST(Gate, IsEmptyUntilARequestEnters) {
+    Gate gate;
+    EXPECT_TRUE(gate.waitUntilEmpty(milliseconds(0)));
+    EXPECT_TRUE(gate.enter());
+    EXPECT_FALSE(gate.waitUntilEmpty(milliseconds(0)));
+    gate.leave();
+    EXPECT_TRUE(gate.waitUntilEmpty(milliseconds(0)));
+}
+
+TEST(Gate, LetsNobodyInOnceItIsClosed) {
+    Gate gate;
+    EXPECT_FALSE(gate.isClosed());
+    EXPECT_TRUE(gate.enter());
+    gate.close();
+    EXPECT_TRUE(gate.isClosed());
+    EXPECT_FALSE(gate.enter());
+    gate.leave();
+    EXPECT_TRUE(gate.waitUntilEmpty(milliseconds(0)));
+}
+
+TEST(Gate, WakesTheWaiterWhenTheLastRequestLeaves) {
+    Gate gate;
+    gate.enter();
+    gate.enter();
+    std::thread requests([&] {
+        gate.leave();
+        gate.leave();
+    });
+    EXPECT_TRUE(gate.waitUntilEmpty(minutes(1)));
+    requests.join();
+}
+
+}  // namespace

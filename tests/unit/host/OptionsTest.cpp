@@ -1,0 +1,142 @@
+#include "host/Options.h"
+
+#include <gmock/gmock.h>
+
+#include "host/Failure.h"
+#include "host/Usage.h"
+
+namespace {
+
+using host::Action;
+using host::Options;
+using host::parseOptions;
+using host::UsageError;
+using testing::HasSubstr;
+
+std::string usageErrorOf(const std::vector<std::string>& arguments) {
+    try {
+        parseOptions(arguments);
+    } catch (const UsageError& error) {
+        return error.what();
+    }
+    return "no usage error";
+}
+
+TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
+    const Options options = parseOptions({});
+    EXPECT_EQ(options.action, Action::Serve);
+    EXPECT_EQ(options.address, "127.0.0.1");
+    EXPECT_EQ(options.port, "8080");
+    EXPECT_EQ(options.plugin, "");
+    EXPECT_EQ(options.chassis, "");
+    EXPECT_EQ(options.state, "");
+    EXPECT_EQ(options.threads, 512u);
+    EXPECT_EQ(options.maxBody, 16777216u);
+    EXPECT_EQ(options.timeout, 30u);
+    EXPECT_EQ(options.tlsCertificate, "");
+    EXPECT_EQ(options.tlsKey, "");
+}
+
+TEST(Options, EachOptionSetsItsOwnField) {
+    const Options options =
+        parseOptions({"--listen", "0.0.0.0:81", "--plugin", "p.so", "--chassis", "c.json",
+                      "--state", "s", "--threads", "3", "--max-body", "4", "--timeout", "5",
+                      "--tls-cert", "cert.pem", "--tls-key", "key.pem"});
+    EXPECT_EQ(options.address, "0.0.0.0");
+    EXPECT_EQ(options.port, "81");
+    EXPECT_EQ(options.plugin, "p.so");
+    EXPECT_EQ(options.chassis, "c.json");
+    EXPECT_EQ(options.state, "s");
+    EXPECT_EQ(options.threads, 3u);
+    EXPECT_EQ(options.maxBody, 4u);
+    EXPECT_EQ(options.timeout, 5u);
+    EXPECT_EQ(options.tlsCertificate, "cert.pem");
+    EXPECT_EQ(options.tlsKey, "key.pem");
+}
+
+TEST(Options, AValueMayFollowAnEqualsSign) {
+    EXPECT_EQ(parseOptions({"--plugin=a=b.so"}).plugin, "a=b.so");
+}
+
+TEST(Options, TheLastOptionOfANameHolds) {
+    EXPECT_EQ(parseOptions({"--threads", "3", "--threads=4"}).threads, 4u);
+}
+
+TEST(Options, AnIpv6AddressLosesItsBrackets) {
+    const Options options = parseOptions({"--listen", "[::1]:0"});
+    EXPECT_EQ(options.address, "::1");
+    EXPECT_EQ(options.port, "0");
+}
+
+TEST(Options, HelpAndVersionWinOverWhatFollows) {
+    EXPECT_EQ(parseOptions({"--help", "--nonsense"}).action, Action::ShowHelp);
+    EXPECT_EQ(parseOptions({"--version", "--nonsense"}).action, Action::ShowVersion);
+}
+
+TEST(Options, WhatIsNotAnAddressAndAPortIsRefused) {
+    for (const char* text : {"8080", ":8080", "::1:8080", "[::1]", "[]:80", "[::1:80", "host:",
+                             "host:port", "host:65536", "host:-1", "host:80 ", "host: 80", ""}) {
+        EXPECT_THAT(usageErrorOf({"--listen", text}), HasSubstr("--listen")) << text;
+    }
+}
+
+TEST(Options, NumbersOutsideTheirRangeAreRefused) {
+    EXPECT_EQ(usageErrorOf({"--threads", "0"}),
+              "--threads takes a number from 1 to 900, not \"0\".");
+    EXPECT_EQ(usageErrorOf({"--threads", "901"}),
+              "--threads takes a number from 1 to 900, not \"901\".");
+    EXPECT_EQ(usageErrorOf({"--max-body", "0"}),
+              "--max-body takes a number from 1 to 4294967295, not \"0\".");
+    EXPECT_EQ(usageErrorOf({"--max-body", "4294967296"}),
+              "--max-body takes a number from 1 to 4294967295, not \"4294967296\".");
+    EXPECT_EQ(usageErrorOf({"--timeout", "0"}),
+              "--timeout takes a number from 1 to 86400, not \"0\".");
+    EXPECT_EQ(usageErrorOf({"--timeout", "86401"}),
+              "--timeout takes a number from 1 to 86400, not \"86401\".");
+}
+
+TEST(Options, TheLimitsOfTheRangesAreTaken) {
+    EXPECT_EQ(parseOptions({"--threads", "1"}).threads, 1u);
+    EXPECT_EQ(parseOptions({"--threads", "900"}).threads, 900u);
+    EXPECT_EQ(parseOptions({"--max-body", "4294967295"}).maxBody, 4294967295u);
+    EXPECT_EQ(parseOptions({"--timeout", "86400"}).timeout, 86400u);
+    EXPECT_EQ(parseOptions({"--listen", "host:65535"}).port, "65535");
+}
+
+TEST(Options, TextThatIsNoNumberIsRefused) {
+    for (const char* text : {"", "x", "1x", " 1", "+1", "-1", "0x1", "1.0"})
+        EXPECT_THAT(usageErrorOf({"--threads", text}), HasSubstr("--threads takes")) << text;
+}
+
+TEST(Options, AnEmptyPathIsRefused) {
+    for (const char* option : {"--plugin", "--chassis", "--state", "--tls-cert", "--tls-key"})
+        EXPECT_EQ(usageErrorOf({option, ""}),
+                  std::string(option) + " takes a path, not an empty text.");
+}
+
+TEST(Options, AMissingValueIsRefused) {
+    EXPECT_EQ(usageErrorOf({"--plugin"}), "--plugin needs a value. Try --help.");
+}
+
+TEST(Options, UnknownArgumentsAreRefused) {
+    EXPECT_EQ(usageErrorOf({"--port", "80"}), "Unknown argument \"--port\". Try --help.");
+    EXPECT_EQ(usageErrorOf({"plugin.so"}), "Unknown argument \"plugin.so\". Try --help.");
+    EXPECT_EQ(usageErrorOf({"--help=yes"}), "Unknown argument \"--help\". Try --help.");
+    EXPECT_EQ(usageErrorOf({""}), "Unknown argument \"\". Try --help.");
+}
+
+TEST(Options, ACertificateWithoutAKeyIsRefused) {
+    const std::string expected = "--tls-cert and --tls-key are given together or not at all.";
+    EXPECT_EQ(usageErrorOf({"--tls-cert", "cert.pem"}), expected);
+    EXPECT_EQ(usageErrorOf({"--tls-key", "key.pem"}), expected);
+}
+
+TEST(Options, TheHelpNamesEveryOption) {
+    for (const char* option :
+         {"--listen", "--plugin", "--chassis", "--state", "--threads", "--max-body", "--timeout",
+          "--tls-cert", "--tls-key", "--help", "--version"}) {
+        EXPECT_THAT(host::kHelpText, HasSubstr(std::string("  ") + option + " "));
+    }
+}
+
+}  // namespace

@@ -1,0 +1,346 @@
+"""Many clients, slow clients, the end of the host, HTTPS, and want of memory."""
+
+import concurrent.futures
+import contextlib
+import http.client
+import resource
+import signal
+import socket
+import subprocess
+import time
+
+import pytest
+
+from conftest import TEST_PLUGIN
+from hostlib import BUILD_DIR, PATIENCE, Host
+
+
+def read_response(client):
+    """(status, body) of the next response on a raw socket."""
+    response = http.client.HTTPResponse(client)
+    response.begin()
+    return response.status, response.read()
+
+
+def raw_post(entry, body):
+    return (f"POST /qitrmc/{entry} HTTP/1.1\r\nHost: a\r\nContent-Length: {len(body)}\r\n\r\n"
+            .encode() + body)
+
+
+def seconds_until_closed(client):
+    """Waits for the host to close a connection on which it sends nothing."""
+    begin = time.monotonic()
+    assert client.recv(1000) == b""
+    return time.monotonic() - begin
+
+
+@contextlib.contextmanager
+def waiting_requests(host, count):
+    """Has `count` requests wait in the plug-in; gives their futures, and releases them after."""
+    with concurrent.futures.ThreadPoolExecutor(count) as pool:
+        waiting = [pool.submit(host.post, b"", "Wait") for _ in range(count)]
+        host.post(b"%d" % count, "AwaitWaiting")
+        try:
+            yield waiting
+        finally:
+            if host.process.poll() is None:
+                with contextlib.suppress(OSError):
+                    host.post(b"", "Release")
+
+
+def test_a_connection_serves_many_requests(host):
+    connection = host.connection()
+    local_ports = set()
+    for i in range(100):
+        connection.request("POST", "/qitrmc/Echo", b"%d" % i)
+        local_ports.add(connection.sock.getsockname())
+        assert connection.getresponse().read() == b"%d" % i
+    connection.close()
+    assert len(local_ports) == 1
+
+
+def test_a_client_may_ask_for_the_connection_to_end(host):
+    with host.raw_socket() as client:
+        client.sendall(b"POST /qitrmc/Echo HTTP/1.1\r\nHost: a\r\nConnection: close\r\n"
+                       b"Content-Length: 1\r\n\r\nx")
+        received = b""
+        while piece := client.recv(1000):
+            received += piece
+    assert received.startswith(b"HTTP/1.1 200 ") and received.endswith(b"\r\n\r\nx")
+
+
+def test_pipelined_requests_are_answered_in_order(host):
+    bodies = [b"%d" % i * (i + 1) for i in range(50)]
+    with host.raw_socket() as client:
+        client.sendall(b"".join(raw_post("Echo", body) for body in bodies))
+        received = b""
+        while received.count(b"HTTP/1.1 200 OK") < 50 or not received.endswith(bodies[-1]):
+            received += client.recv(65536)
+    answers = received.split(b"HTTP/1.1 200 OK")[1:]
+    assert [answer.split(b"\r\n\r\n", 1)[1] for answer in answers] == bodies
+
+
+def test_a_request_that_comes_byte_by_byte_is_served(host):
+    with host.raw_socket() as client:
+        client.setsockopt(socket.IPPROTO_TCP, socket.TCP_NODELAY, 1)
+        for byte in raw_post("Echo", b"slow"):
+            client.sendall(bytes([byte]))
+        assert read_response(client) == (200, b"slow")
+
+
+def test_requests_that_wait_in_the_plugin_delay_no_other(host):
+    with waiting_requests(host, 100) as waiting:
+        assert host.post(b"abc", "Echo")[2] == b"abc"
+        assert not any(future.done() for future in waiting)
+    assert [future.result()[::2] for future in waiting] == [(200, b"released")] * 100
+
+
+def test_many_clients_at_once_each_get_their_own_answer(host):
+    def converse(number):
+        connection = host.connection()
+        answers = []
+        for i in range(50):
+            connection.request("POST", "/qitrmc/Echo", b"%d of %d" % (i, number))
+            answers.append(connection.getresponse().read())
+        connection.close()
+        return answers == [b"%d of %d" % (i, number) for i in range(50)]
+
+    with concurrent.futures.ThreadPoolExecutor(32) as pool:
+        assert all(pool.map(converse, range(32)))
+
+
+def test_more_clients_than_places_are_all_served(start_host):
+    host = start_host("--threads", "2")
+    with concurrent.futures.ThreadPoolExecutor(16) as pool:
+        answers = pool.map(lambda i: host.post(b"%d" % i, "Echo")[2], range(200))
+        assert list(answers) == [b"%d" % i for i in range(200)]
+
+
+@pytest.mark.parametrize("start", [
+    b"",
+    b"POST /qitrmc/Echo HTTP/1.1\r\n",
+    b"POST /qitrmc/Echo HTTP/1.1\r\nHost: a\r\nContent-Length: 10\r\n\r\nabc",
+    raw_post("Nothing", b"")[:30],
+], ids=["nothing", "request line", "half a body", "half a head"])
+def test_a_silent_client_loses_its_connection(start_host, start):
+    host = start_host("--timeout", "1")
+    with host.raw_socket() as client:
+        client.sendall(start)
+        assert 1 <= seconds_until_closed(client) < 10
+    assert host.post(b"abc", "Echo")[2] == b"abc"
+
+
+def test_an_idle_connection_is_closed_after_its_request(start_host):
+    host = start_host("--timeout", "1")
+    with host.raw_socket() as client:
+        client.sendall(raw_post("Echo", b"abc"))
+        assert read_response(client) == (200, b"abc")
+        assert 1 <= seconds_until_closed(client) < 10
+
+
+def test_a_client_that_drips_a_head_loses_its_connection(start_host):
+    host = start_host("--timeout", "1")
+    with host.raw_socket() as client:
+        client.sendall(b"POST /qitrmc/Echo HTTP/1.1\r\n")
+        client.settimeout(0.05)
+        begin = time.monotonic()
+        with pytest.raises(OSError) as caught:
+            while time.monotonic() - begin < PATIENCE:
+                client.sendall(b"X: y\r\n")
+                with contextlib.suppress(TimeoutError):
+                    if client.recv(1) == b"":
+                        raise ConnectionResetError
+    assert isinstance(caught.value, (ConnectionResetError, BrokenPipeError))
+    assert time.monotonic() - begin >= 1
+
+
+def test_a_client_that_does_not_fetch_its_response_loses_its_connection(start_host):
+    host = start_host("--timeout", "1")
+    with host.raw_socket() as client:
+        client.sendall(raw_post("Much", b"100000000"))
+        deadline = time.monotonic() + PATIENCE
+        while len(open_sockets(host)) > 1:
+            assert time.monotonic() < deadline
+        received = 0
+        with contextlib.suppress(ConnectionResetError):
+            while piece := client.recv(1 << 20):
+                received += len(piece)
+    assert received < 100000000
+
+
+def open_sockets(host):
+    """The TCP sockets that the host has open, the listening one among them."""
+    listing = subprocess.run(["ls", "-l", f"/proc/{host.process.pid}/fd"], check=True,
+                             capture_output=True, text=True).stdout
+    inodes = {line.split("socket:[")[1].rstrip("]") for line in listing.splitlines()
+              if "socket:[" in line}
+    table = open(f"/proc/{host.process.pid}/net/tcp", encoding="ascii").read().splitlines()[1:]
+    return [line for line in table if line.split()[9] in inodes]
+
+
+def test_a_request_in_the_plugin_outlives_the_timeout(start_host):
+    host = start_host("--timeout", "1")
+    with waiting_requests(host, 1) as waiting, host.raw_socket() as silent:
+        seconds_until_closed(silent)
+    assert waiting[0].result()[::2] == (200, b"released")
+
+
+def test_silent_clients_in_all_places_give_way_long_before_the_timeout(start_host):
+    host = start_host("--threads", "3", "--timeout", "86400")
+    with contextlib.ExitStack() as stack:
+        silent = [stack.enter_context(host.raw_socket()) for _ in range(6)]
+        for client in silent:
+            client.sendall(b"POST /qit")
+        assert host.post(b"abc", "Echo")[2] == b"abc"
+
+
+def test_requests_in_flight_end_before_the_host_does(start_host, tmp_path):
+    log = tmp_path / "log"
+    host = start_host(HOST_PLUGIN_LOG=str(log))
+    with host.raw_socket() as open_before, waiting_requests(host, 3) as waiting:
+        open_before.sendall(raw_post("Echo", b"1"))
+        assert read_response(open_before) == (200, b"1")
+        host.process.send_signal(signal.SIGTERM)
+        wait_until_refused(host)
+        # The last way in: a connection from before. It is no longer served...
+        open_before.sendall(raw_post("Release", b""))
+        assert read_response(open_before) == (503, b"The server is stopping.\n")
+        assert not any(future.done() for future in waiting)
+        assert host.process.poll() is None
+        host.process.send_signal(signal.SIGTERM)
+    # ... so a second signal has to end what would wait for ever.
+    assert host.process.wait(PATIENCE) == -signal.SIGTERM
+    assert "finalize" not in log.read_text()
+
+
+def wait_until_refused(host):
+    """Waits until the host accepts nobody any more."""
+    deadline = time.monotonic() + PATIENCE
+    while time.monotonic() < deadline:
+        try:
+            host.raw_socket().close()
+        except ConnectionRefusedError:
+            return
+    raise AssertionError("the host goes on accepting connections")
+
+
+@pytest.mark.parametrize("end_signal", [signal.SIGTERM, signal.SIGINT])
+def test_a_signal_lets_the_request_in_flight_end(start_host, tmp_path, end_signal):
+    log = tmp_path / "log"
+    host = start_host(HOST_PLUGIN_LOG=str(log))
+    body = b"x" * 1000
+    with host.raw_socket() as client:
+        request = raw_post("Echo", body)
+        client.sendall(request[:-500])
+        wait_until_in_flight(host)
+        host.process.send_signal(end_signal)
+        wait_until_refused(host)
+        client.sendall(request[-500:])
+        assert read_response(client) == (200, body)
+        assert client.recv(1) == b""
+    assert host.process.wait(PATIENCE) == 0
+    assert log.read_text() == "init\nrun Echo\nfinalize\n"
+
+
+def wait_until_in_flight(host):
+    """Waits until the host has read all that its clients have sent."""
+    deadline = time.monotonic() + PATIENCE
+    while time.monotonic() < deadline:
+        established = [line.split() for line in open_sockets(host) if line.split()[3] == "01"]
+        if established and all(fields[4].endswith(":00000000") for fields in established):
+            return
+    raise AssertionError("the host does not read")
+
+
+def test_a_stop_does_not_wait_for_idle_connections(host):
+    with host.raw_socket() as silent, host.raw_socket() as idle:
+        idle.sendall(raw_post("Echo", b"abc"))
+        assert read_response(idle) == (200, b"abc")
+        silent.sendall(b"POST /qit")
+        host.process.terminate()
+        assert host.process.wait(PATIENCE) == 0
+
+
+def test_clients_that_vanish_do_no_harm(host):
+    with waiting_requests(host, 1):
+        with host.raw_socket() as client:
+            client.sendall(raw_post("Wait", b""))
+            host.post(b"2", "AwaitWaiting")
+        with host.raw_socket() as client:
+            client.sendall(raw_post("Much", b"10000000"))
+    assert host.post(b"abc", "Echo")[2] == b"abc"
+    assert host.stop() == 0
+
+
+def test_https_is_reported_to_the_plugin(start_host, certificate):
+    host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1])
+    assert host.first_line.startswith("Listening on https://127.0.0.1:")
+    status, _, body = host.post(b"x" * 1000)
+    assert status == 200
+    assert b"transport https\n" in body
+    text = b"x" * 3000000
+    assert host.post(text, "Echo")[2] == text
+    assert host.stop() == 0
+
+
+def test_plain_http_on_an_https_port_is_cut_and_the_host_lives_on(start_host, certificate):
+    host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1])
+    with host.raw_socket() as client:
+        client.sendall(raw_post("Echo", b"abc"))
+        received = b""
+        with contextlib.suppress(ConnectionResetError):
+            while piece := client.recv(1000):
+                received += piece
+        assert b"HTTP" not in received
+    assert host.post(b"abc", "Echo")[2] == b"abc"
+
+
+def test_a_silent_client_of_https_loses_its_connection(start_host, certificate):
+    host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1], "--timeout", "1")
+    with host.raw_socket() as client:
+        assert 1 <= seconds_until_closed(client) < 10
+
+
+def test_a_tls_file_that_cannot_be_read_is_named(refused_start, certificate, tmp_path):
+    missing = tmp_path / "none.pem"
+    assert refused_start("--tls-cert", missing, "--tls-key", certificate[1]) == (
+        f"The certificate {missing} cannot be read: No such file or directory. Name a readable "
+        "file with --tls-cert.")
+    assert refused_start("--tls-cert", certificate[0], "--tls-key", missing) == (
+        f"The private key {missing} cannot be read: No such file or directory. Name a readable "
+        "file with --tls-key.")
+
+
+@pytest.mark.parametrize("content", [b"", b"not a key", None], ids=["empty", "text", "mismatch"])
+def test_tls_files_that_do_not_serve_are_refused(refused_start, certificate, tmp_path, content):
+    key = tmp_path / "key.pem"
+    if content is None:
+        subprocess.run(["openssl", "genrsa", "-out", key, "2048"], check=True, capture_output=True)
+    else:
+        key.write_bytes(content)
+    log = tmp_path / "log"
+    message = refused_start("--listen", "127.0.0.1:0", "--plugin", TEST_PLUGIN, "--tls-cert",
+                            certificate[0], "--tls-key", key, HOST_PLUGIN_LOG=str(log))
+    assert message == ("HTTPS cannot be served with these files. Name a certificate in PEM form "
+                       "with --tls-cert and the private key that belongs to it with --tls-key.")
+    assert log.read_text() == "init\nfinalize\n"
+
+
+def is_sanitized():
+    return "QITRMC_SANITIZE:STRING=\n" not in (BUILD_DIR / "CMakeCache.txt").read_text()
+
+
+@pytest.mark.skipif(is_sanitized(), reason="a sanitizer's memory cannot be limited")
+@pytest.mark.parametrize("entry, body", [
+    ("Echo", b"x" * 300_000_000), ("Much", b"300000000"),
+], ids=["request", "response"])
+def test_want_of_memory_fails_one_request_only(start_host, entry, body):
+    host = start_host("--max-body", "4294967295")
+    limit = 300 * 1024 * 1024
+    resource.prlimit(host.process.pid, resource.RLIMIT_AS, (limit, limit))
+    try:
+        assert host.post(body, entry)[0] == 500
+    except (ConnectionResetError, BrokenPipeError, http.client.RemoteDisconnected):
+        pass
+    assert host.post(b"abc", "Echo")[2] == b"abc"
+    assert host.stop() == 0
