@@ -35,13 +35,17 @@ class Host:
     plugin     path of the plug-in; None for the host's own choice
     options    further options of the command line; they may name another --listen
     env        variables added to the environment
+    files      contents of files, by path below the temporary directory, laid out before the start
 
     Attributes: process (subprocess.Popen), directory (temporary pathlib.Path, also the working
     directory; gone after stop()), first_line (what it printed on stdout).
     """
 
-    def __init__(self, build_dir=None, plugin=None, options=(), env=None):
+    def __init__(self, build_dir=None, plugin=None, options=(), env=None, files=None):
         self.directory = pathlib.Path(tempfile.mkdtemp(prefix="qitrmc-host-"))
+        for path, content in (files or {}).items():
+            (self.directory / path).parent.mkdir(parents=True, exist_ok=True)
+            (self.directory / path).write_bytes(content)
         self.program = pathlib.Path(build_dir or BUILD_DIR) / "bin" / "qitrmc-host"
         command = [str(self.program), "--listen", "127.0.0.1:0"]
         if plugin is not None:
