@@ -19,6 +19,8 @@ import urllib.parse
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 BUILD_DIR = pathlib.Path(os.environ.get("QITRMC_BUILD_DIR", ROOT / "build" / "dev")).resolve()
+# A plug-in that answers with what it was asked.
+TEST_PLUGIN = BUILD_DIR / "lib" / "libhost_test_plugin.so"
 
 # Far more than anything here takes: it only ends a test that would never end.
 PATIENCE = 60

@@ -5,9 +5,7 @@ import subprocess
 
 import pytest
 
-from hostlib import BUILD_DIR, Host
-
-TEST_PLUGIN = BUILD_DIR / "lib" / "libhost_test_plugin.so"
+from hostlib import BUILD_DIR, TEST_PLUGIN, Host
 
 
 @pytest.fixture

@@ -11,8 +11,7 @@ import time
 
 import pytest
 
-from conftest import TEST_PLUGIN
-from hostlib import BUILD_DIR, PATIENCE, Host
+from hostlib import BUILD_DIR, PATIENCE, TEST_PLUGIN, Host
 
 
 def read_response(client):

@@ -6,8 +6,7 @@ import subprocess
 
 import pytest
 
-from conftest import TEST_PLUGIN
-from hostlib import BUILD_DIR
+from hostlib import BUILD_DIR, TEST_PLUGIN
 
 
 def test_prints_exactly_one_line_with_the_port_it_took(host):
