@@ -3,14 +3,17 @@
 find_package(GTest REQUIRED)
 include(GoogleTest)
 
-# qitrmc_unit_test(NAME SOURCES ... LIBRARIES ... [LABELS ...]): one test program of GoogleTest
+# qitrmc_unit_test(NAME SOURCES ... LIBRARIES ... [LABELS concurrent]): one test program of GoogleTest
 # cases, each case registered with CTest on its own. The label "concurrent" makes the thread
 # sanitizer run them too.
 function(qitrmc_unit_test name)
-  cmake_parse_arguments(PARSE_ARGV 1 test "" "" "SOURCES;LIBRARIES;LABELS")
+  cmake_parse_arguments(PARSE_ARGV 1 test "" "LABELS" "SOURCES;LIBRARIES")
   add_executable(${name} ${test_SOURCES})
   target_include_directories(${name} PRIVATE "${PROJECT_SOURCE_DIR}/tests")
   target_link_libraries(${name} PRIVATE ${test_LIBRARIES} GTest::gmock GTest::gtest_main)
+  if(NOT test_LABELS)
+    set(test_LABELS sequential)
+  endif()
   gtest_discover_tests(${name} TEST_PREFIX "${name}." DISCOVERY_TIMEOUT 60
-                       PROPERTIES LABELS "unit;${test_LABELS}" TIMEOUT 120)
+                       PROPERTIES LABELS ${test_LABELS} TIMEOUT 120)
 endfunction()
