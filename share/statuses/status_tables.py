@@ -16,7 +16,8 @@ from dataclasses import dataclass
 from pathlib import Path
 
 # The word of each language in column names, and its folder in the shared directory.
-LANGUAGES = {"eng": "English", "fra": "French", "deu": "German", "jpn": "Japanese", "kor": "Korean"}
+LANGUAGES = {"eng": "English", "fra": "French", "deu": "German", "jpn": "Japanese", "kor": "Korean",
+             "chs": "ChineseS"}
 # The raisers of the codes in each table.
 CATALOGUE_RAISERS = ("json-rpc", "service", "platform")
 SIMULATED_RAISER = "simulated-driver"
