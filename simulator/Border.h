@@ -33,6 +33,22 @@ void withSimulator(qierr_Status* status, Body body) noexcept {
     }
 }
 
+// Sets what a function gives out to 0 or null, unless the status keeps it from acting.
+template <typename... Outs>
+void clearOutputs(const qierr_Status* status, Outs*... outs) noexcept {
+    if (status->code >= 0) {
+        ((*outs = Outs{}), ...);
+    }
+}
+
+// Runs body(simulator, session) in the same way, for an open session.
+template <typename Body>
+void withSession(nQITRMCAPI100_Session session, qierr_Status* status, Body body) noexcept {
+    withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>&) {
+        body(simulator, simulator.sessions.get(session));
+    });
+}
+
 // A text that a caller must give. Refuses a null pointer with the argument's name.
 std::string_view required(const char* text, const char* argument);
 

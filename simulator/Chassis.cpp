@@ -9,17 +9,58 @@ std::string Resource::fullName() const {
     return kind == Kind::device ? name : device->name + "/" + name;
 }
 
+const Command* Resource::command(std::string_view commandName) const {
+    for (const Command& command : commands) {
+        if (command.name == commandName) {
+            return &command;
+        }
+    }
+    return nullptr;
+}
+
+void Device::reset() {
+    forEachResource([](Resource& resource) { resource.properties.reset(); });
+    for (const auto& area : nvmemAreas) {
+        area->memory.drop();
+    }
+    registers.reset();
+}
+
+void Device::dropPending(nQITRMCAPI100_Session session) {
+    forEachResource([&](Resource& resource) { resource.properties.dropPending(session); });
+    for (const auto& area : nvmemAreas) {
+        area->memory.dropPending(session);
+    }
+}
+
 Device& Chassis::addDevice(const std::string& name) {
     all.push_back(std::make_unique<Device>(name));
     byName.emplace(foldName(name), all.back().get());
     return *all.back();
 }
 
-Resource& Chassis::addPart(Device& device, Kind kind, const std::string& name) {
-    auto& parts = kind == Kind::physChan ? device.physChans : device.nvmemAreas;
-    parts.push_back(std::make_unique<Resource>(kind, name, device));
-    device.parts.emplace(foldName(name), parts.back().get());
-    return *parts.back();
+Resource& Chassis::addPhysChan(Device& device, const std::string& name) {
+    device.physChans.push_back(std::make_unique<Resource>(Kind::physChan, name, device));
+    device.parts.emplace(foldName(name), device.physChans.back().get());
+    return *device.physChans.back();
+}
+
+NvmemArea& Chassis::addNvmemArea(Device& device, const std::string& name) {
+    device.nvmemAreas.push_back(std::make_unique<NvmemArea>(name, device));
+    device.parts.emplace(foldName(name), device.nvmemAreas.back().get());
+    return *device.nvmemAreas.back();
+}
+
+void Chassis::rename(Device& device, const std::string& newName) {
+    std::string name = newName;
+    const std::string folded = foldName(newName);
+    const std::string old = foldName(device.name);
+    byName.emplace(folded, &device);
+    if (folded != old) {
+        byName.erase(old);
+    }
+    device.name.swap(name);
+    ++changes;
 }
 
 Device* Chassis::findDevice(std::string_view name) const {
@@ -57,12 +98,12 @@ Resource& Chassis::physChan(std::string_view fullName) const {
     return *found;
 }
 
-Resource& Chassis::nvmemArea(std::string_view fullName) const {
+NvmemArea& Chassis::nvmemArea(std::string_view fullName) const {
     Resource* found = find(fullName);
     if (found == nullptr || found->kind != Kind::nvmemArea) {
         throw Refusal(code::unknownNvmemArea).usage(tag::requestedValue, fullName);
     }
-    return *found;
+    return static_cast<NvmemArea&>(*found);
 }
 
 }  // namespace simulator

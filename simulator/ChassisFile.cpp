@@ -10,6 +10,8 @@
 #include "Description.h"
 #include "EmbeddedTexts.h"
 #include "NameText.h"
+#include "PartsFile.h"
+#include "PropertyFile.h"
 #include "Refusal.h"
 
 namespace simulator {
@@ -18,48 +20,46 @@ namespace {
 
 constexpr int32_t chassisCategory = 1;
 constexpr uint32_t mostSlots = 64;
-constexpr uint32_t mostChannels = 1024;
-
-std::string newName(const Node& node, std::string (*faultOf)(std::string_view)) {
-    const std::string name = node.text();
-    const std::string fault = faultOf(name);
-    if (!fault.empty()) {
-        node.fail("is not a name", fault);
-    }
-    return name;
-}
-
-void readChannels(const Node& node, Chassis& chassis, Device& device) {
-    node.expectMembers({"prefix", "count"});
-    const Node prefixNode = node.member("prefix", "the text in front of the channel's number");
-    const std::string prefix = newName(prefixNode, nameFault);
-    if (prefix.back() >= '0' && prefix.back() <= '9') {
-        prefixNode.fail("ends in a digit", "the channel's number follows the prefix");
-    }
-    const Node countNode = node.member("count", "the number of channels");
-    const uint32_t count = countNode.unsignedNumber(1, mostChannels);
-    for (uint32_t i = 0; i < count; ++i) {
-        chassis.addPart(device, Kind::physChan, prefix + std::to_string(i));
-    }
-}
-
-void readArea(const Node& node, Chassis& chassis, Device& device) {
-    node.expectMembers({"name"});
-    const Node nameNode = node.member("name", "the name of the area");
-    const std::string name = newName(nameNode, partNameFault);
-    if (chassis.findPart(device, name) != nullptr) {
-        nameNode.fail("is the name of two parts of the device", "names must differ");
-    }
-    chassis.addPart(device, Kind::nvmemArea, name);
-}
 
 enum class Place { system, slot };
 
-Device& readDevice(const Node& node, Place place, Chassis& chassis);
+// Reads the devices of one description.
+class DeviceReader {
+  public:
+    DeviceReader(Chassis& chassis, const Enumerations& enumerations)
+        : chassis(chassis), enumerations(enumerations) {}
 
-void readModules(const Node& node, Chassis& chassis, Device& owner) {
+    Device& read(const Node& node, Place place);
+
+  private:
+    Device& addDevice(const Node& node);
+    void readSlot(const Node& node, Place place, Device& device);
+    void readModules(const Node& node, Device& owner);
+
+    Chassis& chassis;
+    const Enumerations& enumerations;
+};
+
+Device& DeviceReader::addDevice(const Node& node) {
+    const Node nameNode = node.member("name", "the name of the device");
+    const std::string name = readName(nameNode, nameFault);
+    if (chassis.findDevice(name) != nullptr) {
+        nameNode.fail("is the name of two devices", "names must differ in more than letter case");
+    }
+    return chassis.addDevice(name);
+}
+
+void DeviceReader::readSlot(const Node& node, Place place, Device& device) {
+    if (place == Place::slot) {
+        device.slot = node.member("slot", "the number of the slot").unsignedNumber(1, mostSlots);
+    } else if (node.has("slot")) {
+        node.member("slot", "").fail("belongs to no chassis", "only modules have a slot");
+    }
+}
+
+void DeviceReader::readModules(const Node& node, Device& owner) {
     node.forEachElement([&](const Node& element) {
-        Device& module = readDevice(element, Place::slot, chassis);
+        Device& module = read(element, Place::slot);
         for (const Device* other : owner.modules) {
             if (other->slot == module.slot) {
                 element.fail("stands in a slot that is taken", "slots hold one module each");
@@ -69,37 +69,48 @@ void readModules(const Node& node, Chassis& chassis, Device& owner) {
     });
 }
 
-Device& readDevice(const Node& node, Place place, Chassis& chassis) {
-    node.expectMembers({"name", "category", "slot", "modules", "channels", "nvmem_areas"});
-    const Node nameNode = node.member("name", "the name of the device");
-    const std::string name = newName(nameNode, nameFault);
-    if (chassis.findDevice(name) != nullptr) {
-        nameNode.fail("is the name of two devices", "names must differ in more than letter case");
-    }
-    Device& device = chassis.addDevice(name);
+Device& DeviceReader::read(const Node& node, Place place) {
+    node.expectMembers({"name", "category", "slot", "modules", "channels", "nvmem_areas",
+                        "registers", "values", "properties", "commands", "connect_seconds",
+                        "reachable"});
+    Device& device = addDevice(node);
     device.category = node.member("category", "the product category").signedNumber();
-    if (place == Place::slot) {
-        device.slot = node.member("slot", "the number of the slot").unsignedNumber(1, mostSlots);
-    } else if (node.has("slot")) {
-        node.member("slot", "").fail("belongs to no chassis", "only modules have a slot");
-    }
-    if (node.has("channels")) {
-        readChannels(node.member("channels", ""), chassis, device);
-    }
-    if (node.has("nvmem_areas")) {
-        node.member("nvmem_areas", "").forEachElement([&](const Node& element) {
-            readArea(element, chassis, device);
-        });
-    }
-    if (node.has("modules")) {
-        const Node modules = node.member("modules", "");
+    readSlot(node, place, device);
+    node.ifPresent("connect_seconds",
+                   [&](const Node& time) { device.connectSeconds = time.seconds(); });
+    node.ifPresent("reachable", [&](const Node& flag) { device.reachable = flag.flag(); });
+    readResource(node, Category::device, chassis, enumerations, device);
+    node.ifPresent("channels", [&](const Node& channels) {
+        readPhysChans(channels, enumerations, chassis, device);
+    });
+    node.ifPresent("nvmem_areas", [&](const Node& areas) {
+        areas.forEachElement(
+            [&](const Node& element) { readNvmemArea(element, enumerations, chassis, device); });
+    });
+    node.ifPresent("registers", [&](const Node& blocks) {
+        blocks.forEachElement([&](const Node& block) { readRegisterBlock(block, device); });
+    });
+    node.ifPresent("modules", [&](const Node& modules) {
         if (device.category != chassisCategory || place == Place::slot) {
             modules.fail("belongs to a device that is no chassis",
                          "only a device of category 1 outside of a slot has modules");
         }
-        readModules(modules, chassis, device);
-    }
+        readModules(modules, device);
+    });
     return device;
+}
+
+void readBuiltInCatalogue(Catalogue& catalogue) {
+    JsonDocument document;
+    parseDescription(embedded::catalogue, document);
+    readCatalogue(Node(document), {}, catalogue);
+}
+
+void fillFrom(const Node& root, const char* member, Category category, const Catalogue& catalogue,
+              PropertyStore& store) {
+    root.ifPresent(member,
+                   [&](const Node& values) { fillStore(category, catalogue, &values, store); });
+    fillStore(category, catalogue, nullptr, store);
 }
 
 std::string readFile(const char* path) {
@@ -115,26 +126,31 @@ std::string readFile(const char* path) {
     return content.str();
 }
 
-std::vector<std::string> memberNames(const Node& node) {
-    std::vector<std::string> names;
-    node.forEachMember([&](const std::string& name, const Node&) { names.push_back(name); });
-    return names;
-}
-
 }  // namespace
 
 std::unique_ptr<Chassis> parseChassis(std::string_view text) {
     JsonDocument document;
     parseDescription(text, document);
     const Node root(document);
-    root.expectMembers({"first_session_handle", "devices"});
+    root.expectMembers({"first_session_handle", "enums", "driver_properties", "system_values",
+                        "session_values", "devices"});
     auto chassis = std::make_unique<Chassis>();
-    if (root.has("first_session_handle")) {
-        chassis->firstSessionHandle =
-            root.member("first_session_handle", "").unsignedNumber(1, UINT32_MAX);
-    }
+    root.ifPresent("first_session_handle", [&](const Node& handle) {
+        chassis->firstSessionHandle = handle.unsignedNumber(1, UINT32_MAX);
+    });
+    Enumerations enumerations;
+    root.ifPresent("enums", [&](const Node& node) { enumerations = readEnumerations(node); });
+    readBuiltInCatalogue(chassis->catalogue);
+    root.ifPresent("driver_properties", [&](const Node& node) {
+        readCatalogue(node, enumerations, chassis->catalogue);
+    });
+    fillFrom(root, "system_values", Category::system, chassis->catalogue,
+             chassis->systemProperties);
+    fillFrom(root, "session_values", Category::session, chassis->catalogue,
+             chassis->sessionProperties);
+    DeviceReader reader(*chassis, enumerations);
     root.member("devices", "an array of devices").forEachElement([&](const Node& element) {
-        readDevice(element, Place::system, *chassis);
+        reader.read(element, Place::system);
     });
     return chassis;
 }
@@ -154,19 +170,6 @@ std::unique_ptr<Chassis> loadChassis() {
             .usage(tag::jsonPointer, fault.pointer)
             .usage(tag::explanation, fault.wrong + "; " + fault.right);
     }
-}
-
-Catalogue loadCatalogue() {
-    JsonDocument document;
-    parseDescription(embedded::catalogue, document);
-    const Node root(document);
-    Catalogue catalogue;
-    catalogue.system = memberNames(root.member("system", "properties"));
-    catalogue.session = memberNames(root.member("session", "properties"));
-    catalogue.device = memberNames(root.member("device", "properties"));
-    catalogue.physChan = memberNames(root.member("phys_chan", "properties"));
-    catalogue.nvmemArea = memberNames(root.member("nvmem_area", "properties"));
-    return catalogue;
 }
 
 }  // namespace simulator

@@ -1,10 +1,8 @@
 #pragma once
 
 #include <memory>
-#include <string>
 #include <string_view>
 
-#include "Catalogue.h"
 #include "Chassis.h"
 
 namespace simulator {
@@ -16,8 +14,5 @@ std::unique_ptr<Chassis> parseChassis(std::string_view text);
 // fault is told in one line on standard error, and thrown as a refusal with the file, the place in
 // it, and what is wrong there.
 std::unique_ptr<Chassis> loadChassis();
-
-// The built-in lists of driver-defined properties.
-Catalogue loadCatalogue();
 
 }  // namespace simulator

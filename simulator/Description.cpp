@@ -133,4 +133,16 @@ int32_t Node::signedNumber() const {
     return value->GetInt();
 }
 
+double Node::seconds() const {
+    constexpr double day = 24.0 * 60.0 * 60.0;
+    expect(value->IsNumber() && value->GetDouble() >= 0.0 && value->GetDouble() <= day,
+           "a time in seconds, from 0 to a day");
+    return value->GetDouble();
+}
+
+bool Node::flag() const {
+    expect(value->IsBool(), "true or false");
+    return value->GetBool();
+}
+
 }  // namespace simulator

@@ -60,12 +60,22 @@ class Node {
     // Makes sure that this is an object with no members but these.
     void expectMembers(std::initializer_list<std::string_view> allowed) const;
     bool has(const char* member) const;
+    // Calls read(Node) for a member if it is there.
+    template <typename Read>
+    void ifPresent(const char* name, Read read) const {
+        if (has(name)) {
+            read(member(name, ""));
+        }
+    }
     // The member, which must be there. `right` says what it has to be.
     Node member(const char* name, const char* right) const;
 
     std::string text() const;
     uint32_t unsignedNumber(uint32_t least, uint32_t most) const;
     int32_t signedNumber() const;
+    // A time, 0 to a day.
+    double seconds() const;
+    bool flag() const;
 
     // Calls visit(Node) for the elements of an array, in order.
     template <typename Visit>

@@ -1,9 +1,5 @@
 #include "Lending.h"
 
-#include <cstdlib>
-#include <cstring>
-#include <new>
-
 namespace simulator {
 
 char* lendText(const std::string& text) {

@@ -21,18 +21,23 @@ Reservations::Reservations(const Chassis& chassis, Waits& waits) : waits(waits) 
     }
 }
 
-const Holding* Reservations::conflictOn(const Device& device, const Holding& wanted) const {
+bool Reservations::conflictsOn(const Device& device, const Holding& wanted) const {
+    const std::list<Holding>& present = holders.at(&device);
+    return std::any_of(present.begin(), present.end(),
+                       [&](const Holding& holding) { return holding.conflictsWith(wanted); });
+}
+
+const Holding* Reservations::find(nQITRMCAPI100_Session session, const Device& device) const {
     const std::list<Holding>& present = holders.at(&device);
     const auto found = std::find_if(present.begin(), present.end(), [&](const Holding& holding) {
-        return holding.conflictsWith(wanted);
+        return holding.session == session;
     });
     return found == present.end() ? nullptr : &*found;
 }
 
 bool Reservations::isFree(const Request& request) const {
-    return std::none_of(request.devices.begin(), request.devices.end(), [&](const Device* device) {
-        return conflictOn(*device, request.wanted) != nullptr;
-    });
+    return std::none_of(request.devices.begin(), request.devices.end(),
+                        [&](const Device* device) { return conflictsOn(*device, request.wanted); });
 }
 
 bool Reservations::competes(const Request& earlier, const Request& later) const {
@@ -76,7 +81,7 @@ void Reservations::serveQueue() noexcept {
 void Reservations::refuse(const Request& request) const {
     std::vector<std::string> taken;
     for (const Device* device : request.devices) {
-        if (conflictOn(*device, request.wanted) != nullptr) {
+        if (conflictsOn(*device, request.wanted)) {
             taken.push_back(device->name);
         }
     }
@@ -137,9 +142,19 @@ void Reservations::releaseAll(nQITRMCAPI100_Session session) {
 }
 
 bool Reservations::holds(nQITRMCAPI100_Session session, const Device& device) const {
-    const std::list<Holding>& present = holders.at(&device);
-    return std::any_of(present.begin(), present.end(),
-                       [&](const Holding& holding) { return holding.session == session; });
+    return find(session, device) != nullptr;
+}
+
+void Reservations::expectWritable(nQITRMCAPI100_Session session, const Device& device) const {
+    const Holding* held = find(session, device);
+    if (held == nullptr && conflictsOn(device, Holding{session, readWriteAccess, ""})) {
+        throw Refusal(code::deviceReserved).usage(tag::device, device.name);
+    }
+    if (held != nullptr && held->access == readOnlyAccess) {
+        throw Refusal(code::readOnlyReservation)
+            .elaboration(term::reserveForWriting)
+            .usage(tag::device, device.name);
+    }
 }
 
 }  // namespace simulator

@@ -46,6 +46,11 @@ class Reservations {
 
     bool holds(nQITRMCAPI100_Session session, const Device& device) const;
 
+    // Whoever changes a device must not stand in the way of another session. Refuses with
+    // readOnlyReservation when the session holds the device for reading, and with deviceReserved
+    // when it does not hold the device and another session does.
+    void expectWritable(nQITRMCAPI100_Session session, const Device& device) const;
+
   private:
     // A reservation that waits. The holdings are made beforehand, so that granting cannot fail.
     struct Request {
@@ -64,7 +69,8 @@ class Reservations {
     void serveQueue() noexcept;
     void waitInQueue(Request& request, double timeout, std::unique_lock<std::mutex>& lock);
     [[noreturn]] void refuse(const Request& request) const;
-    const Holding* conflictOn(const Device& device, const Holding& wanted) const;
+    bool conflictsOn(const Device& device, const Holding& wanted) const;
+    const Holding* find(nQITRMCAPI100_Session session, const Device& device) const;
 
     std::map<const Device*, std::list<Holding>> holders;
     std::list<Request*> queue;

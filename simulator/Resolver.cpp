@@ -22,6 +22,17 @@ void expectSome(const std::vector<Resource*>& resources) {
     }
 }
 
+void expectOne(const std::vector<Resource*>& resources) {
+    expectSome(resources);
+    if (resources.size() > 1) {
+        std::vector<std::string> names;
+        for (const Resource* resource : resources) {
+            names.push_back(resource->fullName());
+        }
+        throw Refusal(code::severalResources).usage(tag::resources, names);
+    }
+}
+
 std::vector<Device*> owners(const std::vector<Resource*>& resources) {
     std::vector<Device*> devices;
     for (const Resource* resource : resources) {
@@ -114,6 +125,18 @@ std::vector<Device*> Resolver::devices(std::string_view joined) const {
     const auto found = resources(Kind::device, joined);
     expectSome(found);
     return owners(found);
+}
+
+Device& Resolver::oneDevice(std::string_view joined) const {
+    const auto found = resources(Kind::device, joined);
+    expectOne(found);
+    return *found.front()->device;
+}
+
+NvmemArea& Resolver::oneNvmemArea(std::string_view joined) const {
+    const auto found = resources(Kind::nvmemArea, joined);
+    expectOne(found);
+    return static_cast<NvmemArea&>(*found.front());
 }
 
 }  // namespace simulator

@@ -25,6 +25,10 @@ class Resolver {
     // Devices, each once. Refuses with noResources when there is none.
     std::vector<Device*> devices(std::string_view joined) const;
 
+    // The one resource that a text must name. Refuse with noResources and severalResources.
+    Device& oneDevice(std::string_view joined) const;
+    NvmemArea& oneNvmemArea(std::string_view joined) const;
+
     std::vector<Device*> reservedDevices() const;
 
   private:
@@ -41,6 +45,8 @@ class Resolver {
 
 // Refuses with noResources when the list is empty.
 void expectSome(const std::vector<Resource*>& resources);
+// As above, and with severalResources when there is more than one.
+void expectOne(const std::vector<Resource*>& resources);
 
 // The devices that resources belong to, each once, in the order of the resources.
 std::vector<Device*> owners(const std::vector<Resource*>& resources);

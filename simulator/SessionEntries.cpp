@@ -46,8 +46,8 @@ void setDefaults(Session& session, Kind kind, const std::vector<Resource*>& reso
 
 void openOn(Kind kind, const char* names, const ReservationTerms& terms,
             nQITRMCAPI100_Session* handle, qierr_Status* status) {
+    clearOutputs(status, handle);
     withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
-        *handle = 0;
         Opening opening(simulator.sessions);
         Session& session = opening.session();
         const auto resources =
@@ -70,8 +70,8 @@ using namespace simulator;
 
 void nQITRMCAPI100_initializeSessionWithoutResources(nQITRMCAPI100_Session* session,
                                                      qierr_Status* status) {
+    clearOutputs(status, session);
     withSimulator(status, [&](Simulator& simulator, auto&) {
-        *session = 0;
         Session& made = simulator.sessions.make();
         made.opening = false;
         *session = made.handle;
@@ -105,9 +105,7 @@ void nQITRMCAPI100_initializeSessionWithNvmemAreas(nQITRMCAPI100_Session* sessio
 void nQITRMCAPI100_closeSession(nQITRMCAPI100_Session session, qierr_Status* status) {
     withSimulator(status, [&](Simulator& simulator, auto&) {
         simulator.sessions.get(session);
-        simulator.waits.endAll(session, Wait::End::closed);
-        simulator.reservations.releaseAll(session);
-        simulator.sessions.remove(session);
+        simulator.close(session);
     });
 }
 

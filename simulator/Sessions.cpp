@@ -5,20 +5,20 @@
 namespace simulator {
 
 Session& Sessions::make() {
-    while (next == 0 || table.count(next) != 0) {
-        ++next;
-    }
-    Session& made = table.try_emplace(next, next).first->second;
-    ++next;
+    Session fresh;
+    fresh.properties = firstProperties;
+    const nQITRMCAPI100_Session handle = table.add(std::move(fresh));
+    Session& made = *table.find(handle);
+    made.handle = handle;
     return made;
 }
 
 Session& Sessions::get(nQITRMCAPI100_Session handle) {
-    const auto found = table.find(handle);
-    if (found == table.end() || found->second.opening) {
+    Session* found = table.find(handle);
+    if (found == nullptr || found->opening) {
         throw Refusal(code::unknownSession).usage(tag::sessionHandle, handle);
     }
-    return found->second;
+    return *found;
 }
 
 }  // namespace simulator

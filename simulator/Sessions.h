@@ -1,19 +1,15 @@
 #pragma once
 
-#include <map>
-#include <string>
-#include <string_view>
 #include <vector>
 
+#include "Api.h"
 #include "Chassis.h"
-#include "qitrmcapi.h"
+#include "HandleTable.h"
 
 namespace simulator {
 
 struct Session {
-    explicit Session(nQITRMCAPI100_Session handle) : handle(handle) {}
-
-    const nQITRMCAPI100_Session handle;
+    nQITRMCAPI100_Session handle = 0;
     // Until the session has its devices, nobody else may use its handle.
     bool opening = true;
     // The resources that the session was opened on, and the devices that these belong to.
@@ -21,22 +17,25 @@ struct Session {
     std::vector<Resource*> defaultPhysChans;
     std::vector<Resource*> defaultNvmemAreas;
     std::vector<Device*> connectedDevices;
+    PropertyStore properties;
 };
 
 // The open sessions. A reference to a session is valid until the session is closed.
 class Sessions {
   public:
-    explicit Sessions(nQITRMCAPI100_Session firstHandle) : next(firstHandle) {}
+    // firstProperties: what a session has to begin with.
+    Sessions(nQITRMCAPI100_Session firstHandle, const PropertyStore& firstProperties)
+        : table(firstHandle), firstProperties(firstProperties) {}
 
-    // Makes a session under the next free handle, which is never 0.
+    // Makes a session under the next free handle.
     Session& make();
     // Refuses with unknownSession when the handle is dead or its session is still opening.
     Session& get(nQITRMCAPI100_Session handle);
-    void remove(nQITRMCAPI100_Session handle) noexcept { table.erase(handle); }
+    void remove(nQITRMCAPI100_Session handle) noexcept { table.remove(handle); }
 
   private:
-    std::map<nQITRMCAPI100_Session, Session> table;
-    nQITRMCAPI100_Session next;
+    HandleTable<Session> table;
+    const PropertyStore& firstProperties;
 };
 
 }  // namespace simulator

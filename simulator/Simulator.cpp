@@ -13,7 +13,7 @@ namespace {
 struct Start {
     Start() {
         try {
-            simulator.emplace(loadChassis(), loadCatalogue());
+            simulator.emplace(loadChassis());
         } catch (const Refusal& refusal) {
             failure = refusal;
         }
@@ -33,10 +33,21 @@ Simulator& Simulator::instance() {
     return *start.simulator;
 }
 
-Simulator::Simulator(std::unique_ptr<Chassis> loaded, Catalogue catalogue)
+Simulator::Simulator(std::unique_ptr<Chassis> loaded)
     : chassis(std::move(loaded)),
-      catalogue(std::move(catalogue)),
-      sessions(chassis->firstSessionHandle),
+      sessions(chassis->firstSessionHandle, chassis->sessionProperties),
       reservations(*chassis, waits) {}
+
+void Simulator::close(nQITRMCAPI100_Session session) {
+    const auto isOfSession = [&](const auto& item) { return item.session == session; };
+    waits.endAll(session, Wait::End::closed);
+    reservations.releaseAll(session);
+    openProperties.removeIf(isOfSession);
+    openCommands.removeIf(isOfSession);
+    for (const auto& device : chassis->devices()) {
+        device->dropPending(session);
+    }
+    sessions.remove(session);
+}
 
 }  // namespace simulator

@@ -3,8 +3,8 @@
 #include <memory>
 #include <mutex>
 
-#include "Catalogue.h"
 #include "Chassis.h"
+#include "HandleTable.h"
 #include "Reservations.h"
 #include "Resolver.h"
 #include "Sessions.h"
@@ -12,10 +12,25 @@
 
 namespace simulator {
 
+// A property that a session has opened to read its attributes.
+struct OpenProperty {
+    nQITRMCAPI100_Session session;
+    Category category;
+    DefinitionPointer definition;
+    // Null when the property was opened without a resource.
+    const Resource* resource;
+};
+
+// A command that a session has opened to read its attributes.
+struct OpenCommand {
+    nQITRMCAPI100_Session session;
+    const Command* command;
+};
+
 // The chassis together with the state of all its users. There is one in the process, made at the
 // first use. Its parts are guarded by one mutex, which calls that wait give up.
 struct Simulator {
-    Simulator(std::unique_ptr<Chassis> loaded, Catalogue catalogue);
+    explicit Simulator(std::unique_ptr<Chassis> loaded);
 
     // The loaded simulator. Refuses with chassisNotLoaded when the chassis file is broken.
     static Simulator& instance();
@@ -24,12 +39,16 @@ struct Simulator {
         return Resolver(*chassis, reservations, session);
     }
 
+    // Ends a session with all that it has.
+    void close(nQITRMCAPI100_Session session);
+
     std::mutex mutex;
     const std::unique_ptr<Chassis> chassis;
-    const Catalogue catalogue;
     Waits waits;
     Sessions sessions;
     Reservations reservations;
+    HandleTable<OpenProperty> openProperties;
+    HandleTable<OpenCommand> openCommands;
 };
 
 }  // namespace simulator

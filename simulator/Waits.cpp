@@ -4,6 +4,7 @@
 #include <chrono>
 
 #include "Refusal.h"
+#include "Values.h"
 
 namespace simulator {
 
@@ -16,7 +17,7 @@ constexpr double longestWait = 24.0 * 60.0 * 60.0;
 
 double checkedTimeout(double seconds) {
     if (!(seconds >= 0.0)) {
-        throw Refusal(code::invalidTimeout).usage(tag::requestedValue, std::to_string(seconds));
+        throw Refusal(code::invalidTimeout).usage(tag::timeout, numberText(seconds));
     }
     return std::min(seconds, longestWait);
 }

@@ -4,7 +4,7 @@
 #include <list>
 #include <mutex>
 
-#include "qitrmcapi.h"
+#include "Api.h"
 
 namespace simulator {
 

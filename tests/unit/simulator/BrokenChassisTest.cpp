@@ -81,7 +81,8 @@ TEST(BrokenChassisTest, AMissingMemberIsNamedByItsPlace) {
 
 TEST(BrokenChassisTest, AMistypedMemberIsNamedWithTheOnesThatExist) {
     expectFault("{\"devises\":[]}", "/devises",
-                "is not a known member; the members here are first_session_handle, devices");
+                "is not a known member; the members here are first_session_handle, enums, "
+                "driver_properties, system_values, session_values, devices");
 }
 
 TEST(BrokenChassisTest, AMemberThatStandsTwiceIsRefused) {

@@ -9,7 +9,7 @@ constexpr const char* description = R"({
     "devices": [
         {"name": "Größe", "category": 7,
          "channels": {"prefix": "Kanal", "count": 12},
-         "nvmem_areas": [{"name": "cal1"}, {"name": "cal2"}]}
+         "nvmem_areas": [{"name": "cal1", "size": 8}, {"name": "cal2", "size": 8}]}
     ]
 })";
 

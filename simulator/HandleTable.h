@@ -1,0 +1,47 @@
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <utility>
+
+namespace simulator {
+
+// Things that callers name by a number which is never 0 and differs while they are there. A number
+// is used again only when all others have had their turn.
+template <typename Item>
+class HandleTable {
+  public:
+    explicit HandleTable(uint32_t first = 1) : next(first) {}
+
+    uint32_t add(Item item) {
+        while (next == 0 || items.count(next) != 0) {
+            ++next;
+        }
+        const uint32_t handle = next;
+        items.emplace(handle, std::move(item));
+        ++next;
+        return handle;
+    }
+
+    // Returns null when there is no such item. The item stays where it is until it is removed.
+    Item* find(uint32_t handle) {
+        const auto found = items.find(handle);
+        return found == items.end() ? nullptr : &found->second;
+    }
+
+    // Returns whether there was such an item.
+    bool remove(uint32_t handle) noexcept { return items.erase(handle) != 0; }
+
+    template <typename Condition>
+    void removeIf(Condition condition) {
+        for (auto place = items.begin(); place != items.end();) {
+            place = condition(place->second) ? items.erase(place) : std::next(place);
+        }
+    }
+
+  private:
+    std::map<uint32_t, Item> items;
+    uint32_t next;
+};
+
+}  // namespace simulator

@@ -1,0 +1,61 @@
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "Api.h"
+
+namespace simulator {
+
+// The content of one NVMEM area. Written bytes are read back at once, and last when committed.
+class NvmemMemory {
+  public:
+    // What writing asks for.
+    struct Guard {
+        bool writable = true;
+        bool wantsSerialNumber = false;
+        // Empty when none is wanted.
+        std::string password;
+    };
+
+    NvmemMemory() = default;
+    NvmemMemory(std::vector<uint8_t> content, Guard guard)
+        : lasting(std::move(content)), guard(std::move(guard)) {}
+
+    uint32_t size() const { return static_cast<uint32_t>(lasting.size()); }
+    bool hasPending() const { return pending.has_value(); }
+    const Guard& guardian() const { return guard; }
+
+    // Refuse with nvmemOutOfRange when the bytes do not lie in the area.
+    void read(uint32_t address, uint8_t* buffer, uint32_t count) const;
+    void write(nQITRMCAPI100_Session session, uint32_t address, const uint8_t* bytes,
+               uint32_t count);
+
+    // Refuses with readOnlyNvmemArea, wrongSerialNumber and wrongPassword.
+    void unlock(std::string_view given, std::string_view deviceSerialNumber,
+                std::string_view givenPassword) const;
+
+    void commit();
+    // Forgets what was written since the last commit, by anyone or by one session.
+    void drop() { pending.reset(); }
+    void dropPending(nQITRMCAPI100_Session session);
+
+  private:
+    struct Pending {
+        std::vector<uint8_t> content;
+        // The last one that wrote.
+        nQITRMCAPI100_Session session;
+    };
+
+    void expectInside(uint32_t address, uint32_t count) const;
+
+    std::vector<uint8_t> lasting;
+    Guard guard;
+    std::optional<Pending> pending;
+};
+
+}  // namespace simulator

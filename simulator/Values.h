@@ -1,0 +1,58 @@
+#pragma once
+
+#include <cstdint>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <variant>
+#include <vector>
+
+namespace simulator {
+
+// The numbers of the enumeration "DataType".
+enum class DataType : int32_t {
+    boolean = 1,
+    real = 2,
+    int32 = 3,
+    int64 = 4,
+    text = 5,
+    uint32 = 6,
+    uint64 = 7,
+    booleanArray = 8,
+    realArray = 9,
+    int32Array = 10,
+    int64Array = 11,
+    textArray = 12,
+    uint32Array = 13,
+    uint64Array = 14
+};
+
+bool isArray(DataType type);
+// The type of the elements of an array type, and the other way round.
+DataType elementType(DataType type);
+DataType arrayType(DataType type);
+// The name as it stands in the enumeration "DataType".
+std::string typeName(DataType type);
+std::optional<DataType> typeNamed(std::string_view name);
+
+// A value of any type. The alternatives stand in the order of the scalar types; a scalar is a list
+// of one. Booleans are 0 or 1.
+using Elements = std::variant<std::vector<uint8_t>, std::vector<double>, std::vector<int32_t>,
+                              std::vector<int64_t>, std::vector<std::string>, std::vector<uint32_t>,
+                              std::vector<uint64_t>>;
+
+// No elements, of the alternative that belongs to a scalar or array type.
+Elements noElements(DataType type);
+DataType elementType(const Elements& elements);
+size_t elementCount(const Elements& elements);
+// The element at an index as a value of its own.
+Elements elementAt(const Elements& elements, size_t index);
+// Adds elements of the same alternative.
+void append(Elements& target, const Elements& more);
+
+// Numbers as texts, the same in every locale.
+std::string numberText(double number);
+// The first element as text, for messages.
+std::string firstText(const Elements& elements);
+
+}  // namespace simulator
