@@ -12,7 +12,7 @@ TERMS = Path(__file__).resolve().parents[3] / "share" / "terms"
 GENERATOR = TERMS / "make_dictionary.py"
 TABLES = ("usage_general.tsv", "aux_general.tsv", "usage_family.tsv", "aux_family.tsv")
 LANGUAGES = ("eng", "fra", "deu", "jpn", "kor", "chs")
-TRANSLATED = ("fra", "deu", "jpn")
+TRANSLATED = ("fra", "deu", "jpn", "kor")
 HEADER = ["key", *LANGUAGES, "remark"]
 
 # Texts on which other parts of the service and its users rely.
