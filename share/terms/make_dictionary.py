@@ -87,8 +87,8 @@ def translation_faults(english, translations, remark):
         return
     for language, text in translations.items():
         if not text:
-            continue
-        if text == english and language not in same:
+            yield f"{language} is empty"
+        elif text == english and language not in same:
             yield f"{language} repeats the English text without the remark {SAME_AS_ENGLISH}"
         elif text != english and language in same:
             yield f"{language} differs from the English text although the remark says otherwise"
