@@ -23,12 +23,13 @@ PLATFORM_CONSTANTS = {
 }
 # What a text names literally: members, methods, properties, quoted values and numbers.
 LITERAL = re.compile(r'"[^"]+"|[A-Z][a-z]+\.[A-Za-z.]*[a-z]|[a-z]+_[a-z_]+|[a-z]+[A-Z]\w+|'
-                     r"\b(?:JSON-RPC|JSON|UTF-8|NVMEM|ReadOnly|ReadWrite|size)\b|\d+")
+                     r"\b(?:JSON-RPC|JSON|UTF-8|NVMEM|ReadOnly|ReadWrite)\b|\d+")
 
 # How the word of the first column is rendered wherever an English text holds it, as in the terms.
 GLOSSARY = """
 array       tableau         array           配列         배열       数组
 chassis     châssis         chassis         シャーシ     섀시       机箱
+command     commande        befehl          コマンド     명령       命令
 controller  contrôleur      controller      コントローラ 컨트롤러   控制器
 device      périphérique    gerät           デバイス     디바이스   设备
 details     détails         details         詳細         세부사항   详细信息
