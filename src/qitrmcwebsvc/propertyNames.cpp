@@ -1,0 +1,75 @@
+#include "qitrmcwebsvc/propertyNames.h"
+
+#include <algorithm>
+#include <iterator>
+#include <string_view>
+
+#include "qitrmcwebsvc/DriverOwners.h"
+#include "qitrmcwebsvc/callDriver.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+// Sorted. Neither listed to clients nor known as names that the driver defines.
+constexpr std::string_view hiddenNames[] = {
+    "Dev.AddedToLocalConfig",
+    "Dev.Events",
+    "Dev.TCPIP.LastConnectedEthernetIP",
+    "PhysChan.Events",
+    "Session.Language",
+    "Session.TCPIP.ConnectTimeout",
+    "Session.TCPIP.ConnectTimeoutPerIP",
+    "Session.TCPIP.KeepAliveInterval",
+    "Session.TCPIP.KeepAliveTimeout",
+    "Session.TCPIP.MDNSBrowseTimeout",
+    "Session.TCPIP.SendRecvTimeout",
+    "Sys.ConfigChangeCount",
+};
+
+bool isHidden(std::string_view name) {
+    return std::binary_search(std::begin(hiddenNames), std::end(hiddenNames), name);
+}
+
+const char* nameListOf(PropertyCategory category) {
+    switch (category) {
+        case PropertyCategory::System:
+            return "Sys.SystemProperties";
+        case PropertyCategory::Session:
+            return "Sys.SessionProperties";
+        case PropertyCategory::Device:
+            return "Sys.DeviceProperties";
+        case PropertyCategory::PhysChan:
+            return "Sys.PhysChanProperties";
+        case PropertyCategory::NvmemArea:
+            return "Sys.NVMEMAreaProperties";
+    }
+    throw nQITRMCSHAREDCMN100::InternalError("Unsupported property category", QITRMC_HERE);
+}
+
+// One list as the driver gives it, read when made.
+class ListedNames : public DriverStringArray {
+  public:
+    ListedNames(nQITRMCAPI100_Session session, const char* list) {
+        callDriver(nQITRMCAPI100_getSystemPropertyStringArray, session, list, outArray(),
+                   outCount());
+    }
+};
+
+}  // namespace
+
+std::set<std::string> propertyNames(nQITRMCAPI100_Session session, PropertyCategory category) {
+    const ListedNames listed(session, nameListOf(category));
+    std::set<std::string> names;
+    for (const char* name : listed)
+        if (!isHidden(name))
+            names.emplace(name);
+    return names;
+}
+
+bool isPropertyName(nQITRMCAPI100_Session session, PropertyCategory category,
+                    const std::string& name) {
+    const ListedNames listed(session, nameListOf(category));
+    return !isHidden(name) && std::find(listed.begin(), listed.end(), name) != listed.end();
+}
+
+}  // namespace nQITRMCWEBSVC100
