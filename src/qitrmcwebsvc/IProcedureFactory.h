@@ -18,7 +18,6 @@ class IProcedureFactory {
 // One row of the method table.
 struct Method {
     const char* name;  // compared exactly, case included
-    // Its result is null for a class that does not exist yet.
     std::shared_ptr<IProcedure> (IProcedureFactory::*make)();
 };
 

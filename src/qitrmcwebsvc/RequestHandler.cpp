@@ -51,11 +51,8 @@ std::string compactText(const JsonDocument& document) {
 }  // namespace
 
 RequestHandler::RequestHandler() {
-    for (const Method& method : methodTable) {
-        std::shared_ptr<IProcedure> procedure = (procedureFactory.*method.make)();
-        if (procedure)
-            procedures.emplace(method.name, std::move(procedure));
-    }
+    for (const Method& method : methodTable)
+        procedures.emplace(method.name, (procedureFactory.*method.make)());
 }
 
 std::string RequestHandler::handleRequest(const std::string& body) {

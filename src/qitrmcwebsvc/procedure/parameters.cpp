@@ -42,6 +42,18 @@ bool boolParam(const JsonValue& params, const char* name, bool absent) {
     return value == nullptr ? absent : value->IsTrue();
 }
 
+std::uint32_t uintParam(const JsonValue& params, const char* name) {
+    return params[name].GetUint();
+}
+
+std::uint32_t registerSizeParam(const JsonValue& params) {
+    const JsonValue& size = params["size"];
+    for (const std::uint32_t width : {8u, 16u, 32u, 64u})
+        if (size.IsNumber() && size.GetDouble() == width)
+            return width;
+    return 0;
+}
+
 std::string sessionIdOf(const JsonValue& params) {
     return textParam(params, "session_id");
 }

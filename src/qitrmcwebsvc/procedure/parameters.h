@@ -16,6 +16,12 @@ std::string textParam(const JsonValue& params, const char* name, const char* abs
 double doubleParam(const JsonValue& params, const char* name, double absent);
 bool boolParam(const JsonValue& params, const char* name, bool absent);
 
+// A required integer of the unsigned 32-bit range.
+std::uint32_t uintParam(const JsonValue& params, const char* name);
+// The width of a register in bits, "size". The schema compares numbers by value, so 8.0 is 8 here
+// too; 0 for what it should have kept out.
+std::uint32_t registerSizeParam(const JsonValue& params);
+
 // The session that the request is about.
 std::string sessionIdOf(const JsonValue& params);
 

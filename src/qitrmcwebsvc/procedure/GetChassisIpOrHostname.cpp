@@ -1,0 +1,41 @@
+#include "qitrmcwebsvc/procedure/GetChassisIpOrHostname.h"
+
+#include <qitrmcapi.h>
+
+#include "qitrmcwebsvc/DriverOwners.h"
+#include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/chassis.h"
+#include "qitrmcwebsvc/procedure/jsonValues.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+// In the order of the result.
+constexpr std::pair<const char*, const char*> identityProperties[] = {
+    {"chassis_ip", "Dev.TCPIP.EthernetIP"},
+    {"chassis_hostname", "Dev.TCPIP.Hostname"},
+};
+
+}  // namespace
+
+void GetChassisIpOrHostname::run(const JsonValue& params,
+                                 const std::shared_ptr<SessionContext>& session,
+                                 SingleResponse& response) {
+    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    requireChassis(resource, session);
+    // The driver has to find the default chassis by itself.
+    const auto device = params.FindMember("device");
+    const char* name = device == params.MemberEnd() ? nullptr : device->value.GetString();
+
+    JsonPool& pool = *response.getAllocator();
+    JsonValue result(rapidjson::kObjectType);
+    for (const auto& [key, property] : identityProperties) {
+        DriverString text;
+        callDriver(nQITRMCAPI100_getDevicePropertyString, session->driverSession, name, property,
+                   text.out());
+        result.AddMember(rapidjson::StringRef(key), textValue(text.copy(), pool), pool);
+    }
+    response.setResult(result);
+}
+
+}  // namespace nQITRMCWEBSVC100

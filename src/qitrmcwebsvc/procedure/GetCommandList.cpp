@@ -1,0 +1,40 @@
+#include "qitrmcwebsvc/procedure/GetCommandList.h"
+
+#include <qitrmcapi.h>
+
+#include "qitrmcwebsvc/DriverOwners.h"
+#include "qitrmcwebsvc/RequestResource.h"
+#include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/invalidParams.h"
+#include "qitrmcwebsvc/procedure/jsonValues.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+const char* listPropertyOf(ResourceKind kind) {
+    if (kind == ResourceKind::Device)
+        return "Dev.Commands";
+    if (kind == ResourceKind::PhysicalChannel)
+        return "PhysChan.Commands";
+    throwInvalidParams("MustSpecifyOneOfDevicePhyChannel", QITRMC_HERE);
+}
+
+}  // namespace
+
+void GetCommandList::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
+                         SingleResponse& response) {
+    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    const char* property = listPropertyOf(resource.kind());
+    DriverStringArray names;
+    callDriver(nQITRMCAPI100_getGenericPropertyStringArray, session->driverSession,
+               resource.joinedNames().c_str(), property, names.outArray(), names.outCount());
+
+    JsonPool& pool = *response.getAllocator();
+    JsonValue commands(rapidjson::kArrayType);
+    appendTexts(commands, names, pool);
+    JsonValue result(rapidjson::kObjectType);
+    result.AddMember("commands", commands, pool);
+    response.setResult(result);
+}
+
+}  // namespace nQITRMCWEBSVC100

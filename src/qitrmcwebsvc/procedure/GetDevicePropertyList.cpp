@@ -1,0 +1,65 @@
+#include "qitrmcwebsvc/procedure/GetDevicePropertyList.h"
+
+#include <qitrmcapi.h>
+
+#include "qitrmcwebsvc/DriverOwners.h"
+#include "qitrmcwebsvc/RequestResource.h"
+#include "qitrmcwebsvc/invalidParams.h"
+#include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/propertyNames.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+struct Lists {
+    PropertyCategory category;
+    const char* dynamicProperty;  // null where there is none
+};
+
+Lists listsOf(ResourceKind kind) {
+    switch (kind) {
+        case ResourceKind::Device:
+            return {PropertyCategory::Device, "Dev.Properties"};
+        case ResourceKind::PhysicalChannel:
+            return {PropertyCategory::PhysChan, "PhysChan.Properties"};
+        case ResourceKind::NvmemArea:
+            return {PropertyCategory::NvmemArea, nullptr};
+        case ResourceKind::None:
+            break;
+    }
+    throwInvalidParams("MustSpecifyOneOfDeviceNvmemPhyChannel", QITRMC_HERE);
+}
+
+// A resource that cannot tell what it defines for itself still has the properties of its kind.
+void addDynamicNames(JsonValue& result, nQITRMCAPI100_Session session,
+                     const RequestResource& resource, const char* property, JsonPool& pool) {
+    qierr::Status status;
+    DriverStringArray names;
+    nQITRMCAPI100_getGenericPropertyStringArray(session, resource.joinedNames().c_str(), property,
+                                                names.outArray(), names.outCount(), &status);
+    if (status.code < 0)
+        return;
+    JsonValue dynamicNames(rapidjson::kArrayType);
+    appendTexts(dynamicNames, names, pool);
+    result.AddMember("dynamic_properties", dynamicNames, pool);
+}
+
+}  // namespace
+
+void GetDevicePropertyList::run(const JsonValue& params,
+                                const std::shared_ptr<SessionContext>& session,
+                                SingleResponse& response) {
+    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    const Lists lists = listsOf(resource.kind());
+
+    JsonPool& pool = *response.getAllocator();
+    JsonValue result(rapidjson::kObjectType);
+    JsonValue staticNames(rapidjson::kArrayType);
+    appendTexts(staticNames, propertyNames(session->driverSession, lists.category), pool);
+    result.AddMember("static_properties", staticNames, pool);
+    if (lists.dynamicProperty != nullptr)
+        addDynamicNames(result, session->driverSession, resource, lists.dynamicProperty, pool);
+    response.setResult(result);
+}
+
+}  // namespace nQITRMCWEBSVC100

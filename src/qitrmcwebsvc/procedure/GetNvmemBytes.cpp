@@ -1,0 +1,53 @@
+#include "qitrmcwebsvc/procedure/GetNvmemBytes.h"
+
+#include <qitrmcapi.h>
+
+#include <cstdlib>
+#include <new>
+
+#include "qitrmcwebsvc/RequestResource.h"
+#include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/jsonValues.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+struct Free {
+    void operator()(void* memory) const { std::free(memory); }
+};
+using Buffer = std::unique_ptr<std::uint8_t[], Free>;
+
+// Null for a size of 0. The memory comes zeroed from the system without being touched, so that a
+// request for more than an area holds costs next to nothing before the driver refuses it.
+Buffer zeroedBuffer(std::uint32_t size) {
+    if (size == 0)
+        return nullptr;
+    Buffer buffer(static_cast<std::uint8_t*>(std::calloc(size, 1)));
+    if (buffer == nullptr)
+        throw std::bad_alloc();
+    return buffer;
+}
+
+}  // namespace
+
+void GetNvmemBytes::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
+                        SingleResponse& response) {
+    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    const std::uint32_t address = uintParam(params, "address");
+    const std::uint32_t size = uintParam(params, "size");
+    const Buffer buffer = zeroedBuffer(size);
+    callDriver(nQITRMCAPI100_getNvmemBytes, session->driverSession, resource.joinedNames().c_str(),
+               address, buffer.get(), size);
+
+    JsonPool& pool = *response.getAllocator();
+    JsonValue data(rapidjson::kArrayType);
+    reserveElements(data, size, pool);
+    for (std::uint32_t i = 0; i < size; ++i)
+        data.PushBack(static_cast<unsigned>(buffer[i]), pool);
+    JsonValue result(rapidjson::kObjectType);
+    result.AddMember("data", data, pool);
+    result.AddMember("next_address", address + 1, pool);
+    response.setResult(result);
+}
+
+}  // namespace nQITRMCWEBSVC100

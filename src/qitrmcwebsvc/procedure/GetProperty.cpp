@@ -1,0 +1,28 @@
+#include "qitrmcwebsvc/procedure/GetProperty.h"
+
+#include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/SessionProperty.h"
+#include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/propertyValues.h"
+
+namespace nQITRMCWEBSVC100 {
+
+void GetProperty::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
+                      SingleResponse& response) {
+    const std::string name = textParam(params, "property");
+    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    const SessionProperty property(session, name, resource);
+    const PropertyValueType* type = propertyValueType(property.dataType());
+    if (type == nullptr)
+        throw nQITRMCSHAREDCMN100::InternalError("Unsupported data type for dynamic property.",
+                                                 QITRMC_HERE);
+    JsonPool& pool = *response.getAllocator();
+    JsonValue value = type->read(property, pool);
+
+    JsonValue result(rapidjson::kObjectType);
+    result.AddMember("data_type", enumItemValue("DataType", property.dataType(), pool), pool);
+    result.AddMember("value", value, pool);
+    response.setResult(result);
+}
+
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,63 @@
+#include "qitrmcwebsvc/procedure/GetPropertyInformation.h"
+
+#include <algorithm>
+#include <utility>
+
+#include "qitrmcwebsvc/SessionProperty.h"
+#include "qitrmcwebsvc/procedure/jsonValues.h"
+
+namespace nQITRMCWEBSVC100 {
+namespace {
+
+// Sorted by key, which is the order of the result.
+constexpr std::pair<const char*, const char*> PropertyInfoKeys[] = {
+    {"description", "Prop.Descr"},  {"document", "Prop.Doc"}, {"max_value", "Prop.MaxValue"},
+    {"min_value", "Prop.MinValue"}, {"unit", "Prop.Unit"},
+};
+
+void addTexts(JsonValue& result, const SessionProperty& property, JsonPool& pool) {
+    for (const auto& [key, attribute] : PropertyInfoKeys) {
+        const std::string text = property.metaString(attribute);
+        if (!text.empty())
+            result.AddMember(rapidjson::StringRef(key), textValue(text, pool), pool);
+    }
+}
+
+// The items keep the driver's order.
+JsonValue enumValue(const SessionProperty& property, JsonPool& pool) {
+    JsonValue result(rapidjson::kObjectType);
+    result.AddMember("name", textValue(property.metaString("Prop.Enum.Name"), pool), pool);
+    const std::vector<std::string> names = property.metaStringArray("Prop.Enum.ValueNames");
+    const std::vector<std::int32_t> numbers = property.metaInt32Array("Prop.Enum.Values");
+    JsonValue items(rapidjson::kObjectType);
+    // The two are of one length, unless the driver errs.
+    for (std::size_t i = 0; i < std::min(numbers.size(), names.size()); ++i)
+        items.AddMember(textValue(names[i], pool), JsonValue(numbers[i]), pool);
+    result.AddMember("values", items, pool);
+    return result;
+}
+
+}  // namespace
+
+void GetPropertyInformation::run(const JsonValue& params,
+                                 const std::shared_ptr<SessionContext>& session,
+                                 SingleResponse& response) {
+    const std::string name = textParam(params, "property");
+    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    const SessionProperty property(session, name, resource);
+
+    JsonPool& pool = *response.getAllocator();
+    JsonValue result(rapidjson::kObjectType);
+    addTexts(result, property, pool);
+    result.AddMember("data_type",
+                     enumItemValue("DataType", property.metaInt32("Prop.DataType"), pool), pool);
+    result.AddMember(
+        "access", enumItemValue("PropertyAccess", property.metaInt32("Prop.Access"), pool), pool);
+    result.AddMember("driver_defined", property.isDriverDefined(), pool);
+    result.AddMember("pending_changes", property.metaBool("Prop.PendingChanges"), pool);
+    if (property.metaBool("Prop.IsEnum"))
+        result.AddMember("enum", enumValue(property, pool), pool);
+    response.setResult(result);
+}
+
+}  // namespace nQITRMCWEBSVC100

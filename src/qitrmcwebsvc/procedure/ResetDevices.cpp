@@ -1,0 +1,17 @@
+#include "qitrmcwebsvc/procedure/ResetDevices.h"
+
+#include <qitrmcapi.h>
+
+#include "qitrmcwebsvc/RequestResource.h"
+#include "qitrmcwebsvc/callDriver.h"
+
+namespace nQITRMCWEBSVC100 {
+
+void ResetDevices::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
+                       SingleResponse& response) {
+    const RequestResource resource(params, session->driverSession, ResourceKind::Device);
+    callDriver(nQITRMCAPI100_resetDevices, session->driverSession, resource.joinedNames().c_str());
+    response.setEmptyResult();
+}
+
+}  // namespace nQITRMCWEBSVC100

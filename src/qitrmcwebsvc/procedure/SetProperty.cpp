@@ -1,0 +1,54 @@
+#include "qitrmcwebsvc/procedure/SetProperty.h"
+
+#include <qitrmcapi.h>
+
+#include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/SessionProperty.h"
+#include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/propertyValues.h"
+
+namespace nQITRMCWEBSVC100 {
+
+using nQITRMCSHAREDCMN100::BasicError;
+
+namespace {
+
+constexpr std::int32_t wrongDataTypeCode = -250819;
+
+// A scalar may be written as an array of one element.
+const JsonValue& scalarUnwrap(const JsonValue& value, const SessionProperty& property) {
+    return property.isScalar() && value.IsArray() && value.Size() == 1 ? value[0] : value;
+}
+
+// A data type without a rule passes here; there is no way to write it.
+void checkRequestedType(const JsonValue& value, const SessionProperty& property) {
+    const PropertyValueType* type = propertyValueType(property.dataType());
+    if (type == nullptr || type->accepts(value))
+        return;
+    BasicError error(wrongDataTypeCode, QITRMC_HERE);
+    addUsageString(error.details(), "kUsageTypeRequestedDataType",
+                   nQITRMCAPI100_translateStaticEnumValueToString("DataType", property.dataType()));
+    throw error;
+}
+
+}  // namespace
+
+void SetProperty::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
+                      SingleResponse& response) {
+    const std::string name = textParam(params, "property");
+    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    SessionProperty property(session, name, resource);
+    const JsonValue& value = scalarUnwrap(params["value"], property);
+    checkRequestedType(value, property);
+    const PropertyValueType* type = propertyValueType(property.dataType());
+    if (type == nullptr)
+        throw BasicError(QITRMC_HERE);
+    type->write(property, value);
+
+    JsonPool& pool = *response.getAllocator();
+    JsonValue result(rapidjson::kObjectType);
+    result.AddMember("data_type", enumItemValue("DataType", property.dataType(), pool), pool);
+    response.setResult(result);
+}
+
+}  // namespace nQITRMCWEBSVC100

@@ -1,0 +1,55 @@
+#include "qitrmcwebsvc/procedure/WriteRegister.h"
+
+#include <qitrmcapi.h>
+
+#include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/RequestResource.h"
+#include "qitrmcwebsvc/callDriver.h"
+
+namespace nQITRMCWEBSVC100 {
+
+using namespace nQITRMCSHAREDCMN100;
+
+namespace {
+
+constexpr std::int32_t tooWideCode = -250860;
+
+bool fits(std::uint64_t data, std::uint32_t size) {
+    return size >= 64 || data >> size == 0;
+}
+
+void writeRegister(std::uint32_t size, nQITRMCAPI100_Session session, const char* device,
+                   std::uint32_t address, std::uint64_t data) {
+    // Each cuts the data to its own width.
+    switch (size) {
+        case 8:
+            return callDriver(nQITRMCAPI100_writeRegisterUInt8, session, device, address, data);
+        case 16:
+            return callDriver(nQITRMCAPI100_writeRegisterUInt16, session, device, address, data);
+        case 32:
+            return callDriver(nQITRMCAPI100_writeRegisterUInt32, session, device, address, data);
+        case 64:
+            return callDriver(nQITRMCAPI100_writeRegisterUInt64, session, device, address, data);
+    }
+    throw InternalError("Unsupported register size.", QITRMC_HERE);
+}
+
+}  // namespace
+
+void WriteRegister::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
+                        SingleResponse& response) {
+    const RequestResource resource(params, session->driverSession, ResourceKind::Device);
+    const std::uint32_t address = uintParam(params, "address");
+    const std::uint32_t size = registerSizeParam(params);
+    const std::uint64_t data = params["data"].GetUint64();
+    if (!fits(data, size))
+        throw BasicError(tooWideCode, QITRMC_HERE);
+    writeRegister(size, session->driverSession, resource.joinedNames().c_str(), address, data);
+
+    JsonPool& pool = *response.getAllocator();
+    JsonValue result(rapidjson::kObjectType);
+    result.AddMember("next_address", address + 1, pool);
+    response.setResult(result);
+}
+
+}  // namespace nQITRMCWEBSVC100
