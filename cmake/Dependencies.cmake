@@ -13,3 +13,12 @@ target_include_directories(rapidjson SYSTEM INTERFACE "${RAPIDJSON_INCLUDE_DIR}"
 # need 8.
 target_compile_options(rapidjson INTERFACE "-DRAPIDJSON_ALIGN(x)=(((x)+7u)&~7u)")
 target_compile_definitions(rapidjson INTERFACE RAPIDJSON_HAS_STDSTRING=1)
+
+# The Lua 5.1 interpreter with its JSON and file system modules. The modules do not name the
+# interpreter's library as needed, so they stand before it and bring it along.
+pkg_check_modules(lua REQUIRED IMPORTED_TARGET lua5.1)
+find_library(LUA_CJSON_LIBRARY lua5.1-cjson REQUIRED)
+find_library(LUA_FILESYSTEM_LIBRARY lua5.1-filesystem REQUIRED)
+add_library(lua_modules INTERFACE)
+target_link_libraries(lua_modules INTERFACE "${LUA_CJSON_LIBRARY}" "${LUA_FILESYSTEM_LIBRARY}"
+                      PkgConfig::lua)
