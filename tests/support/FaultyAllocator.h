@@ -1,0 +1,26 @@
+#pragma once
+
+#include <cstdint>
+
+// Compiled into a test program, FaultyAllocator.cpp takes the place of the translators' allocator:
+// it counts the live blocks and fails on demand.
+namespace FaultyAllocator {
+
+constexpr std::uint64_t never = ~std::uint64_t{0};
+
+// Forgets earlier requests. The request number `first` (from 0) and the `count` - 1 after it will
+// fail. Requests that free or shrink a block are not counted and never fail.
+void failAt(std::uint64_t first, std::uint64_t count = 1);
+void succeed();
+
+// Requests since the last call of failAt or succeed.
+std::uint64_t requests();
+// Whether a request was made to fail since then.
+bool hasFailed();
+// Blocks that were handed out and not freed.
+std::int64_t liveBlocks();
+// The bytes in live blocks, and the most there ever were since the last failAt or succeed.
+std::int64_t liveBytes();
+std::int64_t peakBytes();
+
+}  // namespace FaultyAllocator

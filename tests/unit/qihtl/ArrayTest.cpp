@@ -1,0 +1,98 @@
+#include "qihtl/Array.h"
+
+#include <gtest/gtest.h>
+
+#include <utility>
+
+#include "qihtl/String.h"
+#include "support/FaultyAllocator.h"
+
+namespace {
+
+class ArrayTest : public testing::Test {
+  protected:
+    void SetUp() override { FaultyAllocator::succeed(); }
+    void TearDown() override { FaultyAllocator::succeed(); }
+
+    qierr::Status status;
+};
+
+TEST_F(ArrayTest, GrowsFromNothingToEight) {
+    qihtl::Array<int> array;
+    array.append(7, &status);
+    EXPECT_EQ(1u, array.length());
+    EXPECT_EQ(8u, array.capacity());
+    EXPECT_EQ(7, array[0]);
+}
+
+TEST_F(ArrayTest, ReservesExactlyWhatIsAsked) {
+    qihtl::Array<int> array;
+    array.reserve(4, &status);
+    EXPECT_EQ(4u, array.capacity());
+    array.reserve(2, &status);
+    EXPECT_EQ(4u, array.capacity());
+}
+
+TEST_F(ArrayTest, GrowsFromFourToEightAndThenByHalf) {
+    qihtl::Array<int> array;
+    array.reserve(4, &status);
+    for (int value = 0; value < 5; ++value) {
+        array.append(value, &status);
+    }
+    EXPECT_EQ(8u, array.capacity());
+    for (int value = 5; value < 9; ++value) {
+        array.append(value, &status);
+    }
+    EXPECT_EQ(12u, array.capacity());
+    for (std::uint32_t index = 0; index < array.length(); ++index) {
+        EXPECT_EQ(static_cast<int>(index), array[index]);
+    }
+}
+
+TEST_F(ArrayTest, ElementsThatOwnMemoryMoveAndAreFreed) {
+    const std::int64_t before = FaultyAllocator::liveBlocks();
+    {
+        qihtl::Array<qihtl::String> array;
+        for (int count = 0; count < 20; ++count) {
+            qihtl::String text;
+            text.assign("element", &status);
+            array.append(std::move(text), &status);
+        }
+        for (const qihtl::String& text : array) {
+            EXPECT_STREQ("element", text.c_str());
+        }
+    }
+    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+}
+
+TEST_F(ArrayTest, AFailedAllocationSetsMemoryFullAndKeepsTheElements) {
+    qihtl::Array<int> array;
+    for (int value = 0; value < 8; ++value) {
+        array.append(value, &status);
+    }
+    FaultyAllocator::failAt(0);
+    array.append(8, &status);
+    EXPECT_EQ(-52000, status.code);
+    EXPECT_EQ(8u, array.length());
+    EXPECT_EQ(7, array[7]);
+}
+
+TEST_F(ArrayTest, ASizeThatOverflowsIsMemoryFull) {
+    qihtl::Array<double> array;
+    array.reserve(0x20000000, &status);
+    EXPECT_EQ(-52000, status.code);
+    EXPECT_EQ(0u, qihtl_grownCapacity(0x0FFFFFFF, 0x10000000, sizeof(double)));
+    EXPECT_EQ(0x0FFFFFFFu, qihtl_grownCapacity(0x0FFFFFFE, 0x0FFFFFFF, sizeof(double)));
+}
+
+TEST_F(ArrayTest, NothingIsDoneWhenTheStatusIsNegative) {
+    qihtl::Array<int> array;
+    status.code = -1;
+    array.reserve(4, &status);
+    array.append(1, &status);
+    EXPECT_EQ(0u, array.capacity());
+    EXPECT_EQ(0u, array.length());
+    EXPECT_EQ(-1, status.code);
+}
+
+}  // namespace
