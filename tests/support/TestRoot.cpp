@@ -32,6 +32,10 @@ void TestRoot::write(const std::string& path, const std::string& content) const 
     std::ofstream(file, std::ios::binary) << content;
 }
 
+void TestRoot::makeDirectory(const std::string& path) const {
+    std::filesystem::create_directories(locate(path));
+}
+
 void TestRoot::remove(const std::string& path) const {
     std::filesystem::remove_all(locate(path));
 }

@@ -13,6 +13,7 @@ class TestRoot {
 
     // Writes a file under its absolute path on the target, folders included.
     void write(const std::string& path, const std::string& content) const;
+    void makeDirectory(const std::string& path) const;
     void remove(const std::string& path) const;
     // Where a path of the target lies.
     std::string locate(const std::string& path) const;

@@ -1,0 +1,58 @@
+#include "qisysq/qidynlib.h"
+
+#include <dlfcn.h>
+#include <gtest/gtest.h>
+
+#include <string>
+
+namespace {
+
+bool contains(const qierr::Status& status, const std::string& part) {
+    return std::string(status.json).find(part) != std::string::npos;
+}
+
+TEST(QidynlibTest, LoadsALibraryAndFindsASymbol) {
+    qierr::Status status;
+    void* handle = qidynlib_load(RELOCATIONS_COMPLETE, &status);
+    EXPECT_NE(nullptr, qidynlib_symbol(handle, "get_relocated_dir", &status));
+    EXPECT_EQ(0, status.code);
+    dlclose(handle);
+}
+
+TEST(QidynlibTest, AMissingLibraryIsReportedWithTheLoadersWords) {
+    qierr::Status status;
+    EXPECT_EQ(nullptr, qidynlib_load("libabsent-from-every-system.so.0", &status));
+    EXPECT_EQ(-52005, status.code);
+    EXPECT_TRUE(contains(status, "\"error_constant\":\"qiapalerr_invalidParameter\""));
+    EXPECT_TRUE(contains(status,
+                         "\"qidynlib_debug\":{\"debug\":\"failed to qidynlib_load library\","
+                         "\"path\":\"libabsent-from-every-system.so.0\"},"
+                         "\"internal_error\":{\"api\":\"dlerror\",\"string\":\"libabsent"))
+        << status.json;
+    EXPECT_EQ(nullptr, dlerror()) << "the pending text was not cleared";
+}
+
+TEST(QidynlibTest, AMissingSymbolIsReportedWithTheLoadersWords) {
+    qierr::Status status;
+    void* handle = qidynlib_load(RELOCATIONS_LACKING, &status);
+    EXPECT_EQ(nullptr, qidynlib_symbol(handle, "get_relocated_dir", &status));
+    EXPECT_EQ(-52005, status.code);
+    EXPECT_TRUE(contains(status,
+                         "\"qidynlib_debug\":{\"debug\":\"failed to get symbol\","
+                         "\"qidynlib_symbol\":\"get_relocated_dir\"},"
+                         "\"internal_error\":{\"api\":\"dlerror\",\"string\":\""))
+        << status.json;
+    EXPECT_EQ(nullptr, dlerror());
+    dlclose(handle);
+}
+
+TEST(QidynlibTest, NothingIsDoneWhenTheStatusIsNegative) {
+    qierr::Status status;
+    status.code = -1;
+    EXPECT_EQ(nullptr, qidynlib_load(RELOCATIONS_COMPLETE, &status));
+    EXPECT_EQ(nullptr, qidynlib_symbol(nullptr, "get_relocated_dir", &status));
+    EXPECT_EQ(-1, status.code);
+    EXPECT_EQ(nullptr, status.json);
+}
+
+}  // namespace

@@ -1,0 +1,87 @@
+#include "qisysq/stdpath_util.h"
+
+#include <gtest/gtest.h>
+
+#include <cerrno>
+#include <cstring>
+#include <string>
+
+#include "support/FaultyAllocator.h"
+#include "support/TestRoot.h"
+
+namespace {
+
+bool contains(const qierr::Status& status, const std::string& part) {
+    return std::string(status.json).find(part) != std::string::npos;
+}
+
+class ReadFileToBufferTest : public testing::Test {
+  protected:
+    void read(const std::string& path) {
+        qisysq::readFileToBuffer(root.locate(path).c_str(), &buffer, &status);
+    }
+
+    TestRoot root;
+    qihtl::String buffer;
+    qierr::Status status;
+};
+
+TEST_F(ReadFileToBufferTest, GivesTheWholeFileWithANulBehindIt) {
+    const std::string content("a\0b\n", 4);
+    root.write("/file", content);
+    read("/file");
+    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(content, std::string(buffer.c_str(), buffer.length()));
+    EXPECT_EQ('\0', buffer.c_str()[4]);
+}
+
+TEST_F(ReadFileToBufferTest, ReplacesWhatTheBufferHeld) {
+    root.write("/file", "new");
+    buffer.assign("what was there before", &status);
+    read("/file");
+    EXPECT_STREQ("new", buffer.c_str());
+}
+
+TEST_F(ReadFileToBufferTest, AMissingFileIsReportedWithTheErrno) {
+    read("/missing");
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(contains(status, "\"error_constant\":\"qiapalerr_resourceNotFound\""));
+    EXPECT_TRUE(contains(
+        status, "\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENOENT) +
+                    ",\"string\":\"" + std::strerror(ENOENT) +
+                    "\"},\"qisysq_debug\":{\"desc\":\"error opening file\","
+                    "\"filename\":\"" +
+                    root.locate("/missing") + "\"}"))
+        << status.json;
+}
+
+TEST_F(ReadFileToBufferTest, AFileThatCannotBeReadToItsEndIsReported) {
+    root.makeDirectory("/folder");
+    read("/folder");
+    EXPECT_EQ(-52008, status.code);
+    EXPECT_TRUE(contains(status, "\"error_constant\":\"qiapalerr_osFault\""));
+    EXPECT_TRUE(contains(status, "\"internal_error\":{\"api\":\"errno\",\"code\":"));
+    EXPECT_TRUE(contains(status,
+                         "\"qisysq_debug\":{\"desc\":\"didn't read full content of file\","
+                         "\"fileSize\":"))
+        << status.json;
+    EXPECT_TRUE(contains(
+        status, ",\"fread_return\":0,\"filename\":\"" + root.locate("/folder") + "\"}"));
+}
+
+TEST_F(ReadFileToBufferTest, WantOfMemoryIsReported) {
+    root.write("/file", "content");
+    FaultyAllocator::failAt(0);
+    read("/file");
+    FaultyAllocator::succeed();
+    EXPECT_EQ(-52000, status.code);
+}
+
+TEST_F(ReadFileToBufferTest, NothingIsDoneWhenTheStatusIsNegative) {
+    status.code = -1;
+    read("/missing");
+    EXPECT_EQ(-1, status.code);
+    EXPECT_EQ(nullptr, status.json);
+}
+
+}  // namespace
