@@ -1,0 +1,258 @@
+#include "qixlator/json1.h"
+
+#include "jsonz/jsonz.h"
+#include "qihtl/Array.h"
+#include "qixlator/defaultXlator.h"
+#include "qixlator/json1Items.h"
+#include "qixlator/jsonText.h"
+#include "qixlator/report.h"
+
+namespace qixlator::json1 {
+
+namespace {
+
+constexpr const char* lineEnds = "\r\n";
+
+// How the text of one error looks at its level; level 0 is the status itself.
+class NestedFormatter {
+  public:
+    virtual ~NestedFormatter() = default;
+    virtual void operator()(std::uint32_t level, qihtl::String* text, qierr_Status* status) = 0;
+};
+
+// Three blanks a level at the start of each line, and an empty line behind the text.
+class RawTextFormatter : public NestedFormatter {
+  public:
+    void operator()(std::uint32_t level, qihtl::String* text, qierr_Status* status) override;
+};
+
+void indent(std::uint32_t level, qihtl::String* text, qierr_Status* status) {
+    qihtl::String blanks;
+    for (std::uint32_t count = 0; count < level; ++count) {
+        blanks.append("   ", 3, status);
+    }
+    qihtl::String lines;
+    lines.append(blanks.c_str(), blanks.length(), status);
+    const char* end = text->c_str() + text->length();
+    for (const char* byte = text->c_str(); byte != end; ++byte) {
+        lines.append(byte, 1, status);
+        if (*byte == '\n') {
+            lines.append(blanks.c_str(), blanks.length(), status);
+        }
+    }
+    text->assign(lines.c_str(), lines.length(), status);
+}
+
+void RawTextFormatter::operator()(std::uint32_t level, qihtl::String* text, qierr_Status* status) {
+    text->trimStart(lineEnds);
+    text->trimEnd(lineEnds);
+    if (level != 0) {
+        indent(level, text, status);
+    }
+    text->append("\n\n", 2, status);
+}
+
+// A text made by a translator, which goes back through the function that made it.
+class XlatorText {
+  public:
+    explicit XlatorText(char* text) : text(text) {}
+    ~XlatorText() { qixlator_realloc(text, 0, nullptr, nullptr); }
+    XlatorText(const XlatorText&) = delete;
+    XlatorText& operator=(const XlatorText&) = delete;
+
+    const char* get() const { return text; }
+
+  private:
+    char* text;
+};
+
+// Where the walk through the nested errors stands at one level. The positions lie in the text of
+// the outermost status.
+struct NestedErrors {
+    // The error that they are the causes of.
+    const char* owner;
+    // The next one, or null.
+    const char* next;
+    // Whether they stand in an array.
+    bool listed;
+};
+
+class Translation {
+  public:
+    Translation(Session* session, std::uint32_t attributes, const TypedItemFormat* formats,
+                NestedFormatter* formatter, qihtl::String* output, qierr_Status* status)
+        : session(session),
+          attributes(attributes),
+          formats(formats),
+          formatter(formatter),
+          output(output),
+          status(status) {}
+
+    void run(std::int32_t code, const char* json, std::uint32_t flags);
+
+  private:
+    void describe(std::int32_t code, const char* json, std::uint32_t level, std::uint32_t flags);
+    void appendSection(const char* json1, const char* member, const char* prefix,
+                       const char* suffix, qihtl::String* text);
+    void openNested(const char* owner);
+    void describeNext(std::uint32_t flags);
+    void failOnNestedType(const char* what, const char* owner, const char* typeKey,
+                          jsonz_type type);
+
+    Session* session;
+    std::uint32_t attributes;
+    const TypedItemFormat* formats;
+    NestedFormatter* formatter;
+    qihtl::String* output;
+    qierr_Status* status;
+    // Kept here rather than on the call stack, since errors may nest to any depth.
+    qihtl::Array<NestedErrors> levels;
+};
+
+void Translation::run(std::int32_t code, const char* json, std::uint32_t flags) {
+    describe(code, json, 0, flags);
+    if (status->code < 0 || (flags & includeNested) == 0 || json == nullptr) {
+        return;
+    }
+    openNested(json);
+    while (status->code >= 0 && levels.length() != 0) {
+        if (levels.last().next == nullptr) {
+            levels.removeLast();
+        } else {
+            describeNext(includeStatic | includeDynamic | includeNested | (flags & includeDebug));
+        }
+    }
+}
+
+void Translation::describe(std::int32_t code, const char* json, std::uint32_t level,
+                           std::uint32_t flags) {
+    qihtl::String xlatorName;
+    if (json != nullptr) {
+        appendJsonString(jsonz_findMember(json, "translator"), &xlatorName, status);
+    }
+    if (xlatorName.empty()) {
+        xlatorName.assign(defaultXlatorName, status);
+    }
+    if (status->code < 0) {
+        return;
+    }
+    const bool wantsItems = (flags & (includeDynamic | includeDebug)) != 0;
+    const XlatorText description((flags & includeStatic) == 0
+                                     ? nullptr
+                                     : qixlator_getStaticDesc(session, code, xlatorName.c_str(),
+                                                              attributes, qixlator_realloc, nullptr,
+                                                              status));
+    const XlatorText json1(!wantsItems || xlatorName.equals(defaultXlatorName)
+                               ? nullptr
+                               : qixlator_getDynamicDesc(session, json, attributes, "json1",
+                                                         qixlator_realloc, nullptr, status));
+    qihtl::String text;
+    if (description.get() != nullptr) {
+        text.append(sectionFormat.staticPrefix, status);
+        text.append(description.get(), status);
+        text.append(sectionFormat.staticSuffix, status);
+    }
+    if ((flags & includeDynamic) != 0) {
+        appendSection(json1.get(), "dynamic", sectionFormat.dynamicPrefix,
+                      sectionFormat.dynamicSuffix, &text);
+    }
+    if ((flags & includeDebug) != 0) {
+        appendSection(json1.get(), "debug", sectionFormat.debugPrefix, sectionFormat.debugSuffix,
+                      &text);
+    }
+    (*formatter)(level, &text, status);
+    output->append(text.c_str(), text.length(), status);
+}
+
+void Translation::appendSection(const char* json1, const char* member, const char* prefix,
+                                const char* suffix, qihtl::String* text) {
+    if (json1 == nullptr) {
+        return;
+    }
+    text->append(prefix, status);
+    const char* items = jsonz_findMember(json1, member);
+    if (items != nullptr) {
+        formatDynamicReportItems(items, formats, text, status);
+    }
+    text->append(suffix, status);
+}
+
+// Goes one level down to the causes of `owner`, if it has any.
+void Translation::openNested(const char* owner) {
+    const char* nested = jsonz_findMember(owner, "nested_error");
+    if (nested == nullptr) {
+        return;
+    }
+    jsonz_value read;
+    jsonz_readValue(nested, &read);
+    if (read.type == jsonz_typeObject) {
+        levels.append({owner, nested, false}, status);
+    } else if (read.type == jsonz_typeArray) {
+        levels.append({owner, jsonz_firstElement(nested), true}, status);
+    } else {
+        failOnNestedType("nested_error contains invalid json type", owner, "jsonz_type", read.type);
+    }
+}
+
+void Translation::describeNext(std::uint32_t flags) {
+    NestedErrors& current = levels.last();
+    jsonz_value read;
+    const char* error = current.next;
+    const char* end = jsonz_readValue(error, &read);
+    if (read.type != jsonz_typeObject) {
+        failOnNestedType("nested_error contains invalid json type on one of the element",
+                         current.owner, "invalid json_type", read.type);
+        return;
+    }
+    current.next = current.listed ? jsonz_nextElement(end) : nullptr;
+    {
+        qihtl::String json;
+        appendJsonText(error, &json, status);
+        const std::int32_t code = jsonz_getInt(jsonz_findMember(error, "code"), 0);
+        describe(code, json.c_str(), levels.length(), flags);
+    }
+    if (status->code >= 0) {
+        openNested(error);
+    }
+}
+
+void Translation::failOnNestedType(const char* what, const char* owner, const char* typeKey,
+                                   jsonz_type type) {
+    qierr::Status copyStatus;
+    qihtl::String json;
+    appendJsonText(owner, &json, &copyStatus);
+    qierr_Writer writer = reportFailure(status, qiapalerr_invalidParameter,
+                                        QIERR_HERE_NAMED("qiapalerr_invalidParameter"));
+    writer = qierr_Writer_addString(writer, "translateErrStatusToFormattedText", what);
+    writer = qierr_Writer_addString(writer, "json", json.c_str());
+    qierr_Writer_addInt(writer, typeKey, type);
+}
+
+void translate(Session* session, const qierr_Status* source, std::uint32_t attributes,
+               std::uint32_t flags, const TypedItemFormat* formats, qihtl::String* output,
+               qierr_Status* status) {
+    if (source->code == 0 || status->code < 0) {
+        return;
+    }
+    RawTextFormatter formatter;
+    Translation(session, attributes, formats, &formatter, output, status)
+        .run(source->code, source->json, flags);
+    output->trimStart(lineEnds);
+    output->trimEnd(lineEnds);
+}
+
+}  // namespace
+
+void translateErrStatusToRawText(Session* session, const qierr_Status* source,
+                                 std::uint32_t attributes, std::uint32_t flags,
+                                 qihtl::String* output, qierr_Status* status) {
+    translate(session, source, attributes, flags, rawItemFormats, output, status);
+}
+
+void translateErrStatusToFormattedText(Session* session, const qierr_Status* source,
+                                       std::uint32_t attributes, std::uint32_t flags,
+                                       qihtl::String* output, qierr_Status* status) {
+    translate(session, source, attributes, flags, formattedItemFormats, output, status);
+}
+
+}  // namespace qixlator::json1

@@ -1,0 +1,47 @@
+#pragma once
+
+#include "qihtl/String.h"
+
+// The items of a json1 text and the texts that stand around them.
+namespace qixlator::json1 {
+
+// What stands around the sections of one error's text. Null means empty.
+struct SectionFormat {
+    const char* staticPrefix;
+    const char* staticSuffix;
+    const char* dynamicPrefix;
+    const char* dynamicSuffix;
+    const char* debugPrefix;
+    const char* debugSuffix;
+};
+
+// What stands around the parts of one item. Null means empty.
+struct ItemFormat {
+    const char* itemPrefix;
+    const char* itemSuffix;
+    const char* keyPrefix;
+    const char* keySuffix;
+    const char* valuePrefix;
+    const char* valueSuffix;
+    const char* elementPrefix;
+    const char* elementSuffix;
+    const char* elementSeparator;
+};
+
+// The format of the items of one type. A table of these ends with a null type, whose format serves
+// every type that is not named.
+struct TypedItemFormat {
+    const char* type;
+    ItemFormat format;
+};
+
+extern const SectionFormat sectionFormat;
+extern const TypedItemFormat rawItemFormats[];
+extern const TypedItemFormat formattedItemFormats[];
+
+// Appends the items of the JSON array at `array`, all or none. What is no array has no items.
+// -52005 for an item that is no object or a value that is neither a string nor an array of strings.
+void formatDynamicReportItems(const char* array, const TypedItemFormat* formats,
+                              qihtl::String* output, qierr_Status* status);
+
+}  // namespace qixlator::json1

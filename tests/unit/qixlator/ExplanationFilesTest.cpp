@@ -1,0 +1,353 @@
+#include <gtest/gtest.h>
+#include <sys/stat.h>
+
+#include <cerrno>
+#include <cstring>
+#include <filesystem>
+#include <string>
+
+#include "qixlator/qvErrorsParser.h"
+#include "support/FaultyAllocator.h"
+#include "support/TestRoot.h"
+
+namespace {
+
+constexpr const char* heading = "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<qidocument>\n";
+
+std::string document(const std::string& body) {
+    return heading + body + "</qidocument>\n";
+}
+
+std::string block(const std::string& code, const std::string& text) {
+    return "<qierror code=\"" + code + "\">\n" + text + "</qierror>\n";
+}
+
+class ExplanationFilesTest : public testing::Test {
+  protected:
+    // Searches one file of this content.
+    std::string inFile(const std::string& content, std::int32_t code = -1) {
+        root.write("/file.txt", content);
+        qixlator::findErrorDescriptionFromFile(root.at("/file.txt").c_str(), code, &output,
+                                               &status);
+        return text();
+    }
+
+    std::string inDirectory(const std::string& directory, std::int32_t code = -1) {
+        qixlator::findErrorDescriptionFromDir(root.at(directory).c_str(), code, &output, &status);
+        return text();
+    }
+
+    std::string inErrorsDirectory(const std::string& directory, std::int32_t language) {
+        qixlator::findErrorDescriptionFromErrorsDir(root.at(directory).c_str(), -1, language,
+                                                    &output, &status);
+        return text();
+    }
+
+    std::string text() const { return std::string(output.c_str(), output.length()); }
+
+    bool reported(const std::string& part) const {
+        return status.json != nullptr && std::string(status.json).find(part) != std::string::npos;
+    }
+
+    TestRoot root;
+    qihtl::String output;
+    qierr::Status status;
+};
+
+// ---- One file -----------------------------------------------------------------------------------
+
+TEST_F(ExplanationFilesTest, FindsTheDescriptionOfTheCode) {
+    EXPECT_EQ("Second.", inFile(document(block("-2", "First.\n") + block("-1", "Second.\n"))));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, InnerLineEndsStayAndTrailingOnesGo) {
+    EXPECT_EQ("One.\n\nTwo.", inFile(document(block("-1", "One.\n\nTwo.\r\n\n"))));
+}
+
+TEST_F(ExplanationFilesTest, AnUnknownCodeGivesNothingAndIsNoFailure) {
+    EXPECT_EQ("", inFile(document(block("-2", "First.\n"))));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, TheFirstBlockOfACodeWins) {
+    EXPECT_EQ("First.", inFile(document(block("-1", "First.\n") + block("-1", "Second.\n"))));
+}
+
+TEST_F(ExplanationFilesTest, TagsIgnoreCase) {
+    EXPECT_EQ("Text.", inFile("<?XML VERSION=\"1.0\"?>\n<QIDocument>\n<QIERROR CODE=\"-1\">\n"
+                              "Text.\n</QIERROR>\n</QIDOCUMENT>\n"));
+}
+
+TEST_F(ExplanationFilesTest, CodesMayBeHexadecimal) {
+    EXPECT_EQ("Text.", inFile(document(block("0x1A", "Text.\n")), 26));
+    EXPECT_EQ("Text.", inFile(document(block("-0x1A", "Text.\n")), -26));
+}
+
+TEST_F(ExplanationFilesTest, TheRestOfATagLineIsIgnored) {
+    EXPECT_EQ("Text.", inFile(std::string(heading) +
+                              "<qierror code=\"-1\" since=\"2\"> not the text\nText.\n"
+                              "</qierror> more\n</qidocument>\n"));
+}
+
+TEST_F(ExplanationFilesTest, AFileOfAnotherFormIsSkippedWithoutAFailure) {
+    for (const std::string& content :
+         {std::string(), std::string("Notes\n") + block("-1", "Text.\n"),
+          std::string("<?xml version=\"1.0\"?>\n"),
+          "<?xml version=\"1.0\"?>\n<other>\n" + block("-1", "Text.\n"),
+          "<?xml version=\"1.1\"?>\n<qidocument>\n" + block("-1", "Text.\n"),
+          std::string(heading)}) {
+        EXPECT_EQ("", inFile(content)) << content;
+        EXPECT_EQ(0, status.code) << content;
+    }
+}
+
+TEST_F(ExplanationFilesTest, NothingBehindTheEndMarkerIsSeen) {
+    EXPECT_EQ("", inFile(document("") + block("-1", "Text.\n")));
+}
+
+TEST_F(ExplanationFilesTest, AMissingEndMarkerIsNoFailure) {
+    EXPECT_EQ("", inFile(heading + block("-2", "Text.\n")));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, CommentsAndUnknownTagsAndOtherLinesAreSkipped) {
+    EXPECT_EQ("Text.",
+              inFile(document("<foo>\nany line\n\n<qicomment>\n" + block("-1", "Not this.\n") +
+                              "</qicomment>\n" + block("-1", "Text.\n"))));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, AnUnfinishedCommentReachesToTheEnd) {
+    EXPECT_EQ("", inFile(document("<qicomment>\n" + block("-1", "Text.\n"))));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, OnlyTheClosingTagCountsInsideABlock) {
+    EXPECT_EQ("<b>\n</qidocument>\n<qicomment>\n<qierror code=\"-2\">\n &lt; </qierror>",
+              inFile(document(block("-1",
+                                    "<b>\n</qidocument>\n<qicomment>\n<qierror code=\"-2\">\n"
+                                    " &lt; </qierror>\n"))));
+}
+
+TEST_F(ExplanationFilesTest, ALongLineIsCollectedWhole) {
+    const std::string longLine = std::string(3000, 'x') + "end";
+    EXPECT_EQ(longLine, inFile(document(block("-1", longLine + "\n"))));
+}
+
+TEST_F(ExplanationFilesTest, APieceOfALongLineMayEndTheBlock) {
+    const std::string firstPiece(1023, 'x');
+    EXPECT_EQ(firstPiece, inFile(document(block("-1", firstPiece + "</qierror>yyy\n"))));
+}
+
+TEST_F(ExplanationFilesTest, ABlockWithoutLinesGivesNothing) {
+    EXPECT_EQ("", inFile(document(block("-1", "") + block("-1", "Second.\n"))));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, ABlockOfLineEndsOnlyIsLeftAsItIs) {
+    EXPECT_EQ("\n\r\n", inFile(document(block("-1", "\n\r\n"))));
+}
+
+TEST_F(ExplanationFilesTest, ACodeThatIsNoNumberIsAFailure) {
+    EXPECT_EQ("", inFile(document(block("none", "Text.\n"))));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(reported("\"error_constant\":\"qiapalerr_resourceNotFound\""));
+    EXPECT_TRUE(
+        reported("\"qixlator_debug\":{\"debug\":"
+                 "\"Could not successfully read the status data!\",\"sscanf\":0}"))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, AnUnfinishedBlockIsAFailureWhateverItsCode) {
+    EXPECT_EQ("", inFile(std::string(heading) + "<qierror code=\"-2\">\nText.\n"));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(
+        reported("\"debug\":\"Bad explanation file. Could not find the end of the status "
+                 "code definition !\"}"))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, AnUnfinishedBlockOfTheCodeGivesNoText) {
+    EXPECT_EQ("", inFile(std::string(heading) + "<qierror code=\"-1\">\nText.\n"));
+    EXPECT_EQ(-52006, status.code);
+}
+
+TEST_F(ExplanationFilesTest, ALineThatBeginsWithANulIsAFailure) {
+    EXPECT_EQ("", inFile(document(std::string("\0x\n", 3) + block("-1", "Text.\n"))));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(reported("\"debug\":\"Bad explanation file. Unidentified section heading !\"}"))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, AFileThatCannotBeOpenedIsAFailure) {
+    const std::string path = root.at("/missing.txt");
+    qixlator::findErrorDescriptionFromFile(path.c_str(), -1, &output, &status);
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(
+        reported("\"qixlator_debug\":{\"debug\":\"Could not open status explanations "
+                 "file\",\"path\":\"" +
+                 path + "\"}"))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, ASearchOnlyClearsTheOutputWhenTheStatusIsNegative) {
+    root.write("/errors/English/a.txt", document(block("-1", "Text.\n")));
+    output.assign("old", &status);
+    status.code = -7;
+    EXPECT_EQ("", inFile(document(block("-1", "Text.\n"))));
+    EXPECT_EQ("", inDirectory("/errors/English"));
+    EXPECT_EQ("", inErrorsDirectory("/errors", 0));
+    EXPECT_EQ(-7, status.code);
+}
+
+// ---- A directory --------------------------------------------------------------------------------
+
+TEST_F(ExplanationFilesTest, FindsTheCodeInAnyExplanationFileOfTheDirectory) {
+    root.write("/dir/a.txt", document(block("-2", "Two.\n")));
+    root.write("/dir/b.err", document(block("-1", "One.\n")));
+    root.write("/dir/notes.md", "no explanation file");
+    EXPECT_EQ("One.", inDirectory("/dir"));
+    EXPECT_EQ("Two.", inDirectory("/dir", -2));
+    EXPECT_EQ("", inDirectory("/dir", -3));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, OnlyTheExactExtensionsCount) {
+    for (const char* name : {"notes.TXT", "notes.err.bak", "notes", "txt", "notes.txtx"}) {
+        root.write(std::string("/dir/") + name, document(block("-1", name)));
+    }
+    EXPECT_EQ("", inDirectory("/dir"));
+    root.write("/dir/.txt", document(block("-1", "Found.\n")));
+    EXPECT_EQ("Found.", inDirectory("/dir"));
+}
+
+TEST_F(ExplanationFilesTest, DirectoriesAndWhatLiesInThemAreNotRead) {
+    root.write("/dir/below.txt/a.txt", document(block("-1", "Text.\n")));
+    EXPECT_EQ("", inDirectory("/dir"));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, APipeIsNotRead) {
+    root.makeDirectory("/dir");
+    ASSERT_EQ(0, mkfifo(root.at("/dir/pipe.txt").c_str(), 0600));
+    EXPECT_EQ("", inDirectory("/dir"));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, AnEmptyDirectoryGivesNothingAndIsNoFailure) {
+    root.makeDirectory("/dir");
+    EXPECT_EQ("", inDirectory("/dir"));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, TheSearchGoesOnBehindAnEmptyBlock) {
+    root.write("/dir/a.txt", document(block("-1", "")));
+    root.write("/dir/b.txt", document(block("-1", "Text.\n")));
+    root.write("/dir/c.txt", document(block("-1", "")));
+    EXPECT_EQ("Text.", inDirectory("/dir"));
+}
+
+TEST_F(ExplanationFilesTest, ABadFileStopsTheSearch) {
+    root.write("/dir/bad.txt", document(block("none", "")));
+    EXPECT_EQ("", inDirectory("/dir"));
+    EXPECT_EQ(-52006, status.code);
+}
+
+TEST_F(ExplanationFilesTest, AMissingDirectoryIsAFailure) {
+    EXPECT_EQ("", inDirectory("/missing"));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(reported("\"internal_error\":{\"api\":\"errno\",\"code\":" +
+                         std::to_string(ENOENT) + ",\"string\":\"" + std::strerror(ENOENT) +
+                         "\"},\"qixlator_debug\":{\"debug\":\"open dir failed\",\"path\":\"" +
+                         root.at("/missing").string() + "\"}"))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, WhateverKeepsADirectoryShutIsReportedAsMissing) {
+    root.write("/file", "");
+    EXPECT_EQ("", inDirectory("/file"));
+    EXPECT_TRUE(reported("\"code\":" + std::to_string(ENOENT) + ",")) << status.json;
+}
+
+TEST_F(ExplanationFilesTest, AnEmptyPathAndATooLongPathAreFailures) {
+    qixlator::findErrorDescriptionFromDir("", -1, &output, &status);
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(reported("\"code\":" + std::to_string(EINVAL) + ",")) << status.json;
+    qierr::Status longStatus;
+    qixlator::findErrorDescriptionFromDir(std::string(4096, 'd').c_str(), -1, &output, &longStatus);
+    EXPECT_EQ(-52006, longStatus.code);
+    EXPECT_NE(std::string::npos,
+              std::string(longStatus.json).find("\"code\":" + std::to_string(ENAMETOOLONG) + ","));
+}
+
+TEST_F(ExplanationFilesTest, AnEntryThatCannotBeLookedAtStopsTheSearch) {
+    root.makeDirectory("/dir");
+    std::filesystem::create_symlink("nowhere", root.at("/dir/link.txt"));
+    EXPECT_EQ("", inDirectory("/dir"));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(
+        reported("\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENOENT) + ","));
+    EXPECT_TRUE(reported("\"qixlator_debug\":{\"qixlator\":\"get file info failed\",\"path\":\"" +
+                         root.at("/dir").string() + "\"}"))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, WantOfMemoryForTheWalkIsReported) {
+    root.makeDirectory("/dir");
+    for (int allocation = 0; allocation < 2; ++allocation) {
+        qierr::Status failure;
+        FaultyAllocator::failAt(allocation);
+        qixlator::findErrorDescriptionFromDir(root.at("/dir").c_str(), -1, &output, &failure);
+        FaultyAllocator::succeed();
+        EXPECT_EQ(-52000, failure.code);
+        EXPECT_NE(std::string::npos,
+                  std::string(failure.json)
+                      .find("\"qixlator_debug\":{\"qixlator\":\"failed to allocate memory\"}"))
+            << failure.json;
+    }
+}
+
+// ---- An errors directory ------------------------------------------------------------------------
+
+TEST_F(ExplanationFilesTest, TheLanguagesDirectoryComesBeforeItsParent) {
+    root.write("/errors/all.txt", document(block("-1", "Parent.\n")));
+    root.write("/errors/German/a.txt", document(block("-1", "German.\n")));
+    root.makeDirectory("/errors/French");
+    EXPECT_EQ("German.", inErrorsDirectory("/errors", 2));
+    EXPECT_EQ("Parent.", inErrorsDirectory("/errors", 1));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, AMissingLanguageDirectoryIsAFailureAndNoFallback) {
+    root.write("/errors/all.txt", document(block("-1", "Parent.\n")));
+    EXPECT_EQ("", inErrorsDirectory("/errors", 3));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(reported("\"debug\":\"open dir failed\",\"path\":\"" +
+                         root.at("/errors/Japanese").string() + "\""))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, EachLanguageHasItsDirectory) {
+    const char* directories[] = {"English", "French", "German", "Japanese", "Korean", "ChineseS"};
+    for (int language = 0; language < 6; ++language) {
+        EXPECT_STREQ(directories[language], qixlator::convertLangToDir(language, &status));
+    }
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(ExplanationFilesTest, AnUnknownLanguageIsAFailure) {
+    for (const int language : {6, -1}) {
+        qierr::Status failure;
+        EXPECT_STREQ("", qixlator::convertLangToDir(language, &failure));
+        EXPECT_EQ(-52005, failure.code);
+        EXPECT_NE(
+            std::string::npos,
+            std::string(failure.json)
+                .find("\"qixlator_debug\":{\"qverrorsparser\":\"invalid language\",\"lang\":" +
+                      std::to_string(language) + "}"))
+            << failure.json;
+    }
+}
+
+}  // namespace

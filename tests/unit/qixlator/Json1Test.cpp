@@ -1,0 +1,299 @@
+#include "qixlator/json1.h"
+
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "TestXlator.h"
+#include "qierr/Writer.h"
+#include "support/TestRoot.h"
+
+namespace {
+
+using qixlator::json1::translateErrStatusToFormattedText;
+using qixlator::json1::translateErrStatusToRawText;
+
+// The service's own attribute word and flag word.
+constexpr std::uint32_t attributes = 0x200;
+constexpr std::uint32_t serviceFlags = 11;
+
+class Json1Test : public testing::Test {
+  protected:
+    Json1Test() : xlator("test"), session(qixlator_createSession(&failure)) {
+        xlator.descriptions[-1] = "Static one";
+        xlator.descriptions[-2] = "Static two";
+        xlator.descriptions[0] = "Static zero";
+    }
+    ~Json1Test() override { qixlator_destroySession(session); }
+
+    std::string translate(std::int32_t code, const char* json, std::uint32_t flags,
+                          decltype(&translateErrStatusToRawText) function) {
+        qierr::Status status;
+        qierr_Status_setCode(&status, code);
+        if (json != nullptr) {
+            qierr_Status_setJson(&status, json);
+        }
+        qihtl::String text;
+        function(session, &status, attributes, flags, &text, &failure);
+        return std::string(text.c_str(), text.length());
+    }
+
+    std::string raw(std::int32_t code, const char* json, std::uint32_t flags = serviceFlags) {
+        return translate(code, json, flags, translateErrStatusToRawText);
+    }
+
+    // The raw text of a status of the test's translator with these dynamic items.
+    std::string rawItems(const std::string& items) {
+        xlator.json1 = "{\"dynamic\":" + items + ",\"debug\":[]}";
+        return raw(-1, "{\"translator\":\"test\"}");
+    }
+
+    std::string formattedItems(const std::string& items) {
+        xlator.json1 = "{\"dynamic\":" + items + "}";
+        return translate(-1, "{\"translator\":\"test\"}", serviceFlags,
+                         translateErrStatusToFormattedText);
+    }
+
+    bool reported(const std::string& part) const {
+        return failure.json != nullptr && std::string(failure.json).find(part) != std::string::npos;
+    }
+
+    TestRoot root;
+    TestXlator xlator;
+    qierr::Status failure;
+    qixlator::Session* session;
+};
+
+// ---- Sections and items -------------------------------------------------------------------------
+
+TEST_F(Json1Test, ASuccessHasNoText) {
+    EXPECT_EQ("", raw(0, "{\"translator\":\"test\"}"));
+    EXPECT_TRUE(xlator.calls.empty());
+}
+
+TEST_F(Json1Test, NothingIsDoneWhenTheFailureStatusIsNegative) {
+    failure.code = -3;
+    EXPECT_EQ("", raw(-1, "{\"translator\":\"test\"}"));
+    EXPECT_TRUE(xlator.calls.empty());
+}
+
+TEST_F(Json1Test, AnItemStandsBelowTheDescriptionAfterAnEmptyLine) {
+    EXPECT_EQ("Static one\n\nK: V",
+              rawItems("[{\"type\":\"usage\",\"key\":\"K\",\"value\":\"V\"}]"));
+    EXPECT_EQ("Static one\n\nK: V\nL: W",
+              rawItems("[{\"type\":\"usage\",\"key\":\"K\",\"value\":\"V\"},"
+                       "{\"key\":\"L\",\"value\":\"W\"}]"));
+}
+
+TEST_F(Json1Test, TheElementsOfAnArrayAreSeparatedByCommas) {
+    EXPECT_EQ("Static one\n\nK: a, b", rawItems("[{\"key\":\"K\",\"value\":[\"a\", \"b\"]}]"));
+    EXPECT_EQ("Static one\n\nK: a", rawItems("[{\"key\":\"K\",\"value\":[\"a\"]}]"));
+    EXPECT_EQ("Static one\n\nK: ", rawItems("[{\"key\":\"K\",\"value\":[]}]"));
+}
+
+TEST_F(Json1Test, AnElaborationFollowsDirectlyInTheRawForm) {
+    EXPECT_EQ(
+        "Static one\n\nK: VE",
+        rawItems("[{\"key\":\"K\",\"value\":\"V\"},{\"type\":\"elaboration\",\"value\":\"E\"}]"));
+}
+
+TEST_F(Json1Test, TheFormattedFormMarksLabelsAndElaborations) {
+    EXPECT_EQ("Static one\n\n<B>K: </B>V\n<B>E</B>",
+              formattedItems("[{\"key\":\"K\",\"value\":\"V\"},"
+                             "{\"type\":\"elaboration\",\"value\":\"E\"}]"));
+    EXPECT_EQ("Static one\n\n<B>K: </B>a, b\n<B>c, d</B>",
+              formattedItems("[{\"key\":\"K\",\"value\":[\"a\",\"b\"]},"
+                             "{\"type\":\"elaboration\",\"value\":[\"c\",\"d\"]}]"));
+}
+
+TEST_F(Json1Test, AnItemWithoutKeyOrValueLeavesItsPartOut) {
+    EXPECT_EQ("Static one\n\nV", rawItems("[{\"type\":\"header\",\"value\":\"V\"}]"));
+    EXPECT_EQ("Static one\n\nK: ", rawItems("[{\"key\":\"K\"}]"));
+    EXPECT_EQ("Static one\n\nV", rawItems("[{\"key\":\"\",\"value\":\"V\"}]"));
+    EXPECT_EQ("Static one\n\n\nV", rawItems("[{\"type\":\"empty\"},{\"value\":\"V\"}]"));
+}
+
+TEST_F(Json1Test, EscapesAreResolved) {
+    EXPECT_EQ("Static one\n\n\"K\": a\tb\xC3\xA9, \\",
+              rawItems("[{\"key\":\"\\\"K\\\"\",\"value\":[\"a\\tb\\u00e9\",\"\\\\\"]}]"));
+}
+
+TEST_F(Json1Test, AFaultyEscapeEndsItsTextOnly) {
+    EXPECT_EQ("Static one\n\nK: a, b",
+              rawItems("[{\"key\":\"K\",\"value\":[\"a\\ud800z\",\"b\"]}]"));
+    EXPECT_EQ(0, failure.code);
+}
+
+TEST_F(Json1Test, WhatIsNoArrayHasNoItems) {
+    EXPECT_EQ("Static one", rawItems("{}"));
+    EXPECT_EQ("Static one", rawItems("5"));
+    EXPECT_EQ(0, failure.code);
+}
+
+TEST_F(Json1Test, TheFlagsSelectTheSections) {
+    xlator.json1 =
+        "{\"dynamic\":[{\"key\":\"K\",\"value\":\"V\"}],"
+        "\"debug\":[{\"key\":\"D\",\"value\":\"W\"}]}";
+    const char* json = "{\"translator\":\"test\"}";
+    EXPECT_EQ("", raw(-1, json, 0));
+    EXPECT_EQ("Static one", raw(-1, json, 1));
+    EXPECT_EQ("K: V", raw(-1, json, 2));
+    EXPECT_EQ("D: W", raw(-1, json, 4));
+    EXPECT_EQ("Static one\n\nK: V", raw(-1, json, 3));
+    EXPECT_EQ("Static one\n\nK: V\n\nD: W", raw(-1, json, 7));
+}
+
+TEST_F(Json1Test, WithoutAFlagForItemsNoneAreAskedFor) {
+    raw(-1, "{\"translator\":\"test\"}", 1);
+    EXPECT_EQ((std::vector<std::string>{"create test with the registration text", "static -1 512"}),
+              xlator.calls);
+}
+
+TEST_F(Json1Test, TheTextIsAppendedAndLineEndsAreTrimmedOffBothEnds) {
+    qierr::Status status;
+    qierr_Status_setCode(&status, -1);
+    qierr_Status_setJson(&status, "{\"translator\":\"test\"}");
+    qihtl::String text;
+    text.assign("\r\nbefore ", &failure);
+    translateErrStatusToRawText(session, &status, attributes, 1, &text, &failure);
+    EXPECT_STREQ("before Static one", text.c_str());
+}
+
+TEST_F(Json1Test, ANoTextFromTheTranslatorIsNoFailure) {
+    EXPECT_EQ("", raw(-99, "{\"translator\":\"test\"}"));
+    EXPECT_EQ(0, failure.code);
+}
+
+// ---- The translator of a status -----------------------------------------------------------------
+
+TEST_F(Json1Test, AStatusWithoutATranslatorGoesToTheDefaultOne) {
+    root.write("/usr/local/qinstal/share/errors/English/a.txt",
+               "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"-1\">\nDefault text.\n"
+               "</qierror>\n</qidocument>\n");
+    EXPECT_EQ("Default text.", raw(-1, nullptr));
+    EXPECT_EQ("Default text.", raw(-1, "{\"file\":\"x\"}"));
+    EXPECT_EQ("Default text.", raw(-1, "{\"translator\":\"\"}"));
+    EXPECT_EQ("Default text.", raw(-1, "{\"translator\":7}"));
+    EXPECT_EQ("Default text.", raw(-1, "{\"translator\":\"qixlator_default\"}"));
+    EXPECT_EQ(0, failure.code);
+}
+
+TEST_F(Json1Test, AFailedDescriptionFailsTheTranslation) {
+    EXPECT_EQ("", raw(-1, nullptr));
+    EXPECT_EQ(-52006, failure.code);
+}
+
+// ---- Nested errors ------------------------------------------------------------------------------
+
+TEST_F(Json1Test, NestedErrorsAreIndentedByThreeBlanksALevelOnEveryLine) {
+    xlator.json1 = "{\"dynamic\":[{\"key\":\"K\",\"value\":\"V\"}]}";
+    EXPECT_EQ(
+        "Static one\n\nK: V\n\n"
+        "   Static two\n   \n   K: V\n\n"
+        "      Static one\n      \n      K: V",
+        raw(-1,
+            "{\"translator\":\"test\",\"nested_error\":{\"code\":-2,\"translator\":\"test\","
+            "\"nested_error\":{\"code\":-1,\"translator\":\"test\"}}}"));
+}
+
+TEST_F(Json1Test, AnArrayOfNestedErrorsIsTakenInOrder) {
+    EXPECT_EQ("Static one\n\n   Static two\n\n      Static one\n\n   Static one",
+              raw(-1,
+                  "{\"translator\":\"test\",\"nested_error\":[{\"code\":-2,\"translator\":\"test\","
+                  "\"nested_error\":[{\"code\":-1,\"translator\":\"test\"}]},"
+                  "{\"code\":-1,\"translator\":\"test\"}]}"));
+}
+
+TEST_F(Json1Test, ANestedErrorIsTranslatedByItsOwnText) {
+    const std::string nested = "{\"code\":-2, \"translator\":\"test\", \"x\":[1]}";
+    raw(-1, ("{\"translator\":\"test\",\"nested_error\": " + nested + " ,\"y\":2}").c_str());
+    EXPECT_EQ("dynamic json1 " + nested, xlator.calls.back());
+}
+
+TEST_F(Json1Test, OnlyTheNestedFlagOpensNestedErrorsAndTheyShowTheirItems) {
+    xlator.json1 =
+        "{\"dynamic\":[{\"key\":\"K\",\"value\":\"V\"}],"
+        "\"debug\":[{\"key\":\"D\",\"value\":\"W\"}]}";
+    const char* json =
+        "{\"translator\":\"test\",\"nested_error\":{\"code\":-2,\"translator\":\"test\"}}";
+    EXPECT_EQ("Static one", raw(-1, json, 1));
+    EXPECT_EQ("Static one\n\n   Static two\n   \n   K: V", raw(-1, json, 9));
+    EXPECT_EQ("D: W\n\n   Static two\n   \n   K: V\n   \n   D: W", raw(-1, json, 12));
+}
+
+TEST_F(Json1Test, AnEmptyArrayOfNestedErrorsIsNoFailure) {
+    EXPECT_EQ("Static one", raw(-1, "{\"translator\":\"test\",\"nested_error\":[]}"));
+    EXPECT_EQ(0, failure.code);
+}
+
+TEST_F(Json1Test, ANestedErrorWithoutCodeHasCodeZeroAndStillAText) {
+    EXPECT_EQ("Static one\n\n   Static zero",
+              raw(-1, "{\"translator\":\"test\",\"nested_error\":{\"translator\":\"test\"}}"));
+}
+
+TEST_F(Json1Test, ErrorsMayNestDeeply) {
+    std::string json;
+    const int depth = 2000;
+    for (int level = 0; level < depth; ++level) {
+        json += "{\"translator\":\"test\",\"code\":-1,\"nested_error\":";
+    }
+    json += "{\"translator\":\"test\",\"code\":-2}" + std::string(depth, '}');
+    const std::string text = raw(-1, json.c_str(), 9);
+    EXPECT_EQ(0, failure.code);
+    const std::string innermost = "\n" + std::string(3 * depth, ' ') + "Static two";
+    ASSERT_LT(innermost.size(), text.size());
+    EXPECT_EQ(innermost, text.substr(text.size() - innermost.size()));
+}
+
+// ---- Failures -----------------------------------------------------------------------------------
+
+TEST_F(Json1Test, AnItemThatIsNoObjectIsAFailure) {
+    EXPECT_EQ("", rawItems("[{\"key\":\"K\",\"value\":\"V\"},[\"x\"]]"));
+    EXPECT_EQ(-52005, failure.code);
+    EXPECT_TRUE(reported("\"error_constant\":\"qiapalerr_invalidParameter\""));
+    EXPECT_TRUE(reported(
+        "\"qixlator_debug\":{\"formatDynamicReportItems\":\"json1 dynamic object invalid. each "
+        "array item must be an object\",\"json1DynamicObjectBegin\":"
+        "\"[{\\\"key\\\":\\\"K\\\",\\\"value\\\":\\\"V\\\"},[\\\"x\\\"]]\"}"))
+        << failure.json;
+}
+
+TEST_F(Json1Test, AValueThatIsNoStringIsAFailure) {
+    EXPECT_EQ("", rawItems("[{\"key\":\"K\",\"value\":5}]"));
+    EXPECT_EQ(-52005, failure.code);
+    EXPECT_TRUE(reported(
+        "\"qixlator_debug\":{\"formatDynamicReportItems\":\"json1 dynamic object invalid. value "
+        "can only be string\",\"value type\":3}"))
+        << failure.json;
+}
+
+TEST_F(Json1Test, AnElementThatIsNoStringIsAFailure) {
+    EXPECT_EQ("", rawItems("[{\"key\":\"K\",\"value\":[\"a\",null]}]"));
+    EXPECT_EQ(-52005, failure.code);
+    EXPECT_TRUE(reported("\"value type\":1}")) << failure.json;
+}
+
+TEST_F(Json1Test, ANestedErrorOfAnotherTypeIsAFailure) {
+    const std::string json = "{\"translator\":\"test\",\"nested_error\":\"x\"}";
+    EXPECT_EQ("Static one", raw(-1, json.c_str()));
+    EXPECT_EQ(-52005, failure.code);
+    EXPECT_TRUE(reported(
+        "\"qixlator_debug\":{\"translateErrStatusToFormattedText\":\"nested_error contains invalid "
+        "json type\",\"json\":\"{\\\"translator\\\":\\\"test\\\",\\\"nested_error\\\":\\\"x\\\"}\","
+        "\"jsonz_type\":4}"))
+        << failure.json;
+}
+
+TEST_F(Json1Test, AnElementOfNestedErrorsOfAnotherTypeIsAFailure) {
+    EXPECT_EQ("Static one\n\n   Static two",
+              raw(-1,
+                  "{\"translator\":\"test\",\"nested_error\":[{\"translator\":\"test\","
+                  "\"code\":-2},true,{\"translator\":\"test\",\"code\":-1}]}"));
+    EXPECT_EQ(-52005, failure.code);
+    EXPECT_TRUE(
+        reported("\"translateErrStatusToFormattedText\":\"nested_error contains invalid "
+                 "json type on one of the element\",\"json\":\"{\\\"translator\\\""));
+    EXPECT_TRUE(reported(",\"invalid json_type\":2}")) << failure.json;
+}
+
+}  // namespace
