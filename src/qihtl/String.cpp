@@ -42,6 +42,17 @@ void String::clear() noexcept {
     }
 }
 
+void String::shrink() noexcept {
+    if (pointer == nullptr || used == room) {
+        return;
+    }
+    char* moved = static_cast<char*>(qihtl_realloc(pointer, std::size_t{used} + 1));
+    if (moved != nullptr) {
+        pointer = moved;
+        room = used;
+    }
+}
+
 bool String::setRoom(std::uint32_t wanted, qierr_Status* status) {
     char* moved = static_cast<char*>(qihtl_realloc(pointer, std::size_t{wanted} + 1));
     if (moved == nullptr) {

@@ -31,6 +31,8 @@ class String {
     bool equals(const char* text) const noexcept;
 
     void clear() noexcept;
+    // Gives back the memory beyond the text, if it can.
+    void shrink() noexcept;
     // Makes room for exactly `wanted` bytes of text unless there is room already.
     void reserve(std::uint32_t wanted, qierr_Status* status);
     // Makes the text `wanted` bytes long; bytes beyond the old text are NUL.

@@ -65,8 +65,8 @@ TEST_F(ReadFileToBufferTest, AFileThatCannotBeReadToItsEndIsReported) {
                          "\"qisysq_debug\":{\"desc\":\"didn't read full content of file\","
                          "\"fileSize\":"))
         << status.json;
-    EXPECT_TRUE(contains(
-        status, ",\"fread_return\":0,\"filename\":\"" + root.locate("/folder") + "\"}"));
+    EXPECT_TRUE(
+        contains(status, ",\"fread_return\":0,\"filename\":\"" + root.locate("/folder") + "\"}"));
 }
 
 TEST_F(ReadFileToBufferTest, WantOfMemoryIsReported) {

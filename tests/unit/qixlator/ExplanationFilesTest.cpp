@@ -27,18 +27,19 @@ class ExplanationFilesTest : public testing::Test {
     // Searches one file of this content.
     std::string inFile(const std::string& content, std::int32_t code = -1) {
         root.write("/file.txt", content);
-        qixlator::findErrorDescriptionFromFile(root.at("/file.txt").c_str(), code, &output,
+        qixlator::findErrorDescriptionFromFile(root.locate("/file.txt").c_str(), code, &output,
                                                &status);
         return text();
     }
 
     std::string inDirectory(const std::string& directory, std::int32_t code = -1) {
-        qixlator::findErrorDescriptionFromDir(root.at(directory).c_str(), code, &output, &status);
+        qixlator::findErrorDescriptionFromDir(root.locate(directory).c_str(), code, &output,
+                                              &status);
         return text();
     }
 
     std::string inErrorsDirectory(const std::string& directory, std::int32_t language) {
-        qixlator::findErrorDescriptionFromErrorsDir(root.at(directory).c_str(), -1, language,
+        qixlator::findErrorDescriptionFromErrorsDir(root.locate(directory).c_str(), -1, language,
                                                     &output, &status);
         return text();
     }
@@ -181,7 +182,7 @@ TEST_F(ExplanationFilesTest, ALineThatBeginsWithANulIsAFailure) {
 }
 
 TEST_F(ExplanationFilesTest, AFileThatCannotBeOpenedIsAFailure) {
-    const std::string path = root.at("/missing.txt");
+    const std::string path = root.locate("/missing.txt");
     qixlator::findErrorDescriptionFromFile(path.c_str(), -1, &output, &status);
     EXPECT_EQ(-52006, status.code);
     EXPECT_TRUE(
@@ -230,7 +231,7 @@ TEST_F(ExplanationFilesTest, DirectoriesAndWhatLiesInThemAreNotRead) {
 
 TEST_F(ExplanationFilesTest, APipeIsNotRead) {
     root.makeDirectory("/dir");
-    ASSERT_EQ(0, mkfifo(root.at("/dir/pipe.txt").c_str(), 0600));
+    ASSERT_EQ(0, mkfifo(root.locate("/dir/pipe.txt").c_str(), 0600));
     EXPECT_EQ("", inDirectory("/dir"));
     EXPECT_EQ(0, status.code);
 }
@@ -260,7 +261,7 @@ TEST_F(ExplanationFilesTest, AMissingDirectoryIsAFailure) {
     EXPECT_TRUE(reported("\"internal_error\":{\"api\":\"errno\",\"code\":" +
                          std::to_string(ENOENT) + ",\"string\":\"" + std::strerror(ENOENT) +
                          "\"},\"qixlator_debug\":{\"debug\":\"open dir failed\",\"path\":\"" +
-                         root.at("/missing").string() + "\"}"))
+                         root.locate("/missing") + "\"}"))
         << status.json;
 }
 
@@ -283,13 +284,13 @@ TEST_F(ExplanationFilesTest, AnEmptyPathAndATooLongPathAreFailures) {
 
 TEST_F(ExplanationFilesTest, AnEntryThatCannotBeLookedAtStopsTheSearch) {
     root.makeDirectory("/dir");
-    std::filesystem::create_symlink("nowhere", root.at("/dir/link.txt"));
+    std::filesystem::create_symlink("nowhere", root.locate("/dir/link.txt"));
     EXPECT_EQ("", inDirectory("/dir"));
     EXPECT_EQ(-52006, status.code);
     EXPECT_TRUE(
         reported("\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENOENT) + ","));
     EXPECT_TRUE(reported("\"qixlator_debug\":{\"qixlator\":\"get file info failed\",\"path\":\"" +
-                         root.at("/dir").string() + "\"}"))
+                         root.locate("/dir") + "\"}"))
         << status.json;
 }
 
@@ -298,7 +299,7 @@ TEST_F(ExplanationFilesTest, WantOfMemoryForTheWalkIsReported) {
     for (int allocation = 0; allocation < 2; ++allocation) {
         qierr::Status failure;
         FaultyAllocator::failAt(allocation);
-        qixlator::findErrorDescriptionFromDir(root.at("/dir").c_str(), -1, &output, &failure);
+        qixlator::findErrorDescriptionFromDir(root.locate("/dir").c_str(), -1, &output, &failure);
         FaultyAllocator::succeed();
         EXPECT_EQ(-52000, failure.code);
         EXPECT_NE(std::string::npos,
@@ -324,7 +325,7 @@ TEST_F(ExplanationFilesTest, AMissingLanguageDirectoryIsAFailureAndNoFallback) {
     EXPECT_EQ("", inErrorsDirectory("/errors", 3));
     EXPECT_EQ(-52006, status.code);
     EXPECT_TRUE(reported("\"debug\":\"open dir failed\",\"path\":\"" +
-                         root.at("/errors/Japanese").string() + "\""))
+                         root.locate("/errors/Japanese") + "\""))
         << status.json;
 }
 

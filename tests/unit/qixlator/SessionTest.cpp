@@ -373,8 +373,7 @@ TEST_F(DefaultXlatorTest, MissingDirectoriesAreReportedForEnglish) {
     EXPECT_EQ("(null)", describeIn(2, &status));
     EXPECT_EQ(-52006, status.code);
     EXPECT_TRUE(reported(status, "\"debug\":\"open dir failed\",\"path\":\"" +
-                                     root.at("/usr/local/qinstal/share/errors/English").string() +
-                                     "\""))
+                                     root.locate("/usr/local/qinstal/share/errors/English") + "\""))
         << status.json;
 }
 
