@@ -22,3 +22,5 @@ find_library(LUA_FILESYSTEM_LIBRARY lua5.1-filesystem REQUIRED)
 add_library(lua_modules INTERFACE)
 target_link_libraries(lua_modules INTERFACE "${LUA_CJSON_LIBRARY}" "${LUA_FILESYSTEM_LIBRARY}"
                       PkgConfig::lua)
+# The utility script of the JSON module, which becomes an embedded file.
+find_file(LUA_CJSON_UTIL util.lua PATHS /usr/share/lua/5.1/cjson REQUIRED)

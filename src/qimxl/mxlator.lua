@@ -1,0 +1,243 @@
+-- The translator: finds the description of a code, and puts the details of a status into words.
+
+local cjson = require("cjson")
+local utils = require("qixlatorluautils")
+local utilities = require("qimxl_utilities")
+
+local mxlator = {}
+
+-- Both are indexed by their number + 1.
+mxlator.ThreeLetterLngStrings = { "eng", "fra", "deu", "jpn", "kor", "chs" }
+mxlator.Ades = { "none", "qv", "qvi", "qstudio" }
+
+local unsupportedFormat = -52029
+
+-- The usages whose value is the number of an attribute.
+local attributeUsages = {
+    kUsageTypeAttributeId = true,
+    kUsageTypeAttributeIdentifier = true,
+    kUsageTypeAffectedAttribute = true,
+    kUsageTypeConflictingAttr = true,
+    kUsageTypeConflictingProperty = true,
+    kUsageTypeUnspecifiedProperty = true,
+}
+
+-- The first of the modules that can be loaded, or nil.
+local function requireFirst(names)
+    for _, name in ipairs(names) do
+        local success, module = pcall(require, name)
+        if success then
+            return module
+        end
+    end
+    return nil
+end
+
+local function moduleNames(prefix, word)
+    local names = { prefix .. word }
+    if word ~= "eng" then
+        names[2] = prefix .. "eng"
+    end
+    return names
+end
+
+---- Descriptions of codes -------------------------------------------------------------------------
+
+local function fromErrorTable(code, word)
+    local errors = requireFirst(moduleNames("errors_", word))
+    if not errors then
+        return nil
+    end
+    assert(errors.encoding == "utf-8", "Unsupported encoding")
+    return errors.getString(code)
+end
+
+-- Runs one search of explanation files. A failed one, as for want of a directory, finds nothing.
+local function search(find, lang, ...)
+    local success, text = pcall(find, ...)
+    if success and text then
+        return utils.mbsToUtf8(lang, text)
+    end
+    return nil
+end
+
+local function fromDriverFiles(code, lang, languageDir, pathsep)
+    local settings = qixlatorlua_settings
+    if not (settings.MIErrorsDir and settings.driverName) then
+        return nil
+    end
+    local directory = utils.expandPath(qixlatorlua_name, settings.MIErrorsDir)
+        .. pathsep .. settings.driverName .. pathsep
+    local text = search(utils.findErrorDescriptionFromDir, lang, directory .. languageDir, code)
+    if not text and languageDir ~= "English" then
+        text = search(utils.findErrorDescriptionFromDir, 0, directory .. "English", code)
+    end
+    return text
+end
+
+local function fromSharedFiles(code, lang, directory)
+    local find = utils.findErrorDescriptionFromErrorsDir
+    return search(find, lang, directory, code, lang) or search(find, 0, directory, code, 0)
+end
+
+-- The description of a code, in the language of this number or else in English. ade is not used.
+function mxlator.getStaticDesc(code, lang, ade)
+    local pathsep = package.config:sub(1, 1)
+    local word = mxlator.ThreeLetterLngStrings[lang + 1] or "zzz"
+    local languageDir = utilities.convertLangShortToLong(word)
+    local standardErrDir =
+        utils.expandPath(qixlatorlua_name, qixlatorlua_settings.qiSharedErrorsDir)
+    code = qimxl_unmapErrorCode(code)
+    return fromErrorTable(code, word)
+        or fromDriverFiles(code, lang, languageDir, pathsep)
+        or fromSharedFiles(code, lang, standardErrDir)
+        or "Error description not found"
+end
+
+---- Details of a status ---------------------------------------------------------------------------
+
+local function attributeTableNames(word, ade)
+    local names = {}
+    local driver = qixlatorlua_settings.driverName
+    if driver then
+        local adeName = mxlator.Ades[ade + 1]
+        if ade ~= 0 and adeName then
+            for _, name in ipairs(moduleNames(driver .. "_attributes_", word)) do
+                names[#names + 1] = name .. "_" .. adeName
+            end
+        end
+        for _, name in ipairs(moduleNames(driver .. "_attributes_", word)) do
+            names[#names + 1] = name
+        end
+    end
+    names[#names + 1] = "qimxl_defaultAttrTable"
+    return names
+end
+
+local function textOf(value)
+    if value == cjson.null then
+        return "null"
+    end
+    return tostring(value)
+end
+
+local function term(terms, key)
+    if not terms then
+        return key
+    end
+    assert(terms.encoding == "utf-8", "Unsupported encoding")
+    return terms.getString(key) or key
+end
+
+-- The attribute of a number, or nil for what is no number. An unknown one has its number for a name.
+local function attribute(attributes, num)
+    local number = tonumber(num)
+    if not number then
+        return nil
+    end
+    -- Eight digits whatever the number, also where a conversion out of range would be undefined.
+    local attrid = string.format("%08X", number % 4294967296)
+    return attributes and attributes.getAttribute(attrid)
+        or { shortName = "0x" .. attrid, enums = {} }
+end
+
+local function plainText(entry, value, attributes)
+    if attributeUsages[entry.usage] then
+        local found = attribute(attributes, value)
+        return found and found.shortName or textOf(value)
+    end
+    return textOf(value)
+end
+
+local function enumText(entry, value, attributes)
+    local found = attribute(attributes, entry.value_type.id)
+    return found and found.enums[textOf(value)] or textOf(value)
+end
+
+-- The value of a usage entry as a text or an array of texts. Nil for a type that is not known, and
+-- for an empty array, which would be encoded as an object.
+local function usageValue(entry, attributes)
+    local toText = plainText
+    if type(entry.value_type) == "table" then
+        if entry.value_type.type ~= "enum" then
+            return nil
+        end
+        toText = enumText
+    end
+    if type(entry.value) ~= "table" then
+        return toText(entry, entry.value, attributes)
+    end
+    local texts = {}
+    for index, element in ipairs(entry.value) do
+        texts[index] = toText(entry, element, attributes)
+    end
+    return next(texts) and texts
+end
+
+-- The item of one entry, or nil for one that is not shown.
+local function itemOf(entry, terms, attributes)
+    if type(entry) ~= "table" then
+        return nil
+    elseif entry.type == "usage" then
+        return { type = "usage", key = term(terms, entry.usage),
+            value = usageValue(entry, attributes) }
+    elseif entry.type == "elaboration" or entry.type == "header" then
+        return { type = entry.type, value = term(terms, entry.usage) }
+    elseif entry.type == "empty" then
+        return { type = "empty" }
+    end
+    return nil
+end
+
+local function dynamicItems(errorContext, terms, attributes)
+    local items = {}
+    local info = errorContext.translator_info
+    local entries = type(info) == "table" and info.ordered_data
+    if type(entries) == "table" then
+        for _, entry in pairs(entries) do
+            items[#items + 1] = itemOf(entry, terms, attributes)
+        end
+    end
+    return items
+end
+
+local function addDebugItem(items, key, value)
+    if value ~= nil then
+        items[#items + 1] = { type = "usage", key = key, value = textOf(value) }
+    end
+end
+
+-- Takes out of the status what is shown elsewhere; the rest is one item.
+local function debugItems(errorContext, internalError)
+    local items = {}
+    addDebugItem(items, "Component", errorContext.component)
+    addDebugItem(items, "File", errorContext.file)
+    addDebugItem(items, "Line", errorContext.line)
+    addDebugItem(items, "internal_error_string", internalError)
+    for _, member in ipairs({ "translator_info", "component", "file", "line" }) do
+        errorContext[member] = nil
+    end
+    addDebugItem(items, "rest_of_input_json", cjson.encode(errorContext))
+    return items
+end
+
+-- The json1 text of a status's JSON text, or a negative code. lang and ade are hints.
+function mxlator.getDynamicDesc(errjson, lang, ade, format)
+    if format ~= "json1" then
+        return unsupportedFormat
+    end
+    local errorContext = cjson.decode(errjson)
+    local word = mxlator.ThreeLetterLngStrings[lang + 1] or "zzz"
+    local attributeNames = attributeTableNames(word, ade)
+    local attributes = requireFirst(attributeNames)
+    local internalError
+    if not attributes then
+        internalError = "Cannot load " .. attributeNames[#attributeNames] .. "\n"
+    end
+    local terms = requireFirst(moduleNames("commonTerms_", word))
+    local dynamicArray = dynamicItems(errorContext, terms, attributes)
+    local debugArray = debugItems(errorContext, internalError)
+    return cjson.encode({ dynamic = dynamicArray, debug = debugArray })
+end
+
+return mxlator

@@ -1,0 +1,33 @@
+-- The two namings of the languages: the word of three letters and the name of the directory.
+-- An unknown name gives what the last known one gave.
+
+local qimxl_utilities = {}
+
+local longNames = {
+    eng = "English",
+    jpn = "Japanese",
+    chs = "ChineseS",
+    fra = "French",
+    deu = "German",
+    kor = "Korean",
+    zzz = "Zzzzzzz",
+}
+
+local shortNames = {}
+for short, long in pairs(longNames) do
+    if short ~= "zzz" then
+        shortNames[long] = short
+    end
+end
+
+function qimxl_utilities.convertLangShortToLong(short)
+    qimxl_langLong = longNames[short] or qimxl_langLong
+    return qimxl_langLong
+end
+
+function qimxl_utilities.convertLangLongToShort(long)
+    qimxl_langShort = shortNames[long] or qimxl_langShort
+    return qimxl_langShort
+end
+
+return qimxl_utilities
