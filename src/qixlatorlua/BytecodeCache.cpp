@@ -1,0 +1,135 @@
+#include "qixlatorlua/BytecodeCache.h"
+
+#include <cstring>
+#include <lua.hpp>
+#include <new>
+#include <utility>
+
+#include "embedded/preload.h"
+#include "qixlatorlua/LuaMemory.h"
+
+namespace qixlatorlua {
+
+namespace {
+
+struct Dump {
+    qihtl::String* bytecode;
+    qierr_Status* status;
+};
+
+int writeDump(lua_State*, const void* data, std::size_t size, void* context) {
+    const auto* dump = static_cast<const Dump*>(context);
+    dump->bytecode->append(static_cast<const char*>(data), static_cast<std::uint32_t>(size),
+                           dump->status);
+    return dump->status->code < 0;
+}
+
+}  // namespace
+
+BytecodeCache::BytecodeCache(EmbeddedFiles files, qierr_Status* status) {
+    // Nothing below raises a Lua error: loading is protected, and dumping does not allocate.
+    lua_State* L = lua_newstate(allocatePlainly, nullptr);
+    if (L == nullptr) {
+        qihtl_reportMemoryFull(status);
+        return;
+    }
+    for (const EmbeddedFile& file : files) {
+        if (isLuaFile(file) && status->code >= 0) {
+            compile(L, file, status);
+        }
+    }
+    lua_close(L);
+}
+
+void BytecodeCache::compile(lua_State* L, const EmbeddedFile& file, qierr_Status* status) {
+    Script script{&file, {}, {}};
+    const int result = luaL_loadbuffer(L, file.data, file.size, file.name);
+    if (result == 0) {
+        Dump dump{&script.bytecode, status};
+        lua_dump(L, writeDump, &dump);
+        // What is not used to its end is memory for the life of the process.
+        script.bytecode.shrink();
+    } else if (result == LUA_ERRMEM) {
+        qihtl_reportMemoryFull(status);
+    } else {
+        script.failure.assign(lua_tostring(L, -1), status);
+    }
+    lua_settop(L, 0);
+    scripts.append(std::move(script), status);
+}
+
+const BytecodeCache* BytecodeCache::ofEmbeddedFiles() {
+    // A constructor that throws makes the language try again at the next call.
+    struct Complete : BytecodeCache {
+        explicit Complete(qierr::Status&& status) : BytecodeCache(embeddedFiles(), &status) {
+            if (status.code < 0) {
+                throw std::bad_alloc();
+            }
+        }
+    };
+    try {
+        static const Complete cache{qierr::Status()};
+        return &cache;
+    } catch (const std::bad_alloc&) {
+        return nullptr;
+    }
+}
+
+const BytecodeCache::Script* BytecodeCache::find(const char* module, std::size_t length) const {
+    for (const Script& script : scripts) {
+        if (script.failure.empty() && moduleNameLength(*script.file) == length &&
+            std::memcmp(script.file->name, module, length) == 0) {
+            return &script;
+        }
+    }
+    return nullptr;
+}
+
+// The index function of package.preload: arguments are that table and the name of a module.
+int BytecodeCache::load(lua_State* L) {
+    const auto* cache = static_cast<const BytecodeCache*>(lua_touserdata(L, lua_upvalueindex(1)));
+    std::size_t length = 0;
+    const char* module = lua_tolstring(L, 2, &length);
+    const Script* script = module == nullptr ? nullptr : cache->find(module, length);
+    if (script == nullptr) {
+        return 0;
+    }
+    if (luaL_loadbuffer(L, script->bytecode.c_str(), script->bytecode.length(),
+                        script->file->name) != 0) {
+        return lua_error(L);
+    }
+    lua_pushvalue(L, 2);
+    lua_pushvalue(L, -2);
+    lua_rawset(L, 1);
+    return 1;
+}
+
+int BytecodeCache::install(lua_State* L) const {
+    lua_getglobal(L, "package");
+    lua_getfield(L, -1, "preload");
+    lua_newtable(L);
+    // The index function only reads the cache.
+    lua_pushlightuserdata(L, const_cast<BytecodeCache*>(this));
+    lua_pushcclosure(L, load, 1);
+    lua_setfield(L, -2, "__index");
+    lua_setmetatable(L, -2);
+    lua_pop(L, 2);
+    int result = 0;
+    for (const Script& script : scripts) {
+        if (!script.failure.empty()) {
+            reportLoadFailure(script.file->name, script.failure.c_str());
+            result = 1;
+        }
+    }
+    return result;
+}
+
+std::uint64_t BytecodeCache::size() const {
+    std::uint64_t bytes = 0;
+    for (const Script& script : scripts) {
+        bytes += script.bytecode.length();
+    }
+    return bytes;
+}
+
+}  // namespace qixlatorlua

@@ -1,0 +1,132 @@
+#include "qixlatorlua/LuaState.h"
+
+#include <cstdio>
+#include <lua.hpp>
+#include <new>
+
+#include "embedded/preload.h"
+#include "qixlatorlua/BytecodeCache.h"
+#include "qixlatorlua/LuaMemory.h"
+#include "qixlatorlua/libraries.h"
+
+namespace qixlatorlua {
+
+namespace {
+
+lua_State* newPlainState() {
+    return lua_newstate(allocatePlainly, nullptr);
+}
+
+lua_State* newFastState() {
+    void* memory = qihtl_realloc(nullptr, sizeof(LuaArena));
+    if (memory == nullptr) {
+        return nullptr;
+    }
+    auto* arena = new (memory) LuaArena();
+    lua_State* L = lua_newstate(LuaArena::allocate, arena);
+    if (L == nullptr) {
+        arena->~LuaArena();
+        qihtl_realloc(arena, 0);
+        return nullptr;
+    }
+    // A state lives for one translation. Until it has grown well beyond the usual, its garbage is
+    // freed with it.
+    lua_gc(L, LUA_GCSTOP, 0);
+    return L;
+}
+
+int openLibraryProtected(lua_State* L) {
+    openLibrary(L, *static_cast<const LuaLibrary*>(lua_touserdata(L, 1)));
+    return 0;
+}
+
+bool openLibraries(lua_State* L, qierr_Status* status) {
+    for (const LuaLibrary* library = libraries; library->name != nullptr; ++library) {
+        const int result = lua_cpcall(L, openLibraryProtected, const_cast<LuaLibrary*>(library));
+        if (result != 0) {
+            qierr_Writer writer = reportLuaFailure(L, result, "failed to load lua lib", status);
+            qierr_Writer_addString(writer, "lib", library->name);
+            return false;
+        }
+    }
+    return true;
+}
+
+struct Preload {
+    // Null: compile each script.
+    const BytecodeCache* cache;
+    int result;
+};
+
+int preloadProtected(lua_State* L) {
+    auto* preload = static_cast<Preload*>(lua_touserdata(L, 1));
+    preload->result =
+        preload->cache == nullptr ? addEmbeddedFilesToPreload(L) : preload->cache->install(L);
+    return 0;
+}
+
+bool preloadScripts(lua_State* L, LuaRuntime runtime, qierr_Status* status) {
+    Preload preload{runtime == LuaRuntime::fast ? BytecodeCache::ofEmbeddedFiles() : nullptr, 0};
+    const int result = lua_cpcall(L, preloadProtected, &preload);
+    if (result != 0 || preload.result != 0) {
+        reportLuaFailure(L, result, "failed to add embedded modules to preload table", status);
+        return false;
+    }
+    return true;
+}
+
+void reportNoState(qierr_Status* status) {
+    qierr_Status_setCodeNamed(status, qiapalerr_memoryFull,
+                              QIERR_HERE_NAMED("qiapalerr_memoryFull"));
+    qierr_Writer writer =
+        qierr_Writer_beginObject(qierr_Status_writerAtEnd(status), "qixlatorlua_debug");
+    qierr_Writer_addString(writer, "debug", "failed to create lua state");
+}
+
+}  // namespace
+
+lua_State* openState(LuaRuntime runtime, qierr_Status* status) {
+    lua_State* L = runtime == LuaRuntime::fast ? newFastState() : newPlainState();
+    if (L == nullptr) {
+        reportNoState(status);
+        return nullptr;
+    }
+    if (!openLibraries(L, status) || !preloadScripts(L, runtime, status)) {
+        closeState(L);
+        return nullptr;
+    }
+    return L;
+}
+
+void closeState(lua_State* L) {
+    if (L == nullptr) {
+        return;
+    }
+    void* context = nullptr;
+    lua_getallocf(L, &context);
+    lua_close(L);
+    if (context != nullptr) {
+        static_cast<LuaArena*>(context)->~LuaArena();
+        qihtl_realloc(context, 0);
+    }
+}
+
+qierr_Writer reportLuaFailure(lua_State* L, int result, const char* what, qierr_Status* status) {
+    // Only what is a text already: making one could raise an error, which nobody would catch here.
+    const char* message = lua_type(L, -1) == LUA_TSTRING ? lua_tostring(L, -1) : "";
+    if (!qierr_Status_setCodeNamed(
+            status, qiapalerr_softwareFaultAPALInternalUseOnly,
+            QIERR_HERE_NAMED("qiapalerr_softwareFaultAPALInternalUseOnly"))) {
+        return qierr_Writer{nullptr, nullptr, nullptr};
+    }
+    qierr_Writer writer = qierr_Status_writerAtEnd(status);
+    writer = qierr_Writer_beginObject(writer, "internal_error");
+    writer = qierr_Writer_addString(writer, "api", "lua");
+    writer = qierr_Writer_addInt(writer, "code", result);
+    writer = qierr_Writer_addString(writer, "string", message);
+    writer = qierr_Writer_endObject(writer);
+    writer = qierr_Writer_beginObject(writer, "qixlatorlua_debug");
+    return qierr_Writer_addString(writer, "debug", what);
+}
+
+}  // namespace qixlatorlua

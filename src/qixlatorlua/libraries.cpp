@@ -1,0 +1,50 @@
+#include "qixlatorlua/libraries.h"
+
+#include <lua.hpp>
+
+#include "qixlatorlua/qixlatorluautils.h"
+#include "qixlatorlua/restrictions.h"
+#include "stdint/luaopen_stdint.h"
+
+// The header of the JSON module declares a C function without saying so.
+extern "C" {
+#include <lfs.h>
+#include <lua-cjson.h>
+}
+
+namespace qixlatorlua {
+
+const LuaLibrary libraries[] = {
+    {"", luaopen_base, nullptr},
+    {LUA_LOADLIBNAME, luaopen_package, disableNativeModules},
+    {LUA_TABLIBNAME, luaopen_table, nullptr},
+    {LUA_IOLIBNAME, luaopen_io, disablePrograms},
+    {LUA_OSLIBNAME, luaopen_os, nullptr},
+    {LUA_STRLIBNAME, luaopen_string, nullptr},
+    {LUA_MATHLIBNAME, luaopen_math, nullptr},
+    {LUA_DBLIBNAME, luaopen_debug, renameDebugPrompt},
+    {"lfs", luaopen_lfs, nullptr},
+    {"stdint", luaopen_stdint, nullptr},
+    {"cjson", luaopen_cjson, nullptr},
+    {"qixlatorluautils", luaopen_qixlatorluautils, nullptr},
+    {nullptr, nullptr, nullptr},
+};
+
+void openLibrary(lua_State* L, const LuaLibrary& library) {
+    lua_pushcfunction(L, library.open);
+    lua_pushstring(L, library.name);
+    lua_call(L, 1, 1);
+    if (library.name[0] != '\0') {
+        // Some of the modules leave it to their loader to make them known.
+        lua_getfield(L, LUA_REGISTRYINDEX, "_LOADED");
+        lua_pushvalue(L, -2);
+        lua_setfield(L, -2, library.name);
+        lua_pop(L, 1);
+    }
+    if (library.restrict != nullptr) {
+        library.restrict(L);
+    }
+    lua_pop(L, 1);
+}
+
+}  // namespace qixlatorlua

@@ -1,0 +1,134 @@
+#include "qixlatorlua/qixlatorluautils.h"
+
+#include <cstdint>
+#include <lua.hpp>
+#include <new>
+
+#include "qihtl/String.h"
+#include "qixlator/qvErrorsParser.h"
+#include "qixlatorlua/pathVariables.h"
+
+namespace {
+
+constexpr const char* outcomeType = "qixlatorluautils.outcome";
+
+// What a native function works on. It lives in a Lua userdata, since a Lua error may jump over the
+// frame of the function at any call into Lua: the collector then ends it.
+struct Outcome {
+    qihtl::String text;
+    qierr::Status status;
+
+    void reset() {
+        this->~Outcome();
+        new (this) Outcome();
+    }
+};
+
+int endOutcome(lua_State* L) {
+    static_cast<Outcome*>(lua_touserdata(L, 1))->reset();
+    return 0;
+}
+
+Outcome* newOutcome(lua_State* L) {
+    auto* outcome = new (lua_newuserdata(L, sizeof(Outcome))) Outcome();
+    luaL_getmetatable(L, outcomeType);
+    lua_setmetatable(L, -2);
+    return outcome;
+}
+
+// Returns the text, or raises the failure.
+int finish(lua_State* L, Outcome* outcome) {
+    const bool failed = outcome->status.code < 0;
+    if (failed) {
+        lua_pushstring(L, outcome->status.json == nullptr ? "{}" : outcome->status.json);
+    } else {
+        lua_pushlstring(L, outcome->text.c_str(), outcome->text.length());
+    }
+    outcome->reset();
+    return failed ? lua_error(L) : 1;
+}
+
+// The same for a search, where an empty text is none.
+int finishSearch(lua_State* L, Outcome* outcome) {
+    if (outcome->status.code >= 0 && outcome->text.empty()) {
+        outcome->reset();
+        lua_pushnil(L);
+        return 1;
+    }
+    return finish(L, outcome);
+}
+
+std::int32_t checkInt32(lua_State* L, int index) {
+    return static_cast<std::int32_t>(luaL_checkinteger(L, index));
+}
+
+int mbsToUtf8(lua_State* L) {
+    luaL_checkinteger(L, 1);
+    luaL_checkstring(L, 2);
+    lua_pushvalue(L, 2);
+    return 1;
+}
+
+int lookupVariable(lua_State* L) {
+    luaL_checkstring(L, 1);
+    const char* name = luaL_checkstring(L, 2);
+    Outcome* outcome = newOutcome(L);
+    qixlatorlua::lookupVariable(name, &outcome->text, &outcome->status);
+    return finish(L, outcome);
+}
+
+int expandPath(lua_State* L) {
+    luaL_checkstring(L, 1);
+    const char* path = luaL_checkstring(L, 2);
+    Outcome* outcome = newOutcome(L);
+    qixlatorlua::expandPath(path, &outcome->text, &outcome->status);
+    return finish(L, outcome);
+}
+
+int convertLangToDir(lua_State* L) {
+    const std::int32_t language = checkInt32(L, 1);
+    Outcome* outcome = newOutcome(L);
+    const char* directory = qixlator::convertLangToDir(language, &outcome->status);
+    outcome->text.assign(directory, &outcome->status);
+    return finish(L, outcome);
+}
+
+int findErrorDescriptionFromErrorsDir(lua_State* L) {
+    const char* directory = luaL_checkstring(L, 1);
+    const std::int32_t code = checkInt32(L, 2);
+    const std::int32_t language = checkInt32(L, 3);
+    Outcome* outcome = newOutcome(L);
+    qixlator::findErrorDescriptionFromErrorsDir(directory, code, language, &outcome->text,
+                                                &outcome->status);
+    return finishSearch(L, outcome);
+}
+
+int findErrorDescriptionFromDir(lua_State* L) {
+    const char* directory = luaL_checkstring(L, 1);
+    const std::int32_t code = checkInt32(L, 2);
+    Outcome* outcome = newOutcome(L);
+    qixlator::findErrorDescriptionFromDir(directory, code, &outcome->text, &outcome->status);
+    return finishSearch(L, outcome);
+}
+
+}  // namespace
+
+extern "C" int luaopen_qixlatorluautils(lua_State* L) {
+    static const luaL_Reg functions[] = {
+        {"mbsToUtf8", mbsToUtf8},
+        {"lookupVariable", lookupVariable},
+        {"expandPath", expandPath},
+        {"convertLangToDir", convertLangToDir},
+        {"findErrorDescriptionFromErrorsDir", findErrorDescriptionFromErrorsDir},
+        {"findErrorDescriptionFromDir", findErrorDescriptionFromDir},
+        // Takes a directory too, whatever its name says: scripts rely on it.
+        {"findErrorDescriptionFromFile", findErrorDescriptionFromDir},
+        {nullptr, nullptr},
+    };
+    luaL_newmetatable(L, outcomeType);
+    lua_pushcfunction(L, endOutcome);
+    lua_setfield(L, -2, "__gc");
+    lua_pop(L, 1);
+    luaL_register(L, "qixlatorluautils", functions);
+    return 1;
+}

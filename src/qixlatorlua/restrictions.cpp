@@ -1,0 +1,139 @@
+#include "qixlatorlua/restrictions.h"
+
+#include <cstdio>
+#include <cstring>
+#include <lua.hpp>
+
+// Nothing here owns anything: a Lua error jumps over the frames of these functions.
+
+namespace qixlatorlua {
+
+namespace {
+
+constexpr const char* noLoading = "dynamic libraries not enabled; check your Lua installation";
+
+int loadLibrary(lua_State* L) {
+    luaL_checkstring(L, 1);
+    luaL_checkstring(L, 2);
+    lua_pushnil(L);
+    lua_pushstring(L, noLoading);
+    lua_pushliteral(L, "absent");
+    return 3;
+}
+
+bool isReadable(const char* path) {
+    std::FILE* file = std::fopen(path, "r");
+    if (file != nullptr) {
+        std::fclose(file);
+    }
+    return file != nullptr;
+}
+
+// Pushes the native module's path in package.cpath, or else a list of all places looked at, and
+// returns whether there is one. `module` is the stack index of the module's name.
+bool pushNativeModule(lua_State* L, int module) {
+    luaL_gsub(L, lua_tostring(L, module), ".", LUA_DIRSEP);
+    const int fileName = lua_gettop(L);
+    lua_getfield(L, LUA_ENVIRONINDEX, "cpath");
+    const int path = lua_gettop(L);
+    if (lua_tostring(L, path) == nullptr) {
+        luaL_error(L, LUA_QL("package.cpath") " must be a string");
+    }
+    lua_pushliteral(L, "");
+    const char* next = lua_tostring(L, path);
+    while (*next != '\0') {
+        const std::size_t length = std::strcspn(next, LUA_PATHSEP);
+        if (length != 0) {
+            lua_pushlstring(L, next, length);
+            luaL_gsub(L, lua_tostring(L, -1), LUA_PATH_MARK, lua_tostring(L, fileName));
+            lua_remove(L, -2);
+            if (isReadable(lua_tostring(L, -1))) {
+                return true;
+            }
+            lua_pushfstring(L, "\n\tno file " LUA_QS, lua_tostring(L, -1));
+            lua_remove(L, -2);
+            lua_concat(L, 2);
+        }
+        next += next[length] == '\0' ? length : length + 1;
+    }
+    return false;
+}
+
+// Finds the native module whose name is at the stack index `module`: not at all, or in vain.
+int findNativeModule(lua_State* L, int module) {
+    if (pushNativeModule(L, module)) {
+        return luaL_error(L, "error loading module " LUA_QS " from file " LUA_QS ":\n\t%s",
+                          lua_tostring(L, 1), lua_tostring(L, -1), noLoading);
+    }
+    return 1;
+}
+
+int loadNativeModule(lua_State* L) {
+    luaL_checkstring(L, 1);
+    return findNativeModule(L, 1);
+}
+
+// The module may also be a part of a library named as the first word of its name.
+int loadFromRootModule(lua_State* L) {
+    const char* name = luaL_checkstring(L, 1);
+    const char* dot = std::strchr(name, '.');
+    if (dot == nullptr) {
+        return 0;
+    }
+    lua_pushlstring(L, name, static_cast<std::size_t>(dot - name));
+    return findNativeModule(L, lua_gettop(L));
+}
+
+int openProgram(lua_State* L) {
+    luaL_checkstring(L, 1);
+    luaL_optstring(L, 2, "r");
+    return luaL_error(L, LUA_QL("popen") " not supported");
+}
+
+int prompt(lua_State* L) {
+    char line[250];
+    for (;;) {
+        std::fputs("hlua_debug> ", stderr);
+        if (std::fgets(line, sizeof line, stdin) == nullptr || std::strcmp(line, "cont\n") == 0) {
+            return 0;
+        }
+        if (luaL_loadbuffer(L, line, std::strlen(line), "=(debug command)") != 0 ||
+            lua_pcall(L, 0, 0, 0) != 0) {
+            const char* message = lua_tostring(L, -1);
+            std::fprintf(stderr, "%s\n", message == nullptr ? "(no message)" : message);
+        }
+        lua_settop(L, 0);
+    }
+}
+
+// Stores a loader that sees the package table as its environment, as the interpreter's own do. The
+// package table lies below the table of loaders.
+void setLoader(lua_State* L, int index, lua_CFunction loader) {
+    lua_pushcfunction(L, loader);
+    lua_pushvalue(L, -3);
+    lua_setfenv(L, -2);
+    lua_rawseti(L, -2, index);
+}
+
+}  // namespace
+
+void disableNativeModules(lua_State* L) {
+    lua_pushcfunction(L, loadLibrary);
+    lua_setfield(L, -2, "loadlib");
+    lua_getfield(L, -1, "loaders");
+    setLoader(L, 3, loadNativeModule);
+    setLoader(L, 4, loadFromRootModule);
+    lua_pop(L, 1);
+}
+
+void disablePrograms(lua_State* L) {
+    lua_pushcfunction(L, openProgram);
+    lua_setfield(L, -2, "popen");
+}
+
+void renameDebugPrompt(lua_State* L) {
+    lua_pushcfunction(L, prompt);
+    lua_setfield(L, -2, "debug");
+}
+
+}  // namespace qixlatorlua

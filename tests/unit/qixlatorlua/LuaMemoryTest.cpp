@@ -1,0 +1,132 @@
+#include "qixlatorlua/LuaMemory.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdint>
+#include <cstring>
+#include <memory>
+#include <random>
+#include <vector>
+
+#include "support/FaultyAllocator.h"
+
+namespace {
+
+using qixlatorlua::allocatePlainly;
+using qixlatorlua::LuaArena;
+
+class LuaMemoryTest : public testing::Test {
+  protected:
+    void SetUp() override { FaultyAllocator::succeed(); }
+    void TearDown() override { FaultyAllocator::succeed(); }
+};
+
+struct Block {
+    unsigned char* bytes;
+    std::size_t size;
+    unsigned char filling;
+};
+
+bool isIntact(const Block& block, std::size_t size) {
+    for (std::size_t index = 0; index < size; ++index) {
+        if (block.bytes[index] != block.filling) {
+            return false;
+        }
+    }
+    return true;
+}
+
+TEST_F(LuaMemoryTest, BlocksKeepTheirContentThroughAnySequenceOfRequests) {
+    const std::int64_t before = FaultyAllocator::liveBlocks();
+    {
+        LuaArena arena;
+        std::mt19937 random(1);
+        std::vector<Block> blocks;
+        for (int step = 0; step < 20000; ++step) {
+            const std::size_t size = 1 + random() % (random() % 4 == 0 ? 3000 : 200);
+            const auto filling = static_cast<unsigned char>(step);
+            const std::size_t kind = random() % 3;
+            if (kind == 0 || blocks.empty()) {
+                auto* bytes =
+                    static_cast<unsigned char*>(LuaArena::allocate(&arena, nullptr, 0, size));
+                ASSERT_EQ(0u, reinterpret_cast<std::uintptr_t>(bytes) % 8);
+                std::memset(bytes, filling, size);
+                blocks.push_back({bytes, size, filling});
+                continue;
+            }
+            Block& block = blocks[random() % blocks.size()];
+            ASSERT_TRUE(isIntact(block, block.size));
+            if (kind == 1) {
+                auto* bytes = static_cast<unsigned char*>(
+                    LuaArena::allocate(&arena, block.bytes, block.size, size));
+                block.bytes = bytes;
+                ASSERT_TRUE(isIntact(block, std::min(block.size, size)));
+                std::memset(bytes, filling, size);
+                block = {bytes, size, filling};
+            } else {
+                LuaArena::allocate(&arena, block.bytes, block.size, 0);
+                block = blocks.back();
+                blocks.pop_back();
+            }
+        }
+        for (const Block& block : blocks) {
+            EXPECT_TRUE(isIntact(block, block.size));
+        }
+    }
+    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+}
+
+TEST_F(LuaMemoryTest, BlocksThatAreGivenBackAreUsedAgain) {
+    LuaArena arena;
+    for (int count = 0; count < 100000; ++count) {
+        void* small = LuaArena::allocate(&arena, nullptr, 0, 100);
+        void* large = LuaArena::allocate(&arena, nullptr, 0, 1000);
+        LuaArena::allocate(&arena, small, 100, 0);
+        LuaArena::allocate(&arena, large, 1000, 0);
+    }
+    EXPECT_GT(100000, FaultyAllocator::peakBytes() - FaultyAllocator::liveBytes());
+}
+
+TEST_F(LuaMemoryTest, WantOfMemoryIsANullAndLeavesTheOldBlock) {
+    LuaArena arena;
+    FaultyAllocator::failAt(0, FaultyAllocator::never);
+    EXPECT_EQ(nullptr, LuaArena::allocate(&arena, nullptr, 0, 100));
+    EXPECT_EQ(nullptr, LuaArena::allocate(&arena, nullptr, 0, 1000));
+    FaultyAllocator::succeed();
+    auto* block = static_cast<char*>(LuaArena::allocate(&arena, nullptr, 0, 1000));
+    std::memset(block, 'x', 1000);
+    FaultyAllocator::failAt(0, FaultyAllocator::never);
+    EXPECT_EQ(nullptr, LuaArena::allocate(&arena, block, 1000, 100000));
+    EXPECT_EQ('x', block[999]);
+}
+
+TEST_F(LuaMemoryTest, ShrinkingNeverFails) {
+    const std::int64_t before = FaultyAllocator::liveBlocks();
+    {
+        LuaArena arena;
+        void* block = LuaArena::allocate(&arena, nullptr, 0, 2000);
+        FaultyAllocator::failAt(0, FaultyAllocator::never);
+        block = LuaArena::allocate(&arena, block, 2000, 1000);
+        ASSERT_NE(nullptr, block);
+        block = LuaArena::allocate(&arena, block, 1000, 100);
+        ASSERT_NE(nullptr, block);
+        LuaArena::allocate(&arena, block, 100, 0);
+    }
+    FaultyAllocator::succeed();
+    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+}
+
+TEST_F(LuaMemoryTest, ThePlainWayAllocatesEachBlockByItself) {
+    const std::int64_t before = FaultyAllocator::liveBlocks();
+    void* first = allocatePlainly(nullptr, nullptr, 0, 10);
+    void* second = allocatePlainly(nullptr, nullptr, 0, 10);
+    EXPECT_EQ(before + 2, FaultyAllocator::liveBlocks());
+    first = allocatePlainly(nullptr, first, 10, 1000);
+    EXPECT_EQ(before + 2, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(nullptr, allocatePlainly(nullptr, first, 1000, 0));
+    EXPECT_EQ(nullptr, allocatePlainly(nullptr, second, 10, 0));
+    EXPECT_EQ(nullptr, allocatePlainly(nullptr, nullptr, 0, 0));
+    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+}
+
+}  // namespace
