@@ -1,0 +1,29 @@
+#include "qixlator/Registration.h"
+#include "qixlatorlua/LuaXlator.h"
+
+// Registers the translator of the service's own statuses, for the sessions of this program and for
+// other programs.
+
+namespace {
+
+constexpr const char* xlatorName = "mxlator_qitrmc";
+
+#define QIMXL_DRIVER_NAME "qitrmc"
+
+constexpr const char* registrationText =
+    "{\"qixlatorlua_xlator\":\"mxlator\",\"qixlatorlua_settings\":{\"driverName\":"
+    "\"" QIMXL_DRIVER_NAME
+    "\",\"qiSharedErrorsDir\":\"$_qiShared32Dir/errors\","
+    "\"MIErrorsDir\":\"$_qiShared32Dir/mierrors\"}}";
+
+XlatorInterface* create(const char* name, const char* registrationInfo, qierr_Status* status) {
+    return qixlatorlua::createLuaXlator(name, registrationInfo, qixlatorlua::LuaRuntime::fast,
+                                        status);
+}
+
+const qixlator::XlatorRegistration localRegistration(qixlator::localRegistrations(), xlatorName,
+                                                     registrationText, create);
+const qixlator::XlatorRegistration exportedRegistration(qixlator::exportedRegistrations(),
+                                                        xlatorName, nullptr, create);
+
+}  // namespace
