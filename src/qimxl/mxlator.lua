@@ -114,11 +114,14 @@ local function attributeTableNames(word, ade)
     return names
 end
 
+-- A value of JSON as text. One that is neither a string nor a number is its JSON text, since the
+-- interpreter would tell its address.
 local function textOf(value)
-    if value == cjson.null then
-        return "null"
+    local kind = type(value)
+    if kind == "string" or kind == "number" then
+        return tostring(value)
     end
-    return tostring(value)
+    return cjson.encode(value)
 end
 
 local function term(terms, key)
@@ -154,9 +157,12 @@ local function enumText(entry, value, attributes)
     return found and found.enums[textOf(value)] or textOf(value)
 end
 
--- The value of a usage entry as a text or an array of texts. Nil for a type that is not known, and
--- for an empty array, which would be encoded as an object.
+-- The value of a usage entry as a text or an array of texts. Nil where there is none, for a type that
+-- is not known, and for an empty array, which would be encoded as an object.
 local function usageValue(entry, attributes)
+    if entry.value == nil then
+        return nil
+    end
     local toText = plainText
     if type(entry.value_type) == "table" then
         if entry.value_type.type ~= "enum" then

@@ -17,15 +17,6 @@ std::atomic<std::int64_t> blocks{0};
 std::atomic<std::int64_t> bytes{0};
 std::atomic<std::int64_t> peak{0};
 
-bool mustFail() {
-    const std::uint64_t number = requestCount++;
-    if (number < firstFailure || number - firstFailure >= failureCount) {
-        return false;
-    }
-    failed = true;
-    return true;
-}
-
 void account(std::int64_t difference) {
     const std::int64_t now = bytes += difference;
     if (now > peak) {
@@ -44,7 +35,7 @@ void* qihtl_realloc(void* pointer, std::size_t size) {
         std::free(pointer);
         return nullptr;
     }
-    if (static_cast<std::int64_t>(size) > oldSize && mustFail()) {
+    if (static_cast<std::int64_t>(size) > oldSize && FaultyAllocator::nextFails()) {
         return nullptr;
     }
     void* moved = std::realloc(pointer, size);
@@ -63,6 +54,15 @@ void failAt(std::uint64_t first, std::uint64_t count) {
     requestCount = 0;
     failed = false;
     peak = bytes.load();
+}
+
+bool nextFails() {
+    const std::uint64_t number = requestCount++;
+    if (number < firstFailure || number - firstFailure >= failureCount) {
+        return false;
+    }
+    failed = true;
+    return true;
 }
 
 void succeed() {

@@ -3,7 +3,8 @@
 #include <cstdint>
 
 // Compiled into a test program, FaultyAllocator.cpp takes the place of the translators' allocator:
-// it counts the live blocks and fails on demand.
+// it counts the live blocks and fails on demand. A program that is linked with --wrap=calloc and
+// FaultyCalloc.cpp has the buffers of its statuses fail in the same count.
 namespace FaultyAllocator {
 
 constexpr std::uint64_t never = ~std::uint64_t{0};
@@ -13,6 +14,8 @@ constexpr std::uint64_t never = ~std::uint64_t{0};
 void failAt(std::uint64_t first, std::uint64_t count = 1);
 void succeed();
 
+// Counts a request of another allocator: whether it must fail.
+bool nextFails();
 // Requests since the last call of failAt or succeed.
 std::uint64_t requests();
 // Whether a request was made to fail since then.

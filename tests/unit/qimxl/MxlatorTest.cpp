@@ -211,7 +211,14 @@ TEST_F(MxlatorTest, AnUnknownValueTypeShowsNoValue) {
     EXPECT_EQ("usage|x|-\n", usageItem(usage("x", "3", "{\"type\":\"other\"}")));
 }
 
-TEST_F(MxlatorTest, AnEmptyArrayShowsNoValue) {
+TEST_F(MxlatorTest, OtherValuesAreShownAsTheirJsonText) {
+    EXPECT_EQ("usage|x|true\n", usageItem(usage("x", "true", "\"bool\"")));
+    EXPECT_EQ("usage|x|null\n", usageItem(usage("x", "null", "\"string\"")));
+    EXPECT_EQ("usage|x|[\"[1]\",\"a\"]\n", usageItem(usage("x", "[[1],\"a\"]", "\"string\"")));
+}
+
+TEST_F(MxlatorTest, AnEmptyArrayOrNoneShowsNoValue) {
+    EXPECT_EQ("usage|Name|-\n", usageItem("{\"type\":\"usage\",\"usage\":\"kUsageTypeName\"}"));
     EXPECT_EQ("usage|x|-\n", usageItem(usage("x", "[]", "\"string\"")));
 }
 

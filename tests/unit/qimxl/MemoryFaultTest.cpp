@@ -1,0 +1,142 @@
+#include <gtest/gtest.h>
+
+#include <string>
+
+#include "StatusTexts.h"
+#include "qierr/Writer.h"
+#include "qixlator/Registration.h"
+#include "qixlator/json1.h"
+#include "qixlator/qixlator.h"
+#include "qixlatorlua/LuaXlator.h"
+#include "support/FaultyAllocator.h"
+#include "support/TestRoot.h"
+
+namespace {
+
+using qixlatorlua::LuaRuntime;
+
+// Lets each single allocation of a translation fail, one after another, and each one and all that
+// follow it. The process goes on, nothing leaks, and there is a failure or a text.
+class MemoryFaultTest : public testing::Test {
+  protected:
+    MemoryFaultTest() {
+        root.write("/etc/qinstal/share/share.dir", root.locate("/shared"));
+        root.write("/shared/mierrors/qitrmc/English/a.txt",
+                   "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"-1\">\nText.\n"
+                   "</qierror>\n</qidocument>\n");
+        qierr_Status_setCode(&source, -1);
+        const std::string entry =
+            statusTexts::usage("kUsageTypeReservedBySessions", "[\"a\",\"b\"]", "\"string\"");
+        const std::string outer = statusTexts::withEntries(entry);
+        const std::string json = outer.substr(0, outer.size() - 1) +
+                                 ",\"nested_error\":[{\"code\":-1,\"translator\":"
+                                 "\"mxlator_qitrmc\"}]}";
+        qierr_Status_setJson(&source, json.c_str());
+        translateWholly();  // what is made once in the process is made now
+    }
+    ~MemoryFaultTest() override { FaultyAllocator::succeed(); }
+
+    // The road of the service: a session, the raw text, the end of the session.
+    void translateWholly() {
+        failureCode = 0;
+        text.clear();
+        qierr::Status failure;
+        qixlator::Session* session = qixlator_createSession(&failure);
+        if (session != nullptr) {
+            qihtl::String raw;
+            qixlator::json1::translateErrStatusToRawText(session, &source, 0x200, 15, &raw,
+                                                         &failure);
+            text.assign(raw.c_str(), raw.length());
+        }
+        qixlator_destroySession(session);
+        failureCode = failure.code;
+    }
+
+    // One translator of its own, which is asked for both descriptions.
+    void askTranslator(LuaRuntime runtime) {
+        text.clear();
+        qierr::Status failure;
+        XlatorInterface* xlator = qixlatorlua::createLuaXlator(
+            "mxlator_qitrmc", qixlator::localRegistrations().next->registrationInfo, runtime,
+            &failure);
+        if (xlator != nullptr) {
+            take(xlator->getStaticDesc(xlator, -1, 0x200, qixlator_realloc, nullptr, &failure));
+            take(xlator->getDynamicDesc(xlator, source.json, 0x200, "json1", qixlator_realloc,
+                                        nullptr, &failure));
+            xlator->destroy(xlator);
+        }
+        failureCode = failure.code;
+    }
+
+    void take(char* description) {
+        text += description == nullptr ? "" : description;
+        qixlator_realloc(description, 0, nullptr, nullptr);
+    }
+
+    // Runs `action` with `count` requests failing from each request on, `step` apart; the number of
+    // requests that it makes.
+    template <typename Action>
+    std::uint64_t failEach(Action action, std::uint64_t count, std::uint64_t step = 1) {
+        for (std::uint64_t number = 0;; number += step) {
+            const std::int64_t blocks = FaultyAllocator::liveBlocks();
+            FaultyAllocator::failAt(number, count);
+            action();
+            const bool failed = FaultyAllocator::hasFailed();
+            FaultyAllocator::succeed();
+            EXPECT_EQ(blocks, FaultyAllocator::liveBlocks()) << "request " << number;
+            EXPECT_TRUE(failureCode < 0 || !text.empty()) << "request " << number;
+            if (!failed || HasFailure()) {
+                EXPECT_EQ(0, failureCode);
+                return number;
+            }
+        }
+    }
+
+    TestRoot root;
+    qierr::Status source;
+    std::int32_t failureCode = 0;
+    std::string text;
+};
+
+TEST_F(MemoryFaultTest, ATranslationSurvivesEachSingleFailure) {
+    EXPECT_LT(100u, failEach([this] { translateWholly(); }, 1));
+    EXPECT_EQ(0u, text.find("Text.\n\nReserved by Sessions: a, b\n")) << text;
+}
+
+TEST_F(MemoryFaultTest, ATranslationSurvivesTheEndOfAllMemoryAtEachPoint) {
+    EXPECT_LT(100u, failEach([this] { translateWholly(); }, FaultyAllocator::never));
+}
+
+TEST_F(MemoryFaultTest, APlainTranslatorSurvivesEachSingleFailure) {
+    const std::uint64_t count = failEach([this] { askTranslator(LuaRuntime::plain); }, 1);
+    EXPECT_LT(1000u, count);
+    RecordProperty("requests", std::to_string(count));
+}
+
+TEST_F(MemoryFaultTest, WantOfMemoryIsReportedAsTheInterpretersFailure) {
+    FaultyAllocator::failAt(2000, FaultyAllocator::never);
+    qierr::Status failure;
+    EXPECT_EQ(nullptr, qixlatorlua::createLuaXlator(
+                           "n", qixlator::localRegistrations().next->registrationInfo,
+                           LuaRuntime::plain, &failure));
+    EXPECT_TRUE(FaultyAllocator::hasFailed());
+    EXPECT_EQ(-52003, failure.code);
+}
+
+TEST_F(MemoryFaultTest, AStateThatCannotBeMadeIsReported) {
+    for (const LuaRuntime runtime : {LuaRuntime::plain, LuaRuntime::fast}) {
+        // The first request is for the translator itself.
+        FaultyAllocator::failAt(1);
+        qierr::Status failure;
+        EXPECT_EQ(nullptr, qixlatorlua::createLuaXlator("n", "{}", runtime, &failure));
+        FaultyAllocator::succeed();
+        EXPECT_EQ(-52000, failure.code);
+        ASSERT_NE(nullptr, failure.json);
+        EXPECT_NE(std::string::npos,
+                  std::string(failure.json)
+                      .find("\"qixlatorlua_debug\":{\"debug\":\"failed to create lua state\"}"))
+            << failure.json;
+    }
+}
+
+}  // namespace
