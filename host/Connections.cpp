@@ -73,7 +73,7 @@ void Connections::shutOverdue() noexcept {
     const uint32_t now = secondsNow();
     for (const Connection& connection : open) {
         const uint32_t since = connection.waitingSince.load(std::memory_order_relaxed);
-        if (since != kNotWaiting && now - since > limit && since <= now)
+        if (since != kNotWaiting && since < now && now - since > limit)
             shutdown(connection.socket, SHUT_RDWR);
     }
 }

@@ -13,7 +13,7 @@ namespace host {
 
 namespace {
 
-// Holds the service's deepest recursion with much room; 512 of them fit a 32-bit address space.
+// A quarter of what a main thread has; 512 of them fit a 32-bit address space.
 constexpr std::size_t kStackSize = 2 * 1024 * 1024;
 
 // The library closes a connection beyond its limit at once, so its limit stays above ours: a client

@@ -40,7 +40,7 @@ class Host:
     files      contents of files, by path below the temporary directory, laid out before the start
 
     Attributes: process (subprocess.Popen), directory (temporary pathlib.Path, also the working
-    directory; gone after stop()), first_line (what it printed on stdout).
+    directory; gone after kill()), first_line (what it printed on stdout).
     """
 
     def __init__(self, build_dir=None, plugin=None, options=(), env=None, files=None):
@@ -120,17 +120,10 @@ class Host:
     def stop(self):
         """Ends the host as a service manager does. Returns its exit status."""
         self.process.send_signal(signal.SIGTERM)
-        return self.wait()
-
-    def wait(self):
-        """Waits for the end of a host that has been told to end. Returns its exit status."""
-        try:
-            return self.process.wait(PATIENCE)
-        finally:
-            self.kill()
+        return self.process.wait(PATIENCE)
 
     def kill(self):
-        """Leaves nothing behind, whatever state the host is in."""
+        """Leaves nothing behind, whatever state the host is in. May be called again."""
         self.process.kill()
         self.process.wait()
         self.process.stdout.close()

@@ -7,13 +7,14 @@
 
 #include <chrono>
 #include <functional>
+#include <future>
 
 namespace {
 
 using host::Connection;
 using host::Connections;
 
-constexpr int kMomentInMilliseconds = 20;
+constexpr std::chrono::milliseconds kMoment(20);
 
 // Two connected sockets: the host's and its client's.
 class Pair {
@@ -28,7 +29,7 @@ class Pair {
     // Whether the client sees the end of the connection within a moment.
     bool isShut() const {
         pollfd client = {ends[1], POLLIN, 0};
-        return poll(&client, 1, kMomentInMilliseconds) == 1;
+        return poll(&client, 1, static_cast<int>(kMoment.count())) == 1;
     }
 
   private:
@@ -89,6 +90,30 @@ TEST(Connections, ShutAWaitingConnectionSoonerWhenAllPlacesAreTaken) {
     const double seconds = shutOverdueUntil(connections, [&] { return first.isShut(); });
     EXPECT_GE(seconds, 2.0);
     EXPECT_FALSE(second.isShut());
+}
+
+TEST(Connections, HaveAPlaceUntilAsManyAreOpenAsTheHostTakes) {
+    const Pair first;
+    const Pair second;
+    Connections connections(2, 1);
+    connections.add(first.host());
+    EXPECT_TRUE(connections.waitForPlace());
+    Connection* last = connections.add(second.host());
+    std::future<bool> place =
+        std::async(std::launch::async, [&] { return connections.waitForPlace(); });
+    EXPECT_EQ(place.wait_for(kMoment), std::future_status::timeout);
+    connections.remove(last);
+    EXPECT_TRUE(place.get());
+}
+
+TEST(Connections, EndTheWaitForAPlaceWhenTheyAreClosed) {
+    const Pair pair;
+    Connections connections(1, 1);
+    connections.add(pair.host());
+    std::future<bool> place =
+        std::async(std::launch::async, [&] { return connections.waitForPlace(); });
+    connections.close();
+    EXPECT_FALSE(place.get());
 }
 
 TEST(Connections, ForgetAConnectionThatIsRemoved) {

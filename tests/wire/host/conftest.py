@@ -10,7 +10,10 @@ from hostlib import BUILD_DIR, TEST_PLUGIN, Host
 
 @pytest.fixture
 def start_host():
-    """Starts hosts of the test plug-in with further options and environment; ends them all."""
+    """Starts hosts of the test plug-in with further options and environment.
+
+    Those that still run at the end of the test must end well, and none may have met a sanitizer.
+    """
     hosts = []
 
     def start(*options, **env):
@@ -18,8 +21,13 @@ def start_host():
         return hosts[-1]
 
     yield start
-    for host in hosts:
-        host.kill()
+    try:
+        for host in hosts:
+            assert host.process.poll() is not None or host.stop() == 0, host.stderr
+            assert "Sanitizer" not in host.stderr, host.stderr
+    finally:
+        for host in hosts:
+            host.kill()
 
 
 @pytest.fixture

@@ -11,7 +11,7 @@ import time
 
 import pytest
 
-from hostlib import BUILD_DIR, PATIENCE, TEST_PLUGIN, Host
+from hostlib import BUILD_DIR, PATIENCE, TEST_PLUGIN
 
 
 def read_response(client):
@@ -329,17 +329,39 @@ def is_sanitized():
     return "QITRMC_SANITIZE:STRING=\n" not in (BUILD_DIR / "CMakeCache.txt").read_text()
 
 
-@pytest.mark.skipif(is_sanitized(), reason="a sanitizer's memory cannot be limited")
+needs_memory_limit = pytest.mark.skipif(is_sanitized(),
+                                        reason="a sanitizer's memory cannot be limited")
+
+
+def limit_memory(host, size):
+    resource.prlimit(host.process.pid, resource.RLIMIT_AS, (size, resource.RLIM_INFINITY))
+
+
+@needs_memory_limit
 @pytest.mark.parametrize("entry, body", [
     ("Echo", b"x" * 300_000_000), ("Much", b"300000000"),
 ], ids=["request", "response"])
 def test_want_of_memory_fails_one_request_only(start_host, entry, body):
     host = start_host("--max-body", "4294967295")
-    limit = 300 * 1024 * 1024
-    resource.prlimit(host.process.pid, resource.RLIMIT_AS, (limit, limit))
+    limit_memory(host, 300 * 1024 * 1024)
     try:
         assert host.post(body, entry)[0] == 500
     except (ConnectionResetError, BrokenPipeError, http.client.RemoteDisconnected):
         pass
     assert host.post(b"abc", "Echo")[2] == b"abc"
     assert host.stop() == 0
+
+
+@needs_memory_limit
+def test_clients_that_get_no_thread_take_no_place(start_host):
+    host = start_host("--threads", "2")
+    with host.raw_socket() as holder:
+        holder.sendall(raw_post("Echo", b"abc"))
+        assert read_response(holder) == (200, b"abc")
+        limit_memory(host, 1)
+        for _ in range(10):
+            with host.raw_socket() as client, contextlib.suppress(ConnectionResetError):
+                client.sendall(raw_post("Echo", b"abc"))
+                assert client.recv(1000) == b""
+        limit_memory(host, resource.RLIM_INFINITY)
+        assert host.post(b"abc", "Echo")[2] == b"abc"
