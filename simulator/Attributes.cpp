@@ -21,13 +21,13 @@ struct Entry {
 };
 
 Elements oneText(const std::string& text) {
-    return std::vector<std::string>{text};
+    return List<std::string>{text};
 }
 Elements oneText(const std::optional<Elements>& limit) {
     return oneText(limit ? firstText(*limit) : std::string());
 }
 Elements oneFlag(bool flag) {
-    return std::vector<uint8_t>{flag};
+    return List<uint8_t>{flag};
 }
 
 bool isPending(const Resource& resource, const std::string& name) {
@@ -67,11 +67,11 @@ Elements itemNumbers(const Subject& subject) {
 constexpr Entry entries[] = {
     {"Prop.DataType", DataType::int32, false,
      [](const Subject& subject) -> Elements {
-         return std::vector<int32_t>{static_cast<int32_t>(subject.definition().type)};
+         return List<int32_t>{static_cast<int32_t>(subject.definition().type)};
      }},
     {"Prop.Access", DataType::int32, false,
      [](const Subject& subject) -> Elements {
-         return std::vector<int32_t>{static_cast<int32_t>(subject.definition().access)};
+         return List<int32_t>{static_cast<int32_t>(subject.definition().access)};
      }},
     {"Prop.PendingChanges", DataType::boolean, false, pendingChanges},
     {"Prop.IsEnum", DataType::boolean, false,

@@ -21,9 +21,9 @@ Integer sum(Integer left, Integer right) {
 void addNumber(Elements& value, const Elements& added) {
     std::visit(
         [&](auto& list) {
-            using List = std::decay_t<decltype(list)>;
-            if constexpr (!std::is_same_v<List, std::vector<std::string>>) {
-                list.front() = sum(list.front(), std::get<List>(added).front());
+            using Items = std::decay_t<decltype(list)>;
+            if constexpr (!std::is_same_v<Items, List<std::string>>) {
+                list.front() = sum(list.front(), std::get<Items>(added).front());
             }
         },
         value);

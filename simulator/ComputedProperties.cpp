@@ -66,7 +66,7 @@ Value slotNumber(const Subject& subject) {
     if (!isModule(subject.device())) {
         return std::nullopt;
     }
-    return std::vector<uint32_t>{subject.device().slot};
+    return List<uint32_t>{subject.device().slot};
 }
 
 constexpr Entry entries[] = {
@@ -74,7 +74,7 @@ constexpr Entry entries[] = {
      [](const Subject& subject) -> Value { return namesOf(subject.simulator.chassis->devices()); }},
     {Category::system, "Sys.ConfigChangeCount",
      [](const Subject& subject) -> Value {
-         return std::vector<uint64_t>{subject.simulator.chassis->changes};
+         return List<uint64_t>{subject.simulator.chassis->changes};
      }},
     {Category::system, "Sys.SystemProperties", propertyNames<Category::system>},
     {Category::system, "Sys.SessionProperties", propertyNames<Category::session>},
@@ -94,13 +94,9 @@ constexpr Entry entries[] = {
     {Category::session, "Session.DefaultNVMEMAreas",
      [](const Subject& subject) -> Value { return namesOf(subject.session.defaultNvmemAreas); }},
     {Category::device, "Dev.Name",
-     [](const Subject& subject) -> Value {
-         return std::vector<std::string>{subject.device().name};
-     }},
+     [](const Subject& subject) -> Value { return List<std::string>{subject.device().name}; }},
     {Category::device, "Dev.ProductCategory",
-     [](const Subject& subject) -> Value {
-         return std::vector<int32_t>{subject.device().category};
-     }},
+     [](const Subject& subject) -> Value { return List<int32_t>{subject.device().category}; }},
     {Category::device, "Dev.Modules", modules},
     {Category::device, "Dev.SlotNum", slotNumber},
     {Category::device, "Dev.PhysChans",
@@ -112,25 +108,21 @@ constexpr Entry entries[] = {
     {Category::physChan, "PhysChan.Properties", ownPropertyNames},
     {Category::physChan, "PhysChan.Commands", commandNames},
     {Category::nvmemArea, "NVMEMArea.Size",
-     [](const Subject& subject) -> Value {
-         return std::vector<uint32_t>{subject.memory().size()};
-     }},
+     [](const Subject& subject) -> Value { return List<uint32_t>{subject.memory().size()}; }},
     {Category::nvmemArea, "NVMEMArea.Writable",
      [](const Subject& subject) -> Value {
-         return std::vector<uint8_t>{subject.memory().guardian().writable};
+         return List<uint8_t>{subject.memory().guardian().writable};
      }},
     {Category::nvmemArea, "NVMEMArea.SerialNumWanted",
      [](const Subject& subject) -> Value {
-         return std::vector<uint8_t>{subject.memory().guardian().wantsSerialNumber};
+         return List<uint8_t>{subject.memory().guardian().wantsSerialNumber};
      }},
     {Category::nvmemArea, "NVMEMArea.PasswordWanted",
      [](const Subject& subject) -> Value {
-         return std::vector<uint8_t>{!subject.memory().guardian().password.empty()};
+         return List<uint8_t>{!subject.memory().guardian().password.empty()};
      }},
     {Category::nvmemArea, "NVMEMArea.PendingChanges",
-     [](const Subject& subject) -> Value {
-         return std::vector<uint8_t>{subject.memory().hasPending()};
-     }},
+     [](const Subject& subject) -> Value { return List<uint8_t>{subject.memory().hasPending()}; }},
 };
 
 std::string joined(const std::vector<std::string>& names) {

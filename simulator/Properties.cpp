@@ -15,9 +15,9 @@ std::optional<size_t> PropertyDefinition::firstOutOfRange(const Elements& value)
     }
     return std::visit(
         [&](const auto& list) -> std::optional<size_t> {
-            using List = std::decay_t<decltype(list)>;
-            const auto* low = least ? &std::get<List>(*least).front() : nullptr;
-            const auto* high = most ? &std::get<List>(*most).front() : nullptr;
+            using Items = std::decay_t<decltype(list)>;
+            const auto* low = least ? &std::get<Items>(*least).front() : nullptr;
+            const auto* high = most ? &std::get<Items>(*most).front() : nullptr;
             for (size_t i = 0; i < list.size(); ++i) {
                 // Written so that what is not a number is outside too.
                 const bool inside =
@@ -35,7 +35,7 @@ std::optional<size_t> PropertyDefinition::firstWithoutItem(const Elements& value
     if (enumeration == nullptr) {
         return std::nullopt;
     }
-    const auto& numbers = std::get<std::vector<int32_t>>(value);
+    const auto& numbers = std::get<List<int32_t>>(value);
     for (size_t i = 0; i < numbers.size(); ++i) {
         if (!enumeration->has(numbers[i])) {
             return i;

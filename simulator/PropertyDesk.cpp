@@ -123,7 +123,7 @@ void PropertyDesk::expectAcceptable(const Place& place, const Elements& value) c
     }
     if (const auto index = definition.firstWithoutItem(value)) {
         throw about(code::valueNotEnumerated, definition)
-            .usageEnum(tag::requestedValue, std::get<std::vector<int32_t>>(value)[*index],
+            .usageEnum(tag::requestedValue, std::get<List<int32_t>>(value)[*index],
                        definition.enumeration->id);
     }
     if (const auto index = definition.firstOutOfRange(value)) {
@@ -149,7 +149,7 @@ void PropertyDesk::writeAll(const std::vector<Place>& places, DataType type,
     for (size_t i = 0; i < places.size(); ++i) {
         if (places[i].stored == nullptr) {
             setDefaultResources(simulator.resolver(session), session, places[i].definition->name,
-                                std::get<std::vector<std::string>>(parts[i]));
+                                std::get<List<std::string>>(parts[i]));
         } else if (places[i].definition->needsCommit) {
             places[i].stored->pending = Property::Pending{std::move(parts[i]), session.handle};
         } else {

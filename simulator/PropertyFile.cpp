@@ -18,34 +18,34 @@ constexpr std::array<std::pair<const char*, Category>, 5> categories{{
     {"nvmem_area", Category::nvmemArea},
 }};
 
-void readElement(const Node& node, std::vector<uint8_t>& list) {
+void readElement(const Node& node, List<uint8_t>& list) {
     node.expect(node.json().IsBool(), "true or false");
     list.push_back(node.json().GetBool() ? 1 : 0);
 }
 
-void readElement(const Node& node, std::vector<double>& list) {
+void readElement(const Node& node, List<double>& list) {
     node.expect(node.json().IsNumber(), "a number");
     list.push_back(node.json().GetDouble());
 }
 
-void readElement(const Node& node, std::vector<int32_t>& list) {
+void readElement(const Node& node, List<int32_t>& list) {
     list.push_back(node.signedNumber());
 }
 
-void readElement(const Node& node, std::vector<int64_t>& list) {
+void readElement(const Node& node, List<int64_t>& list) {
     node.expect(node.json().IsInt64(), "a whole number of 64 bits");
     list.push_back(node.json().GetInt64());
 }
 
-void readElement(const Node& node, std::vector<std::string>& list) {
+void readElement(const Node& node, List<std::string>& list) {
     list.push_back(node.text());
 }
 
-void readElement(const Node& node, std::vector<uint32_t>& list) {
+void readElement(const Node& node, List<uint32_t>& list) {
     list.push_back(node.unsignedNumber(0, UINT32_MAX));
 }
 
-void readElement(const Node& node, std::vector<uint64_t>& list) {
+void readElement(const Node& node, List<uint64_t>& list) {
     node.expect(node.json().IsUint64(), "a whole number of 64 bits, not below 0");
     list.push_back(node.json().GetUint64());
 }
@@ -54,7 +54,7 @@ void readItem(const Enumeration& enumeration, const Node& node, Elements& elemen
     const std::string name = node.text();
     for (const auto& [item, number] : enumeration.items) {
         if (item == name) {
-            std::get<std::vector<int32_t>>(elements).push_back(number);
+            std::get<List<int32_t>>(elements).push_back(number);
             return;
         }
     }

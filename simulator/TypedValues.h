@@ -14,22 +14,22 @@ namespace simulator {
 
 template <typename Number>
 void lendScalar(const Elements& elements, Number* value) {
-    *value = std::get<std::vector<Number>>(elements).front();
+    *value = std::get<List<Number>>(elements).front();
 }
 
 inline void lendScalar(const Elements& elements, char** value) {
-    *value = lendText(std::get<std::vector<std::string>>(elements).front());
+    *value = lendText(std::get<List<std::string>>(elements).front());
 }
 
 template <typename Number>
 void lendArray(const Elements& elements, Number** array, uint32_t* count) {
-    const auto& list = std::get<std::vector<Number>>(elements);
+    const auto& list = std::get<List<Number>>(elements);
     *array = lendNumbers(list);
     *count = static_cast<uint32_t>(list.size());
 }
 
 inline void lendArray(const Elements& elements, char*** array, uint32_t* count) {
-    const auto& list = std::get<std::vector<std::string>>(elements);
+    const auto& list = std::get<List<std::string>>(elements);
     *array = lendTexts(list);
     *count = static_cast<uint32_t>(list.size());
 }
@@ -49,7 +49,7 @@ inline std::string asElement(const char* value) {
 
 template <typename Value>
 Elements asElements(Value value) {
-    return std::vector<decltype(asElement(value))>{asElement(value)};
+    return List<decltype(asElement(value))>{asElement(value)};
 }
 
 template <typename Value>
@@ -57,7 +57,7 @@ Elements asElements(const Value* array, uint32_t count) {
     if (array == nullptr && count != 0) {
         throw Refusal(code::missingArgument).usage(tag::argument, "array");
     }
-    std::vector<decltype(asElement(*array))> list;
+    List<decltype(asElement(*array))> list;
     list.reserve(count);
     for (uint32_t i = 0; i < count; ++i) {
         list.push_back(asElement(array[i]));

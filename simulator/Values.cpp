@@ -60,19 +60,19 @@ std::optional<DataType> typeNamed(std::string_view name) {
 Elements noElements(DataType type) {
     switch (elementType(type)) {
         case DataType::boolean:
-            return std::vector<uint8_t>();
+            return List<uint8_t>();
         case DataType::real:
-            return std::vector<double>();
+            return List<double>();
         case DataType::int32:
-            return std::vector<int32_t>();
+            return List<int32_t>();
         case DataType::int64:
-            return std::vector<int64_t>();
+            return List<int64_t>();
         case DataType::uint32:
-            return std::vector<uint32_t>();
+            return List<uint32_t>();
         case DataType::uint64:
-            return std::vector<uint64_t>();
+            return List<uint64_t>();
         default:
-            return std::vector<std::string>();
+            return List<std::string>();
     }
 }
 

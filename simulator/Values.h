@@ -4,6 +4,7 @@
 #include <optional>
 #include <string>
 #include <string_view>
+#include <utility>
 #include <variant>
 #include <vector>
 
@@ -35,11 +36,18 @@ DataType arrayType(DataType type);
 std::string typeName(DataType type);
 std::optional<DataType> typeNamed(std::string_view name);
 
+// The elements of one value. It is a type of its own because a std::variant of vectors alone does
+// not survive a copy that runs out of memory: the library takes it for one that always has a value.
+template <typename Item>
+struct List : std::vector<Item> {
+    using std::vector<Item>::vector;
+    List(std::vector<Item> items) : std::vector<Item>(std::move(items)) {}
+};
+
 // A value of any type. The alternatives stand in the order of the scalar types; a scalar is a list
 // of one. Booleans are 0 or 1.
-using Elements = std::variant<std::vector<uint8_t>, std::vector<double>, std::vector<int32_t>,
-                              std::vector<int64_t>, std::vector<std::string>, std::vector<uint32_t>,
-                              std::vector<uint64_t>>;
+using Elements = std::variant<List<uint8_t>, List<double>, List<int32_t>, List<int64_t>,
+                              List<std::string>, List<uint32_t>, List<uint64_t>>;
 
 // No elements, of the alternative that belongs to a scalar or array type.
 Elements noElements(DataType type);

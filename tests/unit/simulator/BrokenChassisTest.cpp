@@ -142,4 +142,109 @@ TEST(BrokenChassisTest, DeepNestingIsReadWithoutHarm) {
     EXPECT_EQ(openWith(file.path).output.substr(0, 8), "-250952\n");
 }
 
+void expectPropertyFault(const std::string& members, const std::string& place,
+                         const std::string& words) {
+    expectFault(device(",\"properties\":{\"P\":{" + members + "}}"),
+                "/devices/0/properties/P" + place, words);
+}
+
+TEST(BrokenChassisTest, PropertiesThatMakeNoSenseAreRefused) {
+    expectPropertyFault("\"type\":\"Float\"", "/type",
+                        "has the wrong type or range; must be Bool, Double, Int32, Int64, String, "
+                        "UInt32 or UInt64, or one of these with Array behind it");
+    expectPropertyFault("\"type\":\"Bool\"", "", "has no value; must give a value");
+    expectPropertyFault("\"type\":\"UInt32\",\"value\":-1", "/value",
+                        "has the wrong type or range; "
+                        "must be a whole number from 0 to 4294967295");
+    expectPropertyFault("\"type\":\"Int32\",\"max\":4,\"value\":5", "/value",
+                        "is out of range; must be within the limits of the property");
+    expectPropertyFault("\"type\":\"String\",\"min\":1,\"value\":\"\"", "/min",
+                        "limits what is no number; only numbers have limits");
+    expectPropertyFault("\"type\":\"Int32\",\"enum\":\"E\",\"value\":5", "/enum",
+                        "is not a known enumeration; must be a member of /enums");
+    expectPropertyFault("\"type\":\"BoolArray\",\"value\":[true,1]", "/value/1",
+                        "has the wrong type or range; must be true or false");
+    expectPropertyFault("\"type\":\"Bool\",\"access\":\"None\",\"value\":true", "/access",
+                        "has the wrong type or range; "
+                        "must be ReadOnly, WriteOnly or ReadWrite");
+    expectPropertyFault("\"type\":\"Bool\",\"computed\":true,\"value\":true", "",
+                        "claims to be computed; only built-in properties are computed");
+    expectPropertyFault("\"type\":\"String\",\"value\":\"a\\u0000b\"", "/value",
+                        "holds a NUL character; texts must not hold one");
+}
+
+TEST(BrokenChassisTest, AnItemThatTheEnumerationLacksIsRefused) {
+    expectFault(
+        "{\"enums\":{\"E\":{\"On\":1}},\"devices\":[{\"name\":\"A\",\"category\":2,"
+        "\"properties\":{\"P\":{\"type\":\"Int32\",\"enum\":\"E\",\"value\":\"Off\"}}}]}",
+        "/devices/0/properties/P/value", "is not an item of the enumeration; must be an item of E");
+    expectFault(
+        "{\"enums\":{\"E\":{\"On\":1}},\"devices\":[{\"name\":\"A\",\"category\":2,"
+        "\"properties\":{\"P\":{\"type\":\"Int32\",\"enum\":\"E\",\"value\":2}}}]}",
+        "/devices/0/properties/P/value", "is not an item of the enumeration; must be an item of E");
+}
+
+TEST(BrokenChassisTest, DriverPropertiesKeepTheirMeaning) {
+    expectFault(device(",\"properties\":{\"Dev.Name\":{\"type\":\"Bool\",\"value\":true}}"),
+                "/devices/0/properties/Dev.Name",
+                "is no name for a property of its own; "
+                "must not be empty, nor a property that there is already");
+    expectFault(device(",\"values\":{\"Dev.Name\":\"B\"}"), "/devices/0/values/Dev.Name",
+                "is not a property whose value can be given; "
+                "must be a stored property that the driver defines for this kind");
+    expectFault(
+        "{\"driver_properties\":{\"device\":{\"Dev.Name\":{\"type\":\"Bool\"}}},"
+        "\"devices\":[]}",
+        "/driver_properties/device/Dev.Name", "is defined already; each property is defined once");
+    expectFault(
+        "{\"driver_properties\":{\"system\":{\"Sys.A\":{\"type\":\"Bool\","
+        "\"needs_commit\":true}}},\"devices\":[]}",
+        "/driver_properties/system/Sys.A",
+        "can never be committed; only properties of resources are committed");
+}
+
+TEST(BrokenChassisTest, CommandsActOnWhatIsThere) {
+    expectFault(device(",\"commands\":{\"C\":{\"sets\":{\"P\":1}}}"),
+                "/devices/0/commands/C/sets/P",
+                "is not a stored property of the resource; "
+                "a command changes properties of its own resource");
+    expectFault(device(",\"commands\":{\"C\":{\"adds\":{\"Dev.Comment\":1}}}"),
+                "/devices/0/commands/C/adds/Dev.Comment",
+                "cannot be added to; only single numbers can");
+    expectFault(device(",\"commands\":{\"C\":{\"seconds\":-1}}"), "/devices/0/commands/C/seconds",
+                "has the wrong type or range; must be a time in seconds, from 0 to a day");
+}
+
+TEST(BrokenChassisTest, RegistersDoNotOverlap) {
+    expectFault(device(",\"registers\":[{\"address\":0,\"size\":8},"
+                       "{\"address\":7,\"size\":1}]"),
+                "/devices/0/registers/1",
+                "overlaps other registers or the end of the addresses; "
+                "each address may stand for one register");
+    expectFault(device(",\"registers\":[{\"address\":4294967295,\"size\":2}]"),
+                "/devices/0/registers/0",
+                "overlaps other registers or the end of the addresses; "
+                "each address may stand for one register");
+}
+
+TEST(BrokenChassisTest, BytesAreGivenInHexadecimalDigits) {
+    const auto block = [](const std::string& bytes) {
+        return device(",\"registers\":[{\"address\":0,\"size\":2,\"bytes\":\"" + bytes + "\"}]");
+    };
+    const std::string place = "/devices/0/registers/0/bytes";
+    expectFault(block("0g"), place, "has the wrong type or range; must be hexadecimal digits");
+    expectFault(block("000"), place,
+                "has the wrong length; must be two digits for each byte, at most size");
+    expectFault(block("000000"), place,
+                "has the wrong length; must be two digits for each byte, at most size");
+}
+
+TEST(BrokenChassisTest, AGuardedAreaNeedsASerialNumberToCompareWith) {
+    expectFault(device(",\"nvmem_areas\":[{\"name\":\"u\",\"size\":1,"
+                       "\"serial_number_wanted\":true}]"),
+                "/devices/0/nvmem_areas/0/serial_number_wanted",
+                "asks for a serial number that is not there; "
+                "the device must have a value for Dev.SerialNum");
+}
+
 }  // namespace

@@ -225,4 +225,103 @@ TEST(WaitTest, HundredsOfThreadsWaitForOneDevice) {
     }
 }
 
+int32_t execute(Session& session, const char* resources, const char* command, double timeout) {
+    Status status;
+    nQITRMCAPI100_executeGenericCommand(session, resources, command, timeout, &status);
+    return status.code;
+}
+
+TEST(WaitTest, AbortEndsACommandWithoutItsEffect) {
+    Session session("Mod1");
+    auto result = std::async(std::launch::async,
+                             [&] { return execute(session, "Mod1", "DMM.Calibrate", longTime); });
+    EXPECT_EQ(resultAfter(result, [&] { session.abort(); }), -250963);
+    EXPECT_EQ(execute(session, "Mod1", "DMM.Trigger", 0.0), 0);
+}
+
+TEST(WaitTest, AResourceCarriesOutOneCommandAtATime) {
+    Session session("Mod1,Mod4");
+    auto result = std::async(std::launch::async,
+                             [&] { return execute(session, "Mod1", "DMM.Calibrate", longTime); });
+    while (execute(session, "Mod1", "DMM.Trigger", 0.0) == 0) {
+        std::this_thread::yield();
+    }
+    Status status;
+    nQITRMCAPI100_executeGenericCommand(session, "Mod1", "DMM.Trigger", 0.0, &status);
+    EXPECT_EQ(status.code, -250977);
+    EXPECT_EQ(status.text(), detailsOf("resourceBusy", usage("Resource", "\"Mod1\"")));
+    EXPECT_EQ(execute(session, "Mod1/ch0", "DMM.Zero", 0.0), 0);
+    EXPECT_EQ(resultAfter(result, [&] { session.abort(); }), -250963);
+    EXPECT_EQ(execute(session, "Mod1", "DMM.Trigger", 0.0), 0);
+}
+
+TEST(WaitTest, ClosingEndsACommand) {
+    Session session("Mod1");
+    auto result = std::async(std::launch::async,
+                             [&] { return execute(session, "Mod1", "DMM.Calibrate", longTime); });
+    while (execute(session, "Mod1", "DMM.Trigger", 0.0) == 0) {
+        std::this_thread::yield();
+    }
+    Status status;
+    nQITRMCAPI100_closeSession(session, &status);
+    EXPECT_EQ(result.get(), -250955);
+    session.handle = 0;
+    Session next("Mod1");
+    EXPECT_EQ(execute(next, "Mod1", "DMM.Trigger", 0.0), 0);
+}
+
+// Sessions read, write, rename and come and go at the same time.
+TEST(WaitTest, SessionsOfAllKindsWorkSideBySide) {
+    constexpr int rounds = 40;
+    std::vector<std::future<int>> workers;
+    const auto start = [&](const std::function<int32_t(Session&)>& act) {
+        workers.push_back(std::async(std::launch::async, [act] {
+            int failures = 0;
+            for (int round = 0; round < rounds; ++round) {
+                Session session;
+                failures += act(session) < 0;
+            }
+            return failures;
+        }));
+    };
+    for (int copy = 0; copy < 2; ++copy) {
+        start([](Session& session) {
+            Status status;
+            double value = 0;
+            nQITRMCAPI100_getGenericPropertyDouble(session, "Mod2/ch0", "PSU.Voltage", &value,
+                                                   &status);
+            return status.code;
+        });
+        start([](Session& session) {
+            Status status;
+            nQITRMCAPI100_setGenericPropertyDouble(session, "Mod2/ch0", "PSU.Voltage", 1.0,
+                                                   &status);
+            return status.code;
+        });
+        start([](Session& session) {
+            return execute(session, "Mod4", "DIG.SelfTest", 0.0) + 250976;
+        });
+        start([](Session& session) {
+            Status status;
+            nQITRMCAPI100_writeRegisterUInt32(session, "Mod1", 256, 1, &status);
+            nQITRMCAPI100_setNvmemBytes(session, "Mod1/user", 0, nullptr, 0, "", "", &status);
+            return status.code;
+        });
+        start([](Session& session) {
+            return static_cast<int32_t>(session.deviceList("Mod1", "Dev.PhysChans").size()) - 4;
+        });
+        start([](Session& session) {
+            Status status;
+            nQITRMCAPI100_renameDevice(session, "Mod5", "MOD5", &status);
+            return status.code;
+        });
+    }
+    for (auto& worker : workers) {
+        EXPECT_EQ(worker.get(), 0);
+    }
+    Session session;
+    Status status;
+    nQITRMCAPI100_renameDevice(session, "Mod5", "Mod5", &status);
+}
+
 }  // namespace

@@ -1,0 +1,179 @@
+#include <atomic>
+#include <functional>
+#include <new>
+
+#include "Values.h"
+
+using namespace drivertest;
+
+namespace {
+
+// How many allocations with new still succeed; below 0 all do.
+std::atomic<long> allowed{-1};
+// Whether one was denied.
+std::atomic<bool> denied{false};
+
+void* allocate(std::size_t size) {
+    if (allowed.load() == 0) {
+        denied = true;
+        return nullptr;
+    }
+    if (allowed.load() > 0) {
+        --allowed;
+    }
+    return std::malloc(size != 0 ? size : 1);
+}
+
+}  // namespace
+
+void* operator new(std::size_t size) {
+    void* memory = allocate(size);
+    if (memory == nullptr) {
+        throw std::bad_alloc();
+    }
+    return memory;
+}
+void* operator new[](std::size_t size) {
+    return operator new(size);
+}
+void operator delete(void* memory) noexcept {
+    std::free(memory);
+}
+void operator delete[](void* memory) noexcept {
+    std::free(memory);
+}
+void operator delete(void* memory, std::size_t) noexcept {
+    std::free(memory);
+}
+void operator delete[](void* memory, std::size_t) noexcept {
+    std::free(memory);
+}
+
+namespace {
+
+constexpr int32_t outOfMemory = -250950;
+
+// Lets each allocation of a call fail in turn. Every one must end in outOfMemory, or in the code
+// that the call has with all the memory it wants. Returns how many allocations the call makes.
+long starve(int32_t usual, const std::function<void(qierr_Status*)>& call) {
+    for (long count = 0;; ++count) {
+        Status status;
+        allowed = count;
+        denied = false;
+        call(&status);
+        allowed = -1;
+        if (!denied) {
+            EXPECT_EQ(status.code, usual) << status.text();
+            return count;
+        }
+        if (status.code != outOfMemory && status.code != usual) {
+            ADD_FAILURE() << "code " << status.code << " with " << count << " allocations";
+            return count;
+        }
+        EXPECT_EQ(status.text(), "{}") << "with " << count << " allocations";
+    }
+}
+
+TEST(MemoryTest, OpeningASession) {
+    Session warm("Mod1");
+    warm.close();
+    EXPECT_GT(starve(0,
+                     [](qierr_Status* status) {
+                         Handle handle = 0;
+                         nQITRMCAPI100_initializeSessionWithDevices(&handle, "Mod1,Mod2", 60.0, 3,
+                                                                    "a group with a long name", 0.0,
+                                                                    status);
+                         EXPECT_EQ(handle == 0, status->code != 0);
+                         Status closing;
+                         nQITRMCAPI100_closeSession(handle, &closing);
+                     }),
+              0);
+    Session next("Mod1,Mod2");
+}
+
+TEST(MemoryTest, ARefusal) {
+    Session session;
+    EXPECT_GT(starve(-250956,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_reserveDevices(session, "a device that is not there", 3, "",
+                                                      0.0, status);
+                     }),
+              0);
+}
+
+TEST(MemoryTest, ReadingATextOfSeveralDevices) {
+    Session session;
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         char** array = nullptr;
+                         uint32_t count = 0;
+                         nQITRMCAPI100_getGenericPropertyStringArray(
+                             session, "Mod1,Mod2", "Dev.ProductName", &array, &count, status);
+                         nQITRMCAPI100_freeStringArray(array, count);
+                     }),
+              0);
+}
+
+TEST(MemoryTest, WritingSeveralChannelsWritesAllOrNone) {
+    Session session("Mod2");
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         const double values[] = {1.0, 2.0};
+                         nQITRMCAPI100_setGenericPropertyDoubleArray(
+                             session, "Mod2/ch0:1", "PSU.Voltage", values, 2, status);
+                         const bool written = status->code == 0;
+                         double first = -1.0;
+                         double second = -1.0;
+                         allowed = -1;
+                         Status reading;
+                         nQITRMCAPI100_getGenericPropertyDouble(session, "Mod2/ch0", "PSU.Voltage",
+                                                                &first, &reading);
+                         nQITRMCAPI100_getGenericPropertyDouble(session, "Mod2/ch1", "PSU.Voltage",
+                                                                &second, &reading);
+                         EXPECT_EQ(first, written ? 1.0 : 0.0);
+                         EXPECT_EQ(second, written ? 2.0 : 0.0);
+                     }),
+              0);
+    EXPECT_EQ(resetDevices(session, "Mod2"), 0);
+}
+
+TEST(MemoryTest, OpeningAProperty) {
+    Session session;
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_Property handle = 0;
+                         nQITRMCAPI100_openGenericProperty(session, "Mod1", "DMM.Range", &handle,
+                                                           status);
+                         Status closing;
+                         nQITRMCAPI100_closeProperty(handle, &closing);
+                     }),
+              0);
+}
+
+TEST(MemoryTest, Renaming) {
+    Session session("Mod5");
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_renameDevice(session, "Mod5",
+                                                    "a name that is longer than usual", status);
+                     }),
+              0);
+    EXPECT_EQ(session.systemList("Sys.Devices").back(), "a name that is longer than usual");
+    Status status;
+    nQITRMCAPI100_renameDevice(session, "a name that is longer than usual", "Mod5", &status);
+    EXPECT_EQ(status.code, 0) << status.text();
+}
+
+TEST(MemoryTest, WritingNvmem) {
+    Session session("Mod5");
+    const uint8_t byte = 1;
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_setNvmemBytes(session, "Mod5/user", 0, &byte, 1, "", "",
+                                                     status);
+                     }),
+              0);
+    EXPECT_EQ(resetDevices(session, "Mod5"), 0);
+}
+
+}  // namespace

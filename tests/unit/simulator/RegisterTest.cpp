@@ -1,0 +1,117 @@
+#include "Values.h"
+
+using namespace drivertest;
+
+namespace {
+
+template <typename Number>
+Answer<Number> read(void (*function)(Handle, const char*, uint32_t, Number*, qierr_Status*),
+                    Handle session, const char* device, uint32_t address) {
+    Answer<Number> answer;
+    answer.value = 99;
+    Status status;
+    function(session, device, address, &answer.value, &status);
+    answer.code = status.code;
+    answer.text = status.text();
+    return answer;
+}
+
+template <typename Number>
+int32_t write(void (*function)(Handle, const char*, uint32_t, Number, qierr_Status*),
+              Handle session, const char* device, uint32_t address, Number value) {
+    Status status;
+    function(session, device, address, value, &status);
+    return status.code;
+}
+
+constexpr auto read8 = nQITRMCAPI100_readRegisterUInt8;
+constexpr auto read16 = nQITRMCAPI100_readRegisterUInt16;
+constexpr auto read32 = nQITRMCAPI100_readRegisterUInt32;
+constexpr auto read64 = nQITRMCAPI100_readRegisterUInt64;
+constexpr auto write8 = nQITRMCAPI100_writeRegisterUInt8;
+constexpr auto write16 = nQITRMCAPI100_writeRegisterUInt16;
+constexpr auto write32 = nQITRMCAPI100_writeRegisterUInt32;
+constexpr auto write64 = nQITRMCAPI100_writeRegisterUInt64;
+
+using RegisterTest = BenchTest;
+
+std::string where(uint32_t address, uint32_t bits) {
+    return "{\"type\":\"usage\",\"usage\":\"kUsageTypeAddress\",\"value\":" +
+           std::to_string(address) +
+           ",\"value_type\":\"uint32_t\"},{\"type\":\"usage\",\"usage\":"
+           "\"kUsageTypeRegisterSize\",\"value\":" +
+           std::to_string(bits) + ",\"value_type\":\"uint32_t\"}";
+}
+
+// The identification of Mod1 is the bytes 4d 4f 44 31 00 51 10 0c from address 0.
+TEST_F(RegisterTest, WiderRegistersAreTheBytesOfNarrowerOnes) {
+    EXPECT_EQ(read(read8, session, "Mod1", 0), uint8_t{0x4d});
+    EXPECT_EQ(read(read8, session, "Mod1", 3), uint8_t{0x31});
+    EXPECT_EQ(read(read16, session, "Mod1", 2), uint16_t{0x3144});
+    EXPECT_EQ(read(read32, session, "Mod1", 0), uint32_t{0x31444f4d});
+    EXPECT_EQ(read(read64, session, "Mod1", 0), uint64_t{0x0c10510031444f4d});
+}
+
+TEST_F(RegisterTest, EachWidthIsWritten) {
+    EXPECT_EQ(write(write64, session, "Mod1", 256, uint64_t{0xfedcba9876543210}), 0);
+    EXPECT_EQ(read(read64, session, "Mod1", 256), uint64_t{0xfedcba9876543210});
+    EXPECT_EQ(read(read32, session, "Mod1", 260), uint32_t{0xfedcba98});
+    EXPECT_EQ(write(write32, session, "Mod1", 260, uint32_t{0x01020304}), 0);
+    EXPECT_EQ(write(write16, session, "Mod1", 258, uint16_t{0xabcd}), 0);
+    EXPECT_EQ(write(write8, session, "Mod1", 256, uint8_t{0xff}), 0);
+    EXPECT_EQ(read(read64, session, "Mod1", 256), uint64_t{0x01020304abcd32ff});
+}
+
+TEST_F(RegisterTest, DevicesHaveTheirOwnRegisters) {
+    EXPECT_EQ(write(write8, session, "Mod2", 256, uint8_t{7}), 0);
+    EXPECT_EQ(read(read8, session, "Mod1", 256), uint8_t{0});
+}
+
+TEST_F(RegisterTest, AnAddressWithoutARegisterIsRefused) {
+    const auto answer = read(read32, session, "Mod1", 16);
+    EXPECT_EQ(answer.code, -250978);
+    EXPECT_EQ(answer.text, detailsOf("unmappedRegister", where(16, 32)));
+    EXPECT_EQ(answer.value, 0u);
+    EXPECT_EQ(read(read8, session, "Mod1", 511).code, 0);
+    EXPECT_EQ(read(read8, session, "Mod1", 512).code, -250978);
+    EXPECT_EQ(read(read8, session, "Mod1", 4294967295u).code, -250978);
+    EXPECT_EQ(read(read64, session, "Mod1", 4294967288u).code, -250978);
+    EXPECT_EQ(write(write8, session, "Mod1", 16, uint8_t{1}), -250978);
+    EXPECT_EQ(read(read8, session, "Bench", 0).code, -250978);
+}
+
+TEST_F(RegisterTest, AMisalignedAddressIsRefused) {
+    const auto answer = read(read32, session, "Mod1", 2);
+    EXPECT_EQ(answer.code, -250979);
+    EXPECT_EQ(answer.text, detailsOf("misalignedRegister", where(2, 32)));
+    EXPECT_EQ(read(read16, session, "Mod1", 1).code, -250979);
+    EXPECT_EQ(write(write64, session, "Mod1", 260, uint64_t{1}), -250979);
+}
+
+TEST_F(RegisterTest, AReadOnlyRegisterIsNotWritten) {
+    EXPECT_EQ(write(write8, session, "Mod1", 0, uint8_t{1}), -250980);
+    EXPECT_EQ(read(read8, session, "Mod1", 0), uint8_t{0x4d});
+}
+
+TEST_F(RegisterTest, OneDeviceIsNamed) {
+    EXPECT_EQ(read(read8, session, "Mod1,Mod2", 0).code, -250966);
+    EXPECT_EQ(read(read8, session, "", 0).code, -250959);
+    EXPECT_EQ(read(read8, session, "Mod1/ch0", 0).code, -250956);
+    EXPECT_EQ(read(read8, session, nullptr, 0).code, -250954);
+    Session one("Bench");
+    EXPECT_EQ(read(read8, one, "$DefaultDevices", 0).code, -250978);
+}
+
+TEST_F(RegisterTest, WritingNeedsADeviceThatMayBeWritten) {
+    Session other;
+    EXPECT_EQ(write(write8, other, "Mod1", 256, uint8_t{1}), -250811);
+    EXPECT_EQ(read(read8, other, "Mod1", 256), uint8_t{0});
+}
+
+TEST_F(RegisterTest, AResetPutsRegistersBack) {
+    EXPECT_EQ(write(write8, session, "Mod1", 256, uint8_t{1}), 0);
+    EXPECT_EQ(resetDevices(session, "Mod1"), 0);
+    EXPECT_EQ(read(read8, session, "Mod1", 256), uint8_t{0});
+}
+
+}  // namespace
