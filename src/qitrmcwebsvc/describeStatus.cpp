@@ -1,9 +1,70 @@
 #include "qitrmcwebsvc/describeStatus.h"
 
+#include <utf8proc.h>
+
+#include <algorithm>
+#include <cstdint>
+#include <memory>
+#include <string_view>
+
+#include "qihtl/String.h"
+#include "qitrmcsharedcmn/Exceptions.h"
+#include "qixlator/json1.h"
+#include "qixlator/qixlator.h"
+
 namespace nQITRMCWEBSVC100 {
 
-std::string describeStatus(const qierr_Status&) {
-    return {};
+using nQITRMCSHAREDCMN100::ThrowingStatus;
+
+namespace {
+
+// English, whatever a client has set for its session, and the third of the environments that ask.
+constexpr std::uint32_t attributes = 0 | 2u << qixlator_adeShift;
+constexpr std::uint32_t flags = qixlator::json1::includeStatic | qixlator::json1::includeDynamic |
+                                qixlator::json1::includeNested;
+
+struct EndSession {
+    void operator()(qixlator::Session* session) const { qixlator_destroySession(session); }
+};
+using SessionOwner = std::unique_ptr<qixlator::Session, EndSession>;
+
+SessionOwner openSession() {
+    ThrowingStatus failure;
+    return SessionOwner(qixlator_createSession(&failure));
+}
+
+void translate(qixlator::Session* session, const qierr_Status& status, qihtl::String* text) {
+    ThrowingStatus failure;
+    qixlator::json1::translateErrStatusToRawText(session, &status, attributes, flags, text,
+                                                 &failure);
+}
+
+// A text may quote bytes of a request or of a file that are no UTF-8, which no JSON text may hold.
+// Each such byte becomes the replacement character.
+std::string withValidUtf8(std::string_view text) {
+    std::string valid;
+    valid.reserve(text.size());
+    while (!text.empty()) {
+        utf8proc_int32_t codePoint = 0;
+        const auto length =
+            utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(text.data()),
+                             static_cast<utf8proc_ssize_t>(text.size()), &codePoint);
+        const std::size_t taken = length > 0 ? static_cast<std::size_t>(length) : 1;
+        valid += length > 0 ? text.substr(0, taken) : std::string_view("\xef\xbf\xbd");
+        text.remove_prefix(taken);
+    }
+    return valid;
+}
+
+}  // namespace
+
+std::string describeStatus(const qierr_Status& status) {
+    const SessionOwner session = openSession();
+    qihtl::String text;
+    translate(session.get(), status, &text);
+    std::string line = withValidUtf8({text.c_str(), text.length()});
+    std::replace(line.begin(), line.end(), '\n', ' ');
+    return line;
 }
 
 }  // namespace nQITRMCWEBSVC100

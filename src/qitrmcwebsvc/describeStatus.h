@@ -6,8 +6,11 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// What a status says to a client: one line of English text, empty for a success. Throws
-// qierr::Exception when the translation fails. May run on any number of threads at once.
+// What a status says to a client: one line of English text, always valid UTF-8, and empty for a
+// success. Throws qierr::Exception when the translation fails. Costs a translation session each
+// time. May run on any number of threads at once.
+//
+// A library of its own, so that tests of the service can link other words.
 std::string describeStatus(const qierr_Status& status);
 
 }  // namespace nQITRMCWEBSVC100

@@ -22,6 +22,7 @@ def test_it_exports_its_entry_points_and_nothing_else():
         "qitrmcResume",
         "qitrmcFinalize",
         "qitrmcRun",
+        "qixlator_exported_create",
     }
 
 

@@ -8,8 +8,9 @@ SOURCES = (".h", ".c", ".cpp", ".def")
 
 # A folder of src/ may include headers of its own floor or of one further down.
 FLOORS = [
-    {"qihtl", "jsonz", "ini", "qi/dsc", "stdint", "embedded"},
+    {"jsonz", "ini", "qi/dsc", "stdint", "embedded"},
     {"qierr"},
+    {"qihtl"},
     {"qisysq"},
     {"qixlator"},
     {"qixlatorlua", "qimxl"},
