@@ -2,7 +2,6 @@
 
 #include <qitrmcapi.h>
 
-#include <cstdint>
 #include <new>
 
 namespace nQITRMCWEBSVC100 {
