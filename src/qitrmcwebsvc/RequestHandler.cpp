@@ -1,5 +1,6 @@
 #include "qitrmcwebsvc/RequestHandler.h"
 
+#include <cmath>
 #include <exception>
 
 #include "qitrmcsharedcmn/Exceptions.h"
@@ -41,9 +42,17 @@ JsonValue skippedResponse(const JsonValue& requestValue, JsonPool& allocator) {
     return std::move(response.getValue());
 }
 
+// JSON has no infinities and no NaN, but a driver may measure one: it is printed as null.
+class FiniteWriter : public JsonWriter {
+  public:
+    using JsonWriter::JsonWriter;
+
+    bool Double(double value) { return std::isfinite(value) ? JsonWriter::Double(value) : Null(); }
+};
+
 std::string compactText(const JsonDocument& document) {
     JsonBuffer buffer;
-    JsonWriter writer(buffer);
+    FiniteWriter writer(buffer);
     document.Accept(writer);
     return std::string(buffer.GetString(), buffer.GetSize());
 }

@@ -7,6 +7,7 @@
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcsharedcmn/parseUtilities.h"
 #include "qitrmcwebsvc/DriverOwners.h"
+#include "qitrmcwebsvc/callDriver.h"
 
 namespace nQITRMCWEBSVC100 {
 
@@ -66,11 +67,6 @@ bool sessionHoldsAnyDevice(nQITRMCAPI100_Session session, const std::set<std::st
                                            [&](const char* name) { return devices.count(name); });
 }
 
-void closeDriverSession(nQITRMCAPI100_Session session) {
-    ThrowingStatus status;
-    nQITRMCAPI100_closeSession(session, &status);
-}
-
 // Closes a session that has just been opened unless it found its place in the table.
 class OpenedSession {
   public:
@@ -102,10 +98,7 @@ SessionManager::~SessionManager() {
 std::string SessionManager::createSession() {
     std::lock_guard<std::recursive_mutex> hold(mutex);
     SessionContext context;
-    {
-        ThrowingStatus status;
-        nQITRMCAPI100_initializeSessionWithoutResources(&context.driverSession, &status);
-    }
+    callDriver(nQITRMCAPI100_initializeSessionWithoutResources, &context.driverSession);
     return addSession(context);
 }
 
@@ -147,7 +140,7 @@ std::shared_ptr<SessionContext> SessionManager::getSessionContext(const std::str
 
 void SessionManager::closeSession(const std::string& sessionId) {
     std::lock_guard<std::recursive_mutex> hold(mutex);
-    closeDriverSession(getSessionContext(sessionId)->driverSession);
+    callDriver(nQITRMCAPI100_closeSession, getSessionContext(sessionId)->driverSession);
     sessions.erase(sessionId);
 }
 
@@ -172,10 +165,7 @@ void SessionManager::unreserveDevices(const std::string& sessionId,
     std::lock_guard<std::recursive_mutex> hold(mutex);
     const std::shared_ptr<SessionContext> context = getSessionContext(sessionId);
     const std::string joinedNames = compressNames(names, NameKind::Path);
-    {
-        ThrowingStatus status;
-        nQITRMCAPI100_unreserveDevices(context->driverSession, joinedNames.c_str(), &status);
-    }
+    callDriver(nQITRMCAPI100_unreserveDevices, context->driverSession, joinedNames.c_str());
     context->access = 0;
 }
 
@@ -196,7 +186,7 @@ void SessionManager::closeSessionsReserving(const DeviceSet& devices) {
         const nQITRMCAPI100_Session session = entry->second->driverSession;
         const auto next = std::next(entry);
         if (sessionHoldsAnyDevice(session, devices)) {
-            closeDriverSession(session);
+            callDriver(nQITRMCAPI100_closeSession, session);
             sessions.erase(entry);
         }
         entry = next;

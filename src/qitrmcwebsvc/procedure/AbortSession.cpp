@@ -2,16 +2,13 @@
 
 #include <qitrmcapi.h>
 
-#include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/callDriver.h"
 
 namespace nQITRMCWEBSVC100 {
 
 void AbortSession::run(const JsonValue&, const std::shared_ptr<SessionContext>& session,
                        SingleResponse& response) {
-    {
-        nQITRMCSHAREDCMN100::ThrowingStatus status;
-        nQITRMCAPI100_abortSession(session->driverSession, &status);
-    }
+    callDriver(nQITRMCAPI100_abortSession, session->driverSession);
     response.setEmptyResult();
 }
 

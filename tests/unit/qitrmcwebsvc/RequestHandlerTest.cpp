@@ -1,5 +1,7 @@
 #include "qitrmcwebsvc/RequestHandler.h"
 
+#include <cmath>
+#include <limits>
 #include <memory>
 #include <string>
 
@@ -162,6 +164,21 @@ TEST_F(RequestHandlerTest, ThrowsWhenNotEvenThatCanBePutIntoWords) {
     plainDescriptions::failNext(2);
     EXPECT_THROW(answer("{}"), std::exception);
     EXPECT_EQ(answer(open), opened("1", "_session1"));
+}
+
+TEST_F(RequestHandlerTest, PrintsWhatIsNoNumberToJsonAsNull) {
+    answer(open);
+    driver.give("getSystemPropertyStringArray(1, \"Sys.Devices\")", Calls{"A"});
+    driver.give("openGenericProperty", std::uint64_t{8});
+    driver.give("getPropertyPropertyInt32", std::int64_t{9});
+    driver.give("translateStaticEnumValueToString", std::string("DoubleArray"));
+    const double infinity = std::numeric_limits<double>::infinity();
+    driver.give("getGenericPropertyDoubleArray",
+                std::vector<double>{0.5, infinity, -infinity, std::nan("")});
+    EXPECT_EQ(answer("{\"jsonrpc\":\"2.0\",\"id\":1,\"method\":\"getProperty\",\"params\":{"
+                     "\"session_id\":\"_session1\",\"property\":\"P\",\"devices\":\"A\"}}"),
+              "{\"jsonrpc\":\"2.0\",\"id\":1,\"result\":{\"data_type\":\"DoubleArray\","
+              "\"value\":[0.5,null,null,null]}}");
 }
 
 TEST_F(RequestHandlerTest, ClosesItsSessionsAtItsEnd) {
