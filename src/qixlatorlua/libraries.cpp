@@ -14,11 +14,31 @@ extern "C" {
 
 namespace qixlatorlua {
 
+namespace {
+
+// Opens the library of files. If that runs out of memory half-way, a handle of a standard file may
+// not know yet that it must not be closed: the collector would close the standard file of the whole
+// process. So the handles then lose what closes them.
+int openFiles(lua_State* L) {
+    luaL_newmetatable(L, LUA_FILEHANDLE);
+    const int handles = lua_gettop(L);
+    lua_pushcfunction(L, luaopen_io);
+    lua_pushvalue(L, 1);
+    if (lua_pcall(L, 1, 1, 0) != 0) {
+        lua_pushnil(L);
+        lua_setfield(L, handles, "__gc");
+        return lua_error(L);
+    }
+    return 1;
+}
+
+}  // namespace
+
 const LuaLibrary libraries[] = {
     {"", luaopen_base, nullptr},
     {LUA_LOADLIBNAME, luaopen_package, disableNativeModules},
     {LUA_TABLIBNAME, luaopen_table, nullptr},
-    {LUA_IOLIBNAME, luaopen_io, disablePrograms},
+    {LUA_IOLIBNAME, openFiles, disablePrograms},
     {LUA_OSLIBNAME, luaopen_os, nullptr},
     {LUA_STRLIBNAME, luaopen_string, nullptr},
     {LUA_MATHLIBNAME, luaopen_math, nullptr},
