@@ -1,11 +1,11 @@
 #include "ChassisFile.h"
 
+#include <array>
 #include <cerrno>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <fstream>
-#include <sstream>
 
 #include "Description.h"
 #include "EmbeddedTexts.h"
@@ -20,6 +20,7 @@ namespace {
 
 constexpr int32_t chassisCategory = 1;
 constexpr uint32_t mostSlots = 64;
+constexpr size_t largestFile = size_t{16} << 20;
 
 enum class Place { system, slot };
 
@@ -113,17 +114,25 @@ void fillFrom(const Node& root, const char* member, Category category, const Cat
     fillStore(category, catalogue, nullptr, store);
 }
 
+[[noreturn]] void refuseFile(const std::string& wrong) {
+    throw DescriptionFault{"", wrong, "QITRMC_SIM_CHASSIS must name a readable file"};
+}
+
 std::string readFile(const char* path) {
+    errno = 0;
     std::ifstream file(path, std::ios::binary);
-    std::ostringstream content;
-    if (file) {
-        content << file.rdbuf();
+    std::string content;
+    std::array<char, 4096> piece;
+    while (file.read(piece.data(), piece.size()) || file.gcount() > 0) {
+        content.append(piece.data(), static_cast<size_t>(file.gcount()));
+        if (content.size() > largestFile) {
+            refuseFile("is larger than 16 MiB");
+        }
     }
-    if (!file || !content) {
-        throw DescriptionFault{"", std::string("cannot be read: ") + std::strerror(errno),
-                               "QITRMC_SIM_CHASSIS must name a readable file"};
+    if (!file.eof()) {
+        refuseFile(std::string("cannot be read: ") + std::strerror(errno));
     }
-    return content.str();
+    return content;
 }
 
 }  // namespace

@@ -150,9 +150,9 @@ void setDefaultResources(const Resolver& resolver, Session& session, std::string
                          const std::vector<std::string>& names) {
     const std::string text = joined(names);
     if (property == "Session.DefaultPhysChans") {
-        session.defaultPhysChans = resolver.resources(Kind::physChan, text);
+        session.defaultPhysChans = distinct(resolver.resources(Kind::physChan, text));
     } else if (property == "Session.DefaultNVMEMAreas") {
-        session.defaultNvmemAreas = resolver.resources(Kind::nvmemArea, text);
+        session.defaultNvmemAreas = distinct(resolver.resources(Kind::nvmemArea, text));
     } else {
         session.defaultDevices = owners(resolver.resources(Kind::device, text));
     }

@@ -3,7 +3,6 @@
 #include <rapidjson/error/en.h>
 
 #include <algorithm>
-#include <set>
 
 namespace simulator {
 
@@ -87,13 +86,9 @@ void Node::expectMembers(std::initializer_list<std::string_view> allowed) const 
         known += known.empty() ? "" : ", ";
         known += name;
     }
-    std::set<std::string> seen;
     forEachMember([&](const std::string& name, const Node& member) {
         if (std::find(allowed.begin(), allowed.end(), name) == allowed.end()) {
             member.fail("is not a known member", "the members here are " + known);
-        }
-        if (!seen.insert(name).second) {
-            member.fail("stands there twice", "each member may be given once");
         }
     });
 }

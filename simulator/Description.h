@@ -4,6 +4,7 @@
 #include <cstdlib>
 #include <initializer_list>
 #include <new>
+#include <set>
 #include <string>
 #include <string_view>
 
@@ -85,13 +86,18 @@ class Node {
             visit(Node((*value)[i], pointer + "/" + std::to_string(i)));
         }
     }
-    // Calls visit(name, Node) for the members of an object, in order.
+    // Calls visit(name, Node) for the members of an object, in order. None may stand there twice.
     template <typename Visit>
     void forEachMember(Visit visit) const {
         expect(value->IsObject(), "an object");
+        std::set<std::string> seen;
         for (const auto& entry : value->GetObject()) {
             const std::string name(entry.name.GetString(), entry.name.GetStringLength());
-            visit(name, Node(entry.value, childPointer(name)));
+            const Node member(entry.value, childPointer(name));
+            if (!seen.insert(name).second) {
+                member.fail("stands there twice", "each member may be given once");
+            }
+            visit(name, member);
         }
     }
 

@@ -40,10 +40,12 @@ uint32_t rangeNumber(std::string_view digits, std::string_view name) {
     return number;
 }
 
-void appendNames(std::string_view part, std::vector<std::string>& names) {
+using Visit = std::function<void(const std::string&)>;
+
+void visitNames(std::string_view part, const Visit& visit) {
     const size_t colon = part.find(':');
     if (colon == std::string_view::npos || part.find('/') == std::string_view::npos) {
-        names.emplace_back(part);
+        visit(std::string(part));
         return;
     }
     size_t digits = colon;
@@ -57,7 +59,7 @@ void appendNames(std::string_view part, std::vector<std::string>& names) {
     }
     const std::string prefix(part.substr(0, digits));
     for (uint32_t offset = 0; offset <= last - first; ++offset) {
-        names.push_back(prefix + std::to_string(first + offset));
+        visit(prefix + std::to_string(first + offset));
     }
 }
 
@@ -101,18 +103,13 @@ std::string foldName(std::string_view name) {
     return std::string(reinterpret_cast<const char*>(folded), static_cast<size_t>(length));
 }
 
-std::vector<std::string> splitNames(std::string_view joined) {
-    std::vector<std::string> names;
-    if (joined.empty()) {
-        return names;
-    }
-    for (;;) {
-        const size_t comma = joined.find(',');
-        appendNames(joined.substr(0, comma), names);
-        if (comma == std::string_view::npos) {
-            return names;
-        }
-        joined.remove_prefix(comma + 1);
+void forEachName(std::string_view joined, const Visit& visit) {
+    constexpr size_t none = std::string_view::npos;
+    size_t comma = joined.empty() ? none : 0;
+    while (comma != none) {
+        comma = joined.find(',');
+        visitNames(joined.substr(0, comma), visit);
+        joined.remove_prefix(comma == none ? joined.size() : comma + 1);
     }
 }
 

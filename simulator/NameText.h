@@ -1,8 +1,8 @@
 #pragma once
 
+#include <functional>
 #include <string>
 #include <string_view>
-#include <vector>
 
 namespace simulator {
 
@@ -11,10 +11,11 @@ namespace simulator {
 // itself.
 std::string foldName(std::string_view name);
 
-// Splits a joined text of resources at its commas and writes out the ranges: "Mod1/ch0:2,Mod2"
-// gives "Mod1/ch0", "Mod1/ch1", "Mod1/ch2", "Mod2". An empty text gives no names. Only a name with
-// a slash can be a range. Throws a refusal for a range that is backwards or longer than 1024.
-std::vector<std::string> splitNames(std::string_view joined);
+// Calls visit(name) for each name of a joined text of resources, in order, with the ranges written
+// out: "Mod1/ch0:2,Mod2" stands for "Mod1/ch0", "Mod1/ch1", "Mod1/ch2" and "Mod2". An empty text
+// holds no names. Only a name with a slash can be a range. Throws a refusal for a range that is
+// backwards or longer than 1024.
+void forEachName(std::string_view joined, const std::function<void(const std::string&)>& visit);
 
 // Says why a text cannot be the name of a device, or returns an empty text when it can.
 std::string nameFault(std::string_view name);

@@ -33,8 +33,9 @@ class Reservations {
   public:
     Reservations(const Chassis& chassis, Waits& waits);
 
-    // Reserves all of these devices or none. A call that waits is served in the order of arrival
-    // among those that want the same devices. When time is over only the holders count. Refuses
+    // Reserves all of these devices or none. Calls that wait are served in the order of arrival
+    // among those that want the same devices; for a call that does not wait, and at the end of a
+    // wait, only the holders count. Refuses
     // with deviceReserved, and when the session is aborted or closed meanwhile. The mutex is given
     // up during the wait.
     void reserve(const std::vector<Device*>& devices, const Holding& wanted, double timeout,

@@ -1,6 +1,8 @@
 #include "Resolver.h"
 
 #include <algorithm>
+#include <iterator>
+#include <set>
 
 #include "NameText.h"
 #include "Refusal.h"
@@ -31,6 +33,14 @@ void expectOne(const std::vector<Resource*>& resources) {
         }
         throw Refusal(code::severalResources).usage(tag::resources, names);
     }
+}
+
+std::vector<Resource*> distinct(const std::vector<Resource*>& resources) {
+    std::set<const Resource*> seen;
+    std::vector<Resource*> kept;
+    std::copy_if(resources.begin(), resources.end(), std::back_inserter(kept),
+                 [&](const Resource* resource) { return seen.insert(resource).second; });
+    return kept;
 }
 
 std::vector<Device*> owners(const std::vector<Resource*>& resources) {
@@ -96,13 +106,13 @@ Resource& Resolver::named(std::string_view name) const {
 template <typename Find>
 std::vector<Resource*> Resolver::collect(std::string_view joined, Find find) const {
     std::vector<Resource*> found;
-    for (const std::string& name : splitNames(joined)) {
+    forEachName(joined, [&](const std::string& name) {
         if (const auto list = tokenResources(name)) {
             found.insert(found.end(), list->begin(), list->end());
         } else {
             found.push_back(&find(name));
         }
-    }
+    });
     return found;
 }
 

@@ -48,6 +48,9 @@ void expectSome(const std::vector<Resource*>& resources);
 // As above, and with severalResources when there is more than one.
 void expectOne(const std::vector<Resource*>& resources);
 
+// The resources without repetitions, in their order.
+std::vector<Resource*> distinct(const std::vector<Resource*>& resources);
+
 // The devices that resources belong to, each once, in the order of the resources.
 std::vector<Device*> owners(const std::vector<Resource*>& resources);
 

@@ -38,9 +38,9 @@ class Opening {
 void setDefaults(Session& session, Kind kind, const std::vector<Resource*>& resources) {
     session.defaultDevices = owners(resources);
     if (kind == Kind::physChan) {
-        session.defaultPhysChans = resources;
+        session.defaultPhysChans = distinct(resources);
     } else if (kind == Kind::nvmemArea) {
-        session.defaultNvmemAreas = resources;
+        session.defaultNvmemAreas = distinct(resources);
     }
 }
 

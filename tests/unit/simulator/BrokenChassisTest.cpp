@@ -61,6 +61,24 @@ TEST(BrokenChassisTest, AMissingFileIsToldOnce) {
               "QITRMC_SIM_CHASSIS must name a readable file\n");
 }
 
+TEST(BrokenChassisTest, AFolderIsNoFile) {
+    EXPECT_EQ(openWith("/tmp").errors,
+              "qitrmcapi: /tmp: cannot be read: Is a directory; "
+              "QITRMC_SIM_CHASSIS must name a readable file\n");
+}
+
+TEST(BrokenChassisTest, AFileWithoutEndIsGivenUp) {
+    EXPECT_EQ(openWith("/dev/zero").errors,
+              "qitrmcapi: /dev/zero: is larger than 16 MiB; "
+              "QITRMC_SIM_CHASSIS must name a readable file\n");
+}
+
+TEST(BrokenChassisTest, AnEmptyFileIsNotJson) {
+    expectFault("", "",
+                "is not JSON at line 1, column 1: The document is empty.; "
+                "a chassis description is one JSON object");
+}
+
 TEST(BrokenChassisTest, TextThatIsNotJsonIsToldWithItsLine) {
     expectFault("{\n  \"devices\": [,]\n}", "",
                 "is not JSON at line 2, column 15: Invalid value.; "
@@ -87,6 +105,11 @@ TEST(BrokenChassisTest, AMistypedMemberIsNamedWithTheOnesThatExist) {
 
 TEST(BrokenChassisTest, AMemberThatStandsTwiceIsRefused) {
     expectFault("{\"devices\":[],\"devices\":[]}", "/devices",
+                "stands there twice; each member may be given once");
+}
+
+TEST(BrokenChassisTest, ACommandThatStandsTwiceIsRefused) {
+    expectFault(device(",\"commands\":{\"C\":{},\"C\":{}}"), "/devices/0/commands/C",
                 "stands there twice; each member may be given once");
 }
 

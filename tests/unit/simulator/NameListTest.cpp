@@ -104,6 +104,17 @@ TEST(NameListTest, NamesAreFoundInAnyLetterCaseAndKeptAsTheChassisSpellsThem) {
     EXPECT_EQ(openedChannels("MOD4/CH3"), Names{"Mod4/ch3"});
 }
 
+TEST(NameListTest, ADefaultThatIsNamedTwiceIsListedOnce) {
+    EXPECT_EQ(openedChannels("Mod1/ch1,Mod1/ch0:1"), (Names{"Mod1/ch1", "Mod1/ch0"}));
+}
+
+TEST(NameListTest, AnEmptyNameInAListIsRefused) {
+    Session session;
+    for (const char* list : {"Mod1,", ",Mod1", ","}) {
+        EXPECT_EQ(session.reserve(list), -250956) << list;
+    }
+}
+
 TEST(NameListTest, RangesNameChannelsInOrder) {
     EXPECT_EQ(openedChannels("Mod1/ch2:3,Mod2/ch0,Mod1/ch0:0"),
               (Names{"Mod1/ch2", "Mod1/ch3", "Mod2/ch0", "Mod1/ch0"}));
