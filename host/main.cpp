@@ -8,6 +8,7 @@
 #include <memory>
 #include <string>
 
+#include "host/DriverCheck.h"
 #include "host/Failure.h"
 #include "host/ListenSocket.h"
 #include "host/Options.h"
@@ -114,6 +115,7 @@ void runHost(const Options& options) {
     const host::ServerSettings settings = settingsOf(options);
     host::ListenSocket socket(options.address, options.port);
     const host::Plugin plugin(options.plugin.empty() ? host::findPlugin() : options.plugin);
+    host::checkDriver();
     plugin.initialize();
     try {
         serve(plugin, socket, settings);

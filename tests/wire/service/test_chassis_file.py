@@ -1,0 +1,37 @@
+"""What the host says of a chassis file that the simulated driver cannot load."""
+
+import subprocess
+
+from hostlib import BUILD_DIR
+
+
+def run_host(tmp_path, text):
+    chassis = tmp_path / "chassis.json"
+    chassis.write_text(text)
+    result = subprocess.run(
+        [BUILD_DIR / "bin" / "qitrmc-host", "--listen", "127.0.0.1:0", "--chassis", chassis],
+        capture_output=True, text=True, timeout=60)
+    return result.returncode, result.stdout, result.stderr.replace(str(chassis), "FILE")
+
+
+def test_a_broken_chassis_file_ends_the_start_and_names_the_place(tmp_path):
+    code, out, err = run_host(tmp_path, '{"devices": [], "colour": "red"}')
+    assert (code, out) == (1, "")
+    driver, host = err.splitlines()
+    assert driver.startswith("qitrmcapi: FILE: /colour is not a known member")
+    assert host == ("qitrmc-host: The driver opens no session. Mend the chassis file, or name "
+                    "another with --chassis.")
+
+
+def test_a_chassis_file_that_is_not_json_ends_the_start(tmp_path):
+    code, out, err = run_host(tmp_path, '{"devices": [')
+    assert (code, out) == (1, "")
+    assert err.splitlines()[0].startswith("qitrmcapi: FILE: ")
+
+
+def test_the_check_takes_no_session_number_from_the_clients(own_host):
+    body = b'{"jsonrpc":"2.0","id":1,"method":"initializeSession"}'
+    assert own_host.post(body)[2] == (
+        b'{"jsonrpc":"2.0","id":1,"result":{"session_id":"_session1"}}')
+    own_host.post(b'{"jsonrpc":"2.0","id":1,"method":"closeSession","params":'
+                  b'{"session_id":"_session1"}}')
