@@ -7,7 +7,6 @@ import pytest
 from hostlib import Host
 from jsonrpc import Client, blanked, call, error_response
 
-DISABLED = b"QI-TRMC web server is disabled. Please enable it in QI-DESK."
 NOT_HTTP = b"Only HTTP protocol is supported."
 NOT_POST = b"Only HTTP POST request is supported."
 
