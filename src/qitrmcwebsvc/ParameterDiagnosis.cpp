@@ -4,6 +4,7 @@
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/JsonRpcCodes.h"
+#include "qitrmcwebsvc/compactJson.h"
 #include "qitrmcwebsvcerr/ErrorDescriptions.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -61,13 +62,6 @@ std::string joined(const JsonValue& array, std::string (*textOf)(const JsonValue
         text += textOf(entry);
     }
     return text;
-}
-
-std::string compactJson(const JsonValue& value) {
-    JsonBuffer text;
-    JsonWriter writer(text);
-    value.Accept(writer);
-    return std::string(text.GetString(), text.GetSize());
 }
 
 std::string describeKeyword(const JsonValue& schema, const SchemaFailure& failure) {

@@ -1,9 +1,9 @@
 #include "qitrmcwebsvc/RequestHandler.h"
 
-#include <cmath>
 #include <exception>
 
 #include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/compactJson.h"
 #include "qitrmcwebsvc/requestText.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -42,21 +42,6 @@ JsonValue skippedResponse(const JsonValue& requestValue, JsonPool& allocator) {
     return std::move(response.getValue());
 }
 
-// JSON has no infinities and no NaN, but a driver may measure one: it is printed as null.
-class FiniteWriter : public JsonWriter {
-  public:
-    using JsonWriter::JsonWriter;
-
-    bool Double(double value) { return std::isfinite(value) ? JsonWriter::Double(value) : Null(); }
-};
-
-std::string compactText(const JsonDocument& document) {
-    JsonBuffer buffer;
-    FiniteWriter writer(buffer);
-    document.Accept(writer);
-    return std::string(buffer.GetString(), buffer.GetSize());
-}
-
 }  // namespace
 
 RequestHandler::RequestHandler() {
@@ -73,7 +58,7 @@ std::string RequestHandler::handleRequest(const std::string& body) {
         setErrorFromCurrentException(response);
         static_cast<JsonValue&>(responseDocument) = response.getValue();
     }
-    return compactText(responseDocument);
+    return compactJson(responseDocument);
 }
 
 void RequestHandler::answer(const std::string& body, JsonDocument& responseDocument) {
