@@ -95,8 +95,11 @@ std::string RequestResource::joinedNames() const {
 
 void RequestResource::readNames(const JsonValue& value) {
     const auto append = [&](const JsonValue& text) {
-        appendExpanded(resourceNames, std::string(text.GetString(), text.GetStringLength()),
-                       NameKind::Path);
+        const std::string list(text.GetString(), text.GetStringLength());
+        // To the driver a list ends at its first NUL, and the names behind it would be lost.
+        if (list.find('\0') != std::string::npos)
+            refuseName(list);
+        appendExpanded(resourceNames, list, NameKind::Path);
     };
     if (value.IsString())
         append(value);

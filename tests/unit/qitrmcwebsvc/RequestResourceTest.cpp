@@ -77,6 +77,12 @@ TEST_F(RequestResourceTest, RefusesABadRangeWithItsText) {
               unknown + "Mod1/ch4:1");
 }
 
+TEST_F(RequestResourceTest, LosesNoNamesBehindANul) {
+    EXPECT_EQ(failureOf([] { read("{\"devices\":\"Mod1\\u0000,Mod2\"}"); }), unknown + "Mod1");
+    EXPECT_EQ(failureOf([] { read("{\"devices\":[\"Mod2\",\"\\u0000\",\"Mod1\"]}"); }), unknown);
+    EXPECT_EQ(failureOf([] { check("{\"device\":\"Mod1\\u0000\"}"); }), unknown + "Mod1");
+}
+
 TEST_F(RequestResourceTest, ReadsTheDeviceListOnceForAllDevices) {
     check("{\"devices\":\"Mod2,Mod1\"}");
     EXPECT_EQ(driver.takeCalls(),
