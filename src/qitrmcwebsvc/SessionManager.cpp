@@ -150,12 +150,13 @@ void SessionManager::reserveDevices(const std::string& sessionId,
                                     double reservationTimeout) {
     std::lock_guard<std::recursive_mutex> hold(mutex);
     const std::shared_ptr<SessionContext> context = getSessionContext(sessionId);
+    const DeviceSet devices(names.begin(), names.end());
     const std::string joinedNames = compressNames(names, NameKind::Path);
     {
         ThrowingStatus status;
         nQITRMCAPI100_reserveDevices(context->driverSession, joinedNames.c_str(), access,
                                      reservationGroup.c_str(), reservationTimeout, &status);
-        reportReservingSessions(DeviceSet(names.begin(), names.end()), &status);
+        reportReservingSessions(devices, &status);
     }
     context->access = access;
 }
