@@ -100,6 +100,12 @@ TEST_F(RequestResourceTest, ReadsAListForEachChannelAndArea) {
                      "freeStringArray(1)"}));
 }
 
+TEST_F(RequestResourceTest, TakesTheDeviceFromBeforeTheFirstSlash) {
+    driver.give("getGenericPropertyStringArray(7, \"Mod1\", \"Dev.PhysChans\")",
+                Calls{"Mod1/a/b0"});
+    EXPECT_EQ(check("{\"physical_channel\":\"Mod1/a/b0\"}").names(), Calls{"Mod1/a/b0"});
+}
+
 TEST_F(RequestResourceTest, RefusesANameThatTheDriverDoesNotKnow) {
     EXPECT_EQ(failureOf([] { check("{\"devices\":\"Mod1,Mod3\"}"); }), unknown + "Mod3");
     EXPECT_EQ(failureOf([] { check("{\"device\":\"Mod1:3\"}"); }), unknown + "Mod1:3");

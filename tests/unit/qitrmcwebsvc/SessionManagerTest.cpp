@@ -189,6 +189,31 @@ TEST_F(SessionManagerTest, AddsNoReportWhenOnlyReadersOrOthersHoldTheDevice) {
         "Exception: -250811");
 }
 
+TEST_F(SessionManagerTest, ListsHoldersByTheirLatestAccess) {
+    openOnDevices(1, {"Mod1"}, 2);
+    openOnDevices(2, {"Mod1"}, 3);
+    openOnDevices(3, {"Mod1"}, 3);
+    for (std::uint64_t handle : {1, 2, 3})
+        holds(handle, {"Mod1"});
+    manager->unreserveDevices("_session2", {"Mod2"});
+    manager->reserveDevices("_session3", {"Mod2"}, 1, "", 0);
+    driver.fail("initializeSessionWithDevices", -250811);
+    EXPECT_EQ(
+        failureOf([&] { manager->createSession(ResourceKind::Device, {"Mod1"}, 3, "", 0, false); }),
+        "Exception: -250811 kUsageTypeReservedBySessions=[\"_session1\"]");
+}
+
+TEST_F(SessionManagerTest, AsksNoSessionWhatItHoldsWhenNoDeviceIsNamed) {
+    openOnDevices(1, {"Mod1"});
+    driver.takeCalls();
+    EXPECT_EQ(openOnDevices(2, {}, 3, true), "_session2");
+    driver.fail("reserveDevices", -250811);
+    EXPECT_EQ(failureOf([&] { manager->reserveDevices("_session1", {}, 3, "", 0); }),
+              "Exception: -250811");
+    EXPECT_EQ(driver.takeCalls(), (Calls{"initializeSessionWithDevices(\"\", 60, 3, \"\", 0)",
+                                         "reserveDevices(1, \"\", 3, \"\", 0)"}));
+}
+
 TEST_F(SessionManagerTest, CountsASessionThatCannotAnswerAsHoldingNothing) {
     openOnDevices(1, {"Mod1"});
     driver.reply(reservedDevicesOf(1), {Calls{"Mod1"}, -3});
