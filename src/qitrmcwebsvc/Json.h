@@ -1,6 +1,6 @@
 #pragma once
 
-// The JSON types of the whole service. Nothing else includes the JSON library.
+// The JSON types of the whole service. Nothing else includes the JSON library for its values.
 //
 // An allocation failure in any of them is a std::bad_alloc. An object or array whose growth failed
 // that way counts on room it does not have: destroy it, and never add to it again.

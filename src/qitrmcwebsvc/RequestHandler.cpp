@@ -3,6 +3,7 @@
 #include <exception>
 
 #include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/compactJson.h"
 #include "qitrmcwebsvc/requestText.h"
 
@@ -11,10 +12,6 @@ namespace nQITRMCWEBSVC100 {
 using namespace nQITRMCSHAREDCMN100;
 
 namespace {
-
-constexpr std::int32_t invalidRequestCode = -32600;
-constexpr std::int32_t unknownMethodCode = -32601;
-constexpr std::int32_t skippedCode = -32001;
 
 void addDefaultParamsToObject(JsonValue& value, JsonPool& allocator) {
     if (value.IsObject() && !value.HasMember("params"))

@@ -5,17 +5,17 @@
 #include <string>
 
 #include "qierr/Status.h"
+#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/describeStatus.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-constexpr std::int32_t serverErrorCode = -32000;
-
 // The codes of JSON-RPC itself, which stand bare; every other failure is a server error whose own
 // code and text travel in "data".
-constexpr std::array<std::int32_t, 6> standingCodes = {-32700, -32603, -32602,
-                                                       -32601, -32600, serverErrorCode};
+constexpr std::array<std::int32_t, 6> standingCodes = {parseErrorCode,     protocolInternalCode,
+                                                       invalidParamsCode,  unknownMethodCode,
+                                                       invalidRequestCode, serverErrorCode};
 
 bool isStandingCode(std::int32_t code) {
     return std::find(standingCodes.begin(), standingCodes.end(), code) != standingCodes.end();

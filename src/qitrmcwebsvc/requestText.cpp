@@ -1,10 +1,10 @@
 #include "qitrmcwebsvc/requestText.h"
 
 #include <cmath>
-#include <cstring>
 #include <optional>
 
 #include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/exponentGuard.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -12,8 +12,6 @@ namespace nQITRMCWEBSVC100 {
 using namespace nQITRMCSHAREDCMN100;
 
 namespace {
-
-constexpr std::int32_t parseErrorCode = -32700;
 
 // Stands between the reader and the document: refuses what the reader lets through although the
 // rest of the service, or a response that quotes the request, could not carry it.
