@@ -1,7 +1,9 @@
 #include <dlfcn.h>
 #include <gtest/gtest.h>
 
+#include <memory>
 #include <string>
+#include <vector>
 
 #include "TestXlator.h"
 #include "qixlator/exported.h"
@@ -175,8 +177,8 @@ TEST_F(SessionTest, ATranslatorThatCannotBeKeptIsDestroyedAtOnce) {
 }
 
 TEST_F(SessionTest, MoreTranslatorsThanThereIsRoomForAtFirstAreKept) {
-    std::vector<std::unique_ptr<TestXlator>> xlators;
     std::vector<std::string> names;
+    std::vector<std::unique_ptr<TestXlator>> xlators;
     for (int number = 0; number < 10; ++number) {
         names.push_back("test" + std::to_string(number));
     }
