@@ -39,9 +39,8 @@ class Details {
 
 // The keys of the labels in use.
 namespace tag {
-inline constexpr std::string_view address = "kUsageTypeAddress";
 inline constexpr std::string_view areaSize = "kUsageTypeNvmemAreaSize";
-inline constexpr std::string_view argument = "kUsageTypeArgument";
+inline constexpr std::string_view argument = "kUsageTypeArgumentName";
 inline constexpr std::string_view attribute = "kUsageTypeAttributeName";
 inline constexpr std::string_view command = "kUsageTypeCommandName";
 inline constexpr std::string_view dataType = "kUsageTypeDataType";
@@ -49,25 +48,26 @@ inline constexpr std::string_view device = "kUsageTypeDevice";
 inline constexpr std::string_view devices = "kUsageTypeDevices";
 inline constexpr std::string_view explanation = "kUsageTypeDetails";
 inline constexpr std::string_view fileName = "kUsageTypeFileName";
-inline constexpr std::string_view handle = "kUsageTypeHandle";
-inline constexpr std::string_view jsonPointer = "kUsageTypeJsonPointer";
+inline constexpr std::string_view handle = "kUsageTypeIdentifier";
+inline constexpr std::string_view jsonPointer = "kUsageTypeJsonDocPointer";
 inline constexpr std::string_view maximum = "kUsageTypeMaximumValue";
 inline constexpr std::string_view minimum = "kUsageTypeMinimumValue";
-inline constexpr std::string_view nvmemArea = "kUsageTypeNvmemArea";
+inline constexpr std::string_view nvmemAddress = "kUsageTypeNvmemAddress";
 inline constexpr std::string_view propertyName = "kUsageTypePropertyName";
-inline constexpr std::string_view registerSize = "kUsageTypeRegisterSize";
-inline constexpr std::string_view requestedSize = "kUsageTypeRequestedSize";
+inline constexpr std::string_view registerAddress = "kUsageTypeRegisterAddress";
+inline constexpr std::string_view registerWidth = "kUsageTypeRegisterWidth";
+inline constexpr std::string_view requestedBytes = "kUsageTypeRequestedBytes";
 inline constexpr std::string_view requestedValue = "kUsageTypeRequestedValue";
-inline constexpr std::string_view resource = "kUsageTypeResource";
-inline constexpr std::string_view resources = "kUsageTypeResources";
+inline constexpr std::string_view resource = "kUsageTypeResourceName";
 inline constexpr std::string_view sessionHandle = "kUsageTypeSessionHandle";
 inline constexpr std::string_view timeout = "kUsageTypeTimeout";
+inline constexpr std::string_view valueCount = "kUsageTypeValueCount";
 }  // namespace tag
 
 // The keys of the phrases in use.
 namespace term {
-inline constexpr std::string_view reserveForWriting = "kAuxTermReserveForWriting";
-inline constexpr std::string_view devicesWithoutAnswer = "kAuxTermDevicesWithoutAnswer";
+inline constexpr std::string_view notAllowed = "kAuxTermOperationNotAllowed";
+inline constexpr std::string_view unreachableDevices = "kAuxTermUnreachableDevices";
 }  // namespace term
 
 }  // namespace simulator

@@ -22,7 +22,7 @@ void expectAnswers(const std::vector<Device*>& devices, double timeout) {
         return;
     }
     Refusal refusal(code::deviceUnreachable);
-    refusal.header(term::devicesWithoutAnswer);
+    refusal.header(term::unreachableDevices);
     for (const Device* device : silent) {
         refusal.usage(tag::device, device->name);
         refusal.cause(Refusal(code::noAnswer).usage(tag::device, device->name));

@@ -9,8 +9,8 @@ namespace simulator {
 void NvmemMemory::expectInside(uint32_t address, uint32_t count) const {
     if (uint64_t{address} + count > lasting.size()) {
         throw Refusal(code::nvmemOutOfRange)
-            .usage(tag::address, address)
-            .usage(tag::requestedSize, count)
+            .usage(tag::nvmemAddress, address)
+            .usage(tag::requestedBytes, count)
             .usage(tag::areaSize, size());
     }
 }

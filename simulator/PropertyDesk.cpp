@@ -141,7 +141,7 @@ void PropertyDesk::writeAll(const std::vector<Place>& places, DataType type,
         expectType(*places[i].definition, type, places.size());
         if (places.size() > 1 && elementCount(values) != places.size()) {
             throw about(code::wrongElementCount, *places[i].definition)
-                .usage(tag::requestedSize, static_cast<uint32_t>(elementCount(values)));
+                .usage(tag::valueCount, static_cast<uint32_t>(elementCount(values)));
         }
         parts.push_back(places.size() > 1 ? elementAt(values, i) : values);
         expectAcceptable(places[i], parts.back());

@@ -30,8 +30,8 @@ bool Registers::add(RegisterBlock block) {
 size_t Registers::find(uint32_t address, uint32_t width) const {
     if (address % width != 0) {
         throw Refusal(code::misalignedRegister)
-            .usage(tag::address, address)
-            .usage(tag::registerSize, width * 8);
+            .usage(tag::registerAddress, address)
+            .usage(tag::registerWidth, width * 8);
     }
     for (size_t i = 0; i < blocks.size(); ++i) {
         if (address >= blocks[i].address && uint64_t{address} + width <= endOf(blocks[i])) {
@@ -39,8 +39,8 @@ size_t Registers::find(uint32_t address, uint32_t width) const {
         }
     }
     throw Refusal(code::unmappedRegister)
-        .usage(tag::address, address)
-        .usage(tag::registerSize, width * 8);
+        .usage(tag::registerAddress, address)
+        .usage(tag::registerWidth, width * 8);
 }
 
 uint64_t Registers::read(uint32_t address, uint32_t width) const {
@@ -56,7 +56,7 @@ uint64_t Registers::read(uint32_t address, uint32_t width) const {
 void Registers::write(uint32_t address, uint32_t width, uint64_t value) {
     RegisterBlock& block = blocks[find(address, width)];
     if (!block.writable) {
-        throw Refusal(code::readOnlyRegister).usage(tag::address, address);
+        throw Refusal(code::readOnlyRegister).usage(tag::registerAddress, address);
     }
     const size_t offset = address - block.address;
     for (uint32_t i = 0; i < width; ++i) {

@@ -152,7 +152,7 @@ void Reservations::expectWritable(nQITRMCAPI100_Session session, const Device& d
     }
     if (held != nullptr && held->access == readOnlyAccess) {
         throw Refusal(code::readOnlyReservation)
-            .elaboration(term::reserveForWriting)
+            .elaboration(term::notAllowed)
             .usage(tag::device, device.name);
     }
 }

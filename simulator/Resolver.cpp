@@ -31,7 +31,7 @@ void expectOne(const std::vector<Resource*>& resources) {
         for (const Resource* resource : resources) {
             names.push_back(resource->fullName());
         }
-        throw Refusal(code::severalResources).usage(tag::resources, names);
+        throw Refusal(code::severalResources).usage(tag::resource, names);
     }
 }
 

@@ -33,7 +33,7 @@ void expectFault(const std::string& text, const std::string& pointer, const std:
     EXPECT_EQ(probe.output,
               "-250952\n" +
                   detailsOf("chassisNotLoaded", usage("FileName", "\"" + file.path + "\"") + "," +
-                                                    usage("JsonPointer", "\"" + pointer + "\"") +
+                                                    usage("JsonDocPointer", "\"" + pointer + "\"") +
                                                     "," + usage("Details", "\"" + words + "\"")) +
                   "\n0 0 0\n");
     EXPECT_EQ(probe.errors, "qitrmcapi: " + file.path + ": " + pointer +

@@ -140,7 +140,7 @@ std::string silence(const std::string& device) {
 
 std::string unreachable(const std::string& entries, const std::string& causes) {
     std::string text = detailsOf(
-        "deviceUnreachable", "{\"type\":\"header\",\"usage\":\"kAuxTermDevicesWithoutAnswer\"}," +
+        "deviceUnreachable", "{\"type\":\"header\",\"usage\":\"kAuxTermUnreachableDevices\"}," +
                                  entries + ",{\"type\":\"empty\"}," + usage("Timeout", "\"2\""));
     text.pop_back();
     return text + ",\"nested_error\":" + causes + "}";

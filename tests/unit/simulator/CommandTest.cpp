@@ -57,8 +57,9 @@ TEST_F(CommandTest, ACommandThatTakesTooLongIsGivenUp) {
 TEST_F(CommandTest, AnUnknownCommandIsRefusedWithItsResource) {
     const Outcome outcome = execute(session, "Mod1,Mod2", "DMM.Trigger", 1.0);
     EXPECT_EQ(outcome.code, -250975);
-    EXPECT_EQ(outcome.text, detailsOf("unknownCommand", usage("CommandName", "\"DMM.Trigger\"") +
-                                                            "," + usage("Resource", "\"Mod2\"")));
+    EXPECT_EQ(outcome.text,
+              detailsOf("unknownCommand", usage("CommandName", "\"DMM.Trigger\"") + "," +
+                                              usage("ResourceName", "\"Mod2\"")));
     EXPECT_EQ(get(getUInt64, session, "Mod1", "DMM.TriggerCount"), uint64_t{0});
 }
 

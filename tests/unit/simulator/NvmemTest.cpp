@@ -61,8 +61,8 @@ TEST_F(NvmemTest, BytesOutsideOfTheAreaAreRefused) {
         return std::string("{\"type\":\"usage\",\"usage\":\"kUsageType") + tag +
                "\",\"value\":" + std::to_string(value) + ",\"value_type\":\"uint32_t\"}";
     };
-    EXPECT_EQ(answer.text, detailsOf("nvmemOutOfRange", number("Address", 250) + "," +
-                                                            number("RequestedSize", 7) + "," +
+    EXPECT_EQ(answer.text, detailsOf("nvmemOutOfRange", number("NvmemAddress", 250) + "," +
+                                                            number("RequestedBytes", 7) + "," +
                                                             number("NvmemAreaSize", 256)));
     uint8_t byte = 0;
     Status huge;

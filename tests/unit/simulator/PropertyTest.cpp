@@ -86,11 +86,10 @@ TEST_F(PropertyTest, SeveralResourcesAskForOneElementEach) {
     const Outcome outcome =
         setArray(setDoubles, session, "Mod2/ch0:1", "PSU.Voltage", {1.0, 2.0, 3.0});
     EXPECT_EQ(outcome.code, -250967);
-    EXPECT_EQ(outcome.text,
-              detailsOf("wrongElementCount",
-                        usage("PropertyName", "\"PSU.Voltage\"") +
-                            ",{\"type\":\"usage\",\"usage\":\"kUsageTypeRequestedSize\","
-                            "\"value\":3,\"value_type\":\"uint32_t\"}"));
+    EXPECT_EQ(outcome.text, detailsOf("wrongElementCount",
+                                      usage("PropertyName", "\"PSU.Voltage\"") +
+                                          ",{\"type\":\"usage\",\"usage\":\"kUsageTypeValueCount\","
+                                          "\"value\":3,\"value_type\":\"uint32_t\"}"));
 }
 
 TEST_F(PropertyTest, OneBadElementKeepsAllFromBeingWritten) {
@@ -119,8 +118,9 @@ TEST_F(PropertyTest, AnotherTypeIsRefusedWithTheRightOne) {
 TEST_F(PropertyTest, AnUnknownPropertyIsRefusedWithItsResource) {
     const auto answer = get(getDouble, session, "mod2", "DMM.Range");
     EXPECT_EQ(answer.code, -250964);
-    EXPECT_EQ(answer.text, detailsOf("unknownProperty", usage("PropertyName", "\"DMM.Range\"") +
-                                                            "," + usage("Resource", "\"Mod2\"")));
+    EXPECT_EQ(answer.text,
+              detailsOf("unknownProperty", usage("PropertyName", "\"DMM.Range\"") + "," +
+                                               usage("ResourceName", "\"Mod2\"")));
     EXPECT_EQ(get(getDouble, session, "Mod1", "dmm.range").code, -250964);
     EXPECT_EQ(get(getDouble, session, "Mod1,Mod2", "DMM.Range").code, -250964);
     EXPECT_EQ(getTexts(session, "Mod1", "Dev.Modules").code, -250964);
@@ -233,7 +233,7 @@ TEST_F(PropertyTest, AReadOnlyReservationKeepsFromWriting) {
     EXPECT_EQ(outcome.code, -250972);
     EXPECT_EQ(outcome.text,
               detailsOf("readOnlyReservation",
-                        "{\"type\":\"elaboration\",\"usage\":\"kAuxTermReserveForWriting\"}," +
+                        "{\"type\":\"elaboration\",\"usage\":\"kAuxTermOperationNotAllowed\"}," +
                             usage("Device", "\"Mod1\"")));
 }
 
@@ -370,9 +370,9 @@ TEST_F(PropertyTest, ANullDeviceIsTheSessionsDefault) {
     Status several;
     nQITRMCAPI100_getDevicePropertyString(session, nullptr, "Dev.Name", &text, &several);
     EXPECT_EQ(several.code, -250966);
-    EXPECT_EQ(
-        several.text(),
-        detailsOf("severalResources", usage("Resources", "[\"Mod1\",\"Mod2\",\"Mod4\",\"Mod5\"]")));
+    EXPECT_EQ(several.text(),
+              detailsOf("severalResources",
+                        usage("ResourceName", "[\"Mod1\",\"Mod2\",\"Mod4\",\"Mod5\"]")));
     Session none;
     Status missing;
     nQITRMCAPI100_getDevicePropertyString(none, nullptr, "Dev.Name", &text, &missing);

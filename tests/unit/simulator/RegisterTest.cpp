@@ -36,10 +36,10 @@ constexpr auto write64 = nQITRMCAPI100_writeRegisterUInt64;
 using RegisterTest = BenchTest;
 
 std::string where(uint32_t address, uint32_t bits) {
-    return "{\"type\":\"usage\",\"usage\":\"kUsageTypeAddress\",\"value\":" +
+    return "{\"type\":\"usage\",\"usage\":\"kUsageTypeRegisterAddress\",\"value\":" +
            std::to_string(address) +
            ",\"value_type\":\"uint32_t\"},{\"type\":\"usage\",\"usage\":"
-           "\"kUsageTypeRegisterSize\",\"value\":" +
+           "\"kUsageTypeRegisterWidth\",\"value\":" +
            std::to_string(bits) + ",\"value_type\":\"uint32_t\"}";
 }
 

@@ -149,7 +149,7 @@ TEST(ReservationTest, ANullTextIsRefusedByName) {
     nQITRMCAPI100_reserveDevices(session, "Mod1", 3, nullptr, 0.0, &status);
     EXPECT_EQ(status.code, -250954);
     EXPECT_EQ(status.text(),
-              detailsOf("missingArgument", usage("Argument", "\"reservationGroup\"")));
+              detailsOf("missingArgument", usage("ArgumentName", "\"reservationGroup\"")));
 }
 
 TEST(ReservationTest, ANegativeStatusKeepsTheDriverFromActing) {

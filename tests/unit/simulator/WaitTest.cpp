@@ -249,7 +249,7 @@ TEST(WaitTest, AResourceCarriesOutOneCommandAtATime) {
     Status status;
     nQITRMCAPI100_executeGenericCommand(session, "Mod1", "DMM.Trigger", 0.0, &status);
     EXPECT_EQ(status.code, -250977);
-    EXPECT_EQ(status.text(), detailsOf("resourceBusy", usage("Resource", "\"Mod1\"")));
+    EXPECT_EQ(status.text(), detailsOf("resourceBusy", usage("ResourceName", "\"Mod1\"")));
     EXPECT_EQ(execute(session, "Mod1/ch0", "DMM.Zero", 0.0), 0);
     EXPECT_EQ(resultAfter(result, [&] { session.abort(); }), -250963);
     EXPECT_EQ(execute(session, "Mod1", "DMM.Trigger", 0.0), 0);

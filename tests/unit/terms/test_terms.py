@@ -5,7 +5,7 @@ import unicodedata
 
 import pytest
 
-from term_tables import ALL_ROWS, ENGLISH_ONLY, LANGUAGES, ROWS, TABLES, TERMS_BY_KEY
+from term_tables import ALL_ROWS, ENGLISH_ONLY, LANGUAGES, ROWS, TABLES, TERMS, TERMS_BY_KEY
 
 # Texts on which other parts of the service and its users rely.
 FIXED_TEXTS = {
@@ -102,6 +102,12 @@ def test_english_labels_are_in_title_case():
 @pytest.mark.parametrize("key", RAISED_BY_THE_SERVICE + ATTRIBUTE_IDS)
 def test_each_tag_that_the_service_uses_has_a_term(key):
     assert TERMS_BY_KEY[key]["eng"]
+
+
+def test_each_tag_and_phrase_of_the_simulated_driver_has_a_term():
+    details = (TERMS.parents[1] / "simulator" / "Details.h").read_text(encoding="utf-8")
+    keys = re.findall(r'"(k(?:UsageType|AuxTerm)\w+)"', details)
+    assert keys and set(keys) <= set(TERMS_BY_KEY)
 
 
 @pytest.mark.parametrize("key", FIXED_TEXTS)
