@@ -22,8 +22,7 @@ class RequestHandler {
     RequestHandler& operator=(const RequestHandler&) = delete;
 
     // Answers a single request or a batch. Returns one complete JSON text, an error text included;
-    // throws when not even an error can be put into words, when a result holds a number that JSON
-    // does not have, or when memory is exhausted.
+    // throws when not even an error can be put into words or memory is exhausted.
     std::string handleRequest(const std::string& body);
 
   private:

@@ -83,13 +83,13 @@ def session(client):
     pytest.param(b"[" * 2000, "Terminate parsing due to Handler error.", 1001, id="too deep"),
 ])
 def test_a_body_that_is_not_json(client, body, details, offset):
-    assert client.ask_exactly(body) == standing(
+    assert client.ask_whole(body) == standing(
         -32700, text(PARSE, f"Details: {details}", f"Offset: {offset}"), id="null")
 
 
 @pytest.mark.parametrize("body", [b"[]", b"1", b'"x"', b"null"])
 def test_a_root_that_is_no_request(client, body):
-    assert client.ask_exactly(body) == standing(-32600, text(REQUEST), id="null")
+    assert client.ask_whole(body) == standing(-32600, text(REQUEST), id="null")
 
 
 @pytest.mark.parametrize("body, member, id", [
@@ -100,26 +100,26 @@ def test_a_root_that_is_no_request(client, body):
     (b'{"id":1,"jsonrpc":"2.0","method":"closeSession","params":[]}', "params", "1"),
 ])
 def test_a_faulty_envelope(client, body, member, id):
-    assert client.ask_exactly(body) == standing(
+    assert client.ask_whole(body) == standing(
         -32600, text(REQUEST, f"Invalid Member: {member}"), id=id)
 
 
 @pytest.mark.parametrize("method", ["", "closesession", "größe", "a \"b\" \\ c", "Devices: x"])
 def test_an_unknown_method(client, method):
-    assert client.ask_exactly(call(method)) == standing(-32601, text(METHOD, f"Method: {method}"))
+    assert client.ask_whole(call(method)) == standing(-32601, text(METHOD, f"Method: {method}"))
 
 
 def test_an_unknown_method_of_several_lines_stays_on_one(client):
-    assert client.ask_exactly(call("a\nb")) == standing(-32601, text(METHOD, "Method: a b"))
+    assert client.ask_whole(call("a\nb")) == standing(-32601, text(METHOD, "Method: a b"))
 
 
 def test_an_unknown_method_that_is_not_utf8_is_quoted_with_replacement_characters(client):
-    assert client.ask_exactly(b'{"jsonrpc":"2.0","id":1,"method":"a\xffb\xc3"}') == standing(
+    assert client.ask_whole(b'{"jsonrpc":"2.0","id":1,"method":"a\xffb\xc3"}') == standing(
         -32601, text(METHOD, "Method: a\N{REPLACEMENT CHARACTER}b\N{REPLACEMENT CHARACTER}"))
 
 
 def test_a_skipped_element_of_a_batch(client):
-    assert client.ask_exactly(b"[" + call("x") + b"," + call("closeSession", id="2") + b"]") == (
+    assert client.ask_whole(b"[" + call("x") + b"," + call("closeSession", id="2") + b"]") == (
         b"[" + standing(-32601, text(METHOD, "Method: x")) + b"," +
         wrapped(-32001, text(SKIPPED), id="2") + b"]")
 
@@ -182,7 +182,7 @@ ONE_OF = "You must specify none or only one of the following parameters: "
      "This parameter you specified is unsupported."),
 ])
 def test_a_parameter_that_breaks_the_schema(client, method, params, pointer, sentence):
-    assert client.ask_exactly(call(method, params)) == at(pointer, sentence)
+    assert client.ask_whole(call(method, params)) == at(pointer, sentence)
 
 
 @pytest.mark.parametrize("method, params, sentence", [
@@ -195,14 +195,14 @@ def test_a_parameter_that_breaks_the_schema(client, method, params, pointer, sen
     ("getModuleName", {"slot_number": 1}, "You must specify none or only one device."),
 ])
 def test_a_request_that_lacks_a_resource(client, session, method, params, sentence):
-    assert client.ask_exactly(call(method, {"session_id": session, **params})) == standing(
+    assert client.ask_whole(call(method, {"session_id": session, **params})) == standing(
         -32602, text(PARAMS, f"Details: {sentence}"))
 
 
 # ---- The service and the driver -------------------------------------------------------------------
 
 def test_an_unknown_session(client):
-    assert client.ask_exactly(call("closeSession", {"session_id": "_session999999"})) == wrapped(
+    assert client.ask_whole(call("closeSession", {"session_id": "_session999999"})) == wrapped(
         -250833, text(SESSION, "Session ID: _session999999"))
 
 
@@ -211,34 +211,34 @@ def test_an_unknown_session(client):
     ("nvmem_areas", "Mod1/none"), ("physical_channels", "Mod1/ch4:1")])
 def test_an_unknown_resource(client, session, member, name):
     params = {"session_id": session, "property": "x", member: name}
-    assert client.ask_exactly(call("getProperty", params)) == wrapped(
+    assert client.ask_whole(call("getProperty", params)) == wrapped(
         -250828, text(RESOURCE, f"Requested Value: {name}"))
 
 
 def test_a_malformed_name_that_is_not_utf8(client):
     body = (b'{"jsonrpc":"2.0","id":1,"method":"initializeSession","params":'
             b'{"physical_channels":"M\xff/ch4:1"}}')
-    assert client.ask_exactly(body) == wrapped(-250832, text(UTF8))
+    assert client.ask_whole(body) == wrapped(-250832, text(UTF8))
 
 
 def test_an_array_property_on_several_resources(client, session):
     params = {"session_id": session, "property": "Dev.PhysChans", "devices": ["Mod1", "Mod2"]}
-    assert client.ask_exactly(call("getProperty", params)) == wrapped(
+    assert client.ask_whole(call("getProperty", params)) == wrapped(
         -250829, text(SEVERAL, "Devices: Mod1,Mod2"))
 
 
 def test_a_device_that_is_no_chassis(client, session):
     params = {"session_id": session, "slot_number": 1, "device": "Mod1"}
-    assert client.ask_exactly(call("getModuleName", params)) == wrapped(-250812, text(NOT_CHASSIS))
+    assert client.ask_whole(call("getModuleName", params)) == wrapped(-250812, text(NOT_CHASSIS))
 
 
 def test_data_wider_than_the_register(client, session):
     params = {"session_id": session, "device": "Mod1", "address": 0, "size": 8, "data": 256}
-    assert client.ask_exactly(call("writeRegister", params)) == wrapped(-250860, text(TOO_WIDE))
+    assert client.ask_whole(call("writeRegister", params)) == wrapped(-250860, text(TOO_WIDE))
 
 
 def test_an_access_with_a_fraction_is_taken_for_a_fault_of_the_program(client):
-    assert client.ask_exactly(call("initializeSession", '{"devices":"Mod1","access":1.0}')) == wrapped(
+    assert client.ask_whole(call("initializeSession", '{"devices":"Mod1","access":1.0}')) == wrapped(
         -250800, text(INTERNAL))
 
 
@@ -247,20 +247,20 @@ def test_a_taken_device_is_told_with_the_sessions_that_hold_it(client):
     with client.session(f'{{"devices":"Mod1",{group}}}') as first:
         with client.session(f'{{"devices":"Mod1",{group}}}') as second:
             holders = ", ".join(sorted((first, second)))
-            assert client.ask_exactly(call("initializeSession", {"devices": "Mod1"})) == wrapped(
+            assert client.ask_whole(call("initializeSession", {"devices": "Mod1"})) == wrapped(
                 -250811, text(RESERVED, "Device: Mod1", f"Reserved by Sessions: {holders}"))
 
 
 def test_a_value_of_another_type(client, session):
-    properties = json.loads(client.ask_exactly(
+    properties = json.loads(client.ask_whole(
         call("getDevicePropertyList", {"session_id": session, "device": "Mod1"})))["result"]
     assert properties["dynamic_properties"]
     params = {"session_id": session, "device": "Mod1", "property": "Dev.ProductCategory"}
-    assert json.loads(client.ask_exactly(call("getPropertyInformation", params)))["result"][
+    assert json.loads(client.ask_whole(call("getPropertyInformation", params)))["result"][
         "data_type"] == "Int32"
     params = {"session_id": session, "devices": "Mod1", "property": "Dev.ProductCategory",
               "value": 1.0}
-    assert client.ask_exactly(call("setProperty", params)) == wrapped(
+    assert client.ask_whole(call("setProperty", params)) == wrapped(
         -250819, text(VALUE_TYPE, "Requested Data Type: Int32"))
 
 
@@ -268,5 +268,5 @@ def test_more_sessions_than_there_is_room_for(own_host):
     with Client(own_host) as client:
         shared = '{"devices":"Mod1","reservation_group":"g"}'
         for _ in range(100):
-            assert b'"result"' in client.ask_exactly(call("initializeSession", shared))
-        assert client.ask_exactly(call("initializeSession", shared)) == wrapped(-250901, text(TOO_MANY))
+            assert b'"result"' in client.ask_whole(call("initializeSession", shared))
+        assert client.ask_whole(call("initializeSession", shared)) == wrapped(-250901, text(TOO_MANY))

@@ -21,7 +21,7 @@ def message(code, details, id="1"):
 
 def test_requests_that_succeed_are_answered(bare_host):
     with Client(bare_host) as client, client.session() as session:
-        assert client.ask_exactly(call("abortSession", {"session_id": session})) == result_response()
+        assert client.ask_whole(call("abortSession", {"session_id": session})) == result_response()
 
 
 @pytest.mark.parametrize("body, answer", [
@@ -49,4 +49,4 @@ def test_failures_that_need_a_text_without_details_are_served_with_a_bare_500(ba
 def test_the_service_goes_on_after_such_a_failure(bare_host):
     bare_host.post(b"[]")
     with Client(bare_host) as client, client.session() as session:
-        assert client.ask_exactly(call("abortSession", {"session_id": session})) == result_response()
+        assert client.ask_whole(call("abortSession", {"session_id": session})) == result_response()

@@ -77,8 +77,12 @@ class Client:
         """Whether the answer has begun to arrive; waits for it up to timeout seconds."""
         return bool(select.select([self.connection.sock], [], [], timeout)[0])
 
-    def receive_exactly(self):
-        """The answer to what was sent: its body as it came."""
+    def receive(self):
+        """The answer to what was sent: its body, with the texts of failures blanked."""
+        return blanked(self.receive_whole())
+
+    def receive_whole(self):
+        """The answer to what was sent: its body as it is."""
         try:
             response = self.connection.getresponse()
             body = response.read()
@@ -89,17 +93,13 @@ class Client:
         assert served == (200, "application/json; charset=utf-8"), body
         return body
 
-    def receive(self):
-        """The same with the texts of failures blanked."""
-        return blanked(self.receive_exactly())
-
-    def ask_exactly(self, body):
-        self.send(body)
-        return self.receive_exactly()
-
     def ask(self, body):
         self.send(body)
         return self.receive()
+
+    def ask_whole(self, body):
+        self.send(body)
+        return self.receive_whole()
 
     def open_session(self, params=None):
         """Opens a session, which must succeed, and returns its id."""
