@@ -5,6 +5,7 @@
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/compactJson.h"
+#include "qitrmcwebsvc/findMember.h"
 #include "qitrmcwebsvcerr/ErrorDescriptions.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -18,11 +19,10 @@ const JsonValue* resolve(const JsonValue& schema, const std::string& pointerText
     return pointer.IsValid() ? pointer.Get(schema) : nullptr;
 }
 
-const JsonValue* findMember(const JsonValue* object, const std::string& name) {
+const JsonValue* memberOfObject(const JsonValue* object, const std::string& name) {
     if (!object || !object->IsObject())
         return nullptr;
-    const auto member = object->FindMember(name.c_str());
-    return member == object->MemberEnd() ? nullptr : &member->value;
+    return findMember(*object, name.c_str());
 }
 
 // Formatting through a stream would share the global locale's caches, which threads fill unguarded.
@@ -87,10 +87,10 @@ std::string describeKeyword(const JsonValue& schema, const SchemaFailure& failur
 
 std::string describeFailure(const JsonValue& schema, const SchemaFailure& failure) {
     const JsonValue* const broken = resolve(schema, failure.schemaPointer);
-    if (!findMember(broken, failure.keyword))
+    if (!memberOfObject(broken, failure.keyword))
         return "";
 
-    const JsonValue* const name = findMember(broken, failure.keyword + "ErrorDescription");
+    const JsonValue* const name = memberOfObject(broken, failure.keyword + "ErrorDescription");
     if (name && name->IsString())
         return getErrorDescription(name->GetString());
     return describeKeyword(schema, failure);

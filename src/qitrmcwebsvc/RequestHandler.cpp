@@ -5,6 +5,7 @@
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/compactJson.h"
+#include "qitrmcwebsvc/findMember.h"
 #include "qitrmcwebsvc/requestText.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -18,12 +19,20 @@ void addDefaultParamsToObject(JsonValue& value, JsonPool& allocator) {
         value.AddMember("params", JsonValue(rapidjson::kObjectType), allocator);
 }
 
+// A body of a few bytes for each element makes a response of hundreds for each, under the exclusive
+// lock; the limit is far above any real batch.
+constexpr rapidjson::SizeType maxBatchElements = 100000;
+
+bool isBatch(const JsonValue& root) {
+    return root.IsArray() && !root.Empty() && root.Size() <= maxBatchElements;
+}
+
 // The id as it was sent, whatever its type; null where there is none.
 JsonValue copyId(const JsonValue& requestValue, JsonPool& allocator) {
     if (!requestValue.IsObject())
         return JsonValue();
-    const auto id = requestValue.FindMember("id");
-    return id == requestValue.MemberEnd() ? JsonValue() : JsonValue(id->value, allocator);
+    const JsonValue* const id = findMember(requestValue, "id");
+    return id == nullptr ? JsonValue() : JsonValue(*id, allocator);
 }
 
 // To be called from inside a handler.
@@ -33,11 +42,25 @@ void setErrorFromCurrentException(SingleResponse& response) {
     response.setError(status);
 }
 
-JsonValue skippedResponse(const JsonValue& requestValue, JsonPool& allocator) {
-    SingleResponse response(copyId(requestValue, allocator), &allocator);
-    response.setError(*BasicError(skippedCode, QITRMC_HERE).status());
-    return std::move(response.getValue());
-}
+// The error of every element that a batch skips, in words that are made once.
+class SkippedError {
+  public:
+    void setOn(SingleResponse& response) {
+        if (error.IsNull())
+            error = make(*response.getAllocator());
+        JsonValue copy(error, *response.getAllocator());
+        response.setError(copy);
+    }
+
+  private:
+    static JsonValue make(JsonPool& pool) {
+        SingleResponse response(&pool);
+        response.setError(*BasicError(skippedCode, QITRMC_HERE).status());
+        return std::move(response.getValue()["error"]);
+    }
+
+    JsonValue error;
+};
 
 }  // namespace
 
@@ -65,7 +88,7 @@ void RequestHandler::answer(const std::string& body, JsonDocument& responseDocum
     if (requestDocument.IsObject()) {
         SharedAccess access(accessLock);
         handleSingleRequest(requestDocument, responseDocument, responseDocument.GetAllocator());
-    } else if (requestDocument.IsArray() && !requestDocument.Empty()) {
+    } else if (isBatch(requestDocument)) {
         ExclusiveAccess access(accessLock);
         handleBatchRequest(requestDocument, responseDocument, responseDocument.GetAllocator());
     } else {
@@ -101,12 +124,16 @@ void RequestHandler::handleBatchRequest(JsonValue& requests, JsonValue& response
                                         JsonPool& allocator) {
     responseValue.SetArray();
     bool carryOn = true;
+    SkippedError skippedError;
     for (JsonValue& element : requests.GetArray()) {
         JsonValue elementResponse;
-        if (carryOn)
+        if (carryOn) {
             carryOn = handleSingleRequest(element, elementResponse, allocator);
-        else
-            elementResponse = skippedResponse(element, allocator);
+        } else {
+            SingleResponse response(copyId(element, allocator), &allocator);
+            skippedError.setOn(response);
+            elementResponse = response.getValue();
+        }
         responseValue.PushBack(elementResponse, allocator);
     }
 }

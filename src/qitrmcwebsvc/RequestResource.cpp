@@ -8,6 +8,7 @@
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcsharedcmn/parseUtilities.h"
 #include "qitrmcwebsvc/DriverOwners.h"
+#include "qitrmcwebsvc/findMember.h"
 #include "qitrmcwebsvc/foldedText.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -71,10 +72,10 @@ class KnownNames {
 
 RequestResource::RequestResource(const JsonValue& params) {
     for (const auto& [member, kind] : resourceMembers) {
-        const auto found = params.FindMember(member);
-        if (found == params.MemberEnd())
+        const JsonValue* const value = findMember(params, member);
+        if (value == nullptr)
             continue;
-        readNames(found->value);
+        readNames(*value);
         resourceKind = kind;
         return;
     }

@@ -5,16 +5,12 @@
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/JsonRpcCodes.h"
+#include "qitrmcwebsvc/findMember.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
 
 using nQITRMCSHAREDCMN100::BasicError;
-
-const JsonValue* findMember(const JsonValue& object, const char* name) {
-    const auto member = object.FindMember(name);
-    return member == object.MemberEnd() ? nullptr : &member->value;
-}
 
 [[noreturn]] void throwInvalidMember(const char* name, const qierr_SourcePosition& position) {
     BasicError error(invalidRequestCode, position);

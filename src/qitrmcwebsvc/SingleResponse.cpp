@@ -61,6 +61,10 @@ void SingleResponse::setError(const qierr_Status& status) {
         data.AddMember("qitrmc_message", JsonValue(text, *allocator), *allocator);
         error.AddMember("data", data, *allocator);
     }
+    setError(error);
+}
+
+void SingleResponse::setError(JsonValue& error) {
     response.AddMember("error", error, *allocator);
 }
 

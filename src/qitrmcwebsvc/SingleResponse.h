@@ -26,6 +26,8 @@ class SingleResponse {
     // Makes "error" of a status. Throws qierr::Exception when its text cannot be made; nothing is
     // added then.
     void setError(const qierr_Status& status);
+    // Moves an error object that another response made into "error".
+    void setError(JsonValue& error);
 
     // The whole response, to be moved out.
     JsonValue& getValue() { return response; }

@@ -75,6 +75,9 @@ void serve(ws_Entry* entry, ws_Request* request) {
     std::string body;
     if (readPostBody(request, body) != 0)
         return SetHTTPResponseCode_QI_QVWS_(request, httpBadRequest);
+    // There is no handler when the last qitrmcInit failed, although the flag is set.
+    if (!requestHandler)
+        return SetHTTPResponseCode_QI_QVWS_(request, httpServerError);
     const std::string response = requestHandler->handleRequest(body);
     SetHTTPResponseMimeType_C_REST_QI_QVWS_(request, "application/json; charset=utf-8");
     write(request, response);

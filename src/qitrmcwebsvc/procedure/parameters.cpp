@@ -1,23 +1,19 @@
 #include "qitrmcwebsvc/procedure/parameters.h"
 
 #include "qitrmcwebsvc/EnumType.h"
+#include "qitrmcwebsvc/findMember.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
 
 constexpr std::int32_t readWriteAccess = 3;
 
-const JsonValue* findParam(const JsonValue& params, const char* name) {
-    const auto found = params.FindMember(name);
-    return found == params.MemberEnd() ? nullptr : &found->value;
-}
-
 std::string textOf(const JsonValue& value) {
     return std::string(value.GetString(), value.GetStringLength());
 }
 
 std::int32_t accessParam(const JsonValue& params) {
-    const JsonValue* access = findParam(params, "access");
+    const JsonValue* access = findMember(params, "access");
     return access == nullptr ? readWriteAccess : EnumType(*access, "ReservationAccess").value();
 }
 
@@ -28,17 +24,17 @@ std::string textParam(const JsonValue& params, const char* name) {
 }
 
 std::string textParam(const JsonValue& params, const char* name, const char* absent) {
-    const JsonValue* value = findParam(params, name);
+    const JsonValue* value = findMember(params, name);
     return value == nullptr ? std::string(absent) : textOf(*value);
 }
 
 double doubleParam(const JsonValue& params, const char* name, double absent) {
-    const JsonValue* value = findParam(params, name);
+    const JsonValue* value = findMember(params, name);
     return value == nullptr ? absent : value->GetDouble();
 }
 
 bool boolParam(const JsonValue& params, const char* name, bool absent) {
-    const JsonValue* value = findParam(params, name);
+    const JsonValue* value = findMember(params, name);
     return value == nullptr ? absent : value->IsTrue();
 }
 

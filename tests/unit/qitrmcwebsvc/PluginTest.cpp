@@ -191,6 +191,12 @@ TEST_F(PluginTest, AnswersAnErrorThatCannotBePutIntoWordsWithABareCode) {
     EXPECT_EQ(run(), served(refusedRoot));
 }
 
+TEST_F(PluginTest, AnswersWithABareCodeWhenItHasNoHandlerAlthoughItIsSwitchedOn) {
+    initialiseEnabled();
+    qitrmcFinalize();
+    EXPECT_EQ(run(), Lines{"code 500"});
+}
+
 TEST_F(PluginTest, ReplacesItsHandlerAndAllSessionsWhenInitialisedAgain) {
     initialiseEnabled();
     request.body = "{\"jsonrpc\":\"2.0\",\"id\":1,\"method\":\"initializeSession\"}";

@@ -143,6 +143,27 @@ TEST_F(RequestHandlerTest, StopsABatchAtAnEnvelopeFaultToo) {
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 
+TEST_F(RequestHandlerTest, MakesTheWordsForAllSkippedElementsOnce) {
+    std::string body = "[{}";
+    std::string expected = "[" + invalid("null", "id");
+    for (int id = 0; id < 50; ++id) {
+        body += ",{\"id\":" + std::to_string(id) + "}";
+        expected += "," + wrapped(std::to_string(id), "-32001", "");
+    }
+    plainDescriptions::failNext(1, 3);  // one for the first element, two for all the others
+    EXPECT_EQ(answer(body + "]"), expected + "]");
+    plainDescriptions::failNext(0);
+}
+
+TEST_F(RequestHandlerTest, RefusesABatchThatIsTooLongAsAWhole) {
+    std::string body = "[1";
+    for (int element = 1; element < 100000; ++element)
+        body += ",1";
+    EXPECT_EQ(answer(body + "]").substr(0, 60),
+              ("[" + refusal("null", "-32600", "")).substr(0, 60));
+    EXPECT_EQ(answer(body + ",1]"), refusal("null", "-32600", ""));
+}
+
 TEST_F(RequestHandlerTest, AnswersABatchOfOneWithAnArray) {
     EXPECT_EQ(answer("[" + open + "]"), "[" + opened("1", "_session1") + "]");
 }
