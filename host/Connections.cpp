@@ -10,6 +10,7 @@ namespace host {
 
 namespace {
 
+constexpr std::chrono::seconds kLongestWayIn(1);
 constexpr uint32_t kPatienceWhenFull = 2;
 constexpr uint32_t kNotWaiting = 0;
 
@@ -36,7 +37,9 @@ Connections::Connections(uint32_t most, uint32_t patience) noexcept
 
 bool Connections::waitForPlace() noexcept {
     std::unique_lock<std::mutex> lock(mutex);
+    changed.wait_for(lock, kLongestWayIn, [this] { return closed || !placeKept; });
     changed.wait(lock, [this] { return closed || open.size() < most; });
+    placeKept = true;
     return !closed;
 }
 
@@ -47,8 +50,10 @@ void Connections::close() noexcept {
 }
 
 Connection* Connections::add(int socket) noexcept {
+    const std::lock_guard<std::mutex> lock(mutex);
+    placeKept = false;
+    changed.notify_one();
     try {
-        const std::lock_guard<std::mutex> lock(mutex);
         Connection& connection = open.emplace_front(socket);
         connection.self = open.begin();
         return &connection;

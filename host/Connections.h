@@ -34,7 +34,9 @@ class Connections {
     // client's step.
     Connections(uint32_t most, uint32_t patience) noexcept;
 
-    // Waits until fewer connections are open than the host takes. False once close() was called.
+    // Waits until fewer connections are open than the host takes, and keeps that place for the next
+    // add(). When the client that had the place before was never added, it waits a second for it.
+    // False once close() was called. For one thread, which then lets a client in.
     bool waitForPlace() noexcept;
 
     // Ends every waitForPlace().
@@ -55,6 +57,7 @@ class Connections {
     const uint32_t patience;
     std::mutex mutex;
     std::condition_variable changed;
+    bool placeKept = false;
     bool closed = false;
     std::list<Connection> open;
 };

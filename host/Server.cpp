@@ -18,11 +18,7 @@ constexpr std::size_t kStackSize = 2 * 1024 * 1024;
 
 // The library closes a connection beyond its limit at once, so its limit stays above ours: a client
 // that finds all places taken waits with the system. That is why this server accepts by itself.
-constexpr unsigned kPlacesInPassing = 64;
-
-// How long to wait when a client cannot be accepted, so that a lasting reason does not keep a core
-// busy.
-constexpr std::chrono::milliseconds kPauseAfterFailure(10);
+constexpr unsigned kPlacesInPassing = 16;
 
 Connection* connectionOf(MHD_Connection* connection) {
     const auto* info = MHD_get_connection_info(connection, MHD_CONNECTION_INFO_SOCKET_CONTEXT);
@@ -174,8 +170,6 @@ void Server::acceptClients() noexcept {
         const int client = socket.accept(address, length);
         if (client >= 0)
             MHD_add_connection(daemon.get(), client, reinterpret_cast<sockaddr*>(&address), length);
-        else
-            std::this_thread::sleep_for(kPauseAfterFailure);
     }
 }
 

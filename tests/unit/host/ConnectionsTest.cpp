@@ -106,6 +106,23 @@ TEST(Connections, HaveAPlaceUntilAsManyAreOpenAsTheHostTakes) {
     EXPECT_TRUE(place.get());
 }
 
+TEST(Connections, KeepAPlaceForTheClientThatIsOnItsWayIn) {
+    const Pair pair;
+    Connections connections(10, 1);
+    EXPECT_TRUE(connections.waitForPlace());
+    std::future<bool> next =
+        std::async(std::launch::async, [&] { return connections.waitForPlace(); });
+    EXPECT_EQ(next.wait_for(kMoment), std::future_status::timeout);
+    connections.add(pair.host());
+    EXPECT_TRUE(next.get());
+}
+
+TEST(Connections, GiveThePlaceOfAClientThatNeverComesToTheNext) {
+    Connections connections(1, 1);
+    EXPECT_TRUE(connections.waitForPlace());
+    EXPECT_TRUE(connections.waitForPlace());
+}
+
 TEST(Connections, EndTheWaitForAPlaceWhenTheyAreClosed) {
     const Pair pair;
     Connections connections(1, 1);

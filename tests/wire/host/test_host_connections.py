@@ -115,6 +115,17 @@ def test_more_clients_than_places_are_all_served(start_host):
         assert list(answers) == [b"%d" % i for i in range(200)]
 
 
+def test_a_rush_of_clients_waits_for_places(start_host):
+    host = start_host("--threads", "2")
+    with contextlib.ExitStack() as stack:
+        clients = [stack.enter_context(host.raw_socket()) for _ in range(200)]
+        for client in clients:
+            client.sendall(raw_post("Echo", b"abc"))
+        for client in clients:
+            assert read_response(client) == (200, b"abc")
+            client.close()
+
+
 @pytest.mark.parametrize("start", [
     b"",
     b"POST /qitrmc/Echo HTTP/1.1\r\n",
