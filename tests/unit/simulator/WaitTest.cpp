@@ -156,15 +156,45 @@ TEST(WaitTest, WaitsAreServedInTheOrderOfArrival) {
     EXPECT_EQ(order, (std::vector<size_t>{0, 1, 2}));
 }
 
+// A session that wants two devices is not passed by those that want one of them.
+TEST(WaitTest, WhoeverWaitsForTwoDevicesIsNotOvertaken) {
+    Session early("Mod1,Mod4", 1);
+    Session late("Mod2");
+    std::mutex mutex;
+    std::vector<int> order;
+    const auto waiter = [&](int number, const char* devices) {
+        return std::async(std::launch::async, [&, number, devices] {
+            Session session;
+            const int32_t code = session.reserve(devices, 3, "", longTime);
+            const std::lock_guard<std::mutex> lock(mutex);
+            order.push_back(number);
+            return code;
+        });
+    };
+    auto first = waiter(1, "Mod1,Mod2");
+    awaitWriterInQueue("Mod1");
+    auto second = waiter(2, "Mod1,Mod4");
+    awaitWriterInQueue("Mod4");
+    early.close();
+    late.close();
+    EXPECT_EQ(first.get(), 0);
+    EXPECT_EQ(second.get(), 0);
+    EXPECT_EQ(order, (std::vector<int>{1, 2}));
+}
+
 TEST(WaitTest, WhoeverGivesUpWaitingDoesNotHoldUpThoseBehind) {
     Session holder("Mod1", 1);
-    Session writer;
-    Session reader;
-    auto writing = reserveLater(writer, "Mod1", 3);
+    Session marker("Mod4", 1);
+    Session first;
+    Session second;
+    auto givesUp = reserveLater(first, "Mod1,Mod2");
     awaitWriterInQueue("Mod1");
-    auto reading = reserveLater(reader, "Mod1", 1);
-    EXPECT_EQ(resultAfter(writing, [&] { writer.abort(); }), -250963);
-    EXPECT_EQ(reading.get(), 0);
+    auto goesOn = reserveLater(second, "Mod2,Mod4");
+    awaitWriterInQueue("Mod4");
+    marker.close();
+    EXPECT_FALSE(isReady(goesOn));
+    EXPECT_EQ(resultAfter(givesUp, [&] { first.abort(); }), -250963);
+    EXPECT_EQ(goesOn.get(), 0);
 }
 
 TEST(WaitTest, OtherSessionsGoOnWhileOneWaits) {
