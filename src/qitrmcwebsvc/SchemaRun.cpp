@@ -1,5 +1,7 @@
 #include "qitrmcwebsvc/SchemaRun.h"
 
+#include <algorithm>
+
 namespace nQITRMCWEBSVC100 {
 namespace {
 
@@ -9,10 +11,47 @@ namespace {
 // their place: that alone makes deeply nested requests cost no more than flat ones.
 constexpr int depthShownAsNull = 4;
 
+// How many bytes a character of UTF-8 has at most behind its first.
+constexpr std::size_t mostFollowingBytes = 3;
+
+bool isUnreserved(char c) {
+    return (c >= '0' && c <= '9') || (c >= 'A' && c <= 'Z') || (c >= 'a' && c <= 'z') || c == '-' ||
+           c == '.' || c == '_';
+}
+
+void appendEscaped(std::string& text, char c) {
+    constexpr const char* hexDigits = "0123456789ABCDEF";
+    const auto byte = static_cast<unsigned char>(c);
+    if (c == '~')
+        text += "~0";
+    else if (c == '/')
+        text += "~1";
+    else if (isUnreserved(c))
+        text += c;
+    else
+        text += {'%', hexDigits[byte >> 4], hexDigits[byte & 15]};
+}
+
+// The JSON library's own way to write a pointer takes a character that a name breaks off in from
+// behind the name. Here each byte stands for itself, so that the bytes of a request need not be
+// UTF-8.
 std::string uriFragment(const JsonPointer& pointer) {
-    JsonBuffer text;
-    pointer.StringifyUriFragment(text);
-    return std::string(text.GetString(), text.GetSize());
+    std::string text = "#";
+    for (std::size_t i = 0; i < pointer.GetTokenCount(); ++i) {
+        const JsonPointer::Token& token = pointer.GetTokens()[i];
+        text += '/';
+        for (rapidjson::SizeType at = 0; at < token.length; ++at)
+            appendEscaped(text, token.name[at]);
+    }
+    return text;
+}
+
+// Whether the last character may be meant to have more bytes than there are.
+bool mayBreakOff(const JsonValue& text) {
+    const char* const end = text.GetString() + text.GetStringLength();
+    const auto inspected = std::min<std::size_t>(mostFollowingBytes, text.GetStringLength());
+    return std::any_of(end - inspected, end,
+                       [](char c) { return static_cast<unsigned char>(c) >= 0xC0; });
 }
 
 }  // namespace
@@ -32,7 +71,16 @@ bool SchemaRun::visit(const JsonValue& value, int depth) {
         return visitObject(value, depth);
     if (value.IsArray())
         return visitArray(value, depth);
+    if (value.IsString() && mayBreakOff(value))
+        return visitBrokenOff(value);
     return value.Accept(validator);
+}
+
+// The pattern engine takes such a character from behind the text, so there must be something.
+bool SchemaRun::visitBrokenOff(const JsonValue& text) {
+    std::string followed(text.GetString(), text.GetStringLength());
+    followed.append(mostFollowingBytes, '\0');
+    return validator.String(followed.data(), text.GetStringLength(), true);
 }
 
 bool SchemaRun::visitObject(const JsonValue& object, int depth) {

@@ -34,6 +34,7 @@ class SchemaRun {
                                           rapidjson::BaseReaderHandler<JsonEncoding>, RunMemory>;
 
     bool visit(const JsonValue& value, int depth);
+    bool visitBrokenOff(const JsonValue& text);
     bool visitObject(const JsonValue& object, int depth);
     bool visitArray(const JsonValue& array, int depth);
 

@@ -270,12 +270,32 @@ TEST(SchemaValidator, WritesOddMemberNamesInUriFragmentForm) {
     EXPECT_EQ(invalidParameter("#/params/0", unsupported), closeSession(R"({"0":1})"));
 }
 
-TEST(SchemaValidator, CutsAPointerOffAtBytesThatAreNotUtf8) {
-    const auto refusal = closeSession("{\"ab\xff\xfe\":1}");
-    ASSERT_TRUE(refusal);
-    EXPECT_EQ(-32602, refusal->code);
-    EXPECT_NE(std::string::npos, refusal->orderedData.find("#/params/ab")) << *refusal;
-    EXPECT_NE(std::string::npos, refusal->orderedData.find(unsupported)) << *refusal;
+TEST(SchemaValidator, WritesBytesThatAreNotUtf8OneByOne) {
+    EXPECT_EQ(invalidParameter("#/params/ab%FF%FEc", unsupported), closeSession("{\"ab\xff\xfe"
+                                                                                "c\":1}"));
+}
+
+TEST(SchemaValidator, ReadsNothingBehindANameThatBreaksOffInACharacter) {
+    for (const std::string broken :
+         {"\xc3", "\xe2\x82", "\xe2", "\xf0\x9f\x92", "\xf0\x9f", "\xf0"})
+        for (std::size_t length = 1; length < 40; ++length) {
+            const std::string name = std::string(length, 'n');
+            const auto refusal = closeSession("{\"" + name + broken + "\":1}");
+            std::string expected = "#/params/" + name;
+            for (const char* byte : {"%F0", "%9F", "%92", "%E2", "%82", "%C3"})
+                if (broken.find(static_cast<char>(std::stoi(byte + 1, nullptr, 16))) != broken.npos)
+                    expected += byte;
+            EXPECT_EQ(invalidParameter(expected, unsupported), refusal);
+        }
+}
+
+// A text this long lies at the end of memory of its own. The pattern ends before the broken
+// character, as it does before a NUL, and so the text is left to the session manager.
+TEST(SchemaValidator, ReadsNothingBehindATextThatBreaksOffInACharacter) {
+    for (const char* broken : {"\xe2", "\xf0", "\xf0\x9f", "\xf0x"})
+        for (std::size_t length = 70000; length < 70008; ++length)
+            EXPECT_FALSE(closeSession(R"({"session_id":"_session)" + std::string(length, '1') +
+                                      broken + "\"}"));
 }
 
 // ---- The validator itself -----------------------------------------------------------------------
