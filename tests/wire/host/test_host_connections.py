@@ -229,6 +229,8 @@ def wait_until_refused(host):
     while time.monotonic() < deadline:
         try:
             host.raw_socket().close()
+        except ConnectionResetError:
+            continue  # the socket was shut in the middle of a connection
         except ConnectionRefusedError:
             return
     raise AssertionError("the host goes on accepting connections")
