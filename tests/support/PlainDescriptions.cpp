@@ -27,6 +27,18 @@ std::string text(const JsonValue& value) {
     return buffer.GetString();
 }
 
+// A status that ran out of memory, or comes from a broken driver, may lack any member.
+std::string member(const JsonValue& item, const char* name) {
+    const auto found = item.FindMember(name);
+    return found != item.MemberEnd() ? text(found->value) : "";
+}
+
+std::string describedItem(const JsonValue& item) {
+    if (item.HasMember("usage"))
+        return " " + member(item, "usage") + "=" + member(item, "value");
+    return " comment=" + member(item, "comment");
+}
+
 void failIfAsked() {
     if (failuresLeft == 0 || successesLeft-- > 0)
         return;
@@ -47,15 +59,12 @@ std::string nQITRMCWEBSVC100::describeStatus(const qierr_Status& status) {
     failIfAsked();
     std::string description = std::to_string(status.code);
     JsonDocument details;
-    details.Parse(status.json != nullptr ? status.json : "{}");
+    details.Parse<rapidjson::kParseIterativeFlag>(status.json != nullptr ? status.json : "{}");
     const JsonValue* items = JsonPointer("/translator_info/ordered_data").Get(details);
-    if (items == nullptr)
+    if (items == nullptr || !items->IsArray())
         return description;
-    for (const JsonValue& item : items->GetArray()) {
-        if (item.HasMember("usage"))
-            description += std::string(" ") + item["usage"].GetString() + "=" + text(item["value"]);
-        else
-            description += std::string(" comment=") + item["comment"].GetString();
-    }
+    for (const JsonValue& item : items->GetArray())
+        if (item.IsObject())
+            description += describedItem(item);
     return description;
 }

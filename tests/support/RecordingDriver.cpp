@@ -8,6 +8,7 @@
 
 #include "qierr/Status.h"
 #include "qierr/Writer.h"
+#include "support/FaultFree.h"
 
 RecordingDriver& RecordingDriver::instance() {
     static RecordingDriver driver;
@@ -43,10 +44,11 @@ int RecordingDriver::outstanding() const {
 
 RecordingDriver::Reply RecordingDriver::record(const std::string& name,
                                                const std::string& arguments) {
+    const FaultFree spared;
+    const std::string call = name + "(" + arguments + ")";
     Reply reply;
     {
         std::lock_guard<std::mutex> hold(mutex);
-        const std::string call = name + "(" + arguments + ")";
         recorded.push_back(call);
         for (const std::string& key : {call, name}) {
             const auto found = replies.find(key);
@@ -58,7 +60,7 @@ RecordingDriver::Reply RecordingDriver::record(const std::string& name,
     }
     if (reply.during)
         reply.during();
-    return reply;
+    return reply.workedOut ? reply.workedOut(call) : reply;
 }
 
 void RecordingDriver::count(int change) {
@@ -88,15 +90,27 @@ std::string written(Integer number) {
 }
 
 template <typename Element>
-std::string writtenArray(const Element* array, std::uint32_t count) {
-    std::string text = array == nullptr ? "null" : "[";
-    for (std::uint32_t i = 0; array != nullptr && i < count; ++i)
-        text += (i != 0 ? "," : "") + written(array[i]);
-    return array == nullptr ? text : text + "]";
+struct Array {
+    const Element* elements;
+    std::uint32_t count;
+};
+
+template <typename Element>
+Array<Element> arrayOf(const Element* elements, std::uint32_t count) {
+    return {elements, count};
+}
+
+template <typename Element>
+std::string written(const Array<Element>& array) {
+    std::string text = array.elements == nullptr ? "null" : "[";
+    for (std::uint32_t i = 0; array.elements != nullptr && i < array.count; ++i)
+        text += (i != 0 ? "," : "") + written(array.elements[i]);
+    return array.elements == nullptr ? text : text + "]";
 }
 
 template <typename... Arguments>
 std::string list(const Arguments&... arguments) {
+    const FaultFree spared;
     std::string text;
     ((text += (text.empty() ? "" : ", ") + written(arguments)), ...);
     return text;
@@ -125,6 +139,7 @@ Number numberIn(const Reply& reply) {
 }
 
 char* lentText(const std::string& text) {
+    const FaultFree spared;
     char* copy = static_cast<char*>(std::malloc(text.size() + 1));
     std::memcpy(copy, text.c_str(), text.size() + 1);
     return copy;
@@ -144,8 +159,9 @@ void give(const Reply& reply, char** out) {
 
 template <typename Number>
 void giveArray(const Reply& reply, Number** out, std::uint32_t* count) {
+    const FaultFree spared;
     *out = nullptr;
-    *count = 0;
+    *count = reply.countOfNoArray;
     std::visit(
         [&](const auto& values) {
             using Held = std::decay_t<decltype(values)>;
@@ -153,6 +169,7 @@ void giveArray(const Reply& reply, Number** out, std::uint32_t* count) {
                           !std::is_same_v<Held, std::monostate>) {
                 if constexpr (std::is_arithmetic_v<typename Held::value_type>) {
                     *out = static_cast<Number*>(std::malloc((values.size() + 1) * sizeof(Number)));
+                    *count = 0;
                     for (auto value : values)
                         (*out)[(*count)++] = static_cast<Number>(value);
                     RecordingDriver::instance().lend();
@@ -164,10 +181,12 @@ void giveArray(const Reply& reply, Number** out, std::uint32_t* count) {
 
 void giveArray(const Reply& reply, char*** out, std::uint32_t* count) {
     const auto* texts = std::get_if<std::vector<std::string>>(&reply.value);
+    const FaultFree spared;
     *out = nullptr;
-    *count = 0;
+    *count = reply.countOfNoArray;
     if (texts == nullptr)
         return;
+    *count = 0;
     *out = static_cast<char**>(std::malloc((texts->size() + 1) * sizeof(char*)));
     for (const std::string& text : *texts)
         (*out)[(*count)++] = lentText(text);
@@ -211,6 +230,7 @@ std::int32_t nQITRMCAPI100_translateStaticEnumStringToValue(const char* enumerat
 
 const char* nQITRMCAPI100_translateStaticEnumValueToString(const char* enumeration,
                                                            std::int32_t value) {
+    const FaultFree spared;
     static thread_local std::string borrowed;
     const Reply reply = RecordingDriver::instance().record("translateStaticEnumValueToString",
                                                            list(enumeration, value));
@@ -294,8 +314,7 @@ DEFINE_GET_TEXTS(Session)
 DEFINE_SET(Session, Double, double)
 DEFINE(setSessionPropertyStringArray, SESSION, const char* property, const char* const* array,
        std::uint32_t count) {
-    called("setSessionPropertyStringArray",
-           list(session, property) + ", " + writtenArray(array, count), status);
+    called("setSessionPropertyStringArray", list(session, property, arrayOf(array, count)), status);
 }
 
 #define DEFINE_GENERIC(type, Out, In)                                                             \
@@ -317,7 +336,7 @@ DEFINE(setSessionPropertyStringArray, SESSION, const char* property, const char*
     DEFINE(setGenericProperty##type##Array, SESSION, const char* resources, const char* property, \
            const In* array, std::uint32_t count) {                                                \
         called("setGenericProperty" #type "Array",                                                \
-               list(session, resources, property) + ", " + writtenArray(array, count), status);   \
+               list(session, resources, property, arrayOf(array, count)), status);                \
     }
 using InText = const char*;
 DEFINE_GENERIC(Bool, std::uint8_t, std::uint8_t)
@@ -398,9 +417,7 @@ DEFINE(getNvmemBytes, SESSION, const char* area, std::uint32_t address, std::uin
 DEFINE(setNvmemBytes, SESSION, const char* area, std::uint32_t address, const std::uint8_t* bytes,
        std::uint32_t size, const char* serialNumber, const char* password) {
     called("setNvmemBytes",
-           list(session, area, address) + ", " + writtenArray(bytes, size) + ", " +
-               list(serialNumber, password),
-           status);
+           list(session, area, address, arrayOf(bytes, size), serialNumber, password), status);
 }
 
 }  // extern "C"

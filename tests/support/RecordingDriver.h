@@ -26,6 +26,10 @@ class RecordingDriver {
         std::int32_t code = 0;
         std::string json = {};
         std::function<void()> during = {};  // runs inside the call
+        // The count that is told where an array is asked for and `value` is none.
+        std::uint32_t countOfNoArray = 0;
+        // Works the reply out from the text of the call, in place of all of the above.
+        std::function<Reply(const std::string& call)> workedOut = {};
     };
 
     static RecordingDriver& instance();
@@ -47,7 +51,8 @@ class RecordingDriver {
     // Texts, arrays and arrays of texts that were lent and not given back.
     int outstanding() const;
 
-    // For the driver's functions.
+    // For the driver's functions. Whatever memory is needed for writing down and for lending is
+    // there, also while allocations fail.
     Reply record(const std::string& name, const std::string& arguments);
     void lend() { count(+1); }
     void takeBack(const void* lent) { count(lent != nullptr ? -1 : 0); }

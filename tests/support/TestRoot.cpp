@@ -36,6 +36,12 @@ void TestRoot::makeDirectory(const std::string& path) const {
     std::filesystem::create_directories(locate(path));
 }
 
+void TestRoot::showDirectory(const std::string& path, const std::string& directory) const {
+    const std::filesystem::path place = locate(path);
+    std::filesystem::create_directories(place.parent_path());
+    std::filesystem::create_directory_symlink(directory, place);
+}
+
 void TestRoot::remove(const std::string& path) const {
     std::filesystem::remove_all(locate(path));
 }

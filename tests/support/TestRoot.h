@@ -14,6 +14,8 @@ class TestRoot {
     // Writes a file under its absolute path on the target, folders included.
     void write(const std::string& path, const std::string& content) const;
     void makeDirectory(const std::string& path) const;
+    // Lets a directory of this machine appear under an absolute path on the target.
+    void showDirectory(const std::string& path, const std::string& directory) const;
     void remove(const std::string& path) const;
     // Where a path of the target lies.
     std::string locate(const std::string& path) const;

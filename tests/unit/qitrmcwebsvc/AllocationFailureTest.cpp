@@ -3,9 +3,9 @@
 #include <new>
 #include <string>
 
-#include "allocationFaults.h"
 #include "embedded/EmbeddedFiles.h"
 #include "requests.h"
+#include "support/allocationFaults.h"
 
 #if defined(__SANITIZE_ADDRESS__)
 #include <sanitizer/lsan_interface.h>

@@ -1,7 +1,8 @@
 #pragma once
 
-// Makes allocations of this thread fail: of malloc and realloc where the test program's own code
-// calls them (it is linked with --wrap for both), and of operator new everywhere.
+// Makes allocations of this thread fail: of malloc, calloc and realloc where the test program's own
+// code calls them (it is linked with --wrap for each), and of operator new everywhere. Stand-ins
+// that are FaultFree are spared.
 class AllocationFault {
   public:
     enum class Extent { one, allFromThere };

@@ -1,10 +1,13 @@
-#include "allocationFaults.h"
+#include "support/allocationFaults.h"
 
 #include <cstdlib>
 #include <new>
 
+#include "support/FaultFree.h"
+
 extern "C" {
 void* __real_malloc(std::size_t size);
+void* __real_calloc(std::size_t count, std::size_t size);
 void* __real_realloc(void* block, std::size_t size);
 }
 
@@ -20,7 +23,7 @@ struct Fault {
 thread_local Fault fault;
 
 bool strikes() {
-    if (!fault.armed)
+    if (!fault.armed || FaultFree::isActive())
         return false;
     if (fault.struck)
         return fault.extent == AllocationFault::Extent::allFromThere;
@@ -48,6 +51,10 @@ void* __wrap_malloc(std::size_t size) {
     return strikes() ? nullptr : __real_malloc(size);
 }
 
+void* __wrap_calloc(std::size_t count, std::size_t size) {
+    return strikes() ? nullptr : __real_calloc(count, size);
+}
+
 void* __wrap_realloc(void* block, std::size_t size) {
     return strikes() ? nullptr : __real_realloc(block, size);
 }
@@ -57,6 +64,10 @@ void* operator new(std::size_t size) {
     if (void* const block = std::malloc(size == 0 ? 1 : size))
         return block;
     throw std::bad_alloc();
+}
+
+void* operator new(std::size_t size, const std::nothrow_t&) noexcept {
+    return std::malloc(size == 0 ? 1 : size);
 }
 
 void operator delete(void* block) noexcept {

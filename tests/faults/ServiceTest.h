@@ -1,0 +1,93 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "support/DriverTest.h"
+#include "support/FakeWebRuntime.h"
+#include "support/ModelledSessions.h"
+#include "support/TestRoot.h"
+#include "support/responseFault.h"
+
+extern "C" {
+void qitrmcInit();
+void qitrmcFinalize();
+void qitrmcRun(ws_Entry* entry, ws_Request* request);
+}
+
+// The base of tests that put faults before the whole plug-in: it is enabled and runs on a driver
+// that keeps sessions. In the end no session may be left in the driver, and no call may ever have
+// been made for one that was not open.
+class ServiceTest : public DriverTest {
+  protected:
+    using Lines = std::vector<std::string>;
+    using Outcomes = std::vector<std::int32_t>;
+
+    // Stands for the code of HTTP among outcomes.
+    static constexpr std::int32_t httpServerError = 500;
+    static constexpr std::int32_t outOfMemory = -250801;
+    // The same in the layers that put a status into words.
+    static constexpr std::int32_t memoryFull = -52000;
+    static constexpr std::int32_t skipped = -32001;
+
+    void SetUp() override {
+        DriverTest::SetUp();
+        sessions.answerCalls();
+        root.showDirectory("/usr/local/qinstal/share", QITRMC_SHARED);
+        root.write("/etc/qinstal/share/qitrmc.ini", "[WebService]\nEnable=1\n");
+        qitrmcInit();
+    }
+    void TearDown() override {
+        sessions.answerCalls();
+        qitrmcFinalize();
+        EXPECT_EQ(sessions.open(), std::vector<ModelledSessions::Handle>{});
+        EXPECT_EQ(sessions.callsForClosedSessions(), 0);
+        DriverTest::TearDown();
+    }
+
+    static std::string call(const std::string& method, const std::string& params) {
+        return R"({"jsonrpc":"2.0","id":1,"method":")" + method + R"(","params":)" + params + "}";
+    }
+    static std::string callFor(const std::string& method, ModelledSessions::Handle session) {
+        return call(method, R"({"session_id":"_session)" + std::to_string(session) + "\"}");
+    }
+
+    // What the plug-in did to answer a body.
+    Lines post(const std::string& body) {
+        ws_Request request;
+        request.body = body;
+        qitrmcRun(&entry, &request);
+        return request.done;
+    }
+
+    // How a body was answered, once it is sure that the answer is either whole or none.
+    static Outcomes outcomesOf(const Lines& done) {
+        if (done == Lines{"code 500"})
+            return {httpServerError};
+        const std::string write = "write ";
+        EXPECT_EQ(done.size(), 2u);
+        EXPECT_EQ(done.front(), "type application/json; charset=utf-8");
+        EXPECT_EQ(done.back().substr(0, write.size()), write);
+        const std::string text = done.back().substr(write.size());
+        const std::string fault = responseFault(text);
+        EXPECT_EQ(fault, "") << text;
+        return fault.empty() ? outcomesIn(text) : Outcomes{};
+    }
+    Outcomes outcomesOfPost(const std::string& body) { return outcomesOf(post(body)); }
+
+    // Shows that the service is as good as before: the access lock is free for either kind of
+    // request, nothing is lent, and each session of the driver can be closed by its id.
+    void expectSoundService() {
+        EXPECT_EQ(driver.outstanding(), 0);
+        EXPECT_EQ(outcomesOfPost("[" + call("initializeSession", "{}") + "]"), Outcomes{0});
+        for (const ModelledSessions::Handle session : sessions.open())
+            EXPECT_EQ(outcomesOfPost(callFor("closeSession", session)), Outcomes{0});
+        EXPECT_EQ(sessions.open(), std::vector<ModelledSessions::Handle>{});
+        driver.takeCalls();
+    }
+
+    ModelledSessions sessions;
+    TestRoot root;
+    FakeEntry entry{U"Call"};
+};

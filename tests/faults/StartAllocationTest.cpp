@@ -1,0 +1,86 @@
+#include <new>
+#include <optional>
+
+#include "ServiceTest.h"
+#include "support/allocationFaults.h"
+
+#if defined(__SANITIZE_ADDRESS__)
+#include <sanitizer/lsan_interface.h>
+#endif
+
+namespace {
+
+const std::vector<std::string> disabled = {
+    "code 404", "write QI-TRMC web server is disabled. Please enable it in QI-DESK."};
+
+class StartAllocationTest : public ServiceTest,
+                            public testing::WithParamInterface<AllocationFault::Extent> {
+  protected:
+    enum class Start { done, outOfMemory };
+
+    // Initialises with one fault. Returns how that ended if the fault struck.
+    std::optional<Start> startWithFault(int successes) {
+#if defined(__SANITIZE_ADDRESS__)
+        // The JSON library loses what it has compiled so far when the memory for the rest of a
+        // schema is missing. That can happen at the start only.
+        __lsan::ScopedDisabler expected;
+#endif
+        AllocationFault fault(successes, GetParam());
+        Start start = Start::done;
+        try {
+            qitrmcInit();
+        } catch (const std::bad_alloc&) {
+            start = Start::outOfMemory;
+        }
+        return fault.hasStruck() ? std::make_optional(start) : std::nullopt;
+    }
+
+    // The next allocation to fail. The validators of all methods are built alike, so the later ones
+    // are tried at ever greater intervals.
+    static int after(int successes) {
+        return successes + 1 + successes / 200;
+    }
+
+    const std::string open = call("initializeSession", "{}");
+};
+
+TEST_P(StartAllocationTest, EndsForWantOfMemoryAndCanBeRepeated) {
+    int tried = 0;
+    for (int successes = 0;; successes = after(successes)) {
+        SCOPED_TRACE("allocation " + std::to_string(successes + 1));
+        qitrmcFinalize();
+        const std::optional<Start> start = startWithFault(successes);
+        if (!start)
+            break;
+        ++tried;
+        // Memory that is missing for the configuration leaves the service switched off; without a
+        // handler it can say nothing, but must not fall over.
+        if (*start == Start::outOfMemory)
+            EXPECT_EQ(outcomesOfPost(open), Outcomes{httpServerError});
+        else
+            EXPECT_EQ(post(open), disabled);
+        qitrmcInit();
+        expectSoundService();
+        ASSERT_FALSE(HasFailure());
+    }
+    EXPECT_GT(tried, 0);
+    RecordProperty("allocations", tried);
+}
+
+TEST_P(StartAllocationTest, LeavesTheRunningHandlerInPlaceWhenThereIsNoMemoryForANewOne) {
+    EXPECT_EQ(outcomesOfPost(open), Outcomes{0});
+    // The configuration takes fewer allocations than this, the handler many more.
+    ASSERT_EQ(startWithFault(200), Start::outOfMemory);
+    EXPECT_EQ(outcomesOfPost(callFor("closeSession", sessions.opened())), Outcomes{0});
+    expectSoundService();
+}
+
+INSTANTIATE_TEST_SUITE_P(Faults, StartAllocationTest,
+                         testing::Values(AllocationFault::Extent::one,
+                                         AllocationFault::Extent::allFromThere),
+                         [](const auto& info) {
+                             return info.param == AllocationFault::Extent::one ? "OneFails"
+                                                                               : "AllFailFromThere";
+                         });
+
+}  // namespace

@@ -1,0 +1,57 @@
+#!/usr/bin/python3
+"""Writes first inputs for the harnesses that take requests, and a dictionary of the words in them.
+
+Usage: make_seeds.py FOLDER. Writes FOLDER/<harness>/* and FOLDER/words.dict.
+"""
+
+import json
+import random
+import sys
+from pathlib import Path
+
+UNIT_TESTS = Path(__file__).resolve().parents[1] / "unit"
+sys.path[:0] = [str(UNIT_TESTS / "embedded"), str(UNIT_TESTS / "qitrmcwebsvc")]
+from parameter_model import INLINE, METHODS  # noqa: E402
+from test_random_requests import random_params, request_text  # noqa: E402
+
+REQUESTS_PER_METHOD = 12
+ENVELOPE = ["jsonrpc", "id", "method", "params", "2.0", "_session1", "$ConnectedDevices"]
+
+
+def requests_of(method, source: random.Random) -> list[str]:
+    return [
+        request_text(method, random_params(method, source)) for _ in range(REQUESTS_PER_METHOD)
+    ]
+
+
+def write(folder: Path, number: int, text: str):
+    folder.mkdir(parents=True, exist_ok=True)
+    (folder / f"seed{number}").write_text(text, encoding="utf-8")
+
+
+def write_requests(folder: Path):
+    source = random.Random(1)
+    everything = []
+    for method in METHODS:
+        schema = method.file.removeprefix("procedure_").removesuffix(".json")
+        for request in requests_of(method, source):
+            write(folder / "validateSchema", len(everything), f"{schema}\n{request}")
+            write(folder / "handleRequest", len(everything), request)
+            everything.append(request)
+    for number in range(len(everything), len(everything) + 50):
+        batch = source.sample(everything, source.randint(1, 5))
+        write(folder / "handleRequest", number, f"[{','.join(batch)}]")
+
+
+def write_words(path: Path):
+    words = {method.name for method in METHODS}.union(
+        *(method.members for method in METHODS), ENVELOPE
+    )
+    words |= {str(item) for shape in INLINE.values() for item in getattr(shape, "items", ())}
+    path.write_text("".join(f"{json.dumps(word)}\n" for word in sorted(words)), encoding="utf-8")
+
+
+if __name__ == "__main__":
+    target = Path(sys.argv[1])
+    write_requests(target)
+    write_words(target / "words.dict")
