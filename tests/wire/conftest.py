@@ -1,4 +1,4 @@
-"""Fixtures of the wire tests. This file puts its folder on the import path of the tests below it."""
+"""Fixtures of the wire tests. Their folder is on the import path of the tests below it."""
 
 import pytest
 

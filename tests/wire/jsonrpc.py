@@ -1,7 +1,7 @@
 """JSON-RPC over a running host: requests as bytes, the bytes that must answer them, and a client.
 
-Ids, params and results are JSON texts here, not Python values, so that a test states every byte that
-it compares. A byte that is not UTF-8 stands in them as os.fsdecode() writes it.
+Ids, params and results are JSON texts here, not Python values, so that a test states every byte
+that it compares. A byte that is not UTF-8 stands in them as os.fsdecode() writes it.
 """
 
 import contextlib

@@ -5,7 +5,7 @@ import json
 import pytest
 
 from answers import EXPLANATIONS, error, failure, session_on, wrong_parameter
-from jsonrpc import call, result_response
+from jsonrpc import Client, call, result_response
 
 DONE = result_response()
 UNSUPPORTED = "This parameter you specified is unsupported."
@@ -35,6 +35,16 @@ def test_devices_are_connected_and_disconnected(rack):
         assert names_in(session, "ConnectedDevices") == names("Unit1")
         # That a device was not connected is a warning, which nobody sees.
         assert session.ask("disconnectFromDevices", '"devices":["Unit2","Unit1"]') == DONE
+        assert names_in(session, "ConnectedDevices") == names()
+
+
+@pytest.mark.concurrent
+def test_connecting_is_aborted_from_another_connection(rack_host, rack):
+    with Client(rack_host) as waiting, session_on(waiting) as session:
+        session.send("connectToDevices", '"devices":["Unit1","Slow"]')
+        while not waiting.is_answered():
+            assert rack.ask_whole(session.body("abortSession")) == DONE
+        assert waiting.receive_whole() == failure(-250963)
         assert names_in(session, "ConnectedDevices") == names()
 
 

@@ -140,10 +140,13 @@ FAILURES = {
             (-250972, "Crate", "x", {"opening": '{"devices":"Four","access":1}'}),
             (-250985, "Crate", "$"), (-250986, "Empty", "Unit1")]],
     "GetChassisIpOrHostname": [
-        *bad_names("device"), (-250812, ONE_UNIT), (-250959, NO_DEVICE), (-250964, '"device":"Bare"'),
+        *bad_names("device"), (-250812, ONE_UNIT), (-250959, NO_DEVICE),
+        (-250964, '"device":"Bare"'),
         (-250966, "", {"opening": '{"devices":"Unit1,Unit2"}'})],
 }
-# What takes two connections, a hundred sessions or ten seconds.
+
+# What takes two connections or a hundred sessions, and has a test of its own; and -250987, which would
+# take ten seconds and has one with the driver alone.
 PROVOKED_ELSEWHERE = {"initializeSession": {-250901}, "connectToDevices": {-250963, -250987},
                       "executeCommand": {-250963, -250977}}
 

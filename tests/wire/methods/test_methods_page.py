@@ -55,8 +55,8 @@ def test_the_page_has_a_section_for_each_of_the_26_methods():
 
 def test_a_method_without_an_entry_is_a_fault(sources):
     methods = make_methods.METHODS.read_text(encoding="utf-8")
-    sources("METHODS", methods.replace(
-        "#undef", 'QITRMC_METHOD("newMethod", NewMethod,\n   "procedure_close_session.json")\n#undef'))
+    row = 'QITRMC_METHOD("newMethod", NewMethod,\n              "procedure_close_session.json")\n'
+    sources("METHODS", methods.replace("#undef", row + "#undef"))
     with pytest.raises(make_methods.Fault, match="newMethod"):
         make_methods.page_text()
 
@@ -64,7 +64,7 @@ def test_a_method_without_an_entry_is_a_fault(sources):
 @pytest.mark.parametrize("method", TABLE["methods"])
 def test_a_missing_entry_is_a_fault(sources, method):
     sources("TABLE", {**TABLE, "methods": without(TABLE["methods"], method)})
-    with pytest.raises(make_methods.Fault, match="methods.json|TABLE"):
+    with pytest.raises(make_methods.Fault, match="TABLE"):
         make_methods.page_text()
 
 

@@ -17,7 +17,8 @@ VALUES = {"Bool": ("false", "true"), "Double": ("0.0", "2.5"), "Int32": ("0", "-
           "StringArray": ("[]", '["x"]'), "UInt32Array": ("[]", "[5]"),
           "UInt64Array": ("[]", "[5]")}
 # What the driver can do for properties that belong to no resource.
-READABLE = {"Sys": {"Bool", "Double", "UInt64", "StringArray"}, "Session": {"Double", "StringArray"}}
+READABLE = {"Sys": {"Bool", "Double", "UInt64", "StringArray"},
+            "Session": {"Double", "StringArray"}}
 WRITABLE = {"Sys": {"Bool", "Double"}, "Session": {"Double", "String", "StringArray"}}
 
 EVERY = [(prefix, type) for prefix in ("Sys", "Session") for type in VALUES]

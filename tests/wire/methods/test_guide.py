@@ -1,0 +1,78 @@
+"""The exchanges of docs/guide.md, sent in their order to a service that was just started.
+
+They are compared byte by byte, but for the blanks and line feeds between the tokens of JSON, which
+wrap them on the page. The ids of sessions are those of a fresh service, so that nothing has to be
+replaced.
+"""
+
+import json
+import pathlib
+import re
+
+from jsonrpc import Client, call
+
+GUIDE = pathlib.Path(__file__).resolve().parents[3] / "docs" / "guide.md"
+
+BLOCK = re.compile(r"^```json (request|answer)\n(.*?)^```$", re.MULTILINE | re.DOTALL)
+TEXT_OR_BLANKS = re.compile(r'("(?:[^"\\]|\\.)*")|\s+')
+
+BUSY, OUT_OF_TIME = -250977, -250976
+
+
+def compact(text):
+    """JSON without the blanks outside of its texts."""
+    return TEXT_OR_BLANKS.sub(lambda match: match[1] or "", text)
+
+
+def exchanges():
+    """The blocks of the guide in their order, as (kind, JSON text) pairs."""
+    guide = GUIDE.read_text(encoding="utf-8")
+    blocks = BLOCK.findall(guide)
+    assert guide.count("```json") == len(blocks), "a block is neither a request nor an answer"
+    return blocks
+
+
+def id_of(text):
+    """What an answer has in common with its request."""
+    message = json.loads(text)
+    return message["id"] if isinstance(message, dict) else tuple(one["id"] for one in message)
+
+
+def wait_until_busy(host, request):
+    """Returns when the device of a command carries it out. A second command without any time is
+    refused then, and given up without an effect before."""
+    params = json.loads(request)["params"]
+    probe = call("executeCommand", {**params, "timeout": 0})
+    with Client(host) as client:
+        while True:
+            code = json.loads(client.ask(probe))["error"]["data"]["qitrmc_code"]
+            if code == BUSY:
+                return
+            assert code == OUT_OF_TIME
+
+
+def test_the_exchanges_of_the_guide_come_back(own_host):
+    blocks = exchanges()
+    waiting = {}
+    for (kind, text), following in zip(blocks, [*blocks[1:], None]):
+        if kind == "request":
+            client = Client(own_host)
+            client.send(text.encode())
+            waiting[id_of(text)] = client
+            if following[0] == "request":
+                wait_until_busy(own_host, text)
+        else:
+            with waiting.pop(id_of(text)) as client:
+                assert client.receive_whole().decode() == compact(text)
+    assert not waiting
+
+
+def test_every_request_of_the_guide_is_answered_in_it():
+    asked = [id_of(text) for kind, text in exchanges() if kind == "request"]
+    answered = [id_of(text) for kind, text in exchanges() if kind == "answer"]
+    assert sorted(map(str, asked)) == sorted(map(str, answered))
+    assert len(set(asked)) == len(asked) > 30
+
+
+def test_blanks_in_texts_are_compared():
+    assert compact('{"a b" : [1, "x \\" y"]}\n') == '{"a b":[1,"x \\" y"]}'
