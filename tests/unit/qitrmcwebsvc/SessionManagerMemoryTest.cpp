@@ -1,6 +1,6 @@
 #include <optional>
 
-#include "allocationFaults.h"
+#include "support/allocationFaults.h"
 #include "qitrmcwebsvc/SessionManager.h"
 #include "support/DriverTest.h"
 

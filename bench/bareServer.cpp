@@ -1,0 +1,55 @@
+// The yardstick of the whole service: an HTTP server of the same library and with the same threads
+// as the development host, which answers every POST with one fixed text.
+//
+// Usage: qitrmc-bench-bare-server TEXT. Prints the line that the host prints, and serves until its
+// standard input ends.
+
+#include <microhttpd.h>
+
+#include <cstdio>
+#include <cstring>
+
+namespace {
+
+MHD_Result answer(void* text, MHD_Connection* connection, const char*, const char*, const char*,
+                  const char*, std::size_t* bodySize, void** state) {
+    static int begun;
+    if (*state == nullptr) {
+        *state = &begun;
+        return MHD_YES;
+    }
+    if (*bodySize != 0) {
+        *bodySize = 0;
+        return MHD_YES;
+    }
+    MHD_Response* response =
+        MHD_create_response_from_buffer(std::strlen(static_cast<char*>(text)), text,  //
+                                        MHD_RESPMEM_PERSISTENT);
+    MHD_add_response_header(response, "Content-Type", "application/json; charset=utf-8");
+    const MHD_Result result = MHD_queue_response(connection, MHD_HTTP_OK, response);
+    MHD_destroy_response(response);
+    return result;
+}
+
+}  // namespace
+
+int main(int count, char** arguments) {
+    if (count != 2) {
+        std::fprintf(stderr, "usage: %s TEXT\n", arguments[0]);
+        return 2;
+    }
+    MHD_Daemon* const daemon = MHD_start_daemon(
+        MHD_USE_INTERNAL_POLLING_THREAD | MHD_USE_THREAD_PER_CONNECTION | MHD_USE_POLL, 0, nullptr,
+        nullptr, answer, arguments[1], MHD_OPTION_END);
+    if (daemon == nullptr) {
+        std::fprintf(stderr, "cannot listen\n");
+        return 1;
+    }
+    std::printf("Listening on http://127.0.0.1:%u/qitrmc/Call\n",
+                unsigned{MHD_get_daemon_info(daemon, MHD_DAEMON_INFO_BIND_PORT)->port});
+    std::fflush(stdout);
+    while (std::getchar() != EOF) {
+    }
+    MHD_stop_daemon(daemon);
+    return 0;
+}

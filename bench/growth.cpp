@@ -1,0 +1,180 @@
+// Requests that grow in one respect: what each part of them costs should not depend on how many
+// there are. The name of a benchmark says what is counted, its argument how many.
+
+#include <benchmark/benchmark.h>
+
+#include <string>
+
+#include "Service.h"
+
+namespace {
+
+using Count = std::int64_t;
+
+std::string repeated(const std::string& text, Count count, const char* separator = "") {
+    std::string all;
+    for (Count i = 0; i < count; ++i)
+        all += (i == 0 ? "" : separator) + text;
+    return all;
+}
+
+std::string array(const std::string& element, Count count) {
+    return "[" + repeated(element, count, ",") + "]";
+}
+
+std::string text(const std::string& part, Count count) {
+    return '"' + repeated(part, count) + '"';
+}
+
+// ---- Requests -----------------------------------------------------------------------------------
+// Each makes the text of a request on `session`, a member with the id of an open session.
+
+using MakeRequest = std::string (*)(const std::string& session, Count count);
+
+std::string getTemperatures(const std::string& session, const std::string& resources) {
+    return Service::request("getProperty",
+                            session + R"(,"property":"Dev.Temperature",)" + resources);
+}
+
+std::string namesInDevices(const std::string& session, Count count) {
+    return getTemperatures(session, R"("devices":)" + array("\"Mod9\"", count));
+}
+
+std::string namesInOneText(const std::string& session, Count count) {
+    return getTemperatures(session, R"("devices":")" + repeated("mod18", count, ",") + '"');
+}
+
+std::string namesInRanges(const std::string& session, Count count) {
+    return getTemperatures(session, R"("physical_channels":)" + array("\"Mod1/ch0:7\"", count / 8));
+}
+
+std::string batchElements(const std::string& session, Count count) {
+    return array(getTemperatures(session, R"("devices":"Mod1")"), count);
+}
+
+std::string setTemperature(const std::string& session, const std::string& value) {
+    return Service::request(
+        "setProperty", session + R"(,"property":"Dev.Temperature","devices":["Mod1","Mod2"],)" +
+                           R"("value":)" + value);
+}
+
+std::string valueNumbers(const std::string& session, Count count) {
+    return setTemperature(session, array("36.625", count));
+}
+
+std::string nvmemBytesRead(const std::string& session, Count count) {
+    return Service::request(
+        "getNvmemBytes",
+        session + R"(,"nvmem_area":"Mod1/user","address":0,"size":)" + std::to_string(count));
+}
+
+std::string nvmemBytesWritten(const std::string& session, Count count) {
+    return Service::request(
+        "setNvmemBytes",
+        session + R"(,"nvmem_area":"Mod1/user","address":0,"data":)" + array("200", count));
+}
+
+// A request that does next to nothing, with further members.
+std::string closing(const std::string& session, const std::string& members) {
+    return R"({"jsonrpc":"2.0","id":1,"method":"abortSession","params":{)" + session + "}," +
+           members + "}";
+}
+
+std::string unknownMembers(const std::string& session, Count count) {
+    return closing(session, repeated(R"("unknown":1)", count, ","));
+}
+
+std::string nestedBrackets(const std::string& session, Count count) {
+    return closing(session, R"("x":)" + repeated("[", count) + repeated("]", count));
+}
+
+std::string siblingBrackets(const std::string& session, Count count) {
+    return closing(session, R"("x":)" + array(repeated("[", 16) + repeated("]", 16), count / 16));
+}
+
+std::string escapesInText(const std::string& session, Count count) {
+    return closing(session, R"("x":)" + text(R"(\u00e9\n)", count / 2));
+}
+
+std::string charactersInId(const std::string& session, Count count) {
+    return R"({"jsonrpc":"2.0","id":)" + text("\\\"", count) +
+           R"(,"method":"abortSession","params":{)" + session + "}}";
+}
+
+std::string longExponents(const std::string& session, Count count) {
+    return closing(session, R"("x":)" + array("0.1e-2147483647", count));
+}
+
+// ---- Requests that fail -------------------------------------------------------------------------
+
+std::string charactersOfUnknownName(const std::string& session, Count count) {
+    return getTemperatures(session, R"("devices":)" + text("x", count));
+}
+
+std::string escapesOfUnknownName(const std::string& session, Count count) {
+    return getTemperatures(session, R"("devices":)" + text(R"(\u00e9\n)", count / 2));
+}
+
+std::string bracketsTooDeep(const std::string& session, Count count) {
+    return closing(session, R"("x":)" + repeated("[", count));
+}
+
+std::string batchElementsSkipped(const std::string& session, Count count) {
+    return "[1," + repeated(getTemperatures(session, R"("devices":"Mod1")"), count, ",") + "]";
+}
+
+// ---- Registration -------------------------------------------------------------------------------
+
+struct Case {
+    const char* name;
+    MakeRequest make;
+    Count first;
+    Count last;
+    bool succeeds;
+};
+
+#define CASE(make, first, last, succeeds) \
+    { #make, make, first, last, succeeds }
+
+const Case cases[] = {
+    CASE(namesInDevices, 1024, 65536, true),
+    CASE(namesInOneText, 1024, 65536, true),
+    CASE(namesInRanges, 1024, 65536, true),
+    CASE(batchElements, 64, 4096, true),
+    CASE(valueNumbers, 1024, 65536, true),
+    CASE(nvmemBytesRead, 16384, 1048576, true),
+    CASE(nvmemBytesWritten, 1024, 65536, true),
+    CASE(unknownMembers, 1024, 65536, true),
+    CASE(nestedBrackets, 120, 960, true),
+    CASE(siblingBrackets, 1024, 65536, true),
+    CASE(escapesInText, 16384, 1048576, true),
+    CASE(charactersInId, 16384, 1048576, true),
+    CASE(longExponents, 1024, 65536, true),
+    CASE(charactersOfUnknownName, 16384, 1048576, false),
+    CASE(escapesOfUnknownName, 16384, 1048576, false),
+    CASE(bracketsTooDeep, 16384, 1048576, false),
+    CASE(batchElementsSkipped, 64, 1024, false),
+};
+
+void runGrowth(benchmark::State& state, const Case& measured) {
+    Service service;
+    const std::string session = R"("session_id":")" + service.openSession("Mod1") + '"';
+    const std::string request = measured.make(session, state.range(0));
+    if (isSuccess(service.answer(request)) != measured.succeeds)
+        state.SkipWithError("another outcome than expected");
+    for (auto _ : state)
+        benchmark::DoNotOptimize(service.answer(request));
+    state.SetComplexityN(state.range(0));
+}
+
+const bool registered = [] {
+    for (const Case& measured : cases)
+        benchmark::RegisterBenchmark((std::string("growth/") + measured.name).c_str(), runGrowth,
+                                     measured)
+            ->RangeMultiplier(4)
+            ->Range(measured.first, measured.last)
+            ->Complexity();
+    return true;
+}();
+
+}  // namespace

@@ -1,0 +1,4 @@
+-- For wrk: posts the text in BODY.
+
+wrk.method = "POST"
+wrk.body = os.getenv("BODY")
