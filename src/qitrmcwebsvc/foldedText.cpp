@@ -50,11 +50,34 @@ class FoldedCodePoints {
     std::size_t count = 0;
 };
 
+bool isAscii(char c) {
+    return static_cast<unsigned char>(c) < 0x80;
+}
+
+char foldAscii(char c) {
+    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+}
+
+// Drops what both texts begin with as far as they are ASCII, where a byte folds to a byte. False
+// when they differ there.
+bool dropEqualAscii(std::string_view& left, std::string_view& right) {
+    std::size_t same = 0;
+    while (same < left.size() && same < right.size() && isAscii(left[same]) &&
+           isAscii(right[same])) {
+        if (foldAscii(left[same]) != foldAscii(right[same]))
+            return false;
+        ++same;
+    }
+    left.remove_prefix(same);
+    right.remove_prefix(same);
+    return true;
+}
+
 }  // namespace
 
 bool equalFolded(std::string_view left, std::string_view right) {
-    if (left == right)
-        return true;
+    if (!dropEqualAscii(left, right))
+        return false;
     FoldedCodePoints leftPoints(left);
     FoldedCodePoints rightPoints(right);
     while (!leftPoints.atEnd() && !rightPoints.atEnd())

@@ -21,6 +21,14 @@ TEST(EqualFolded, LetsOneLetterStandForSeveral) {
     EXPECT_FALSE(equalFolded("ff", "\ufb03"));
 }
 
+TEST(EqualFolded, GoesOnAfterAsciiThatOnlyOneOfTheTextsHas) {
+    EXPECT_TRUE(equalFolded("10 \u212a", "10 k"));  // the sign of kelvins folds to k
+    EXPECT_TRUE(equalFolded("MA\ufb03x", "maFFIX"));
+    EXPECT_FALSE(equalFolded("MA\ufb03x", "maFFIY"));
+    EXPECT_FALSE(equalFolded("ma", "MA\ufb03"));
+    EXPECT_FALSE(equalFolded("@[`{", "`{@["));  // the neighbours of the letters
+}
+
 TEST(EqualFolded, DoesNotFoldAccentsOrWidths) {
     EXPECT_FALSE(equalFolded("e", "\u00e9"));
     EXPECT_FALSE(equalFolded("A", "\uff21"));
