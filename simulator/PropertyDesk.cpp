@@ -88,6 +88,10 @@ std::vector<PropertyDesk::Place> PropertyDesk::find(std::string_view resources,
     std::vector<Place> places;
     for (Resource* resource : found) {
         places.push_back(find(categoryOf(resource->kind), resource, resource->properties, name));
+        // Lists of several resources are refused. They must not pile up until that is found out.
+        if (found.size() > 1 && isArray(places.back().definition->type)) {
+            places.back().computed.reset();
+        }
     }
     return places;
 }

@@ -1,3 +1,4 @@
+#include <algorithm>
 #include <atomic>
 #include <functional>
 #include <new>
@@ -12,6 +13,9 @@ namespace {
 std::atomic<long> allowed{-1};
 // Whether one was denied.
 std::atomic<bool> denied{false};
+// How many allocations are there, and the most since this was last set.
+std::atomic<long> liveAllocations{0};
+std::atomic<long> mostAllocations{0};
 
 void* allocate(std::size_t size) {
     if (allowed.load() == 0) {
@@ -21,7 +25,14 @@ void* allocate(std::size_t size) {
     if (allowed.load() > 0) {
         --allowed;
     }
+    ++liveAllocations;
+    mostAllocations = std::max(mostAllocations.load(), liveAllocations.load());
     return std::malloc(size != 0 ? size : 1);
+}
+
+void release(void* memory) {
+    liveAllocations -= memory != nullptr ? 1 : 0;
+    std::free(memory);
 }
 
 }  // namespace
@@ -37,16 +48,16 @@ void* operator new[](std::size_t size) {
     return operator new(size);
 }
 void operator delete(void* memory) noexcept {
-    std::free(memory);
+    release(memory);
 }
 void operator delete[](void* memory) noexcept {
-    std::free(memory);
+    release(memory);
 }
 void operator delete(void* memory, std::size_t) noexcept {
-    std::free(memory);
+    release(memory);
 }
 void operator delete[](void* memory, std::size_t) noexcept {
-    std::free(memory);
+    release(memory);
 }
 
 namespace {
@@ -112,6 +123,23 @@ TEST(MemoryTest, ReadingATextOfSeveralDevices) {
                          nQITRMCAPI100_freeStringArray(array, count);
                      }),
               0);
+}
+
+TEST(MemoryTest, ListsOfManyDevicesDoNotPileUpBeforeTheyAreRefused) {
+    Session session;
+    std::string devices = "Mod1";
+    for (int i = 1; i < 1000; ++i) {
+        devices += ",Mod1";
+    }
+    Status status;
+    char** array = nullptr;
+    uint32_t count = 0;
+    const long before = liveAllocations;
+    mostAllocations = before;
+    nQITRMCAPI100_getGenericPropertyStringArray(session, devices.c_str(), "Dev.Properties", &array,
+                                                &count, &status);
+    EXPECT_EQ(status.code, -250966);
+    EXPECT_LT(mostAllocations - before, 100);
 }
 
 TEST(MemoryTest, WritingSeveralChannelsWritesAllOrNone) {
