@@ -41,17 +41,6 @@ TEST_P(RegisterWidthTest, TakesItsLargestValue) {
                      "writeRegisterUInt" + size + "(7, \"Mod1\", 100, " + largest + ")"}));
 }
 
-TEST_P(RegisterWidthTest, TakesNoneAboveIt) {
-    if (GetParam().size == 64)
-        return;
-    const std::string tooLarge = std::to_string(GetParam().largest + 1);
-    EXPECT_EQ(ask("writeRegister", R"("address":0,"size":)" + size + R"(,"data":)" + tooLarge),
-              "-250860");
-    EXPECT_EQ(ask("writeRegister", R"("address":0,"data":18446744073709551615,"size":)" + size),
-              "-250860");
-    EXPECT_EQ(driver.takeCalls(), Calls{});
-}
-
 TEST_P(RegisterWidthTest, MayBeWrittenWithAFraction) {
     give("readRegisterUInt" + size, std::uint64_t{1});
     EXPECT_EQ(ask("readRegister", R"("address":0,"size":)" + size + ".0"),
@@ -73,6 +62,30 @@ TEST_P(RegisterWidthTest, FailsAsTheDriverRefuses) {
 INSTANTIATE_TEST_SUITE_P(Widths, RegisterWidthTest,
                          testing::Values(Width{8, 255}, Width{16, 65535}, Width{32, 4294967295},
                                          Width{64, std::numeric_limits<std::uint64_t>::max()}));
+
+// No number that JSON holds as an integer is too large for the widest one.
+class NarrowRegisterTest : public RegisterWidthTest {};
+
+TEST_P(NarrowRegisterTest, TakesNoneAboveItsLargestValue) {
+    const std::string tooLarge = std::to_string(GetParam().largest + 1);
+    EXPECT_EQ(ask("writeRegister", R"("address":0,"size":)" + size + R"(,"data":)" + tooLarge),
+              "-250860");
+    EXPECT_EQ(ask("writeRegister", R"("address":0,"data":18446744073709551615,"size":)" + size),
+              "-250860");
+    EXPECT_EQ(driver.takeCalls(), Calls{});
+}
+
+INSTANTIATE_TEST_SUITE_P(Widths, NarrowRegisterTest,
+                         testing::Values(Width{8, 255}, Width{16, 65535}, Width{32, 4294967295}));
+
+TEST_F(RegistersTest, DataBeyondTheWidestRegisterIsRefusedByTheSchema) {
+    EXPECT_EQ(
+        ask("writeRegister", R"("address":0,"size":64,"data":18446744073709551616)"),
+        R"(-32602 [{"type":"usage","usage":"kUsageTypeParameter","value":"#/params/data",)"
+        R"("value_type":"string"},{"type":"usage","usage":"kUsageTypeDetails","value":"Wrong )"
+        R"(parameter data type. The data type must be integer.","value_type":"string"}])");
+    EXPECT_EQ(driver.takeCalls(), Calls{});
+}
 
 TEST_F(RegistersTest, TheNextAddressIsOneHigherAndWrapsAround) {
     give("readRegisterUInt32", std::uint64_t{9});
