@@ -43,7 +43,7 @@ void GetNvmemBytes::run(const JsonValue& params, const std::shared_ptr<SessionCo
     JsonValue data(rapidjson::kArrayType);
     reserveElements(data, size, pool);
     for (std::uint32_t i = 0; i < size; ++i)
-        data.PushBack(static_cast<unsigned>(buffer[i]), pool);
+        appendElement(data, pool).SetUint(buffer[i]);
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("data", data, pool);
     result.AddMember("next_address", address + 1, pool);
