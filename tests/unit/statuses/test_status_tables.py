@@ -32,7 +32,7 @@ chassis     châssis         chassis         シャーシ     섀시       机�
 command     commande        befehl          コマンド     명령       命令
 controller  contrôleur      controller      コントローラ 컨트롤러   控制器
 device      périphérique    gerät           デバイス     디바이스   设备
-details     détails         details         詳細         세부사항   详细信息
+details     détails         details         詳細         세부.사항  详细信息
 driver      driver          treiber         ドライバ     드라이버   驱动程序
 method      méthode         methode         メソッド     메서드     方法
 parameters  paramètres      parameter       パラメータ   파라미터   参数
