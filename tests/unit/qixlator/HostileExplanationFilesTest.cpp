@@ -1,0 +1,217 @@
+#include <dirent.h>
+#include <gmock/gmock.h>
+#include <gtest/gtest.h>
+#include <sys/resource.h>
+#include <unistd.h>
+
+#include <atomic>
+#include <filesystem>
+#include <fstream>
+#include <string>
+#include <thread>
+
+#include "qixlator/qvErrorsParser.h"
+#include "support/FaultyAllocator.h"
+#include "support/TestRoot.h"
+
+namespace {
+
+constexpr const char* heading = "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<qidocument>\n";
+
+std::string document(const std::string& body) {
+    return heading + body + "</qidocument>\n";
+}
+
+std::string block(const std::string& code, const std::string& text) {
+    return "<qierror code=\"" + code + "\">\n" + text + "</qierror>\n";
+}
+
+int openDescriptors() {
+    int count = 0;
+    DIR* directory = opendir("/proc/self/fd");
+    while (readdir(directory) != nullptr) {
+        ++count;
+    }
+    closedir(directory);
+    return count;
+}
+
+// Lets this process open a few descriptors more and no further ones.
+class FewDescriptors {
+  public:
+    explicit FewDescriptors(rlim_t more) {
+        getrlimit(RLIMIT_NOFILE, &before);
+        const int next = dup(STDIN_FILENO);
+        close(next);
+        const rlimit few{static_cast<rlim_t>(next) + more, before.rlim_max};
+        setrlimit(RLIMIT_NOFILE, &few);
+    }
+    ~FewDescriptors() { setrlimit(RLIMIT_NOFILE, &before); }
+    FewDescriptors(const FewDescriptors&) = delete;
+    FewDescriptors& operator=(const FewDescriptors&) = delete;
+
+  private:
+    rlimit before{};
+};
+
+// What lies on the disk is not this program's own: it may be anything, and may change at any time.
+class HostileExplanationFilesTest : public testing::Test {
+  protected:
+    std::string search(const std::string& directory) {
+        status.code = 0;
+        qixlator::findErrorDescriptionFromDir(root.locate(directory).c_str(), -1, &output, &status);
+        return std::string(output.c_str(), output.length());
+    }
+
+    TestRoot root;
+    qihtl::String output;
+    qierr::Status status;
+};
+
+TEST_F(HostileExplanationFilesTest, AFileThatDoesNotOpenStopsTheSearch) {
+    root.write("/dir/a.txt", document(block("-1", "Text.\n")));
+    {
+        // One for the directory, none for the file.
+        const FewDescriptors few(1);
+        EXPECT_EQ("", search("/dir"));
+    }
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_NE(std::string::npos,
+              std::string(status.json)
+                  .find("\"qixlator_debug\":{\"debug\":\"Could not open status explanations "
+                        "file\",\"path\":\"" +
+                        root.locate("/dir/a.txt") + "\"}"))
+        << status.json;
+}
+
+TEST_F(HostileExplanationFilesTest, EmptyFilesAreSkipped) {
+    root.write("/dir/a.txt", "");
+    root.write("/dir/b.txt", document(block("-1", "Text.\n")));
+    root.write("/dir/c.err", "");
+    EXPECT_EQ("Text.", search("/dir"));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(HostileExplanationFilesTest, BytesThatAreNoUtf8AreTakenAsTheyStand) {
+    root.write("/dir/a.txt", document("\xFF\xFE\n" + block("-1", "a\xFF\xC3(\xED\xA0\x80\n")));
+    EXPECT_EQ("a\xFF\xC3(\xED\xA0\x80", search("/dir"));
+}
+
+TEST_F(HostileExplanationFilesTest, ANulEndsALineOfTextButNotTheFile) {
+    root.write("/dir/a.txt", document(block("-1", std::string("one\0two\n", 8) +
+                                                      std::string("\0\n", 2) + "\n" + "three\n")));
+    EXPECT_EQ("one\nthree", search("/dir"));
+}
+
+TEST_F(HostileExplanationFilesTest, ACodeInSeveralFilesGivesOneOfTheTexts) {
+    root.write("/dir/a.txt", document(block("-1", "First.\n")));
+    root.write("/dir/b.txt", document(block("-1", "Second.\n")));
+    EXPECT_THAT(search("/dir"), testing::AnyOf("First.", "Second."));
+    EXPECT_EQ(0, status.code);
+}
+
+TEST_F(HostileExplanationFilesTest, AHugeFileTakesNoMemory) {
+    root.write("/dir/a.txt", heading);
+    {
+        std::ofstream file(root.locate("/dir/a.txt"), std::ios::app);
+        const std::string other = block("-2", std::string(4000, 'x') + "\n");
+        for (int count = 0; count < 8000; ++count) {
+            file << other;
+        }
+        file << block("-1", "Text.\n") << "</qidocument>\n";
+    }
+    ASSERT_LT(32000000u, std::filesystem::file_size(root.locate("/dir/a.txt")));
+    FaultyAllocator::succeed();
+    const std::int64_t before = FaultyAllocator::liveBytes();
+    EXPECT_EQ("Text.", search("/dir"));
+    EXPECT_GT(20000, FaultyAllocator::peakBytes() - before);
+}
+
+TEST_F(HostileExplanationFilesTest, ALineOfMillionsOfBytesIsSkippedOrCollectedWhole) {
+    const std::string line(16000000, 'x');
+    root.write("/dir/a.txt",
+               document(line + "\n" + block("-2", line + "\n") + block("-1", line + "end\n")));
+    EXPECT_EQ(line + "end", search("/dir"));
+}
+
+TEST_F(HostileExplanationFilesTest, ADescriptionWithoutMemoryIsAFailure) {
+    root.write("/dir/a.txt", document(block("-1", std::string(100000, 'x') + "\n")));
+    const std::int64_t blocks = FaultyAllocator::liveBlocks();
+    // The two records of the walk come first, then the text as it grows.
+    for (int allocation = 2; allocation < 10; ++allocation) {
+        qihtl::String text;
+        qierr::Status failure;
+        FaultyAllocator::failAt(allocation);
+        qixlator::findErrorDescriptionFromDir(root.locate("/dir").c_str(), -1, &text, &failure);
+        EXPECT_TRUE(FaultyAllocator::hasFailed());
+        FaultyAllocator::succeed();
+        EXPECT_EQ(-52000, failure.code);
+        EXPECT_TRUE(text.empty());
+    }
+    EXPECT_EQ(blocks, FaultyAllocator::liveBlocks());
+}
+
+TEST_F(HostileExplanationFilesTest, NoDescriptorIsLeftOpenWhateverTheSearchMeets) {
+    root.write("/found/a.txt", document(block("-1", "Text.\n")));
+    root.write("/none/a.txt", document(block("-2", "Text.\n")));
+    root.write("/empty/a.txt", "");
+    root.write("/heading/a.txt", heading);
+    root.write("/code/a.txt", document(block("none", "")));
+    root.write("/unfinished/a.txt", std::string(heading) + "<qierror code=\"-1\">\nText.\n");
+    root.write("/nul/a.txt", document(std::string("\0\n", 2)));
+    root.makeDirectory("/link");
+    std::filesystem::create_symlink("nowhere", root.locate("/link/a.txt"));
+    const int before = openDescriptors();
+    for (int count = 0; count < 500; ++count) {
+        for (const char* directory : {"/found", "/none", "/empty", "/heading", "/code",
+                                      "/unfinished", "/nul", "/link", "/missing"}) {
+            search(directory);
+        }
+    }
+    EXPECT_EQ(before, openDescriptors());
+}
+
+// Makes and removes a directory with two files for as long as it lives.
+class Flicker {
+  public:
+    explicit Flicker(const TestRoot& root)
+        : root(root), thread([this] {
+              while (!stopped) {
+                  this->root.write("/dir/a.txt", document(block("-1", "Text.\n")));
+                  this->root.write("/dir/b.txt", document(block("-1", "Text.\n")));
+                  ++rounds;
+                  this->root.remove("/dir");
+              }
+          }) {}
+    ~Flicker() {
+        stopped = true;
+        thread.join();
+    }
+    int count() const { return rounds; }
+
+  private:
+    const TestRoot& root;
+    std::atomic<bool> stopped{false};
+    std::atomic<int> rounds{0};
+    std::thread thread;
+};
+
+TEST_F(HostileExplanationFilesTest, FilesThatComeAndGoDuringASearchGiveTheTextNoneOrAFailure) {
+    const int before = openDescriptors();
+    int found = 0;
+    int failed = 0;
+    {
+        const Flicker flicker(root);
+        while (flicker.count() < 1000 || found == 0 || failed == 0) {
+            const std::string text = search("/dir");
+            ASSERT_TRUE(status.code == 0 || status.code == -52006) << status.code;
+            ASSERT_TRUE(text == "Text." || text.empty()) << text;
+            ASSERT_TRUE(status.code == 0 || text.empty()) << text;
+            found += text.empty() ? 0 : 1;
+            failed += status.code < 0 ? 1 : 0;
+        }
+    }
+    EXPECT_EQ(before, openDescriptors());
+}
+
+}  // namespace
