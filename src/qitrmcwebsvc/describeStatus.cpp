@@ -60,6 +60,9 @@ std::string withValidUtf8(std::string_view text) {
 
 std::string describeStatus(const qierr_Status& status) {
     const SessionOwner session = openSession();
+    if (session == nullptr) {
+        return {};  // that failure was dropped, since an exception is in flight
+    }
     qihtl::String text;
     translate(session.get(), status, &text);
     std::string line = withValidUtf8({text.c_str(), text.length()});
