@@ -3,8 +3,12 @@
 #include <cstdint>
 
 // Compiled into a test program, FaultyAllocator.cpp takes the place of the translators' allocator:
-// it counts the live blocks and fails on demand. A program that is linked with --wrap=calloc and
-// FaultyCalloc.cpp has the buffers of its statuses fail in the same count.
+// it counts the live blocks and fails on demand. Further sources let more fail in the same count:
+//
+//   FaultyCalloc.cpp  the buffers of statuses; to be linked with --wrap=calloc
+//   FaultyFiles.cpp   the opening of files and directories, which allocates in the C library; to be
+//                     linked with --wrap=fopen,--wrap=opendir
+//   FaultyNew.cpp     operator new
 namespace FaultyAllocator {
 
 constexpr std::uint64_t never = ~std::uint64_t{0};

@@ -1,0 +1,103 @@
+#include <gtest/gtest.h>
+
+#include <new>
+#include <regex>
+#include <set>
+#include <string>
+
+#include "qierr/Exception.h"
+#include "qierr/Writer.h"
+#include "qitrmcwebsvc/describeStatus.h"
+#include "support/FaultyAllocator.h"
+#include "support/TestRoot.h"
+
+// The JSON module of the interpreter, a library of the system, loses its buffer of some hundred
+// bytes when the interpreter runs out of memory in the middle of a decode.
+extern "C" __attribute__((visibility("default"))) const char* __lsan_default_suppressions() {
+    return "leak:strbuf_new\n";
+}
+
+namespace {
+
+using nQITRMCWEBSVC100::describeStatus;
+
+constexpr const char* details =
+    "{\"translator\":\"mxlator_qitrmc\",\"translator_info\":{\"ordered_data\":[{\"type\":\"usage\","
+    "\"usage\":\"kUsageTypeName\",\"value\":[\"a name\",\"b\"],\"value_type\":\"string\"}]},"
+    "\"nested_error\":[{\"code\":-1,\"translator\":\"mxlator_qitrmc\"},{\"code\":-1}]}";
+
+// What there is to read when no search of a file and no module fails, and when some do.
+const char* const wholeText =
+    "A text beyond a short string.  Name: a name, b     A text beyond a short string.     A text "
+    "beyond a short string.";
+const std::regex anyText(
+    "(A text beyond a short string\\.|Error description not found)  (Name|kUsageTypeName): "
+    "a name, b     (A text beyond a short string\\.|Error description not found)     A text beyond "
+    "a short string\\.");
+
+// Lets each allocation of a description fail, those of its files and directories too: of C++, of
+// the statuses, of the interpreter and of the C library.
+class DescribeStatusFaultTest : public testing::TestWithParam<std::uint64_t> {
+  protected:
+    DescribeStatusFaultTest() {
+        root.write("/usr/local/qinstal/share/errors/English/a.txt",
+                   "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"-1\">\nA text beyond a "
+                   "short string.\n</qierror>\n</qidocument>\n");
+        qierr_Status_setCode(&source, -1);
+        qierr_Status_setJson(&source, details);
+        describeStatus(source);  // what is made once in the process is made now
+    }
+    ~DescribeStatusFaultTest() override { FaultyAllocator::succeed(); }
+
+    // Describes once with a fault at the request `number` and the ones behind it. Returns whether
+    // there is such a request.
+    bool describe(std::uint64_t number, std::uint64_t count) {
+        std::string text;
+        std::int32_t failure = 0;
+        FaultyAllocator::failAt(number, count);
+        try {
+            text = describeStatus(source);
+        } catch (const qierr::Exception& error) {
+            failure = error.status()->code;
+        } catch (const std::bad_alloc&) {
+            failure = badAlloc;
+        }
+        const bool struck = FaultyAllocator::hasFailed();
+        FaultyAllocator::succeed();
+        failures.insert(failure);
+        if (failure == 0) {
+            EXPECT_TRUE(std::regex_match(text, anyText)) << "request " << number << ": " << text;
+        }
+        if (!struck) {
+            EXPECT_EQ(wholeText, text);
+        }
+        return struck;
+    }
+
+    static constexpr std::int32_t badAlloc = -1;
+
+    TestRoot root;
+    qierr::Status source;
+    std::set<std::int32_t> failures;
+};
+
+INSTANTIATE_TEST_SUITE_P(Extents, DescribeStatusFaultTest,
+                         testing::Values(std::uint64_t{1}, FaultyAllocator::never),
+                         [](const testing::TestParamInfo<std::uint64_t>& extent) {
+                             return extent.param == 1 ? "One" : "AllFromThere";
+                         });
+
+TEST_P(DescribeStatusFaultTest, EachFaultGivesATextOrAnException) {
+    const std::int64_t blocks = FaultyAllocator::liveBlocks();
+    std::uint64_t requests = 0;
+    while (describe(requests, GetParam()) && !HasFailure()) {
+        EXPECT_EQ(blocks, FaultyAllocator::liveBlocks()) << "request " << requests;
+        ++requests;
+    }
+    EXPECT_LT(100u, requests);
+    // Of C++, of the sessions and texts, of the interpreter, and of the files of the default
+    // translator.
+    EXPECT_EQ((std::set<std::int32_t>{badAlloc, -52000, -52003, -52006, 0}), failures);
+}
+
+}  // namespace
