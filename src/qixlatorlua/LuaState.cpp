@@ -83,6 +83,21 @@ void reportNoState(qierr_Status* status) {
     qierr_Writer_addString(writer, "debug", "failed to create lua state");
 }
 
+// What stands on the top of the stack as a text, "" for what is none. A number is written into
+// `buffer`: making a text of it inside the state could raise an error, which nobody would catch
+// here.
+const char* messageOnTop(lua_State* L, char* buffer, std::size_t size) {
+    switch (lua_gettop(L) == 0 ? LUA_TNONE : lua_type(L, -1)) {
+        case LUA_TSTRING:
+            return lua_tostring(L, -1);
+        case LUA_TNUMBER:
+            std::snprintf(buffer, size, LUA_NUMBER_FMT, lua_tonumber(L, -1));
+            return buffer;
+        default:
+            return "";
+    }
+}
+
 }  // namespace
 
 lua_State* openState(LuaRuntime runtime, qierr_Status* status) {
@@ -112,13 +127,13 @@ void closeState(lua_State* L) {
 }
 
 qierr_Writer reportLuaFailure(lua_State* L, int result, const char* what, qierr_Status* status) {
-    // Only what is a text already: making one could raise an error, which nobody would catch here.
-    const char* message = lua_type(L, -1) == LUA_TSTRING ? lua_tostring(L, -1) : "";
     if (!qierr_Status_setCodeNamed(
             status, qiapalerr_softwareFaultAPALInternalUseOnly,
             QIERR_HERE_NAMED("qiapalerr_softwareFaultAPALInternalUseOnly"))) {
         return qierr_Writer{nullptr, nullptr, nullptr};
     }
+    char number[LUAI_MAXNUMBER2STR];
+    const char* message = messageOnTop(L, number, sizeof number);
     qierr_Writer writer = qierr_Status_writerAtEnd(status);
     writer = qierr_Writer_beginObject(writer, "internal_error");
     writer = qierr_Writer_addString(writer, "api", "lua");

@@ -17,9 +17,8 @@ struct LuaXlator : XlatorInterface {
 enum class LuaRuntime {
     // Compiles every script, and allocates each block by itself.
     plain,
-    // Reads bytecode that is compiled once in the process when it is required, and allocates from
-    // an
-    // arena. As `plain` when there is no memory for the bytecode.
+    // Reads bytecode, compiled once in the process, when it is required, and allocates from an
+    // arena. Compiles every script when there is no memory for the bytecode.
     fast,
 };
 
