@@ -38,7 +38,7 @@ class StartAllocationTest : public ServiceTest,
     // The next allocation to fail. The validators of all methods are built alike, so the later ones
     // are tried at ever greater intervals.
     static int after(int successes) {
-        return successes + 1 + successes / 200;
+        return successes + 1 + successes / 50;
     }
 
     const std::string open = call("initializeSession", "{}");

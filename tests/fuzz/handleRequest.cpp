@@ -1,6 +1,7 @@
 #include "harnesses.h"
 #include "qitrmcwebsvc/RequestHandler.h"
 #include "support/ModelledSessions.h"
+#include "support/knownChassis.h"
 #include "support/responseFault.h"
 
 namespace {
@@ -11,6 +12,7 @@ class Service {
   public:
     Service() {
         RecordingDriver::instance().reset();
+        giveKnownChassis();
         sessions.answerCalls();
     }
 

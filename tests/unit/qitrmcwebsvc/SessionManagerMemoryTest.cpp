@@ -1,8 +1,8 @@
 #include <optional>
 
-#include "support/allocationFaults.h"
 #include "qitrmcwebsvc/SessionManager.h"
 #include "support/DriverTest.h"
+#include "support/allocationFaults.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
