@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "qisysq/stdpath.h"
+#include "qixlator/qixlator.h"
 #include "qixlator/qvErrorsParser.h"
 #include "qixlator/report.h"
 
@@ -39,7 +40,9 @@ void reportNotFound(std::int32_t code, std::uint32_t attributes, qierr_Status* s
                                     "couldn't find description for code");
     writer = qierr_Writer_addInt(writer, "code", code);
     writer = qierr_Writer_addInt(writer, "lang", 0);
-    qierr_Writer_addInt(writer, "ade", static_cast<std::int32_t>((attributes >> 8) & 0xF));
+    qierr_Writer_addInt(
+        writer, "ade",
+        static_cast<std::int32_t>((attributes >> qixlator_adeShift) & qixlator_adeMask));
 }
 
 char* getStaticDesc(XlatorInterface*, std::int32_t code, std::uint32_t attributes,
@@ -52,8 +55,9 @@ char* getStaticDesc(XlatorInterface*, std::int32_t code, std::uint32_t attribute
         return nullptr;
     }
     qihtl::String text;
-    searchWithFallback(errorsDirectory.c_str(), code, static_cast<std::int32_t>(attributes & 0xFF),
-                       &text, status);
+    searchWithFallback(errorsDirectory.c_str(), code,
+                       static_cast<std::int32_t>(attributes & qixlator_languageMask), &text,
+                       status);
     if (status->code < 0) {
         return nullptr;
     }

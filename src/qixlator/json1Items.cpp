@@ -20,8 +20,8 @@ const TypedItemFormat formattedItemFormats[] = {
 
 namespace {
 
-// The array that is being laid out, for reports, with where its text goes.
-struct Report {
+// Lays the items of one array out.
+struct ItemLayout {
     const char* array;
     qihtl::String* output;
     qierr_Status* status;
@@ -29,12 +29,12 @@ struct Report {
     void fail(const char* what, const char* value) const;
     void failOnType(jsonz_type type) const;
     void element(const char* position, const ItemFormat& format) const;
-    void elements(const char* array, const ItemFormat& format) const;
+    void elements(const char* position, const ItemFormat& format) const;
     void value(const char* position, const ItemFormat& format) const;
     void item(const char* position, const TypedItemFormat* formats) const;
 };
 
-void Report::fail(const char* what, const char* value) const {
+void ItemLayout::fail(const char* what, const char* value) const {
     // The texts are copied first: nothing can be copied for a status that is negative.
     qierr::Status copyStatus;
     qihtl::String arrayText;
@@ -52,7 +52,7 @@ void Report::fail(const char* what, const char* value) const {
     }
 }
 
-void Report::failOnType(jsonz_type type) const {
+void ItemLayout::failOnType(jsonz_type type) const {
     qierr_Writer writer = reportFailure(status, qiapalerr_invalidParameter,
                                         QIERR_HERE_NAMED("qiapalerr_invalidParameter"));
     writer = qierr_Writer_addString(writer, "formatDynamicReportItems",
@@ -60,7 +60,7 @@ void Report::failOnType(jsonz_type type) const {
     qierr_Writer_addInt(writer, "value type", type);
 }
 
-void Report::element(const char* position, const ItemFormat& format) const {
+void ItemLayout::element(const char* position, const ItemFormat& format) const {
     jsonz_value read;
     jsonz_readValue(position, &read);
     output->append(format.elementPrefix, status);
@@ -72,18 +72,18 @@ void Report::element(const char* position, const ItemFormat& format) const {
     output->append(format.elementSuffix, status);
 }
 
-void Report::elements(const char* first, const ItemFormat& format) const {
-    const char* position = jsonz_firstElement(first);
-    while (position != nullptr && status->code >= 0) {
-        element(position, format);
-        position = jsonz_nextElement(jsonz_readValue(position, nullptr));
-        if (position != nullptr) {
+void ItemLayout::elements(const char* position, const ItemFormat& format) const {
+    const char* next = jsonz_firstElement(position);
+    while (next != nullptr && status->code >= 0) {
+        element(next, format);
+        next = jsonz_nextElement(jsonz_readValue(next, nullptr));
+        if (next != nullptr) {
             output->append(format.elementSeparator, status);
         }
     }
 }
 
-void Report::value(const char* position, const ItemFormat& format) const {
+void ItemLayout::value(const char* position, const ItemFormat& format) const {
     jsonz_value read;
     if (jsonz_readValue(position, &read) == nullptr) {
         fail("json1 dynamic object invalid. something's wrong with value item", position);
@@ -105,7 +105,7 @@ const ItemFormat& formatFor(const qihtl::String& type, const TypedItemFormat* fo
     return formats->format;
 }
 
-void Report::item(const char* position, const TypedItemFormat* formats) const {
+void ItemLayout::item(const char* position, const TypedItemFormat* formats) const {
     qihtl::String type;
     appendJsonString(jsonz_findMember(position, "type"), &type, status);
     const ItemFormat& format = formatFor(type, formats);
@@ -129,16 +129,16 @@ void Report::item(const char* position, const TypedItemFormat* formats) const {
 void formatDynamicReportItems(const char* array, const TypedItemFormat* formats,
                               qihtl::String* output, qierr_Status* status) {
     qihtl::String text;
-    const Report report{array, &text, status};
+    const ItemLayout layout{array, &text, status};
     const char* position = jsonz_firstElement(array);
     while (position != nullptr && status->code >= 0) {
         jsonz_value read;
         const char* end = jsonz_readValue(position, &read);
         if (read.type != jsonz_typeObject) {
-            report.fail("json1 dynamic object invalid. each array item must be an object", nullptr);
+            layout.fail("json1 dynamic object invalid. each array item must be an object", nullptr);
             return;
         }
-        report.item(position, formats);
+        layout.item(position, formats);
         position = jsonz_nextElement(end);
     }
     output->append(text.c_str(), text.length(), status);
