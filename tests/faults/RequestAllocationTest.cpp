@@ -3,13 +3,8 @@
 
 #include "ServiceTest.h"
 #include "support/allocationFaults.h"
+#include "support/cjsonLeak.h"
 #include "support/knownChassis.h"
-
-// The JSON library of Lua loses the buffer of a text that it is reading when the memory for a value
-// in it is missing.
-extern "C" __attribute__((visibility("default"))) const char* __lsan_default_suppressions() {
-    return "leak:strbuf_new\n";
-}
 
 namespace {
 

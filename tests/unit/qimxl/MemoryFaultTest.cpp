@@ -12,12 +12,7 @@
 #include "qixlatorlua/LuaXlator.h"
 #include "support/FaultyAllocator.h"
 #include "support/TestRoot.h"
-
-// The JSON module of the interpreter, a library of the system, loses its buffer of some hundred
-// bytes when the interpreter runs out of memory in the middle of a decode.
-extern "C" __attribute__((visibility("default"))) const char* __lsan_default_suppressions() {
-    return "leak:strbuf_new\n";
-}
+#include "support/cjsonLeak.h"
 
 namespace {
 
