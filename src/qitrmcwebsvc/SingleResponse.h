@@ -18,6 +18,8 @@ class SingleResponse {
     // With a deep copy of the id, of whatever type it is.
     SingleResponse(const JsonValue& id, JsonPool* allocator);
     virtual ~SingleResponse() = default;
+    SingleResponse(const SingleResponse&) = delete;
+    SingleResponse& operator=(const SingleResponse&) = delete;
 
     // Moves a value into "result".
     void setResult(JsonValue& value);
