@@ -2,10 +2,10 @@
 
 The texts of a code stand in one place each:
 
-    catalogue.tsv                     every code that the service itself raises, in all languages
-    ../../simulator/statuses.tsv      the codes that the simulated driver raises, in English; the
-                                      simulator makes its own constants from that table
-    driver.tsv                        the translations of the codes of that table, and their raiser
+    catalogue.tsv                        every code that the service itself raises, in all languages
+    ../../simulator/status/statuses.tsv  the codes that the simulated driver raises, in English; the
+                                         simulator makes its own constants from that table
+    driver.tsv                           the translations of the codes of that table, and their raiser
 
 Every fault is reported as "file:line: what is wrong".
 """
@@ -26,7 +26,7 @@ DRIVER_RAISERS = ("driver", SIMULATED_RAISER)
 HERE = Path(__file__).resolve().parent
 CATALOGUE = HERE / "catalogue.tsv"
 DRIVER = HERE / "driver.tsv"
-SIMULATOR = HERE.parent.parent / "simulator" / "statuses.tsv"
+SIMULATOR = HERE.parent.parent / "simulator" / "status" / "statuses.tsv"
 # Stands before the names of the simulator's own codes in the details of its failures.
 SIMULATOR_PREFIX = "qitrmcsim_"
 

@@ -19,7 +19,7 @@ def rows_of(path):
 
 CATALOGUE = rows_of(STATUSES / "catalogue.tsv")
 DRIVER = rows_of(STATUSES / "driver.tsv")
-SIMULATOR = rows_of(ROOT / "simulator" / "statuses.tsv")
+SIMULATOR = rows_of(ROOT / "simulator" / "status" / "statuses.tsv")
 
 
 def gather_texts():

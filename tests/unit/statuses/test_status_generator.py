@@ -8,7 +8,7 @@ from status_catalogue import FOLDERS, ROOT, generate
 
 CATALOGUE = "share/statuses/catalogue.tsv"
 DRIVER = "share/statuses/driver.tsv"
-SIMULATOR = "simulator/statuses.tsv"
+SIMULATOR = "simulator/status/statuses.tsv"
 
 
 class Project:

@@ -18,7 +18,8 @@ INTERNAL_ERROR = -250800
 
 def _explanations():
     texts = {}
-    for name, prefix in (("share/statuses/catalogue.tsv", "eng_"), ("simulator/statuses.tsv", "")):
+    for name, prefix in (("share/statuses/catalogue.tsv", "eng_"),
+                         ("simulator/status/statuses.tsv", "")):
         with open(ROOT / name, encoding="utf-8", newline="") as table:
             for row in csv.DictReader(table, delimiter="\t", quoting=csv.QUOTE_NONE):
                 texts[int(row["code"])] = row[prefix + "happened"] + " " + row[prefix + "remedy"]

@@ -12,7 +12,8 @@ import pytest
 
 from jsonrpc import Client, batch, call
 
-BENCH = json.loads((pathlib.Path(__file__).resolve().parents[3] / "simulator" / "bench.json"
+BENCH = json.loads((pathlib.Path(__file__).resolve().parents[3]
+                    / "simulator" / "chassis" / "bench.json"
                     ).read_text(encoding="utf-8"))
 
 

@@ -1,0 +1,184 @@
+#include "description/ChassisFile.h"
+
+#include <array>
+#include <cerrno>
+#include <cstdio>
+#include <cstdlib>
+#include <cstring>
+#include <fstream>
+
+#include "EmbeddedTexts.h"
+#include "description/Description.h"
+#include "description/PartsFile.h"
+#include "description/PropertyFile.h"
+#include "model/NameText.h"
+#include "status/Refusal.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr int32_t chassisCategory = 1;
+constexpr uint32_t mostSlots = 64;
+constexpr size_t largestFile = size_t{16} << 20;
+
+enum class Place { system, slot };
+
+// Reads the devices of one description.
+class DeviceReader {
+  public:
+    DeviceReader(Chassis& chassis, const Enumerations& enumerations)
+        : chassis(chassis), enumerations(enumerations) {}
+
+    Device& read(const Node& node, Place place);
+
+  private:
+    Device& addDevice(const Node& node);
+    void readSlot(const Node& node, Place place, Device& device);
+    void readModules(const Node& node, Device& owner);
+
+    Chassis& chassis;
+    const Enumerations& enumerations;
+};
+
+Device& DeviceReader::addDevice(const Node& node) {
+    const Node nameNode = node.member("name", "the name of the device");
+    const std::string name = readName(nameNode, nameFault);
+    if (chassis.findDevice(name) != nullptr) {
+        nameNode.fail("is the name of two devices", "names must differ in more than letter case");
+    }
+    return chassis.addDevice(name);
+}
+
+void DeviceReader::readSlot(const Node& node, Place place, Device& device) {
+    if (place == Place::slot) {
+        device.slot = node.member("slot", "the number of the slot").unsignedNumber(1, mostSlots);
+    } else if (node.has("slot")) {
+        node.member("slot", "").fail("belongs to no chassis", "only modules have a slot");
+    }
+}
+
+void DeviceReader::readModules(const Node& node, Device& owner) {
+    node.forEachElement([&](const Node& element) {
+        Device& module = read(element, Place::slot);
+        for (const Device* other : owner.modules) {
+            if (other->slot == module.slot) {
+                element.fail("stands in a slot that is taken", "slots hold one module each");
+            }
+        }
+        owner.modules.push_back(&module);
+    });
+}
+
+Device& DeviceReader::read(const Node& node, Place place) {
+    node.expectMembers({"name", "category", "slot", "modules", "channels", "nvmem_areas",
+                        "registers", "values", "properties", "commands", "connect_seconds",
+                        "reachable"});
+    Device& device = addDevice(node);
+    device.category = node.member("category", "the product category").signedNumber();
+    readSlot(node, place, device);
+    node.ifPresent("connect_seconds",
+                   [&](const Node& time) { device.connectSeconds = time.seconds(); });
+    node.ifPresent("reachable", [&](const Node& flag) { device.reachable = flag.flag(); });
+    readResource(node, Category::device, chassis, enumerations, device);
+    node.ifPresent("channels", [&](const Node& channels) {
+        readPhysChans(channels, enumerations, chassis, device);
+    });
+    node.ifPresent("nvmem_areas", [&](const Node& areas) {
+        areas.forEachElement(
+            [&](const Node& element) { readNvmemArea(element, enumerations, chassis, device); });
+    });
+    node.ifPresent("registers", [&](const Node& blocks) {
+        blocks.forEachElement([&](const Node& block) { readRegisterBlock(block, device); });
+    });
+    node.ifPresent("modules", [&](const Node& modules) {
+        if (device.category != chassisCategory || place == Place::slot) {
+            modules.fail("belongs to a device that is no chassis",
+                         "only a device of category 1 outside of a slot has modules");
+        }
+        readModules(modules, device);
+    });
+    return device;
+}
+
+void readBuiltInCatalogue(Catalogue& catalogue) {
+    JsonDocument document;
+    parseDescription(embedded::catalogue, document);
+    readCatalogue(Node(document), {}, catalogue);
+}
+
+void fillFrom(const Node& root, const char* member, Category category, const Catalogue& catalogue,
+              PropertyStore& store) {
+    root.ifPresent(member,
+                   [&](const Node& values) { fillStore(category, catalogue, &values, store); });
+    fillStore(category, catalogue, nullptr, store);
+}
+
+[[noreturn]] void refuseFile(const std::string& wrong) {
+    throw DescriptionFault{"", wrong, "QITRMC_SIM_CHASSIS must name a readable file"};
+}
+
+std::string readFile(const char* path) {
+    errno = 0;
+    std::ifstream file(path, std::ios::binary);
+    std::string content;
+    std::array<char, 4096> piece;
+    while (file.read(piece.data(), piece.size()) || file.gcount() > 0) {
+        content.append(piece.data(), static_cast<size_t>(file.gcount()));
+        if (content.size() > largestFile) {
+            refuseFile("is larger than 16 MiB");
+        }
+    }
+    if (!file.eof()) {
+        refuseFile(std::string("cannot be read: ") + std::strerror(errno));
+    }
+    return content;
+}
+
+}  // namespace
+
+std::unique_ptr<Chassis> parseChassis(std::string_view text) {
+    JsonDocument document;
+    parseDescription(text, document);
+    const Node root(document);
+    root.expectMembers({"first_session_handle", "enums", "driver_properties", "system_values",
+                        "session_values", "devices"});
+    auto chassis = std::make_unique<Chassis>();
+    root.ifPresent("first_session_handle", [&](const Node& handle) {
+        chassis->firstSessionHandle = handle.unsignedNumber(1, UINT32_MAX);
+    });
+    Enumerations enumerations;
+    root.ifPresent("enums", [&](const Node& node) { enumerations = readEnumerations(node); });
+    readBuiltInCatalogue(chassis->catalogue);
+    root.ifPresent("driver_properties", [&](const Node& node) {
+        readCatalogue(node, enumerations, chassis->catalogue);
+    });
+    fillFrom(root, "system_values", Category::system, chassis->catalogue,
+             chassis->systemProperties);
+    fillFrom(root, "session_values", Category::session, chassis->catalogue,
+             chassis->sessionProperties);
+    DeviceReader reader(*chassis, enumerations);
+    root.member("devices", "an array of devices").forEachElement([&](const Node& element) {
+        reader.read(element, Place::system);
+    });
+    return chassis;
+}
+
+std::unique_ptr<Chassis> loadChassis() {
+    const char* path = std::getenv("QITRMC_SIM_CHASSIS");
+    const bool fromFile = path != nullptr && *path != '\0';
+    try {
+        return parseChassis(fromFile ? readFile(path) : std::string(embedded::bench));
+    } catch (const DescriptionFault& fault) {
+        const std::string name = fromFile ? path : "(built-in chassis)";
+        const std::string place = fault.pointer.empty() ? "" : fault.pointer + " ";
+        std::fprintf(stderr, "qitrmcapi: %s: %s%s; %s\n", name.c_str(), place.c_str(),
+                     fault.wrong.c_str(), fault.right.c_str());
+        throw Refusal(code::chassisNotLoaded)
+            .usage(tag::fileName, name)
+            .usage(tag::jsonPointer, fault.pointer)
+            .usage(tag::explanation, fault.wrong + "; " + fault.right);
+    }
+}
+
+}  // namespace simulator

@@ -1,0 +1,182 @@
+#include "description/PartsFile.h"
+
+#include "model/NameText.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr uint32_t mostChannels = 1024;
+constexpr uint32_t mostBytes = 16u << 20;
+
+int hexDigit(char c) {
+    if (c >= '0' && c <= '9') {
+        return c - '0';
+    }
+    if (c >= 'a' && c <= 'f') {
+        return c - 'a' + 10;
+    }
+    return c >= 'A' && c <= 'F' ? c - 'A' + 10 : -1;
+}
+
+// Reads the members "size" and "bytes": so many bytes, the first of them given in hexadecimal
+// digits and the others 0.
+std::vector<uint8_t> readBytes(const Node& node) {
+    const Node sizeNode = node.member("size", "the number of bytes");
+    std::vector<uint8_t> bytes(sizeNode.unsignedNumber(1, mostBytes));
+    if (!node.has("bytes")) {
+        return bytes;
+    }
+    const Node textNode = node.member("bytes", "");
+    const std::string text = textNode.text();
+    if (text.size() % 2 != 0 || text.size() / 2 > bytes.size()) {
+        textNode.fail("has the wrong length", "must be two digits for each byte, at most size");
+    }
+    for (size_t i = 0; i < text.size(); i += 2) {
+        const int high = hexDigit(text[i]);
+        const int low = hexDigit(text[i + 1]);
+        textNode.expect(high >= 0 && low >= 0, "hexadecimal digits");
+        bytes[i / 2] = static_cast<uint8_t>(high * 16 + low);
+    }
+    return bytes;
+}
+
+bool readWritable(const Node& node) {
+    if (!node.has("access")) {
+        return true;
+    }
+    const Node access = node.member("access", "");
+    const std::string name = access.text();
+    access.expect(name == "ReadOnly" || name == "ReadWrite", "ReadOnly or ReadWrite");
+    return name == "ReadWrite";
+}
+
+const Property& effectTarget(const Node& node, const std::string& name,
+                             const PropertyStore& properties) {
+    const Property* property = properties.find(name);
+    if (property == nullptr) {
+        node.fail("is not a stored property of the resource",
+                  "a command changes properties of its own resource");
+    }
+    return *property;
+}
+
+void readEffects(const Node& node, CommandEffect::Action action, const PropertyStore& properties,
+                 Command& command) {
+    node.forEachMember([&](const std::string& name, const Node& value) {
+        const PropertyDefinition& definition = *effectTarget(value, name, properties).definition;
+        if (action == CommandEffect::Action::set) {
+            command.effects.push_back({action, name, readValue(definition, value)});
+            return;
+        }
+        if (isArray(definition.type) || definition.type == DataType::text ||
+            definition.type == DataType::boolean) {
+            value.fail("cannot be added to", "only single numbers can");
+        }
+        PropertyDefinition number;
+        number.type = definition.type;
+        command.effects.push_back({action, name, readValue(number, value)});
+    });
+}
+
+Command readCommand(const std::string& name, const Node& node, const PropertyStore& properties) {
+    node.expectMembers({"description", "document", "seconds", "resets", "sets", "adds"});
+    Command command;
+    command.name = name;
+    node.ifPresent("description", [&](const Node& text) { command.description = text.text(); });
+    node.ifPresent("document", [&](const Node& text) { command.document = text.text(); });
+    node.ifPresent("seconds", [&](const Node& time) { command.seconds = time.seconds(); });
+    node.ifPresent("resets", [&](const Node& resets) { command.resets = resets.flag(); });
+    node.ifPresent("sets", [&](const Node& effects) {
+        readEffects(effects, CommandEffect::Action::set, properties, command);
+    });
+    node.ifPresent("adds", [&](const Node& effects) {
+        readEffects(effects, CommandEffect::Action::add, properties, command);
+    });
+    return command;
+}
+
+}  // namespace
+
+std::string readName(const Node& node, std::string (*faultOf)(std::string_view)) {
+    const std::string name = node.text();
+    const std::string fault = faultOf(name);
+    if (!fault.empty()) {
+        node.fail("is not a name", fault);
+    }
+    return name;
+}
+
+void readResource(const Node& node, Category category, const Chassis& chassis,
+                  const Enumerations& enumerations, Resource& resource) {
+    if (node.has("values")) {
+        const Node values = node.member("values", "");
+        fillStore(category, chassis.catalogue, &values, resource.properties);
+    } else {
+        fillStore(category, chassis.catalogue, nullptr, resource.properties);
+    }
+    node.ifPresent("properties", [&](const Node& definitions) {
+        addOwnProperties(definitions, category, chassis.catalogue, enumerations,
+                         resource.properties);
+    });
+    node.ifPresent("commands", [&](const Node& commands) {
+        commands.forEachMember([&](const std::string& name, const Node& entry) {
+            resource.commands.push_back(readCommand(name, entry, resource.properties));
+        });
+    });
+}
+
+void readPhysChans(const Node& node, const Enumerations& enumerations, Chassis& chassis,
+                   Device& device) {
+    node.expectMembers({"prefix", "count", "values", "properties", "commands"});
+    const Node prefixNode = node.member("prefix", "the text in front of the channel's number");
+    const std::string prefix = readName(prefixNode, nameFault);
+    if (prefix.back() >= '0' && prefix.back() <= '9') {
+        prefixNode.fail("ends in a digit", "the channel's number follows the prefix");
+    }
+    const Node countNode = node.member("count", "the number of channels");
+    const uint32_t count = countNode.unsignedNumber(1, mostChannels);
+    for (uint32_t i = 0; i < count; ++i) {
+        Resource& channel = chassis.addPhysChan(device, prefix + std::to_string(i));
+        readResource(node, Category::physChan, chassis, enumerations, channel);
+    }
+}
+
+void readNvmemArea(const Node& node, const Enumerations& enumerations, Chassis& chassis,
+                   Device& device) {
+    node.expectMembers({"name", "size", "bytes", "access", "serial_number_wanted", "password",
+                        "values", "properties"});
+    const Node nameNode = node.member("name", "the name of the area");
+    const std::string name = readName(nameNode, partNameFault);
+    if (chassis.findPart(device, name) != nullptr) {
+        nameNode.fail("is the name of two parts of the device", "names must differ");
+    }
+    NvmemArea& area = chassis.addNvmemArea(device, name);
+    NvmemMemory::Guard guard;
+    guard.writable = readWritable(node);
+    node.ifPresent("password", [&](const Node& text) { guard.password = text.text(); });
+    node.ifPresent("serial_number_wanted", [&](const Node& wanted) {
+        guard.wantsSerialNumber = wanted.flag();
+        if (guard.wantsSerialNumber && device.properties.find("Dev.SerialNum") == nullptr) {
+            wanted.fail("asks for a serial number that is not there",
+                        "the device must have a value for Dev.SerialNum");
+        }
+    });
+    area.memory = NvmemMemory(readBytes(node), std::move(guard));
+    readResource(node, Category::nvmemArea, chassis, enumerations, area);
+}
+
+void readRegisterBlock(const Node& node, Device& device) {
+    node.expectMembers({"address", "size", "bytes", "access"});
+    RegisterBlock block;
+    block.address = node.member("address", "the first address").unsignedNumber(0, UINT32_MAX);
+    block.writable = readWritable(node);
+    block.initial = readBytes(node);
+    block.bytes = block.initial;
+    if (!device.registers.add(std::move(block))) {
+        node.fail("overlaps other registers or the end of the addresses",
+                  "each address may stand for one register");
+    }
+}
+
+}  // namespace simulator

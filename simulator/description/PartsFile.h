@@ -1,0 +1,24 @@
+#pragma once
+
+#include "description/Description.h"
+#include "description/PropertyFile.h"
+#include "model/Chassis.h"
+
+namespace simulator {
+
+// Read what belongs to one device. `enumerations` are those of the whole description. All of them
+// throw DescriptionFault.
+
+// The values, properties and commands of a resource, from the members of `node`.
+void readResource(const Node& node, Category category, const Chassis& chassis,
+                  const Enumerations& enumerations, Resource& resource);
+void readPhysChans(const Node& node, const Enumerations& enumerations, Chassis& chassis,
+                   Device& device);
+void readNvmemArea(const Node& node, const Enumerations& enumerations, Chassis& chassis,
+                   Device& device);
+void readRegisterBlock(const Node& node, Device& device);
+
+// Reads a text that can serve as a name; `faultOf` says why not.
+std::string readName(const Node& node, std::string (*faultOf)(std::string_view));
+
+}  // namespace simulator

@@ -1,0 +1,36 @@
+#pragma once
+
+#include <map>
+#include <memory>
+#include <string>
+
+#include "description/Description.h"
+#include "model/Properties.h"
+
+namespace simulator {
+
+using Enumerations = std::map<std::string, std::shared_ptr<const Enumeration>>;
+
+// Reads the enumerations of a description: an object of objects of item name to number.
+Enumerations readEnumerations(const Node& node);
+
+// Reads one definition. The property needs a value only where it is to be stored on its own.
+PropertyDefinition readDefinition(const std::string& name, const Node& node,
+                                  const Enumerations& enumerations);
+
+// Reads a value that the property may have. Items of an enumeration may be given by name.
+Elements readValue(const PropertyDefinition& definition, const Node& node);
+
+// Adds the driver-defined properties of an object of categories to a catalogue.
+void readCatalogue(const Node& node, const Enumerations& enumerations, Catalogue& catalogue);
+
+// Fills a store with the driver-defined properties of a category that have a value: one from
+// `values`, which may be null, or the initial one of the definition.
+void fillStore(Category category, const Catalogue& catalogue, const Node* values,
+               PropertyStore& store);
+
+// Adds the properties of an object of definitions, none of which the driver defines itself.
+void addOwnProperties(const Node& node, Category category, const Catalogue& catalogue,
+                      const Enumerations& enumerations, PropertyStore& store);
+
+}  // namespace simulator

@@ -1,0 +1,93 @@
+// The attributes of properties.
+
+#include "entries/Attributes.h"
+#include "entries/TypedValues.h"
+#include "sessions/PropertyDesk.h"
+
+using namespace simulator;
+
+namespace {
+
+const OpenProperty& openProperty(Simulator& simulator, nQITRMCAPI100_Property handle) {
+    const OpenProperty* found = simulator.openProperties.find(handle);
+    if (found == nullptr) {
+        throw Refusal(code::unknownHandle).usage(tag::handle, handle);
+    }
+    return *found;
+}
+
+template <typename Value>
+void getScalar(nQITRMCAPI100_Property handle, const char* name, DataType type, Value* value,
+               qierr_Status* status) {
+    clearOutputs(status, value);
+    withSimulator(status, [&](Simulator& simulator, auto&) {
+        const OpenProperty& property = openProperty(simulator, handle);
+        lendScalar(attribute(simulator, property, required(name, "attribute"), type), value);
+    });
+}
+
+template <typename Value>
+void getArray(nQITRMCAPI100_Property handle, const char* name, DataType type, Value** array,
+              uint32_t* count, qierr_Status* status) {
+    clearOutputs(status, array, count);
+    withSimulator(status, [&](Simulator& simulator, auto&) {
+        const OpenProperty& property = openProperty(simulator, handle);
+        lendArray(attribute(simulator, property, required(name, "attribute"), type), array, count);
+    });
+}
+
+}  // namespace
+
+void nQITRMCAPI100_openDriverDefinedProperty(nQITRMCAPI100_Session session, const char* property,
+                                             nQITRMCAPI100_Property* handle, qierr_Status* status) {
+    clearOutputs(status, handle);
+    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+        *handle = simulator.openProperties.add(
+            PropertyDesk(simulator, owner).openDriverDefined(required(property, "property")));
+    });
+}
+
+void nQITRMCAPI100_openGenericProperty(nQITRMCAPI100_Session session, const char* resource,
+                                       const char* property, nQITRMCAPI100_Property* handle,
+                                       qierr_Status* status) {
+    clearOutputs(status, handle);
+    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+        *handle = simulator.openProperties.add(
+            PropertyDesk(simulator, owner)
+                .openGeneric(required(resource, "resource"), required(property, "property")));
+    });
+}
+
+void nQITRMCAPI100_closeProperty(nQITRMCAPI100_Property handle, qierr_Status* status) {
+    withSimulator(status, [&](Simulator& simulator, auto&) {
+        openProperty(simulator, handle);
+        simulator.openProperties.remove(handle);
+    });
+}
+
+void nQITRMCAPI100_getPropertyPropertyInt32(nQITRMCAPI100_Property handle, const char* attribute,
+                                            int32_t* value, qierr_Status* status) {
+    getScalar(handle, attribute, DataType::int32, value, status);
+}
+
+void nQITRMCAPI100_getPropertyPropertyBool(nQITRMCAPI100_Property handle, const char* attribute,
+                                           uint8_t* value, qierr_Status* status) {
+    getScalar(handle, attribute, DataType::boolean, value, status);
+}
+
+void nQITRMCAPI100_getPropertyPropertyString(nQITRMCAPI100_Property handle, const char* attribute,
+                                             char** value, qierr_Status* status) {
+    getScalar(handle, attribute, DataType::text, value, status);
+}
+
+void nQITRMCAPI100_getPropertyPropertyInt32Array(nQITRMCAPI100_Property handle,
+                                                 const char* attribute, int32_t** array,
+                                                 uint32_t* count, qierr_Status* status) {
+    getArray(handle, attribute, DataType::int32Array, array, count, status);
+}
+
+void nQITRMCAPI100_getPropertyPropertyStringArray(nQITRMCAPI100_Property handle,
+                                                  const char* attribute, char*** array,
+                                                  uint32_t* count, qierr_Status* status) {
+    getArray(handle, attribute, DataType::textArray, array, count, status);
+}

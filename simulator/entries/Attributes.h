@@ -1,0 +1,17 @@
+#pragma once
+
+#include <string_view>
+
+#include "sessions/Simulator.h"
+
+namespace simulator {
+
+// One attribute of an open property. `type` is the data type that the caller's function stands
+// for. Refuses with unknownAttribute. A text that the property does not have is empty.
+Elements attribute(const Simulator& simulator, const OpenProperty& property, std::string_view name,
+                   DataType type);
+
+// A text attribute of a command.
+const std::string& attribute(const Command& command, std::string_view name);
+
+}  // namespace simulator

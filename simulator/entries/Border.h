@@ -1,0 +1,55 @@
+#pragma once
+
+#include <mutex>
+#include <new>
+#include <string_view>
+
+#include "Api.h"
+#include "entries/StatusFiller.h"
+#include "sessions/Simulator.h"
+#include "status/Refusal.h"
+
+// What stands between C callers and the simulator. No exception gets past it.
+namespace simulator {
+
+// Puts a refusal into a status. Without the memory for its details, only the code arrives.
+void report(const Refusal& refusal, qierr_Status& status) noexcept;
+// Puts the exception in flight into a status.
+void reportCurrentException(qierr_Status& status) noexcept;
+
+// Runs body(simulator, lock) with the mutex held, unless the status is negative already. What body
+// throws ends up in the status.
+template <typename Body>
+void withSimulator(qierr_Status* status, Body body) noexcept {
+    if (status->code < 0) {
+        return;
+    }
+    try {
+        Simulator& simulator = Simulator::instance();
+        std::unique_lock<std::mutex> lock(simulator.mutex);
+        body(simulator, lock);
+    } catch (...) {
+        reportCurrentException(*status);
+    }
+}
+
+// Sets what a function gives out to 0 or null, unless the status keeps it from acting.
+template <typename... Outs>
+void clearOutputs(const qierr_Status* status, Outs*... outs) noexcept {
+    if (status->code >= 0) {
+        ((*outs = Outs{}), ...);
+    }
+}
+
+// Runs body(simulator, session) in the same way, for an open session.
+template <typename Body>
+void withSession(nQITRMCAPI100_Session session, qierr_Status* status, Body body) noexcept {
+    withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>&) {
+        body(simulator, simulator.sessions.get(session));
+    });
+}
+
+// A text that a caller must give. Refuses a null pointer with the argument's name.
+std::string_view required(const char* text, const char* argument);
+
+}  // namespace simulator

@@ -1,0 +1,130 @@
+#include <algorithm>
+
+#include "entries/Attributes.h"
+#include "entries/TypedValues.h"
+
+using namespace simulator;
+
+namespace {
+
+struct Task {
+    Resource* resource;
+    const Command* command;
+};
+
+// One task for each resource, however often it is named.
+std::vector<Task> findTasks(const Resolver& resolver, std::string_view resources,
+                            std::string_view command) {
+    const auto found = resolver.anyResources(resources);
+    expectSome(found);
+    std::vector<Task> tasks;
+    for (Resource* resource : found) {
+        const Command* known = resource->command(command);
+        if (known == nullptr) {
+            throw Refusal(code::unknownCommand)
+                .usage(tag::command, command)
+                .usage(tag::resource, resource->fullName());
+        }
+        const auto isSame = [&](const Task& task) { return task.resource == resource; };
+        if (std::none_of(tasks.begin(), tasks.end(), isSame)) {
+            tasks.push_back({resource, known});
+        }
+    }
+    return tasks;
+}
+
+// Marks resources as busy for as long as it lives.
+class Occupation {
+  public:
+    explicit Occupation(const std::vector<Task>& tasks) : tasks(tasks) { mark(true); }
+    Occupation(const Occupation&) = delete;
+    Occupation& operator=(const Occupation&) = delete;
+    ~Occupation() { mark(false); }
+
+  private:
+    void mark(bool busy) {
+        for (const Task& task : tasks) {
+            task.resource->busy = busy;
+        }
+    }
+
+    const std::vector<Task>& tasks;
+};
+
+void expectReady(const Task& task, const Reservations& reservations,
+                 nQITRMCAPI100_Session session) {
+    reservations.expectWritable(session, *task.resource->device);
+    if (task.resource->busy) {
+        throw Refusal(code::resourceBusy).usage(tag::resource, task.resource->fullName());
+    }
+}
+
+// Lets the time of the commands pass; they run side by side.
+void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Session session,
+               Waits& waits, std::unique_lock<std::mutex>& lock) {
+    double longest = 0.0;
+    for (const Task& task : tasks) {
+        longest = std::max(longest, task.command->seconds);
+    }
+    if (longest > 0.0 && timeout > 0.0) {
+        Wait wait(session);
+        waits.sleep(wait, std::min(longest, timeout), lock);
+    }
+    if (longest > timeout) {
+        throw Refusal(code::commandTimedOut)
+            .usage(tag::command, tasks.front().command->name)
+            .usage(tag::timeout, numberText(timeout));
+    }
+}
+
+}  // namespace
+
+void nQITRMCAPI100_executeGenericCommand(nQITRMCAPI100_Session session, const char* resources,
+                                         const char* command, double timeout,
+                                         qierr_Status* status) {
+    withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+        const Session& owner = simulator.sessions.get(session);
+        const auto tasks = findTasks(simulator.resolver(owner), required(resources, "resources"),
+                                     required(command, "command"));
+        const double patience = checkedTimeout(timeout);
+        for (const Task& task : tasks) {
+            expectReady(task, simulator.reservations, session);
+        }
+        const Occupation occupation(tasks);
+        spendTime(tasks, patience, session, simulator.waits, lock);
+        for (const Task& task : tasks) {
+            carryOut(*task.command, task.resource->properties);
+        }
+    });
+}
+
+void nQITRMCAPI100_openGenericCommand(nQITRMCAPI100_Session session, const char* resources,
+                                      const char* command, nQITRMCAPI100_Command* handle,
+                                      qierr_Status* status) {
+    clearOutputs(status, handle);
+    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+        const auto tasks = findTasks(simulator.resolver(owner), required(resources, "resources"),
+                                     required(command, "command"));
+        *handle = simulator.openCommands.add({session, tasks.front().command});
+    });
+}
+
+void nQITRMCAPI100_closeCommand(nQITRMCAPI100_Command handle, qierr_Status* status) {
+    withSimulator(status, [&](Simulator& simulator, auto&) {
+        if (!simulator.openCommands.remove(handle)) {
+            throw Refusal(code::unknownHandle).usage(tag::handle, handle);
+        }
+    });
+}
+
+void nQITRMCAPI100_getCommandPropertyString(nQITRMCAPI100_Command handle, const char* attribute,
+                                            char** value, qierr_Status* status) {
+    clearOutputs(status, value);
+    withSimulator(status, [&](Simulator& simulator, auto&) {
+        const OpenCommand* open = simulator.openCommands.find(handle);
+        if (open == nullptr) {
+            throw Refusal(code::unknownHandle).usage(tag::handle, handle);
+        }
+        *value = lendText(simulator::attribute(*open->command, required(attribute, "attribute")));
+    });
+}

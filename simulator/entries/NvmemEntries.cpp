@@ -1,0 +1,77 @@
+#include <algorithm>
+
+#include "entries/Border.h"
+
+using namespace simulator;
+
+namespace {
+
+void expectBytes(const uint8_t* bytes, uint32_t size, const char* argument) {
+    if (bytes == nullptr && size != 0) {
+        throw Refusal(code::missingArgument).usage(tag::argument, argument);
+    }
+}
+
+std::string serialNumber(const Device& device) {
+    const Property* property = device.properties.find("Dev.SerialNum");
+    return property != nullptr ? firstText(property->value) : std::string();
+}
+
+// The areas that are named, and all areas of the devices that are named.
+std::vector<NvmemArea*> areasOf(const Resolver& resolver, std::string_view resources) {
+    const auto found = resolver.anyResources(resources);
+    expectSome(found);
+    std::vector<NvmemArea*> areas;
+    for (Resource* resource : found) {
+        if (resource->kind == Kind::nvmemArea) {
+            areas.push_back(static_cast<NvmemArea*>(resource));
+        } else if (resource->kind == Kind::device) {
+            for (const auto& area : resource->device->nvmemAreas) {
+                areas.push_back(area.get());
+            }
+        } else {
+            throw Refusal(code::unknownNvmemArea).usage(tag::requestedValue, resource->fullName());
+        }
+    }
+    return areas;
+}
+
+}  // namespace
+
+void nQITRMCAPI100_getNvmemBytes(nQITRMCAPI100_Session session, const char* nvmemArea,
+                                 uint32_t address, uint8_t* buffer, uint32_t size,
+                                 qierr_Status* status) {
+    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+        const NvmemArea& area =
+            simulator.resolver(owner).oneNvmemArea(required(nvmemArea, "nvmemArea"));
+        expectBytes(buffer, size, "buffer");
+        area.memory.read(address, buffer, size);
+    });
+}
+
+void nQITRMCAPI100_setNvmemBytes(nQITRMCAPI100_Session session, const char* nvmemArea,
+                                 uint32_t address, const uint8_t* bytes, uint32_t size,
+                                 const char* serialNumberGiven, const char* password,
+                                 qierr_Status* status) {
+    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+        NvmemArea& area = simulator.resolver(owner).oneNvmemArea(required(nvmemArea, "nvmemArea"));
+        expectBytes(bytes, size, "bytes");
+        simulator.reservations.expectWritable(session, *area.device);
+        area.memory.unlock(required(serialNumberGiven, "serialNumber"), serialNumber(*area.device),
+                           required(password, "password"));
+        area.memory.write(session, address, bytes, size);
+    });
+}
+
+void nQITRMCAPI100_commitNvmemGeneric(nQITRMCAPI100_Session session, const char* resources,
+                                      qierr_Status* status) {
+    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+        const auto areas = areasOf(simulator.resolver(owner), required(resources, "resources"));
+        for (const NvmemArea* area : areas) {
+            simulator.reservations.expectWritable(session, *area->device);
+        }
+        for (NvmemArea* area : areas) {
+            area->memory.commit();
+        }
+    });
+}

@@ -1,0 +1,43 @@
+#include "entries/StatusFiller.h"
+
+#include <cstring>
+
+namespace simulator {
+
+namespace {
+
+constexpr std::string_view emptyText = "{}";
+// A NUL behind the text, and the end marker.
+constexpr size_t framing = 2;
+
+bool putText(qierr_Status& status, std::string_view text) noexcept {
+    const size_t needed = text.size() + framing;
+    if (needed > INT32_MAX) {
+        return false;
+    }
+    if (needed > status.capacity && !status.reallocJson(&status, static_cast<uint32_t>(needed))) {
+        return false;
+    }
+    if (status.json == nullptr || status.capacity < needed) {
+        return false;
+    }
+    std::memcpy(status.json, text.data(), text.size());
+    std::memset(status.json + text.size(), 0, status.capacity - text.size());
+    status.json[status.capacity - 1] = 'J';
+    return true;
+}
+
+}  // namespace
+
+void fillStatus(qierr_Status& status, int32_t code, std::string_view text) noexcept {
+    if (status.code < 0 || code == 0 || (status.code > 0 && code > 0)) {
+        return;
+    }
+    status.code = code;
+    if (!putText(status, text) && status.json != nullptr) {
+        // The text of a warning that is replaced must not be taken for this failure's.
+        putText(status, emptyText);
+    }
+}
+
+}  // namespace simulator

@@ -1,0 +1,68 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "entries/Border.h"
+#include "entries/Lending.h"
+#include "model/Values.h"
+
+// Between the C types of the driver's functions and values. A text is a pointer there, and a
+// Boolean the only number of 8 bits.
+namespace simulator {
+
+template <typename Number>
+void lendScalar(const Elements& elements, Number* value) {
+    *value = std::get<List<Number>>(elements).front();
+}
+
+inline void lendScalar(const Elements& elements, char** value) {
+    *value = lendText(std::get<List<std::string>>(elements).front());
+}
+
+template <typename Number>
+void lendArray(const Elements& elements, Number** array, uint32_t* count) {
+    const auto& list = std::get<List<Number>>(elements);
+    *array = lendNumbers(list);
+    *count = static_cast<uint32_t>(list.size());
+}
+
+inline void lendArray(const Elements& elements, char*** array, uint32_t* count) {
+    const auto& list = std::get<List<std::string>>(elements);
+    *array = lendTexts(list);
+    *count = static_cast<uint32_t>(list.size());
+}
+
+template <typename Number>
+Number asElement(Number value) {
+    return value;
+}
+
+inline uint8_t asElement(uint8_t value) {
+    return value != 0 ? 1 : 0;
+}
+
+inline std::string asElement(const char* value) {
+    return std::string(required(value, "value"));
+}
+
+template <typename Value>
+Elements asElements(Value value) {
+    return List<decltype(asElement(value))>{asElement(value)};
+}
+
+template <typename Value>
+Elements asElements(const Value* array, uint32_t count) {
+    if (array == nullptr && count != 0) {
+        throw Refusal(code::missingArgument).usage(tag::argument, "array");
+    }
+    List<decltype(asElement(*array))> list;
+    list.reserve(count);
+    for (uint32_t i = 0; i < count; ++i) {
+        list.push_back(asElement(array[i]));
+    }
+    return list;
+}
+
+}  // namespace simulator

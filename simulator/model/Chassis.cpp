@@ -1,0 +1,109 @@
+#include "model/Chassis.h"
+
+#include "model/NameText.h"
+#include "status/Refusal.h"
+
+namespace simulator {
+
+std::string Resource::fullName() const {
+    return kind == Kind::device ? name : device->name + "/" + name;
+}
+
+const Command* Resource::command(std::string_view commandName) const {
+    for (const Command& command : commands) {
+        if (command.name == commandName) {
+            return &command;
+        }
+    }
+    return nullptr;
+}
+
+void Device::reset() {
+    forEachResource([](Resource& resource) { resource.properties.reset(); });
+    for (const auto& area : nvmemAreas) {
+        area->memory.drop();
+    }
+    registers.reset();
+}
+
+void Device::dropPending(nQITRMCAPI100_Session session) {
+    forEachResource([&](Resource& resource) { resource.properties.dropPending(session); });
+    for (const auto& area : nvmemAreas) {
+        area->memory.dropPending(session);
+    }
+}
+
+Device& Chassis::addDevice(const std::string& name) {
+    all.push_back(std::make_unique<Device>(name));
+    byName.emplace(foldName(name), all.back().get());
+    return *all.back();
+}
+
+Resource& Chassis::addPhysChan(Device& device, const std::string& name) {
+    device.physChans.push_back(std::make_unique<Resource>(Kind::physChan, name, device));
+    device.parts.emplace(foldName(name), device.physChans.back().get());
+    return *device.physChans.back();
+}
+
+NvmemArea& Chassis::addNvmemArea(Device& device, const std::string& name) {
+    device.nvmemAreas.push_back(std::make_unique<NvmemArea>(name, device));
+    device.parts.emplace(foldName(name), device.nvmemAreas.back().get());
+    return *device.nvmemAreas.back();
+}
+
+void Chassis::rename(Device& device, const std::string& newName) {
+    std::string name = newName;
+    const std::string folded = foldName(newName);
+    const std::string old = foldName(device.name);
+    byName.emplace(folded, &device);
+    if (folded != old) {
+        byName.erase(old);
+    }
+    device.name.swap(name);
+    ++changes;
+}
+
+Device* Chassis::findDevice(std::string_view name) const {
+    const auto found = byName.find(foldName(name));
+    return found == byName.end() ? nullptr : found->second;
+}
+
+Resource* Chassis::findPart(const Device& device, std::string_view name) const {
+    const auto found = device.parts.find(foldName(name));
+    return found == device.parts.end() ? nullptr : found->second;
+}
+
+Resource* Chassis::find(std::string_view fullName) const {
+    const size_t slash = fullName.find('/');
+    Device* device = findDevice(fullName.substr(0, slash));
+    if (device == nullptr || slash == std::string_view::npos) {
+        return device;
+    }
+    return findPart(*device, fullName.substr(slash + 1));
+}
+
+Device& Chassis::device(std::string_view name) const {
+    Device* found = findDevice(name);
+    if (found == nullptr) {
+        throw Refusal(code::unknownDevice).usage(tag::requestedValue, name);
+    }
+    return *found;
+}
+
+Resource& Chassis::physChan(std::string_view fullName) const {
+    Resource* found = find(fullName);
+    if (found == nullptr || found->kind != Kind::physChan) {
+        throw Refusal(code::unknownPhysChan).usage(tag::requestedValue, fullName);
+    }
+    return *found;
+}
+
+NvmemArea& Chassis::nvmemArea(std::string_view fullName) const {
+    Resource* found = find(fullName);
+    if (found == nullptr || found->kind != Kind::nvmemArea) {
+        throw Refusal(code::unknownNvmemArea).usage(tag::requestedValue, fullName);
+    }
+    return static_cast<NvmemArea&>(*found);
+}
+
+}  // namespace simulator

@@ -1,0 +1,125 @@
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "model/Commands.h"
+#include "model/Nvmem.h"
+#include "model/Properties.h"
+#include "model/Registers.h"
+
+namespace simulator {
+
+enum class Kind { device, physChan, nvmemArea };
+
+struct Device;
+
+// Something that clients name. Resources live as long as the chassis; their addresses identify
+// them, while their names may change.
+struct Resource {
+    Resource(Kind kind, std::string name, Device& device)
+        : kind(kind), name(std::move(name)), device(&device) {}
+    Resource(const Resource&) = delete;
+    Resource& operator=(const Resource&) = delete;
+
+    // "Mod1" for a device, "Mod1/ch0" for what belongs to one.
+    std::string fullName() const;
+    // Returns null when there is no such command.
+    const Command* command(std::string_view commandName) const;
+
+    Kind kind;
+    // The part of the name behind the slash, or the whole name of a device.
+    std::string name;
+    // The device that this belongs to; a device belongs to itself.
+    Device* device;
+    PropertyStore properties;
+    // In the order of the description.
+    std::vector<Command> commands;
+    // While a command takes its time.
+    bool busy = false;
+};
+
+struct NvmemArea : Resource {
+    NvmemArea(std::string name, Device& device)
+        : Resource(Kind::nvmemArea, std::move(name), device) {}
+
+    NvmemMemory memory;
+};
+
+struct Device : Resource {
+    explicit Device(std::string name) : Resource(Kind::device, std::move(name), *this) {}
+
+    uint32_t slot = 0;
+    int32_t category = 0;
+    std::vector<std::unique_ptr<Resource>> physChans;
+    std::vector<std::unique_ptr<NvmemArea>> nvmemAreas;
+    // What stands in the slots of a chassis, owned by the chassis.
+    std::vector<Device*> modules;
+    // The channels and areas by their folded names, without the device's.
+    std::map<std::string, Resource*, std::less<>> parts;
+    Registers registers;
+    // How long it takes to connect, and whether the device answers then.
+    double connectSeconds = 0.0;
+    bool reachable = true;
+
+    // Calls visit(Resource&) for the device itself and all its parts.
+    template <typename Visit>
+    void forEachResource(Visit visit) {
+        visit(static_cast<Resource&>(*this));
+        for (const auto& channel : physChans) {
+            visit(*channel);
+        }
+        for (const auto& area : nvmemAreas) {
+            visit(static_cast<Resource&>(*area));
+        }
+    }
+    // Puts everything but the names and the lasting content of the NVMEM areas into the state
+    // after power-on.
+    void reset();
+    // Forgets what a session wrote to the device and its parts and did not commit.
+    void dropPending(nQITRMCAPI100_Session session);
+};
+
+// All resources of the system. Names are looked up without regard to letter case.
+class Chassis {
+  public:
+    // Adds a device behind those present. The name must be free.
+    Device& addDevice(const std::string& name);
+    // Add a part to a device. The name must be free on that device.
+    Resource& addPhysChan(Device& device, const std::string& name);
+    NvmemArea& addNvmemArea(Device& device, const std::string& name);
+    // Gives a device a name that no other device has.
+    void rename(Device& device, const std::string& newName);
+
+    // Return null when there is no such resource.
+    Device* findDevice(std::string_view name) const;
+    Resource* findPart(const Device& device, std::string_view name) const;
+    // Finds a resource of any kind by its full name.
+    Resource* find(std::string_view fullName) const;
+
+    // Find a resource of one kind, or refuse with a status of that kind.
+    Device& device(std::string_view name) const;
+    Resource& physChan(std::string_view fullName) const;
+    NvmemArea& nvmemArea(std::string_view fullName) const;
+
+    const std::vector<std::unique_ptr<Device>>& devices() const { return all; }
+
+    // The handle of the first session that is opened.
+    uint32_t firstSessionHandle = 1;
+    // How often a name has changed.
+    uint64_t changes = 0;
+    Catalogue catalogue;
+    PropertyStore systemProperties;
+    // What every session begins with.
+    PropertyStore sessionProperties;
+
+  private:
+    std::vector<std::unique_ptr<Device>> all;
+    std::map<std::string, Device*, std::less<>> byName;
+};
+
+}  // namespace simulator

@@ -1,0 +1,147 @@
+#include "model/NameText.h"
+
+#include <utf8proc.h>
+
+#include <algorithm>
+#include <charconv>
+#include <cstdlib>
+#include <memory>
+#include <new>
+
+#include "status/Refusal.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr uint32_t longestRange = 1024;
+constexpr size_t longestName = 64;
+
+bool isDigit(char c) {
+    return c >= '0' && c <= '9';
+}
+
+std::string foldAscii(std::string_view name) {
+    std::string folded(name);
+    for (char& c : folded) {
+        if (c >= 'A' && c <= 'Z') {
+            c = static_cast<char>(c - 'A' + 'a');
+        }
+    }
+    return folded;
+}
+
+uint32_t rangeNumber(std::string_view digits, std::string_view name) {
+    uint32_t number = 0;
+    const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), number);
+    if (error != std::errc() || end != digits.data() + digits.size()) {
+        throw Refusal(code::invalidNameRange).usage(tag::requestedValue, name);
+    }
+    return number;
+}
+
+using Visit = std::function<void(const std::string&)>;
+
+void visitNames(std::string_view part, const Visit& visit) {
+    const size_t colon = part.find(':');
+    if (colon == std::string_view::npos || part.find('/') == std::string_view::npos) {
+        visit(std::string(part));
+        return;
+    }
+    size_t digits = colon;
+    while (digits > 0 && isDigit(part[digits - 1])) {
+        --digits;
+    }
+    const uint32_t first = rangeNumber(part.substr(digits, colon - digits), part);
+    const uint32_t last = rangeNumber(part.substr(colon + 1), part);
+    if (first > last || last - first >= longestRange) {
+        throw Refusal(code::invalidNameRange).usage(tag::requestedValue, part);
+    }
+    const std::string prefix(part.substr(0, digits));
+    for (uint32_t offset = 0; offset <= last - first; ++offset) {
+        visit(prefix + std::to_string(first + offset));
+    }
+}
+
+// The number at the end of a name may be written as part of a range, where zeros in front are lost.
+bool endsInZeroPaddedNumber(std::string_view name) {
+    const auto lastOther = std::find_if_not(name.rbegin(), name.rend(), isDigit);
+    const size_t digits = static_cast<size_t>(lastOther - name.rbegin());
+    return digits > 1 && name[name.size() - digits] == '0';
+}
+
+bool isValidUtf8(std::string_view text) {
+    while (!text.empty()) {
+        utf8proc_int32_t point = 0;
+        const auto length = utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(text.data()),
+                                             static_cast<utf8proc_ssize_t>(text.size()), &point);
+        if (length < 1) {
+            return false;
+        }
+        text.remove_prefix(static_cast<size_t>(length));
+    }
+    return true;
+}
+
+}  // namespace
+
+std::string foldName(std::string_view name) {
+    if (std::all_of(name.begin(), name.end(), [](unsigned char c) { return c < 0x80; })) {
+        return foldAscii(name);
+    }
+    utf8proc_uint8_t* folded = nullptr;
+    const auto length =
+        utf8proc_map(reinterpret_cast<const utf8proc_uint8_t*>(name.data()),
+                     static_cast<utf8proc_ssize_t>(name.size()), &folded, UTF8PROC_CASEFOLD);
+    const std::unique_ptr<utf8proc_uint8_t, decltype(&std::free)> owner(folded, &std::free);
+    if (length == UTF8PROC_ERROR_NOMEM) {
+        throw std::bad_alloc();
+    }
+    if (length < 0) {
+        return std::string(name);
+    }
+    return std::string(reinterpret_cast<const char*>(folded), static_cast<size_t>(length));
+}
+
+void forEachName(std::string_view joined, const Visit& visit) {
+    constexpr size_t none = std::string_view::npos;
+    size_t comma = joined.empty() ? none : 0;
+    while (comma != none) {
+        comma = joined.find(',');
+        visitNames(joined.substr(0, comma), visit);
+        joined.remove_prefix(comma == none ? joined.size() : comma + 1);
+    }
+}
+
+std::string nameFault(std::string_view name) {
+    const auto isControl = [](unsigned char c) { return c < 0x20 || c == 0x7F; };
+    if (name.empty()) {
+        return "a name must not be empty";
+    }
+    if (name.size() > longestName) {
+        return "a name has at most 64 bytes";
+    }
+    if (!isValidUtf8(name)) {
+        return "a name must be UTF-8 text";
+    }
+    if (name.find_first_of(",/:") != std::string_view::npos) {
+        return "a name must not hold a comma, a slash or a colon";
+    }
+    if (name.front() == '$') {
+        return "names that begin with a dollar sign are reserved";
+    }
+    if (name.front() == ' ' || name.back() == ' ' ||
+        std::any_of(name.begin(), name.end(), isControl)) {
+        return "a name must not begin or end with a blank nor hold control characters";
+    }
+    return {};
+}
+
+std::string partNameFault(std::string_view name) {
+    if (endsInZeroPaddedNumber(name)) {
+        return "the number at its end must not begin with 0, or a range could not name it";
+    }
+    return nameFault(name);
+}
+
+}  // namespace simulator

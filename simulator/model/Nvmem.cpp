@@ -1,0 +1,60 @@
+#include "model/Nvmem.h"
+
+#include <algorithm>
+
+#include "status/Refusal.h"
+
+namespace simulator {
+
+void NvmemMemory::expectInside(uint32_t address, uint32_t count) const {
+    if (uint64_t{address} + count > lasting.size()) {
+        throw Refusal(code::nvmemOutOfRange)
+            .usage(tag::nvmemAddress, address)
+            .usage(tag::requestedBytes, count)
+            .usage(tag::areaSize, size());
+    }
+}
+
+void NvmemMemory::read(uint32_t address, uint8_t* buffer, uint32_t count) const {
+    expectInside(address, count);
+    const std::vector<uint8_t>& content = pending ? pending->content : lasting;
+    std::copy_n(content.begin() + address, count, buffer);
+}
+
+void NvmemMemory::write(nQITRMCAPI100_Session session, uint32_t address, const uint8_t* bytes,
+                        uint32_t count) {
+    expectInside(address, count);
+    if (!pending) {
+        pending = Pending{lasting, session};
+    }
+    pending->session = session;
+    std::copy_n(bytes, count, pending->content.begin() + address);
+}
+
+void NvmemMemory::unlock(std::string_view given, std::string_view deviceSerialNumber,
+                         std::string_view givenPassword) const {
+    if (!guard.writable) {
+        throw Refusal(code::readOnlyNvmemArea);
+    }
+    if (guard.wantsSerialNumber && given != deviceSerialNumber) {
+        throw Refusal(code::wrongSerialNumber).usage(tag::requestedValue, given);
+    }
+    if (!guard.password.empty() && givenPassword != guard.password) {
+        throw Refusal(code::wrongPassword);
+    }
+}
+
+void NvmemMemory::commit() {
+    if (pending) {
+        lasting = std::move(pending->content);
+        pending.reset();
+    }
+}
+
+void NvmemMemory::dropPending(nQITRMCAPI100_Session session) {
+    if (pending && pending->session == session) {
+        pending.reset();
+    }
+}
+
+}  // namespace simulator

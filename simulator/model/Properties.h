@@ -1,0 +1,111 @@
+#pragma once
+
+#include <map>
+#include <memory>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <utility>
+#include <vector>
+
+#include "Api.h"
+#include "model/Values.h"
+
+namespace simulator {
+
+// What kinds of things have properties.
+enum class Category { system, session, device, physChan, nvmemArea };
+
+// The numbers of the enumeration "PropertyAccess".
+enum class PropertyAccess : int32_t { readOnly = 1, writeOnly = 2, readWrite = 3 };
+
+struct Enumeration {
+    std::string name;
+    // By which the details of a status refer to the enumeration.
+    uint32_t id = 0;
+    // In the order of the description.
+    std::vector<std::pair<std::string, int32_t>> items;
+
+    bool has(int32_t value) const;
+};
+
+// Everything about a property but its value.
+struct PropertyDefinition {
+    std::string name;
+    DataType type = DataType::text;
+    PropertyAccess access = PropertyAccess::readOnly;
+    // Kept by the simulator itself, not stored as a value.
+    bool computed = false;
+    // Written values take effect at a commit.
+    bool needsCommit = false;
+    std::string description;
+    std::string document;
+    std::string unit;
+    // Limits of each element, one element each.
+    std::optional<Elements> least;
+    std::optional<Elements> most;
+    std::shared_ptr<const Enumeration> enumeration;
+    std::optional<Elements> initial;
+
+    // The index of the first element outside of the limits, or that is no item of the enumeration.
+    // The elements are of the property's type.
+    std::optional<size_t> firstOutOfRange(const Elements& value) const;
+    std::optional<size_t> firstWithoutItem(const Elements& value) const;
+};
+
+using DefinitionPointer = std::shared_ptr<const PropertyDefinition>;
+
+// A property with its value.
+struct Property {
+    struct Pending {
+        Elements value;
+        nQITRMCAPI100_Session session;
+    };
+
+    DefinitionPointer definition;
+    // The value after power-on.
+    Elements initial;
+    Elements value;
+    std::optional<Pending> pending;
+};
+
+// The stored properties of one thing. Names are compared byte by byte.
+class PropertyStore {
+  public:
+    // Adds a property with its value after power-on. A name that is there keeps its property.
+    void add(const DefinitionPointer& definition, const Elements& initial);
+    // Adds a property that the driver does not define itself.
+    void addOwn(const DefinitionPointer& definition);
+
+    // Return null when there is no such property.
+    Property* find(std::string_view name);
+    const Property* find(std::string_view name) const;
+
+    // The names of the properties that the driver does not define, in the order of addition.
+    const std::vector<std::string>& ownNames() const { return own; }
+
+    void reset();
+    void commit();
+    // Forgets what a session wrote and did not commit.
+    void dropPending(nQITRMCAPI100_Session session);
+
+  private:
+    std::map<std::string, Property, std::less<>> all;
+    std::vector<std::string> own;
+};
+
+// The properties that the driver itself defines.
+class Catalogue {
+  public:
+    void add(Category category, const DefinitionPointer& definition);
+
+    const std::vector<DefinitionPointer>& definitions(Category category) const;
+    std::vector<std::string> names(Category category) const;
+    // Returns null when there is no such property.
+    DefinitionPointer find(Category category, std::string_view name) const;
+
+  private:
+    std::map<Category, std::vector<DefinitionPointer>> all;
+};
+
+}  // namespace simulator

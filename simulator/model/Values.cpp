@@ -1,0 +1,114 @@
+#include "model/Values.h"
+
+#include <array>
+#include <charconv>
+
+namespace simulator {
+
+namespace {
+
+constexpr int32_t scalarTypes = 7;
+constexpr std::array<const char*, scalarTypes> scalarNames{"Bool",   "Double", "Int32", "Int64",
+                                                           "String", "UInt32", "UInt64"};
+
+DataType fromNumber(int32_t number) {
+    return static_cast<DataType>(number);
+}
+int32_t toNumber(DataType type) {
+    return static_cast<int32_t>(type);
+}
+
+std::string textOf(double number) {
+    return numberText(number);
+}
+std::string textOf(const std::string& text) {
+    return text;
+}
+template <typename Integer>
+std::string textOf(Integer number) {
+    return std::to_string(number);
+}
+
+}  // namespace
+
+bool isArray(DataType type) {
+    return toNumber(type) > scalarTypes;
+}
+
+DataType elementType(DataType type) {
+    return isArray(type) ? fromNumber(toNumber(type) - scalarTypes) : type;
+}
+
+DataType arrayType(DataType type) {
+    return isArray(type) ? type : fromNumber(toNumber(type) + scalarTypes);
+}
+
+std::string typeName(DataType type) {
+    const auto index = static_cast<size_t>(toNumber(elementType(type)) - 1);
+    return std::string(scalarNames[index]) + (isArray(type) ? "Array" : "");
+}
+
+std::optional<DataType> typeNamed(std::string_view name) {
+    for (int32_t number = 1; number <= 2 * scalarTypes; ++number) {
+        if (typeName(fromNumber(number)) == name) {
+            return fromNumber(number);
+        }
+    }
+    return std::nullopt;
+}
+
+Elements noElements(DataType type) {
+    switch (elementType(type)) {
+        case DataType::boolean:
+            return List<uint8_t>();
+        case DataType::real:
+            return List<double>();
+        case DataType::int32:
+            return List<int32_t>();
+        case DataType::int64:
+            return List<int64_t>();
+        case DataType::uint32:
+            return List<uint32_t>();
+        case DataType::uint64:
+            return List<uint64_t>();
+        default:
+            return List<std::string>();
+    }
+}
+
+DataType elementType(const Elements& elements) {
+    return fromNumber(static_cast<int32_t>(elements.index()) + 1);
+}
+
+size_t elementCount(const Elements& elements) {
+    return std::visit([](const auto& list) { return list.size(); }, elements);
+}
+
+Elements elementAt(const Elements& elements, size_t index) {
+    return std::visit(
+        [&](const auto& list) -> Elements { return std::decay_t<decltype(list)>{list[index]}; },
+        elements);
+}
+
+void append(Elements& target, const Elements& more) {
+    std::visit(
+        [&](auto& list) {
+            const auto& added = std::get<std::decay_t<decltype(list)>>(more);
+            list.insert(list.end(), added.begin(), added.end());
+        },
+        target);
+}
+
+std::string numberText(double number) {
+    std::array<char, 64> digits;
+    const auto [end, error] = std::to_chars(digits.data(), digits.data() + digits.size(), number);
+    return error == std::errc() ? std::string(digits.data(), end) : std::string();
+}
+
+std::string firstText(const Elements& elements) {
+    return std::visit(
+        [](const auto& list) { return list.empty() ? std::string() : textOf(list.front()); },
+        elements);
+}
+
+}  // namespace simulator

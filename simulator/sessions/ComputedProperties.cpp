@@ -1,0 +1,161 @@
+#include "sessions/ComputedProperties.h"
+
+#include "status/Refusal.h"
+
+namespace simulator {
+
+namespace {
+
+struct Subject {
+    const Simulator& simulator;
+    const Session& session;
+    const Resource* resource;
+
+    const Device& device() const { return *resource->device; }
+    const NvmemMemory& memory() const { return static_cast<const NvmemArea*>(resource)->memory; }
+};
+
+using Value = std::optional<Elements>;
+
+struct Entry {
+    Category category;
+    std::string_view name;
+    Value (*read)(const Subject& subject);
+};
+
+template <typename List>
+std::vector<std::string> namesOf(const List& resources) {
+    std::vector<std::string> names;
+    for (const auto& resource : resources) {
+        names.push_back(resource->fullName());
+    }
+    return names;
+}
+
+template <Category category>
+Value propertyNames(const Subject& subject) {
+    return subject.simulator.chassis->catalogue.names(category);
+}
+
+Value ownPropertyNames(const Subject& subject) {
+    return subject.resource->properties.ownNames();
+}
+
+Value commandNames(const Subject& subject) {
+    std::vector<std::string> names;
+    for (const Command& command : subject.resource->commands) {
+        names.push_back(command.name);
+    }
+    return names;
+}
+
+// Only a chassis has modules, and only a module has a slot.
+bool isModule(const Device& device) {
+    return device.slot != 0;
+}
+
+Value modules(const Subject& subject) {
+    constexpr int32_t chassisCategory = 1;
+    if (subject.device().category != chassisCategory || isModule(subject.device())) {
+        return std::nullopt;
+    }
+    return namesOf(subject.device().modules);
+}
+
+Value slotNumber(const Subject& subject) {
+    if (!isModule(subject.device())) {
+        return std::nullopt;
+    }
+    return List<uint32_t>{subject.device().slot};
+}
+
+constexpr Entry entries[] = {
+    {Category::system, "Sys.Devices",
+     [](const Subject& subject) -> Value { return namesOf(subject.simulator.chassis->devices()); }},
+    {Category::system, "Sys.ConfigChangeCount",
+     [](const Subject& subject) -> Value {
+         return List<uint64_t>{subject.simulator.chassis->changes};
+     }},
+    {Category::system, "Sys.SystemProperties", propertyNames<Category::system>},
+    {Category::system, "Sys.SessionProperties", propertyNames<Category::session>},
+    {Category::system, "Sys.DeviceProperties", propertyNames<Category::device>},
+    {Category::system, "Sys.PhysChanProperties", propertyNames<Category::physChan>},
+    {Category::system, "Sys.NVMEMAreaProperties", propertyNames<Category::nvmemArea>},
+    {Category::session, "Session.ReservedDevices",
+     [](const Subject& subject) -> Value {
+         return namesOf(subject.simulator.resolver(subject.session).reservedDevices());
+     }},
+    {Category::session, "Session.ConnectedDevices",
+     [](const Subject& subject) -> Value { return namesOf(subject.session.connectedDevices); }},
+    {Category::session, "Session.DefaultDevices",
+     [](const Subject& subject) -> Value { return namesOf(subject.session.defaultDevices); }},
+    {Category::session, "Session.DefaultPhysChans",
+     [](const Subject& subject) -> Value { return namesOf(subject.session.defaultPhysChans); }},
+    {Category::session, "Session.DefaultNVMEMAreas",
+     [](const Subject& subject) -> Value { return namesOf(subject.session.defaultNvmemAreas); }},
+    {Category::device, "Dev.Name",
+     [](const Subject& subject) -> Value { return List<std::string>{subject.device().name}; }},
+    {Category::device, "Dev.ProductCategory",
+     [](const Subject& subject) -> Value { return List<int32_t>{subject.device().category}; }},
+    {Category::device, "Dev.Modules", modules},
+    {Category::device, "Dev.SlotNum", slotNumber},
+    {Category::device, "Dev.PhysChans",
+     [](const Subject& subject) -> Value { return namesOf(subject.device().physChans); }},
+    {Category::device, "Dev.NVMEM.Areas",
+     [](const Subject& subject) -> Value { return namesOf(subject.device().nvmemAreas); }},
+    {Category::device, "Dev.Properties", ownPropertyNames},
+    {Category::device, "Dev.Commands", commandNames},
+    {Category::physChan, "PhysChan.Properties", ownPropertyNames},
+    {Category::physChan, "PhysChan.Commands", commandNames},
+    {Category::nvmemArea, "NVMEMArea.Size",
+     [](const Subject& subject) -> Value { return List<uint32_t>{subject.memory().size()}; }},
+    {Category::nvmemArea, "NVMEMArea.Writable",
+     [](const Subject& subject) -> Value {
+         return List<uint8_t>{subject.memory().guardian().writable};
+     }},
+    {Category::nvmemArea, "NVMEMArea.SerialNumWanted",
+     [](const Subject& subject) -> Value {
+         return List<uint8_t>{subject.memory().guardian().wantsSerialNumber};
+     }},
+    {Category::nvmemArea, "NVMEMArea.PasswordWanted",
+     [](const Subject& subject) -> Value {
+         return List<uint8_t>{!subject.memory().guardian().password.empty()};
+     }},
+    {Category::nvmemArea, "NVMEMArea.PendingChanges",
+     [](const Subject& subject) -> Value { return List<uint8_t>{subject.memory().hasPending()}; }},
+};
+
+std::string joined(const std::vector<std::string>& names) {
+    std::string text;
+    for (const std::string& name : names) {
+        text += (text.empty() ? "" : ",") + name;
+    }
+    return text;
+}
+
+}  // namespace
+
+std::optional<Elements> computedValue(const Simulator& simulator, const Session& session,
+                                      Category category, const Resource* resource,
+                                      std::string_view name) {
+    for (const Entry& entry : entries) {
+        if (entry.category == category && entry.name == name) {
+            return entry.read({simulator, session, resource});
+        }
+    }
+    return std::nullopt;
+}
+
+void setDefaultResources(const Resolver& resolver, Session& session, std::string_view property,
+                         const std::vector<std::string>& names) {
+    const std::string text = joined(names);
+    if (property == "Session.DefaultPhysChans") {
+        session.defaultPhysChans = distinct(resolver.resources(Kind::physChan, text));
+    } else if (property == "Session.DefaultNVMEMAreas") {
+        session.defaultNvmemAreas = distinct(resolver.resources(Kind::nvmemArea, text));
+    } else {
+        session.defaultDevices = owners(resolver.resources(Kind::device, text));
+    }
+}
+
+}  // namespace simulator

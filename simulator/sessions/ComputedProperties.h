@@ -1,0 +1,20 @@
+#pragma once
+
+#include <optional>
+#include <string_view>
+
+#include "sessions/Simulator.h"
+
+namespace simulator {
+
+// The value of a property that the simulator keeps itself, or nothing when there is no such
+// property or the resource lacks it. `resource` is null for the categories system and session.
+std::optional<Elements> computedValue(const Simulator& simulator, const Session& session,
+                                      Category category, const Resource* resource,
+                                      std::string_view name);
+
+// Writes one of the session's lists of default resources. Refuses names that are unknown.
+void setDefaultResources(const Resolver& resolver, Session& session, std::string_view property,
+                         const std::vector<std::string>& names);
+
+}  // namespace simulator

@@ -1,0 +1,211 @@
+#include "sessions/PropertyDesk.h"
+
+#include "sessions/ComputedProperties.h"
+#include "status/Refusal.h"
+
+namespace simulator {
+
+namespace {
+
+Category categoryOf(Kind kind) {
+    switch (kind) {
+        case Kind::physChan:
+            return Category::physChan;
+        case Kind::nvmemArea:
+            return Category::nvmemArea;
+        default:
+            return Category::device;
+    }
+}
+
+[[noreturn]] void refuseUnknown(std::string_view name, const Resource* resource) {
+    Refusal refusal(code::unknownProperty);
+    refusal.usage(tag::propertyName, name);
+    if (resource != nullptr) {
+        refusal.usage(tag::resource, resource->fullName());
+    }
+    throw refusal;
+}
+
+Refusal about(const Code& reason, const PropertyDefinition& definition) {
+    Refusal refusal(reason);
+    refusal.usage(tag::propertyName, definition.name);
+    return refusal;
+}
+
+void expectType(const PropertyDefinition& definition, DataType type, size_t places) {
+    if (places > 1 && (isArray(definition.type) || !isArray(type))) {
+        throw about(code::severalResources, definition);
+    }
+    const DataType expected = places > 1 ? arrayType(definition.type) : definition.type;
+    if (type != expected) {
+        throw about(code::wrongPropertyType, definition)
+            .usage(tag::dataType, typeName(definition.type));
+    }
+}
+
+[[noreturn]] void refuseRange(const PropertyDefinition& definition, const Elements& value,
+                              size_t index) {
+    Refusal refusal = about(code::valueOutOfRange, definition);
+    refusal.usage(tag::requestedValue, firstText(elementAt(value, index)));
+    if (definition.least) {
+        refusal.usage(tag::minimum, firstText(*definition.least));
+    }
+    if (definition.most) {
+        refusal.usage(tag::maximum, firstText(*definition.most));
+    }
+    throw refusal;
+}
+
+}  // namespace
+
+PropertyDesk::Place PropertyDesk::find(Category category, Resource* resource, PropertyStore& store,
+                                       std::string_view name) {
+    if (Property* stored = store.find(name)) {
+        return {category, resource, stored->definition, stored, std::nullopt};
+    }
+    auto computed = computedValue(simulator, session, category, resource, name);
+    DefinitionPointer definition = simulator.chassis->catalogue.find(category, name);
+    if (!computed || definition == nullptr) {
+        refuseUnknown(name, resource);
+    }
+    return {category, resource, definition, nullptr, std::move(computed)};
+}
+
+std::vector<PropertyDesk::Place> PropertyDesk::findIn(Category category, std::string_view name) {
+    PropertyStore& store =
+        category == Category::session ? session.properties : simulator.chassis->systemProperties;
+    return {find(category, nullptr, store, name)};
+}
+
+std::vector<PropertyDesk::Place> PropertyDesk::find(std::string_view resources,
+                                                    std::string_view name) {
+    if (simulator.chassis->catalogue.find(Category::session, name) != nullptr) {
+        return findIn(Category::session, name);
+    }
+    const auto found = simulator.resolver(session).anyResources(resources);
+    expectSome(found);
+    std::vector<Place> places;
+    for (Resource* resource : found) {
+        places.push_back(find(categoryOf(resource->kind), resource, resource->properties, name));
+        // Lists of several resources are refused. They must not pile up until that is found out.
+        if (found.size() > 1 && isArray(places.back().definition->type)) {
+            places.back().computed.reset();
+        }
+    }
+    return places;
+}
+
+Elements PropertyDesk::readAll(const std::vector<Place>& places, DataType type) {
+    Elements all = noElements(type);
+    for (const Place& place : places) {
+        expectType(*place.definition, type, places.size());
+        if (place.definition->access == PropertyAccess::writeOnly) {
+            throw about(code::writeOnlyProperty, *place.definition);
+        }
+        append(all, place.computed ? *place.computed : place.stored->value);
+    }
+    return all;
+}
+
+Elements PropertyDesk::readSystem(std::string_view name, DataType type) {
+    return readAll(findIn(Category::system, name), type);
+}
+
+Elements PropertyDesk::readSession(std::string_view name, DataType type) {
+    return readAll(findIn(Category::session, name), type);
+}
+
+Elements PropertyDesk::read(std::string_view resources, std::string_view name, DataType type) {
+    return readAll(find(resources, name), type);
+}
+
+void PropertyDesk::expectAcceptable(const Place& place, const Elements& value) const {
+    const PropertyDefinition& definition = *place.definition;
+    if (definition.access == PropertyAccess::readOnly) {
+        throw about(code::readOnlyProperty, definition);
+    }
+    if (const auto index = definition.firstWithoutItem(value)) {
+        throw about(code::valueNotEnumerated, definition)
+            .usageEnum(tag::requestedValue, std::get<List<int32_t>>(value)[*index],
+                       definition.enumeration->id);
+    }
+    if (const auto index = definition.firstOutOfRange(value)) {
+        refuseRange(definition, value, *index);
+    }
+    if (place.resource != nullptr) {
+        simulator.reservations.expectWritable(session.handle, *place.resource->device);
+    }
+}
+
+void PropertyDesk::writeAll(const std::vector<Place>& places, DataType type,
+                            const Elements& values) {
+    std::vector<Elements> parts;
+    for (size_t i = 0; i < places.size(); ++i) {
+        expectType(*places[i].definition, type, places.size());
+        if (places.size() > 1 && elementCount(values) != places.size()) {
+            throw about(code::wrongElementCount, *places[i].definition)
+                .usage(tag::valueCount, static_cast<uint32_t>(elementCount(values)));
+        }
+        parts.push_back(places.size() > 1 ? elementAt(values, i) : values);
+        expectAcceptable(places[i], parts.back());
+    }
+    for (size_t i = 0; i < places.size(); ++i) {
+        if (places[i].stored == nullptr) {
+            setDefaultResources(simulator.resolver(session), session, places[i].definition->name,
+                                std::get<List<std::string>>(parts[i]));
+        } else if (places[i].definition->needsCommit) {
+            places[i].stored->pending = Property::Pending{std::move(parts[i]), session.handle};
+        } else {
+            places[i].stored->value = std::move(parts[i]);
+        }
+    }
+}
+
+void PropertyDesk::writeSystem(std::string_view name, DataType type, const Elements& values) {
+    writeAll(findIn(Category::system, name), type, values);
+}
+
+void PropertyDesk::writeSession(std::string_view name, DataType type, const Elements& values) {
+    writeAll(findIn(Category::session, name), type, values);
+}
+
+void PropertyDesk::write(std::string_view resources, std::string_view name, DataType type,
+                         const Elements& values) {
+    writeAll(find(resources, name), type, values);
+}
+
+void PropertyDesk::commit(std::string_view resources) {
+    const auto found = simulator.resolver(session).anyResources(resources);
+    expectSome(found);
+    for (const Resource* resource : found) {
+        simulator.reservations.expectWritable(session.handle, *resource->device);
+    }
+    for (Resource* resource : found) {
+        if (resource->kind == Kind::device) {
+            resource->device->forEachResource([](Resource& part) { part.properties.commit(); });
+        } else {
+            resource->properties.commit();
+        }
+    }
+}
+
+OpenProperty PropertyDesk::openDriverDefined(std::string_view name) {
+    for (const Category category : {Category::session, Category::system, Category::device,
+                                    Category::physChan, Category::nvmemArea}) {
+        if (auto definition = simulator.chassis->catalogue.find(category, name)) {
+            return {session.handle, category, std::move(definition), nullptr};
+        }
+    }
+    refuseUnknown(name, nullptr);
+}
+
+OpenProperty PropertyDesk::openGeneric(std::string_view resource, std::string_view name) {
+    const auto found = simulator.resolver(session).anyResources(resource);
+    expectOne(found);
+    Resource& owner = *found.front();
+    Place place = find(categoryOf(owner.kind), &owner, owner.properties, name);
+    return {session.handle, place.category, std::move(place.definition), &owner};
+}
+
+}  // namespace simulator

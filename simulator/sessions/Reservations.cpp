@@ -1,0 +1,160 @@
+#include "sessions/Reservations.h"
+
+#include <algorithm>
+
+#include "status/Refusal.h"
+
+namespace simulator {
+
+bool Holding::conflictsWith(const Holding& other) const {
+    const bool bothRead = access == readOnlyAccess && other.access == readOnlyAccess;
+    const bool sameGroup = !group.empty() && group == other.group;
+    return session != other.session && !bothRead && !sameGroup;
+}
+
+Reservations::Request::Request(const std::vector<Device*>& devices, const Holding& wanted)
+    : devices(devices), wanted(wanted), prepared(devices.size(), wanted), wait(wanted.session) {}
+
+Reservations::Reservations(const Chassis& chassis, Waits& waits) : waits(waits) {
+    for (const auto& device : chassis.devices()) {
+        holders[device.get()];
+    }
+}
+
+bool Reservations::conflictsOn(const Device& device, const Holding& wanted) const {
+    const std::list<Holding>& present = holders.at(&device);
+    return std::any_of(present.begin(), present.end(),
+                       [&](const Holding& holding) { return holding.conflictsWith(wanted); });
+}
+
+const Holding* Reservations::find(nQITRMCAPI100_Session session, const Device& device) const {
+    const std::list<Holding>& present = holders.at(&device);
+    const auto found = std::find_if(present.begin(), present.end(), [&](const Holding& holding) {
+        return holding.session == session;
+    });
+    return found == present.end() ? nullptr : &*found;
+}
+
+bool Reservations::isFree(const Request& request) const {
+    return std::none_of(request.devices.begin(), request.devices.end(),
+                        [&](const Device* device) { return conflictsOn(*device, request.wanted); });
+}
+
+bool Reservations::competes(const Request& earlier, const Request& later) const {
+    return earlier.wait.end == Wait::End::none && earlier.wanted.conflictsWith(later.wanted) &&
+           std::any_of(earlier.devices.begin(), earlier.devices.end(), [&](const Device* device) {
+               return std::find(later.devices.begin(), later.devices.end(), device) !=
+                      later.devices.end();
+           });
+}
+
+bool Reservations::mustQueue(const Request& request) const {
+    for (const Request* earlier : queue) {
+        if (earlier == &request) {
+            return false;
+        }
+        if (competes(*earlier, request)) {
+            return true;
+        }
+    }
+    return false;
+}
+
+void Reservations::grant(Request& request) noexcept {
+    for (const Device* device : request.devices) {
+        std::list<Holding>& present = holders.find(device)->second;
+        present.remove_if(
+            [&](const Holding& holding) { return holding.session == request.wanted.session; });
+        present.splice(present.end(), request.prepared, request.prepared.begin());
+    }
+    request.wait.finish(Wait::End::done);
+}
+
+void Reservations::serveQueue() noexcept {
+    for (Request* request : queue) {
+        if (request->wait.end == Wait::End::none && !mustQueue(*request) && isFree(*request)) {
+            grant(*request);
+        }
+    }
+}
+
+void Reservations::refuse(const Request& request) const {
+    std::vector<std::string> taken;
+    for (const Device* device : request.devices) {
+        if (conflictsOn(*device, request.wanted)) {
+            taken.push_back(device->name);
+        }
+    }
+    if (taken.size() == 1) {
+        throw Refusal(code::deviceReserved).usage(tag::device, taken.front());
+    }
+    throw Refusal(code::deviceReserved).usage(tag::devices, taken);
+}
+
+void Reservations::waitInQueue(Request& request, double timeout,
+                               std::unique_lock<std::mutex>& lock) {
+    struct InQueue {
+        InQueue(Reservations& owner, Request& request)
+            : owner(owner), place(owner.queue.insert(owner.queue.end(), &request)) {}
+        ~InQueue() {
+            owner.queue.erase(place);
+            owner.serveQueue();
+        }
+        Reservations& owner;
+        std::list<Request*>::iterator place;
+    } const inQueue(*this, request);
+    if (!waits.sleep(request.wait, timeout, lock)) {
+        if (!isFree(request)) {
+            refuse(request);
+        }
+        grant(request);
+    }
+}
+
+void Reservations::reserve(const std::vector<Device*>& devices, const Holding& wanted,
+                           double timeout, std::unique_lock<std::mutex>& lock) {
+    Request request(devices, wanted);
+    const bool mayWait = timeout > 0.0;
+    if (isFree(request) && !(mayWait && mustQueue(request))) {
+        grant(request);
+        serveQueue();
+    } else if (mayWait) {
+        waitInQueue(request, timeout, lock);
+    } else {
+        refuse(request);
+    }
+}
+
+bool Reservations::release(nQITRMCAPI100_Session session, const Device& device) {
+    std::list<Holding>& present = holders.at(&device);
+    const size_t before = present.size();
+    present.remove_if([&](const Holding& holding) { return holding.session == session; });
+    const bool held = present.size() != before;
+    serveQueue();
+    return held;
+}
+
+void Reservations::releaseAll(nQITRMCAPI100_Session session) {
+    for (auto& [device, present] : holders) {
+        present.remove_if([&](const Holding& holding) { return holding.session == session; });
+    }
+    serveQueue();
+}
+
+bool Reservations::holds(nQITRMCAPI100_Session session, const Device& device) const {
+    return find(session, device) != nullptr;
+}
+
+void Reservations::expectWritable(nQITRMCAPI100_Session session, const Device& device) const {
+    const Holding* held = find(session, device);
+    if (held == nullptr && conflictsOn(device, Holding{session, readWriteAccess, ""})) {
+        throw Refusal(code::deviceReserved).usage(tag::device, device.name);
+    }
+    if (held != nullptr && held->access == readOnlyAccess) {
+        throw Refusal(code::readOnlyReservation)
+            .elaboration(term::notAllowed)
+            .usage(tag::device, device.name);
+    }
+}
+
+}  // namespace simulator

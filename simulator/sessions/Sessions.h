@@ -1,0 +1,41 @@
+#pragma once
+
+#include <vector>
+
+#include "Api.h"
+#include "model/Chassis.h"
+#include "sessions/HandleTable.h"
+
+namespace simulator {
+
+struct Session {
+    nQITRMCAPI100_Session handle = 0;
+    // Until the session has its devices, nobody else may use its handle.
+    bool opening = true;
+    // The resources that the session was opened on, and the devices that these belong to.
+    std::vector<Device*> defaultDevices;
+    std::vector<Resource*> defaultPhysChans;
+    std::vector<Resource*> defaultNvmemAreas;
+    std::vector<Device*> connectedDevices;
+    PropertyStore properties;
+};
+
+// The open sessions. A reference to a session is valid until the session is closed.
+class Sessions {
+  public:
+    // firstProperties: what a session has to begin with.
+    Sessions(nQITRMCAPI100_Session firstHandle, const PropertyStore& firstProperties)
+        : table(firstHandle), firstProperties(firstProperties) {}
+
+    // Makes a session under the next free handle.
+    Session& make();
+    // Refuses with unknownSession when the handle is dead or its session is still opening.
+    Session& get(nQITRMCAPI100_Session handle);
+    void remove(nQITRMCAPI100_Session handle) noexcept { table.remove(handle); }
+
+  private:
+    HandleTable<Session> table;
+    const PropertyStore& firstProperties;
+};
+
+}  // namespace simulator

@@ -1,0 +1,53 @@
+#include "sessions/Simulator.h"
+
+#include <optional>
+
+#include "description/ChassisFile.h"
+#include "status/Refusal.h"
+
+namespace simulator {
+
+namespace {
+
+// What the first use leaves behind: a simulator, or the reason why there is none.
+struct Start {
+    Start() {
+        try {
+            simulator.emplace(loadChassis());
+        } catch (const Refusal& refusal) {
+            failure = refusal;
+        }
+    }
+
+    std::optional<Simulator> simulator;
+    std::optional<Refusal> failure;
+};
+
+}  // namespace
+
+Simulator& Simulator::instance() {
+    static Start start;
+    if (start.failure) {
+        throw *start.failure;
+    }
+    return *start.simulator;
+}
+
+Simulator::Simulator(std::unique_ptr<Chassis> loaded)
+    : chassis(std::move(loaded)),
+      sessions(chassis->firstSessionHandle, chassis->sessionProperties),
+      reservations(*chassis, waits) {}
+
+void Simulator::close(nQITRMCAPI100_Session session) {
+    const auto isOfSession = [&](const auto& item) { return item.session == session; };
+    waits.endAll(session, Wait::End::closed);
+    reservations.releaseAll(session);
+    openProperties.removeIf(isOfSession);
+    openCommands.removeIf(isOfSession);
+    for (const auto& device : chassis->devices()) {
+        device->dropPending(session);
+    }
+    sessions.remove(session);
+}
+
+}  // namespace simulator

@@ -1,0 +1,54 @@
+#pragma once
+
+#include <memory>
+#include <mutex>
+
+#include "model/Chassis.h"
+#include "sessions/HandleTable.h"
+#include "sessions/Reservations.h"
+#include "sessions/Resolver.h"
+#include "sessions/Sessions.h"
+#include "sessions/Waits.h"
+
+namespace simulator {
+
+// A property that a session has opened to read its attributes.
+struct OpenProperty {
+    nQITRMCAPI100_Session session;
+    Category category;
+    DefinitionPointer definition;
+    // Null when the property was opened without a resource.
+    const Resource* resource;
+};
+
+// A command that a session has opened to read its attributes.
+struct OpenCommand {
+    nQITRMCAPI100_Session session;
+    const Command* command;
+};
+
+// The chassis together with the state of all its users. There is one in the process, made at the
+// first use. Its parts are guarded by one mutex, which calls that wait give up.
+struct Simulator {
+    explicit Simulator(std::unique_ptr<Chassis> loaded);
+
+    // The loaded simulator. Refuses with chassisNotLoaded when the chassis file is broken.
+    static Simulator& instance();
+
+    Resolver resolver(const Session& session) const {
+        return Resolver(*chassis, reservations, session);
+    }
+
+    // Ends a session with all that it has.
+    void close(nQITRMCAPI100_Session session);
+
+    std::mutex mutex;
+    const std::unique_ptr<Chassis> chassis;
+    Waits waits;
+    Sessions sessions;
+    Reservations reservations;
+    HandleTable<OpenProperty> openProperties;
+    HandleTable<OpenCommand> openCommands;
+};
+
+}  // namespace simulator

@@ -1,0 +1,30 @@
+#include "status/Refusal.h"
+
+namespace simulator {
+
+Refusal& Refusal::usageEnum(std::string_view tag, int32_t value, uint32_t id) {
+    details.addUsageEnum(tag, value, id);
+    return *this;
+}
+
+Refusal& Refusal::elaboration(std::string_view term) {
+    details.addElaboration(term);
+    return *this;
+}
+
+Refusal& Refusal::header(std::string_view term) {
+    details.addHeader(term);
+    return *this;
+}
+
+Refusal& Refusal::empty() {
+    details.addEmpty();
+    return *this;
+}
+
+Refusal& Refusal::cause(const Refusal& other) {
+    details.addCause(other.reason.number, other.reason.constant, other.details);
+    return *this;
+}
+
+}  // namespace simulator
