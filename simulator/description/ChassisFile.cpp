@@ -2,7 +2,6 @@
 
 #include <array>
 #include <cerrno>
-#include <cstdio>
 #include <cstdlib>
 #include <cstring>
 #include <fstream>
@@ -11,8 +10,8 @@
 #include "description/Description.h"
 #include "description/PartsFile.h"
 #include "description/PropertyFile.h"
+#include "description/StartRefusal.h"
 #include "model/NameText.h"
-#include "status/Refusal.h"
 
 namespace simulator {
 
@@ -170,14 +169,7 @@ std::unique_ptr<Chassis> loadChassis() {
     try {
         return parseChassis(fromFile ? readFile(path) : std::string(embedded::bench));
     } catch (const DescriptionFault& fault) {
-        const std::string name = fromFile ? path : "(built-in chassis)";
-        const std::string place = fault.pointer.empty() ? "" : fault.pointer + " ";
-        std::fprintf(stderr, "qitrmcapi: %s: %s%s; %s\n", name.c_str(), place.c_str(),
-                     fault.wrong.c_str(), fault.right.c_str());
-        throw Refusal(code::chassisNotLoaded)
-            .usage(tag::fileName, name)
-            .usage(tag::jsonPointer, fault.pointer)
-            .usage(tag::explanation, fault.wrong + "; " + fault.right);
+        refuseStart(fromFile ? path : "(built-in chassis)", fault);
     }
 }
 

@@ -17,20 +17,26 @@ const OpenProperty& openProperty(Simulator& simulator, nQITRMCAPI100_Property ha
 }
 
 template <typename Value>
-void getScalar(nQITRMCAPI100_Property handle, const char* name, DataType type, Value* value,
-               qierr_Status* status) {
+void getScalar(const char* function, nQITRMCAPI100_Property handle, const char* name, DataType type,
+               Value* value, qierr_Status* status) {
     clearOutputs(status, value);
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&] {
+        return Call(function).in("handle", handle).in("attribute", name).out("value", value);
+    };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         const OpenProperty& property = openProperty(simulator, handle);
         lendScalar(attribute(simulator, property, required(name, "attribute"), type), value);
     });
 }
 
 template <typename Value>
-void getArray(nQITRMCAPI100_Property handle, const char* name, DataType type, Value** array,
-              uint32_t* count, qierr_Status* status) {
+void getArray(const char* function, nQITRMCAPI100_Property handle, const char* name, DataType type,
+              Value** array, uint32_t* count, qierr_Status* status) {
     clearOutputs(status, array, count);
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&] {
+        return Call(function).in("handle", handle).in("attribute", name).out("array", array, count);
+    };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         const OpenProperty& property = openProperty(simulator, handle);
         lendArray(attribute(simulator, property, required(name, "attribute"), type), array, count);
     });
@@ -41,7 +47,10 @@ void getArray(nQITRMCAPI100_Property handle, const char* name, DataType type, Va
 void nQITRMCAPI100_openDriverDefinedProperty(nQITRMCAPI100_Session session, const char* property,
                                              nQITRMCAPI100_Property* handle, qierr_Status* status) {
     clearOutputs(status, handle);
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function).session(session).in("property", property).out("handle", handle);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         *handle = simulator.openProperties.add(
             PropertyDesk(simulator, owner).openDriverDefined(required(property, "property")));
     });
@@ -51,7 +60,14 @@ void nQITRMCAPI100_openGenericProperty(nQITRMCAPI100_Session session, const char
                                        const char* property, nQITRMCAPI100_Property* handle,
                                        qierr_Status* status) {
     clearOutputs(status, handle);
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function)
+            .session(session)
+            .resources("resource", resource)
+            .in("property", property)
+            .out("handle", handle);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         *handle = simulator.openProperties.add(
             PropertyDesk(simulator, owner)
                 .openGeneric(required(resource, "resource"), required(property, "property")));
@@ -59,7 +75,8 @@ void nQITRMCAPI100_openGenericProperty(nQITRMCAPI100_Session session, const char
 }
 
 void nQITRMCAPI100_closeProperty(nQITRMCAPI100_Property handle, qierr_Status* status) {
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&, function = __func__] { return Call(function).in("handle", handle); };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         openProperty(simulator, handle);
         simulator.openProperties.remove(handle);
     });
@@ -67,27 +84,27 @@ void nQITRMCAPI100_closeProperty(nQITRMCAPI100_Property handle, qierr_Status* st
 
 void nQITRMCAPI100_getPropertyPropertyInt32(nQITRMCAPI100_Property handle, const char* attribute,
                                             int32_t* value, qierr_Status* status) {
-    getScalar(handle, attribute, DataType::int32, value, status);
+    getScalar(__func__, handle, attribute, DataType::int32, value, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyBool(nQITRMCAPI100_Property handle, const char* attribute,
                                            uint8_t* value, qierr_Status* status) {
-    getScalar(handle, attribute, DataType::boolean, value, status);
+    getScalar(__func__, handle, attribute, DataType::boolean, value, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyString(nQITRMCAPI100_Property handle, const char* attribute,
                                              char** value, qierr_Status* status) {
-    getScalar(handle, attribute, DataType::text, value, status);
+    getScalar(__func__, handle, attribute, DataType::text, value, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyInt32Array(nQITRMCAPI100_Property handle,
                                                  const char* attribute, int32_t** array,
                                                  uint32_t* count, qierr_Status* status) {
-    getArray(handle, attribute, DataType::int32Array, array, count, status);
+    getArray(__func__, handle, attribute, DataType::int32Array, array, count, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyStringArray(nQITRMCAPI100_Property handle,
                                                   const char* attribute, char*** array,
                                                   uint32_t* count, qierr_Status* status) {
-    getArray(handle, attribute, DataType::textArray, array, count, status);
+    getArray(__func__, handle, attribute, DataType::textArray, array, count, status);
 }

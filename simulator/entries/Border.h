@@ -6,28 +6,31 @@
 
 #include "Api.h"
 #include "entries/StatusFiller.h"
+#include "entries/WatchedCall.h"
 #include "sessions/Simulator.h"
 #include "status/Refusal.h"
+#include "trace/Call.h"
 
 // What stands between C callers and the simulator. No exception gets past it.
 namespace simulator {
 
-// Puts a refusal into a status. Without the memory for its details, only the code arrives.
-void report(const Refusal& refusal, qierr_Status& status) noexcept;
-// Puts the exception in flight into a status.
-void reportCurrentException(qierr_Status& status) noexcept;
-
 // Runs body(simulator, lock) with the mutex held, unless the status is negative already. What body
-// throws ends up in the status.
-template <typename Body>
-void withSimulator(qierr_Status* status, Body body) noexcept {
+// throws ends up in the status. describe() makes the Call for those who watch calls; it is not run
+// when nobody does.
+template <typename Describe, typename Body>
+void withSimulator(qierr_Status* status, Describe describe, Body body) noexcept {
     if (status->code < 0) {
         return;
     }
     try {
         Simulator& simulator = Simulator::instance();
-        std::unique_lock<std::mutex> lock(simulator.mutex);
-        body(simulator, lock);
+        if (!simulator.isWatched()) {
+            std::unique_lock<std::mutex> lock(simulator.mutex);
+            body(simulator, lock);
+            return;
+        }
+        WatchedCall watched(simulator, describe(), *status);
+        watched.run([&](std::unique_lock<std::mutex>& lock) { body(simulator, lock); });
     } catch (...) {
         reportCurrentException(*status);
     }
@@ -42,9 +45,10 @@ void clearOutputs(const qierr_Status* status, Outs*... outs) noexcept {
 }
 
 // Runs body(simulator, session) in the same way, for an open session.
-template <typename Body>
-void withSession(nQITRMCAPI100_Session session, qierr_Status* status, Body body) noexcept {
-    withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>&) {
+template <typename Describe, typename Body>
+void withSession(nQITRMCAPI100_Session session, qierr_Status* status, Describe describe,
+                 Body body) noexcept {
+    withSimulator(status, describe, [&](Simulator& simulator, std::unique_lock<std::mutex>&) {
         body(simulator, simulator.sessions.get(session));
     });
 }

@@ -82,7 +82,14 @@ void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Ses
 void nQITRMCAPI100_executeGenericCommand(nQITRMCAPI100_Session session, const char* resources,
                                          const char* command, double timeout,
                                          qierr_Status* status) {
-    withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+    const auto call = [&, function = __func__] {
+        return Call(function)
+            .session(session)
+            .resources("resources", resources)
+            .in("command", command)
+            .in("timeout", timeout);
+    };
+    withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
         const Session& owner = simulator.sessions.get(session);
         const auto tasks = findTasks(simulator.resolver(owner), required(resources, "resources"),
                                      required(command, "command"));
@@ -102,7 +109,14 @@ void nQITRMCAPI100_openGenericCommand(nQITRMCAPI100_Session session, const char*
                                       const char* command, nQITRMCAPI100_Command* handle,
                                       qierr_Status* status) {
     clearOutputs(status, handle);
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function)
+            .session(session)
+            .resources("resources", resources)
+            .in("command", command)
+            .out("handle", handle);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         const auto tasks = findTasks(simulator.resolver(owner), required(resources, "resources"),
                                      required(command, "command"));
         *handle = simulator.openCommands.add({session, tasks.front().command});
@@ -110,7 +124,8 @@ void nQITRMCAPI100_openGenericCommand(nQITRMCAPI100_Session session, const char*
 }
 
 void nQITRMCAPI100_closeCommand(nQITRMCAPI100_Command handle, qierr_Status* status) {
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&, function = __func__] { return Call(function).in("handle", handle); };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         if (!simulator.openCommands.remove(handle)) {
             throw Refusal(code::unknownHandle).usage(tag::handle, handle);
         }
@@ -120,7 +135,10 @@ void nQITRMCAPI100_closeCommand(nQITRMCAPI100_Command handle, qierr_Status* stat
 void nQITRMCAPI100_getCommandPropertyString(nQITRMCAPI100_Command handle, const char* attribute,
                                             char** value, qierr_Status* status) {
     clearOutputs(status, value);
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&, function = __func__] {
+        return Call(function).in("handle", handle).in("attribute", attribute).out("value", value);
+    };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         const OpenCommand* open = simulator.openCommands.find(handle);
         if (open == nullptr) {
             throw Refusal(code::unknownHandle).usage(tag::handle, handle);

@@ -65,7 +65,10 @@ void expectFreeName(const Chassis& chassis, const Device& device, std::string_vi
 
 void nQITRMCAPI100_connectToDevices(nQITRMCAPI100_Session session, const char* devices,
                                     double timeout, qierr_Status* status) {
-    withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+    const auto call = [&, function = __func__] {
+        return Call(function).session(session).resources("devices", devices).in("timeout", timeout);
+    };
+    withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
         Session& owner = simulator.sessions.get(session);
         auto wanted = simulator.resolver(owner).devices(required(devices, "devices"));
         const double patience = timeout < 0.0 ? usualConnectTime : checkedTimeout(timeout);
@@ -82,7 +85,10 @@ void nQITRMCAPI100_connectToDevices(nQITRMCAPI100_Session session, const char* d
 
 void nQITRMCAPI100_disconnectFromDevices(nQITRMCAPI100_Session session, const char* devices,
                                          qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function).session(session).resources("devices", devices);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         std::vector<std::string> notConnected;
         auto& connected = owner.connectedDevices;
         for (Device* device : simulator.resolver(owner).devices(required(devices, "devices"))) {
@@ -100,7 +106,10 @@ void nQITRMCAPI100_disconnectFromDevices(nQITRMCAPI100_Session session, const ch
 
 void nQITRMCAPI100_resetDevices(nQITRMCAPI100_Session session, const char* devices,
                                 qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function).session(session).resources("devices", devices);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         const auto wanted = simulator.resolver(owner).devices(required(devices, "devices"));
         for (const Device* device : wanted) {
             simulator.reservations.expectWritable(session, *device);
@@ -113,7 +122,10 @@ void nQITRMCAPI100_resetDevices(nQITRMCAPI100_Session session, const char* devic
 
 void nQITRMCAPI100_renameDevice(nQITRMCAPI100_Session session, const char* device,
                                 const char* newName, qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function).session(session).resources("device", device).in("newName", newName);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
         const std::string name(required(newName, "newName"));
         expectFreeName(*simulator.chassis, found, name);

@@ -7,11 +7,22 @@ using namespace simulator;
 
 namespace {
 
+Call propertyCall(const char* function, nQITRMCAPI100_Session session, const char* resources,
+                  const char* property) {
+    return Call(function)
+        .session(session)
+        .resources("resources", resources)
+        .in("property", property);
+}
+
 template <typename Value>
-void getScalar(nQITRMCAPI100_Session session, const char* resources, const char* property,
-               DataType type, Value* value, qierr_Status* status) {
+void getScalar(const char* function, nQITRMCAPI100_Session session, const char* resources,
+               const char* property, DataType type, Value* value, qierr_Status* status) {
     clearOutputs(status, value);
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&] {
+        return propertyCall(function, session, resources, property).out("value", value);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         PropertyDesk desk(simulator, owner);
         lendScalar(
             desk.read(required(resources, "resources"), required(property, "property"), type),
@@ -20,10 +31,14 @@ void getScalar(nQITRMCAPI100_Session session, const char* resources, const char*
 }
 
 template <typename Value>
-void getArray(nQITRMCAPI100_Session session, const char* resources, const char* property,
-              DataType type, Value** array, uint32_t* count, qierr_Status* status) {
+void getArray(const char* function, nQITRMCAPI100_Session session, const char* resources,
+              const char* property, DataType type, Value** array, uint32_t* count,
+              qierr_Status* status) {
     clearOutputs(status, array, count);
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&] {
+        return propertyCall(function, session, resources, property).out("array", array, count);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         PropertyDesk desk(simulator, owner);
         lendArray(desk.read(required(resources, "resources"), required(property, "property"), type),
                   array, count);
@@ -31,9 +46,12 @@ void getArray(nQITRMCAPI100_Session session, const char* resources, const char* 
 }
 
 template <typename Value>
-void setScalar(nQITRMCAPI100_Session session, const char* resources, const char* property,
-               DataType type, Value value, qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+void setScalar(const char* function, nQITRMCAPI100_Session session, const char* resources,
+               const char* property, DataType type, Value value, qierr_Status* status) {
+    const auto call = [&] {
+        return propertyCall(function, session, resources, property).in("value", value);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         PropertyDesk(simulator, owner)
             .write(required(resources, "resources"), required(property, "property"), type,
                    asElements(value));
@@ -41,9 +59,13 @@ void setScalar(nQITRMCAPI100_Session session, const char* resources, const char*
 }
 
 template <typename Value>
-void setArray(nQITRMCAPI100_Session session, const char* resources, const char* property,
-              DataType type, const Value* array, uint32_t count, qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+void setArray(const char* function, nQITRMCAPI100_Session session, const char* resources,
+              const char* property, DataType type, const Value* array, uint32_t count,
+              qierr_Status* status) {
+    const auto call = [&] {
+        return propertyCall(function, session, resources, property).in("array", array, count);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         PropertyDesk(simulator, owner)
             .write(required(resources, "resources"), required(property, "property"), type,
                    asElements(array, count));
@@ -58,22 +80,24 @@ void setArray(nQITRMCAPI100_Session session, const char* resources, const char* 
     void nQITRMCAPI100_getGenericProperty##Name(nQITRMCAPI100_Session session,                     \
                                                 const char* resources, const char* property,       \
                                                 Given* value, qierr_Status* status) {              \
-        getScalar(session, resources, property, DataType::type, value, status);                    \
+        getScalar(__func__, session, resources, property, DataType::type, value, status);          \
     }                                                                                              \
     void nQITRMCAPI100_getGenericProperty##Name##Array(                                            \
         nQITRMCAPI100_Session session, const char* resources, const char* property, Given** array, \
         uint32_t* count, qierr_Status* status) {                                                   \
-        getArray(session, resources, property, DataType::type##Array, array, count, status);       \
+        getArray(__func__, session, resources, property, DataType::type##Array, array, count,      \
+                 status);                                                                          \
     }                                                                                              \
     void nQITRMCAPI100_setGenericProperty##Name(nQITRMCAPI100_Session session,                     \
                                                 const char* resources, const char* property,       \
                                                 Taken value, qierr_Status* status) {               \
-        setScalar(session, resources, property, DataType::type, value, status);                    \
+        setScalar(__func__, session, resources, property, DataType::type, value, status);          \
     }                                                                                              \
     void nQITRMCAPI100_setGenericProperty##Name##Array(                                            \
         nQITRMCAPI100_Session session, const char* resources, const char* property,                \
         Taken const* array, uint32_t count, qierr_Status* status) {                                \
-        setArray(session, resources, property, DataType::type##Array, array, count, status);       \
+        setArray(__func__, session, resources, property, DataType::type##Array, array, count,      \
+                 status);                                                                          \
     }
 
 GENERIC_PROPERTY_FUNCTIONS(Bool, uint8_t, uint8_t, boolean)
@@ -88,7 +112,10 @@ GENERIC_PROPERTY_FUNCTIONS(UInt64, uint64_t, uint64_t, uint64)
 
 void nQITRMCAPI100_commitPropertiesGeneric(nQITRMCAPI100_Session session, const char* resources,
                                            qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function).session(session).resources("resources", resources);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         PropertyDesk(simulator, owner).commit(required(resources, "resources"));
     });
 }
@@ -97,7 +124,14 @@ void nQITRMCAPI100_getDevicePropertyString(nQITRMCAPI100_Session session, const 
                                            const char* property, char** value,
                                            qierr_Status* status) {
     clearOutputs(status, value);
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function)
+            .session(session)
+            .resources("device", device)
+            .in("property", property)
+            .out("value", value);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         const char* resource = device != nullptr ? device : "$DefaultDevices";
         const Device& found = simulator.resolver(owner).oneDevice(resource);
         PropertyDesk desk(simulator, owner);

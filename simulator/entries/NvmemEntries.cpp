@@ -41,7 +41,14 @@ std::vector<NvmemArea*> areasOf(const Resolver& resolver, std::string_view resou
 void nQITRMCAPI100_getNvmemBytes(nQITRMCAPI100_Session session, const char* nvmemArea,
                                  uint32_t address, uint8_t* buffer, uint32_t size,
                                  qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function)
+            .session(session)
+            .resources("nvmemArea", nvmemArea)
+            .in("address", address)
+            .out("buffer", buffer, size);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         const NvmemArea& area =
             simulator.resolver(owner).oneNvmemArea(required(nvmemArea, "nvmemArea"));
         expectBytes(buffer, size, "buffer");
@@ -53,7 +60,16 @@ void nQITRMCAPI100_setNvmemBytes(nQITRMCAPI100_Session session, const char* nvme
                                  uint32_t address, const uint8_t* bytes, uint32_t size,
                                  const char* serialNumberGiven, const char* password,
                                  qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function)
+            .session(session)
+            .resources("nvmemArea", nvmemArea)
+            .in("address", address)
+            .in("bytes", bytes, size)
+            .in("serialNumber", serialNumberGiven)
+            .in("password", password);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         NvmemArea& area = simulator.resolver(owner).oneNvmemArea(required(nvmemArea, "nvmemArea"));
         expectBytes(bytes, size, "bytes");
         simulator.reservations.expectWritable(session, *area.device);
@@ -65,7 +81,10 @@ void nQITRMCAPI100_setNvmemBytes(nQITRMCAPI100_Session session, const char* nvme
 
 void nQITRMCAPI100_commitNvmemGeneric(nQITRMCAPI100_Session session, const char* resources,
                                       qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&, function = __func__] {
+        return Call(function).session(session).resources("resources", resources);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         const auto areas = areasOf(simulator.resolver(owner), required(resources, "resources"));
         for (const NvmemArea* area : areas) {
             simulator.reservations.expectWritable(session, *area->device);

@@ -5,19 +5,33 @@ using namespace simulator;
 namespace {
 
 template <typename Number>
-void readRegister(nQITRMCAPI100_Session session, const char* device, uint32_t address,
-                  Number* value, qierr_Status* status) {
+void readRegister(const char* function, nQITRMCAPI100_Session session, const char* device,
+                  uint32_t address, Number* value, qierr_Status* status) {
     clearOutputs(status, value);
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+    const auto call = [&] {
+        return Call(function)
+            .session(session)
+            .resources("device", device)
+            .in("address", address)
+            .out("value", value);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         const Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
         *value = static_cast<Number>(found.registers.read(address, sizeof(Number)));
     });
 }
 
 template <typename Number>
-void writeRegister(nQITRMCAPI100_Session session, const char* device, uint32_t address,
-                   Number value, qierr_Status* status) {
-    withSession(session, status, [&](Simulator& simulator, Session& owner) {
+void writeRegister(const char* function, nQITRMCAPI100_Session session, const char* device,
+                   uint32_t address, Number value, qierr_Status* status) {
+    const auto call = [&] {
+        return Call(function)
+            .session(session)
+            .resources("device", device)
+            .in("address", address)
+            .in("value", value);
+    };
+    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
         simulator.reservations.expectWritable(session, found);
         found.registers.write(address, sizeof(Number), value);
@@ -28,40 +42,40 @@ void writeRegister(nQITRMCAPI100_Session session, const char* device, uint32_t a
 
 void nQITRMCAPI100_readRegisterUInt8(nQITRMCAPI100_Session session, const char* device,
                                      uint32_t address, uint8_t* value, qierr_Status* status) {
-    readRegister(session, device, address, value, status);
+    readRegister(__func__, session, device, address, value, status);
 }
 
 void nQITRMCAPI100_readRegisterUInt16(nQITRMCAPI100_Session session, const char* device,
                                       uint32_t address, uint16_t* value, qierr_Status* status) {
-    readRegister(session, device, address, value, status);
+    readRegister(__func__, session, device, address, value, status);
 }
 
 void nQITRMCAPI100_readRegisterUInt32(nQITRMCAPI100_Session session, const char* device,
                                       uint32_t address, uint32_t* value, qierr_Status* status) {
-    readRegister(session, device, address, value, status);
+    readRegister(__func__, session, device, address, value, status);
 }
 
 void nQITRMCAPI100_readRegisterUInt64(nQITRMCAPI100_Session session, const char* device,
                                       uint32_t address, uint64_t* value, qierr_Status* status) {
-    readRegister(session, device, address, value, status);
+    readRegister(__func__, session, device, address, value, status);
 }
 
 void nQITRMCAPI100_writeRegisterUInt8(nQITRMCAPI100_Session session, const char* device,
                                       uint32_t address, uint8_t value, qierr_Status* status) {
-    writeRegister(session, device, address, value, status);
+    writeRegister(__func__, session, device, address, value, status);
 }
 
 void nQITRMCAPI100_writeRegisterUInt16(nQITRMCAPI100_Session session, const char* device,
                                        uint32_t address, uint16_t value, qierr_Status* status) {
-    writeRegister(session, device, address, value, status);
+    writeRegister(__func__, session, device, address, value, status);
 }
 
 void nQITRMCAPI100_writeRegisterUInt32(nQITRMCAPI100_Session session, const char* device,
                                        uint32_t address, uint32_t value, qierr_Status* status) {
-    writeRegister(session, device, address, value, status);
+    writeRegister(__func__, session, device, address, value, status);
 }
 
 void nQITRMCAPI100_writeRegisterUInt64(nQITRMCAPI100_Session session, const char* device,
                                        uint32_t address, uint64_t value, qierr_Status* status) {
-    writeRegister(session, device, address, value, status);
+    writeRegister(__func__, session, device, address, value, status);
 }

@@ -44,16 +44,33 @@ void setDefaults(Session& session, Kind kind, const std::vector<Resource*>& reso
     }
 }
 
-void openOn(Kind kind, const char* names, const ReservationTerms& terms,
-            nQITRMCAPI100_Session* handle, qierr_Status* status) {
+// One of the functions that open a session on resources.
+struct Opener {
+    const char* function;
+    Kind kind;
+    // The name of the argument that names the resources.
+    const char* argument;
+};
+
+void openOn(const Opener& opener, const char* names, double connectTimeout,
+            const ReservationTerms& terms, nQITRMCAPI100_Session* handle, qierr_Status* status) {
     clearOutputs(status, handle);
-    withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+    const auto call = [&] {
+        return Call(opener.function)
+            .out("session", handle)
+            .resources(opener.argument, names)
+            .in("timeout", connectTimeout)
+            .in("access", terms.access)
+            .in("reservationGroup", terms.group)
+            .in("reservationTimeout", terms.timeout);
+    };
+    withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
         Opening opening(simulator.sessions);
         Session& session = opening.session();
         const auto resources =
-            simulator.resolver(session).resources(kind, required(names, "resources"));
+            simulator.resolver(session).resources(opener.kind, required(names, "resources"));
         expectSome(resources);
-        setDefaults(session, kind, resources);
+        setDefaults(session, opener.kind, resources);
         const double timeout = checkedTimeout(terms.timeout);
         simulator.reservations.reserve(session.defaultDevices, holding(session.handle, terms),
                                        timeout, lock);
@@ -71,7 +88,8 @@ using namespace simulator;
 void nQITRMCAPI100_initializeSessionWithoutResources(nQITRMCAPI100_Session* session,
                                                      qierr_Status* status) {
     clearOutputs(status, session);
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&, function = __func__] { return Call(function).out("session", session); };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         Session& made = simulator.sessions.make();
         made.opening = false;
         *session = made.handle;
@@ -79,38 +97,41 @@ void nQITRMCAPI100_initializeSessionWithoutResources(nQITRMCAPI100_Session* sess
 }
 
 void nQITRMCAPI100_initializeSessionWithDevices(nQITRMCAPI100_Session* session, const char* devices,
-                                                double, int32_t access,
+                                                double timeout, int32_t access,
                                                 const char* reservationGroup,
                                                 double reservationTimeout, qierr_Status* status) {
-    openOn(Kind::device, devices, {access, reservationGroup, reservationTimeout}, session, status);
+    openOn({__func__, Kind::device, "devices"}, devices, timeout,
+           {access, reservationGroup, reservationTimeout}, session, status);
 }
 
 void nQITRMCAPI100_initializeSessionWithPhysChans(nQITRMCAPI100_Session* session,
-                                                  const char* physicalChannels, double,
+                                                  const char* physicalChannels, double timeout,
                                                   int32_t access, const char* reservationGroup,
                                                   double reservationTimeout, qierr_Status* status) {
-    openOn(Kind::physChan, physicalChannels, {access, reservationGroup, reservationTimeout},
-           session, status);
+    openOn({__func__, Kind::physChan, "physicalChannels"}, physicalChannels, timeout,
+           {access, reservationGroup, reservationTimeout}, session, status);
 }
 
 void nQITRMCAPI100_initializeSessionWithNvmemAreas(nQITRMCAPI100_Session* session,
-                                                   const char* nvmemAreas, double, int32_t access,
-                                                   const char* reservationGroup,
+                                                   const char* nvmemAreas, double timeout,
+                                                   int32_t access, const char* reservationGroup,
                                                    double reservationTimeout,
                                                    qierr_Status* status) {
-    openOn(Kind::nvmemArea, nvmemAreas, {access, reservationGroup, reservationTimeout}, session,
-           status);
+    openOn({__func__, Kind::nvmemArea, "nvmemAreas"}, nvmemAreas, timeout,
+           {access, reservationGroup, reservationTimeout}, session, status);
 }
 
 void nQITRMCAPI100_closeSession(nQITRMCAPI100_Session session, qierr_Status* status) {
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&, function = __func__] { return Call(function).session(session); };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         simulator.sessions.get(session);
         simulator.close(session);
     });
 }
 
 void nQITRMCAPI100_abortSession(nQITRMCAPI100_Session session, qierr_Status* status) {
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&, function = __func__] { return Call(function).session(session); };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         simulator.sessions.get(session);
         simulator.waits.endAll(session, Wait::End::aborted);
     });
@@ -119,7 +140,15 @@ void nQITRMCAPI100_abortSession(nQITRMCAPI100_Session session, qierr_Status* sta
 void nQITRMCAPI100_reserveDevices(nQITRMCAPI100_Session session, const char* devices,
                                   int32_t access, const char* reservationGroup,
                                   double reservationTimeout, qierr_Status* status) {
-    withSimulator(status, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+    const auto call = [&, function = __func__] {
+        return Call(function)
+            .session(session)
+            .resources("devices", devices)
+            .in("access", access)
+            .in("reservationGroup", reservationGroup)
+            .in("reservationTimeout", reservationTimeout);
+    };
+    withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
         const Session& holder = simulator.sessions.get(session);
         const auto wanted = simulator.resolver(holder).devices(required(devices, "devices"));
         const double timeout = checkedTimeout(reservationTimeout);
@@ -131,7 +160,10 @@ void nQITRMCAPI100_reserveDevices(nQITRMCAPI100_Session session, const char* dev
 
 void nQITRMCAPI100_unreserveDevices(nQITRMCAPI100_Session session, const char* devices,
                                     qierr_Status* status) {
-    withSimulator(status, [&](Simulator& simulator, auto&) {
+    const auto call = [&, function = __func__] {
+        return Call(function).session(session).resources("devices", devices);
+    };
+    withSimulator(status, call, [&](Simulator& simulator, auto&) {
         const Session& holder = simulator.sessions.get(session);
         std::vector<std::string> notHeld;
         for (const Device* device :

@@ -1,6 +1,7 @@
 #include "entries/StatusFiller.h"
 
 #include <cstring>
+#include <new>
 
 namespace simulator {
 
@@ -37,6 +38,26 @@ void fillStatus(qierr_Status& status, int32_t code, std::string_view text) noexc
     if (!putText(status, text) && status.json != nullptr) {
         // The text of a warning that is replaced must not be taken for this failure's.
         putText(status, emptyText);
+    }
+}
+
+void report(const Refusal& refusal, qierr_Status& status) noexcept {
+    try {
+        fillStatus(status, refusal.code(), refusal.text());
+    } catch (const std::bad_alloc&) {
+        fillStatus(status, refusal.code(), "{}");
+    }
+}
+
+void reportCurrentException(qierr_Status& status) noexcept {
+    try {
+        throw;
+    } catch (const Refusal& refusal) {
+        report(refusal, status);
+    } catch (const std::bad_alloc&) {
+        fillStatus(status, code::outOfMemory.number, "{}");
+    } catch (...) {
+        fillStatus(status, code::driverFault.number, "{}");
     }
 }
 

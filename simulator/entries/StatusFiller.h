@@ -4,6 +4,7 @@
 #include <string_view>
 
 #include "qierr_status.h"
+#include "status/Refusal.h"
 
 namespace simulator {
 
@@ -11,5 +12,10 @@ namespace simulator {
 // warning, and puts the details into its text. The room for the text is made by the record's own
 // reallocJson; where that fails the code is set and the details are lost.
 void fillStatus(qierr_Status& status, int32_t code, std::string_view text) noexcept;
+
+// Puts a refusal into a status. Without the memory for its details, only the code arrives.
+void report(const Refusal& refusal, qierr_Status& status) noexcept;
+// Puts the exception in flight into a status.
+void reportCurrentException(qierr_Status& status) noexcept;
 
 }  // namespace simulator

@@ -9,6 +9,7 @@
 #include "sessions/Resolver.h"
 #include "sessions/Sessions.h"
 #include "sessions/Waits.h"
+#include "trace/Trace.h"
 
 namespace simulator {
 
@@ -39,11 +40,15 @@ struct Simulator {
         return Resolver(*chassis, reservations, session);
     }
 
+    // Whether anybody wants to know of calls.
+    bool isWatched() const { return trace.isOn(); }
+
     // Ends a session with all that it has.
     void close(nQITRMCAPI100_Session session);
 
     std::mutex mutex;
     const std::unique_ptr<Chassis> chassis;
+    const Trace trace;
     Waits waits;
     Sessions sessions;
     Reservations reservations;

@@ -23,6 +23,16 @@ void appendEscaped(std::string& out, unsigned char byte) {
     }
 }
 
+std::string quotedList(const std::vector<std::string>& values) {
+    std::string out = "[";
+    for (const std::string& value : values) {
+        out += (out.size() == 1 ? "" : ",") + quoted(value);
+    }
+    return out += ']';
+}
+
+}  // namespace
+
 std::string quoted(std::string_view text) {
     std::string out = "\"";
     while (!text.empty()) {
@@ -38,16 +48,6 @@ std::string quoted(std::string_view text) {
     }
     return out += '"';
 }
-
-std::string quotedList(const std::vector<std::string>& values) {
-    std::string out = "[";
-    for (const std::string& value : values) {
-        out += (out.size() == 1 ? "" : ",") + quoted(value);
-    }
-    return out += ']';
-}
-
-}  // namespace
 
 void Details::addEntry(std::string_view type, std::string_view usage, std::string_view rest) {
     entries += entries.empty() ? "{\"type\":" : ",{\"type\":";
