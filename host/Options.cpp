@@ -70,6 +70,7 @@ constexpr OptionWithValue kOptionsWithValue[] = {
     {"--plugin", setPath<&Options::plugin>},
     {"--chassis", setPath<&Options::chassis>},
     {"--state", setPath<&Options::state>},
+    {"--trace", setPath<&Options::trace>},
     {"--threads", setThreads},
     {"--max-body", setMaxBody},
     {"--timeout", setTimeout},

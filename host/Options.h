@@ -16,6 +16,7 @@ struct Options {
     std::string plugin;                   // path; empty: look beside the program
     std::string chassis;                  // path; empty: leave the driver's own choice
     std::string state;                    // path; empty: leave the driver's own choice
+    std::string trace;                    // path; empty: leave the driver's own choice
     uint32_t threads = 512;               // 1 to kMostThreads
     uint32_t maxBody = 16 * 1024 * 1024;  // bytes, 1 and more
     uint32_t timeout = 30;                // seconds, 1 to kLongestTimeout

@@ -13,6 +13,8 @@ The service answers POST requests at /qitrmc/Call.
   --plugin PATH       the plug-in (libqitrmcsvc.so in ../lib beside the program's folder, or in it)
   --chassis FILE      the chassis that the simulated driver shows (QITRMC_SIM_CHASSIS)
   --state DIR         where the simulated driver keeps its state (QITRMC_SIM_STATE)
+  --trace FILE        where the simulated driver notes each call of it, "-" for standard error
+                      (QITRMC_SIM_TRACE)
   --threads N         most connections at once, each with a thread of its own (512; 1 to 900)
   --max-body BYTES    largest request body; a larger one is answered with 413 (16777216)
   --timeout SECONDS   how long a client may stay idle, and how long it may take to send the head of

@@ -8,12 +8,12 @@
 #include <memory>
 #include <string>
 
-#include "host/DriverCheck.h"
 #include "host/Failure.h"
 #include "host/ListenSocket.h"
 #include "host/Options.h"
 #include "host/Plugin.h"
 #include "host/Server.h"
+#include "host/SimulatedDriver.h"
 #include "host/Usage.h"
 
 namespace {
@@ -50,6 +50,7 @@ void configureDriver(const Options& options) {
         readFile(options.chassis, "chassis file", "--chassis");
     setEnvironment("QITRMC_SIM_CHASSIS", options.chassis);
     setEnvironment("QITRMC_SIM_STATE", options.state);
+    setEnvironment("QITRMC_SIM_TRACE", options.trace);
 }
 
 host::ServerSettings settingsOf(const Options& options) {
@@ -100,13 +101,21 @@ void finishRequests(host::Server& server) {
 }
 
 void serve(const host::Plugin& plugin, host::ListenSocket& socket,
-           const host::ServerSettings& settings) {
+           const host::ServerSettings& settings, const std::string& chassis) {
     host::Server server(plugin, socket, settings);
-    std::printf("Listening on %s://%s/qitrmc/Call\n", settings.tls ? "https" : "http",
-                socket.authority().c_str());
+    std::printf("Listening on %s://%s/qitrmc/Call\n%s", settings.tls ? "https" : "http",
+                socket.authority().c_str(), chassis.c_str());
     std::fflush(stdout);
     serveUntilSignal(server);
     finishRequests(server);
+}
+
+void reportThingsNotGivenBack() {
+    const std::string things = host::thingsNotGivenBack();
+    if (!things.empty()) {
+        std::fprintf(stderr, "qitrmc-host: The plug-in has not given back to the driver: %s.\n",
+                     things.c_str());
+    }
 }
 
 void runHost(const Options& options) {
@@ -115,15 +124,16 @@ void runHost(const Options& options) {
     const host::ServerSettings settings = settingsOf(options);
     host::ListenSocket socket(options.address, options.port);
     const host::Plugin plugin(options.plugin.empty() ? host::findPlugin() : options.plugin);
-    host::checkDriver();
+    const std::string chassis = host::startSimulatedDriver();
     plugin.initialize();
     try {
-        serve(plugin, socket, settings);
+        serve(plugin, socket, settings, chassis);
     } catch (...) {
         plugin.finalize();
         throw;
     }
     plugin.finalize();
+    reportThingsNotGivenBack();
 }
 
 void perform(const Options& options) {

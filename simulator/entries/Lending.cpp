@@ -1,13 +1,52 @@
 #include "entries/Lending.h"
 
+#include <cstdio>
+#include <new>
+
+#include "entries/Ledger.h"
+
 namespace simulator {
 
-char* lendText(const std::string& text) {
-    auto* copy = static_cast<char*>(std::malloc(text.size() + 1));
-    if (copy == nullptr) {
+namespace {
+
+void* allocate(size_t size) {
+    void* memory = std::malloc(size);
+    if (memory == nullptr) {
         throw std::bad_alloc();
     }
+    return memory;
+}
+
+char* copyOf(const std::string& text) {
+    auto* copy = static_cast<char*>(allocate(text.size() + 1));
     std::memcpy(copy, text.c_str(), text.size() + 1);
+    return copy;
+}
+
+void freeTexts(char** array, size_t count) noexcept {
+    for (size_t i = 0; i < count; ++i) {
+        std::free(array[i]);
+    }
+    std::free(array);
+}
+
+void complain(const char* function, const char* item) noexcept {
+    std::fprintf(stderr,
+                 "qitrmcapi: nQITRMCAPI100_%s was given what is not %s that is lent; it was left "
+                 "alone. Give each thing back once, through the function of its kind.\n",
+                 function, item);
+}
+
+}  // namespace
+
+char* lendText(const std::string& text) {
+    char* copy = copyOf(text);
+    try {
+        Ledger::instance().lend(copy, Ledger::Item::text);
+    } catch (...) {
+        std::free(copy);
+        throw;
+    }
     return copy;
 }
 
@@ -15,27 +54,63 @@ char** lendTexts(const std::vector<std::string>& texts) {
     if (texts.empty()) {
         return nullptr;
     }
-    auto** array = static_cast<char**>(std::malloc(texts.size() * sizeof(char*)));
-    if (array == nullptr) {
-        throw std::bad_alloc();
-    }
-    uint32_t lent = 0;
+    auto** array = static_cast<char**>(allocate(texts.size() * sizeof(char*)));
+    size_t made = 0;
     try {
-        for (; lent < texts.size(); ++lent) {
-            array[lent] = lendText(texts[lent]);
+        for (; made < texts.size(); ++made) {
+            array[made] = copyOf(texts[made]);
         }
+        Ledger::instance().lend(array, Ledger::Item::texts);
     } catch (...) {
-        takeBackTexts(array, lent);
+        freeTexts(array, made);
         throw;
     }
     return array;
 }
 
-void takeBackTexts(char** array, uint32_t count) noexcept {
-    for (uint32_t i = 0; i < count; ++i) {
-        std::free(array[i]);
+void* lendNumberMemory(size_t size) {
+    void* array = allocate(size);
+    try {
+        Ledger::instance().lend(array, Ledger::Item::numbers);
+    } catch (...) {
+        std::free(array);
+        throw;
     }
-    std::free(array);
+    return array;
+}
+
+void takeBackText(char* text) noexcept {
+    if (text == nullptr) {
+        return;
+    }
+    if (Ledger::instance().takeBack(text, Ledger::Item::text)) {
+        std::free(text);
+    } else {
+        complain("freeString", "a text");
+    }
+}
+
+void takeBackNumbers(void* array) noexcept {
+    Ledger& ledger = Ledger::instance();
+    if (array == nullptr) {
+        return;
+    }
+    if (ledger.takeBack(array, Ledger::Item::numbers) || !ledger.has(array)) {
+        std::free(array);
+    } else {
+        complain("freeArray", "an array of numbers");
+    }
+}
+
+void takeBackTexts(char** array, uint32_t count) noexcept {
+    if (array == nullptr) {
+        return;
+    }
+    if (Ledger::instance().takeBack(array, Ledger::Item::texts)) {
+        freeTexts(array, count);
+    } else {
+        complain("freeStringArray", "an array of texts");
+    }
 }
 
 }  // namespace simulator

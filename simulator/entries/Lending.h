@@ -3,31 +3,36 @@
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
-#include <new>
 #include <string>
 #include <vector>
 
 namespace simulator {
 
 // Copies of texts and numbers for a caller, who owns them and gives them back to the driver. All of
-// them come from malloc. These throw std::bad_alloc and lend nothing then.
+// them come from malloc and stand in the ledger. These throw std::bad_alloc and lend nothing then.
 char* lendText(const std::string& text);
 // An empty list is lent as null.
 char** lendTexts(const std::vector<std::string>& texts);
+
+// Memory for an array of numbers that is lent. size is in bytes and not 0.
+void* lendNumberMemory(size_t size);
+
 template <typename Number>
 Number* lendNumbers(const std::vector<Number>& numbers) {
     if (numbers.empty()) {
         return nullptr;
     }
     const size_t size = numbers.size() * sizeof(Number);
-    auto* array = static_cast<Number*>(std::malloc(size));
-    if (array == nullptr) {
-        throw std::bad_alloc();
-    }
+    void* array = lendNumberMemory(size);
     std::memcpy(array, numbers.data(), size);
-    return array;
+    return static_cast<Number*>(array);
 }
 
+// Take back what was lent, or null. What was not lent as such a thing is left alone, with a line on
+// standard error; but an array of numbers that is not in the ledger was made by its owner with
+// malloc, and is freed.
+void takeBackText(char* text) noexcept;
+void takeBackNumbers(void* array) noexcept;
 void takeBackTexts(char** array, uint32_t count) noexcept;
 
 }  // namespace simulator

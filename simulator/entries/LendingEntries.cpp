@@ -1,16 +1,14 @@
-#include <cstdlib>
-
 #include "Api.h"
 #include "entries/Lending.h"
 
 void nQITRMCAPI100_freeString(char* text) {
-    std::free(text);
+    simulator::takeBackText(text);
 }
 
 void nQITRMCAPI100_freeArray(void* array) {
-    std::free(array);
+    simulator::takeBackNumbers(array);
 }
 
 void nQITRMCAPI100_freeStringArray(char** array, uint32_t count) {
-    simulator::takeBackTexts(array, array == nullptr ? 0 : count);
+    simulator::takeBackTexts(array, count);
 }

@@ -39,6 +39,8 @@ class HandleTable {
         }
     }
 
+    uint32_t size() const { return static_cast<uint32_t>(items.size()); }
+
   private:
     std::map<uint32_t, Item> items;
     uint32_t next;

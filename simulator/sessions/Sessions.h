@@ -33,6 +33,9 @@ class Sessions {
     Session& get(nQITRMCAPI100_Session handle);
     void remove(nQITRMCAPI100_Session handle) noexcept { table.remove(handle); }
 
+    // With those that are still opening.
+    uint32_t size() const { return table.size(); }
+
   private:
     HandleTable<Session> table;
     const PropertyStore& firstProperties;

@@ -30,6 +30,7 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
     EXPECT_EQ(options.plugin, "");
     EXPECT_EQ(options.chassis, "");
     EXPECT_EQ(options.state, "");
+    EXPECT_EQ(options.trace, "");
     EXPECT_EQ(options.threads, 512u);
     EXPECT_EQ(options.maxBody, 16777216u);
     EXPECT_EQ(options.timeout, 30u);
@@ -38,15 +39,16 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
 }
 
 TEST(Options, EachOptionSetsItsOwnField) {
-    const Options options =
-        parseOptions({"--listen", "0.0.0.0:81", "--plugin", "p.so", "--chassis", "c.json",
-                      "--state", "s", "--threads", "3", "--max-body", "4", "--timeout", "5",
-                      "--tls-cert", "cert.pem", "--tls-key", "key.pem"});
+    const Options options = parseOptions(
+        {"--listen",  "0.0.0.0:81", "--plugin",   "p.so",      "--chassis", "c.json",     "--state",
+         "s",         "--trace",    "t",          "--threads", "3",         "--max-body", "4",
+         "--timeout", "5",          "--tls-cert", "cert.pem",  "--tls-key", "key.pem"});
     EXPECT_EQ(options.address, "0.0.0.0");
     EXPECT_EQ(options.port, "81");
     EXPECT_EQ(options.plugin, "p.so");
     EXPECT_EQ(options.chassis, "c.json");
     EXPECT_EQ(options.state, "s");
+    EXPECT_EQ(options.trace, "t");
     EXPECT_EQ(options.threads, 3u);
     EXPECT_EQ(options.maxBody, 4u);
     EXPECT_EQ(options.timeout, 5u);
@@ -109,7 +111,8 @@ TEST(Options, TextThatIsNoNumberIsRefused) {
 }
 
 TEST(Options, AnEmptyPathIsRefused) {
-    for (const char* option : {"--plugin", "--chassis", "--state", "--tls-cert", "--tls-key"})
+    for (const char* option :
+         {"--plugin", "--chassis", "--state", "--trace", "--tls-cert", "--tls-key"})
         EXPECT_EQ(usageErrorOf({option, ""}),
                   std::string(option) + " takes a path, not an empty text.");
 }
@@ -133,8 +136,8 @@ TEST(Options, ACertificateWithoutAKeyIsRefused) {
 
 TEST(Options, TheHelpNamesEveryOption) {
     for (const char* option :
-         {"--listen", "--plugin", "--chassis", "--state", "--threads", "--max-body", "--timeout",
-          "--tls-cert", "--tls-key", "--help", "--version"}) {
+         {"--listen", "--plugin", "--chassis", "--state", "--trace", "--threads", "--max-body",
+          "--timeout", "--tls-cert", "--tls-key", "--help", "--version"}) {
         EXPECT_THAT(host::kHelpText, HasSubstr(std::string("  ") + option + " "));
     }
 }

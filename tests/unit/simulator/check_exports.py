@@ -1,7 +1,7 @@
 #!/usr/bin/python3
-"""Fails unless a shared library exports exactly the functions of a C header.
+"""Fails unless a shared library exports exactly the functions of C headers.
 
-usage: check_exports.py NM LIBRARY HEADER
+usage: check_exports.py NM LIBRARY HEADER...
 """
 
 import re
@@ -10,10 +10,14 @@ import sys
 from pathlib import Path
 
 
+def functions(header):
+    text = re.sub(r"/\*.*?\*/", "", header.read_text(encoding="utf-8"), flags=re.S)
+    return set(re.findall(r"\b((?:nQITRMCAPI100|qitrmcsim)_\w+)\(", text))
+
+
 def main():
-    nm, library, header = sys.argv[1:]
-    text = re.sub(r"/\*.*?\*/", "", Path(header).read_text(encoding="utf-8"), flags=re.S)
-    declared = set(re.findall(r"\b(nQITRMCAPI100_\w+)\(", text))
+    nm, library, *headers = sys.argv[1:]
+    declared = set().union(*(functions(Path(header)) for header in headers))
     table = subprocess.run(
         [nm, "-D", "--defined-only", library], check=True, capture_output=True, text=True
     )

@@ -19,8 +19,8 @@ def test_a_broken_chassis_file_ends_the_start_and_names_the_place(tmp_path):
     assert (code, out) == (1, "")
     driver, host = err.splitlines()
     assert driver.startswith("qitrmcapi: FILE: /colour is not a known member")
-    assert host == ("qitrmc-host: The driver opens no session. Mend the chassis file, or name "
-                    "another with --chassis.")
+    assert host == ("qitrmc-host: The simulated chassis does not start. Mend what the line above "
+                    "names, and try again.")
 
 
 def test_a_chassis_file_that_is_not_json_ends_the_start(tmp_path):

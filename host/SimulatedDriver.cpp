@@ -1,0 +1,73 @@
+#include "host/SimulatedDriver.h"
+
+#include <dlfcn.h>
+#include <qitrmcapi.h>
+#include <qitrmcsim.h>
+
+#include <memory>
+
+#include "host/Failure.h"
+
+namespace host {
+
+namespace {
+
+template <typename Function>
+Function* functionOf(void* library, const char* name) {
+    return reinterpret_cast<Function*>(dlsym(library, name));
+}
+
+// Null when the plug-in has not loaded the driver. The plug-in keeps it loaded, so no reference to
+// it stays here.
+void* loadedDriver() {
+    void* const driver = dlopen("libqitrmcapi.so.1", RTLD_NOW | RTLD_NOLOAD);
+    if (driver != nullptr)
+        dlclose(driver);
+    return driver;
+}
+
+void addCount(std::string& text, uint32_t count, const char* things) {
+    if (count != 0)
+        text += (text.empty() ? "" : ", ") + std::to_string(count) + " " + things;
+}
+
+}  // namespace
+
+std::string startSimulatedDriver() {
+    void* const driver = loadedDriver();
+    if (driver == nullptr)
+        return "";
+    const auto start = functionOf<decltype(qitrmcsim_start)>(driver, "qitrmcsim_start");
+    const auto freeString =
+        functionOf<decltype(nQITRMCAPI100_freeString)>(driver, "nQITRMCAPI100_freeString");
+    if (start == nullptr || freeString == nullptr)
+        return "";
+    char* text = nullptr;
+    if (start(&text) != 0) {
+        throw Failure(
+            "The simulated chassis does not start. Mend what the line above names, and try again.");
+    }
+    const std::unique_ptr<char, decltype(freeString)> owner(text, freeString);
+    return text;
+}
+
+std::string thingsNotGivenBack() {
+    void* const driver = loadedDriver();
+    if (driver == nullptr)
+        return "";
+    const auto countOutstanding =
+        functionOf<decltype(qitrmcsim_countOutstanding)>(driver, "qitrmcsim_countOutstanding");
+    if (countOutstanding == nullptr)
+        return "";
+    qitrmcsim_Outstanding counts;
+    countOutstanding(&counts);
+    std::string text;
+    addCount(text, counts.texts, "texts");
+    addCount(text, counts.numberArrays, "arrays of numbers");
+    addCount(text, counts.textArrays, "arrays of texts");
+    addCount(text, counts.openProperties, "open properties");
+    addCount(text, counts.openCommands, "open commands");
+    return text;
+}
+
+}  // namespace host

@@ -1,0 +1,17 @@
+#pragma once
+
+#include <string>
+
+namespace host {
+
+// Both do nothing when the plug-in has loaded another driver than the simulated one.
+
+// Starts the simulated driver and returns what it says of its chassis. Throws Failure when the
+// chassis cannot be loaded.
+std::string startSimulatedDriver();
+
+// What the plug-in has not given back to the simulated driver, in one line; empty when there is
+// nothing. Sessions do not count: clients may leave them open.
+std::string thingsNotGivenBack();
+
+}  // namespace host

@@ -1,0 +1,40 @@
+// What the simulator offers beyond the driver's functions.
+
+#include "description/Summary.h"
+#include "entries/Ledger.h"
+#include "entries/Lending.h"
+#include "sessions/Simulator.h"
+#include "status/Refusal.h"
+
+using namespace simulator;
+
+int32_t qitrmcsim_start(char** text) {
+    *text = nullptr;
+    try {
+        Simulator& simulator = Simulator::instance();
+        const std::lock_guard<std::mutex> lock(simulator.mutex);
+        *text = lendText(summaryOf(*simulator.chassis));
+        return 0;
+    } catch (const Refusal& refusal) {
+        return refusal.code();
+    } catch (...) {
+        return code::outOfMemory.number;
+    }
+}
+
+void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
+    const Ledger& ledger = Ledger::instance();
+    *counts = {};
+    counts->texts = static_cast<uint32_t>(ledger.count(Ledger::Item::text));
+    counts->numberArrays = static_cast<uint32_t>(ledger.count(Ledger::Item::numbers));
+    counts->textArrays = static_cast<uint32_t>(ledger.count(Ledger::Item::texts));
+    try {
+        Simulator& simulator = Simulator::instance();
+        const std::lock_guard<std::mutex> lock(simulator.mutex);
+        counts->openProperties = simulator.openProperties.size();
+        counts->openCommands = simulator.openCommands.size();
+        counts->sessions = simulator.sessions.size();
+    } catch (const Refusal&) {
+        // A simulator that did not start has opened nothing.
+    }
+}
