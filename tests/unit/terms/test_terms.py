@@ -105,7 +105,7 @@ def test_each_tag_that_the_service_uses_has_a_term(key):
 
 
 def test_each_tag_and_phrase_of_the_simulated_driver_has_a_term():
-    details = (TERMS.parents[1] / "simulator" / "Details.h").read_text(encoding="utf-8")
+    details = (TERMS.parents[1] / "simulator" / "status" / "Details.h").read_text(encoding="utf-8")
     keys = re.findall(r'"(k(?:UsageType|AuxTerm)\w+)"', details)
     assert keys and set(keys) <= set(TERMS_BY_KEY)
 

@@ -4,6 +4,7 @@ import concurrent.futures
 import contextlib
 import http.client
 import resource
+import select
 import signal
 import socket
 import subprocess
@@ -168,6 +169,8 @@ def test_a_client_that_does_not_fetch_its_response_loses_its_connection(start_ho
     host = start_host("--timeout", "1")
     with host.raw_socket() as client:
         client.sendall(raw_post("Much", b"100000000"))
+        # Looking for the end of the connection makes sense from here on alone.
+        assert select.select([client], [], [], PATIENCE)[0], "the response does not begin"
         deadline = time.monotonic() + PATIENCE
         while len(open_sockets(host)) > 1:
             assert time.monotonic() < deadline
