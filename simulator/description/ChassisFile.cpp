@@ -8,6 +8,7 @@
 
 #include "EmbeddedTexts.h"
 #include "description/Description.h"
+#include "description/LiveFile.h"
 #include "description/PartsFile.h"
 #include "description/PropertyFile.h"
 #include "description/StartRefusal.h"
@@ -72,7 +73,7 @@ void DeviceReader::readModules(const Node& node, Device& owner) {
 Device& DeviceReader::read(const Node& node, Place place) {
     node.expectMembers({"name", "category", "slot", "modules", "channels", "nvmem_areas",
                         "registers", "values", "properties", "commands", "connect_seconds",
-                        "reachable"});
+                        "reachable", "live"});
     Device& device = addDevice(node);
     device.category = node.member("category", "the product category").signedNumber();
     readSlot(node, place, device);
@@ -141,10 +142,14 @@ std::unique_ptr<Chassis> parseChassis(std::string_view text) {
     parseDescription(text, document);
     const Node root(document);
     root.expectMembers({"first_session_handle", "enums", "driver_properties", "system_values",
-                        "session_values", "devices"});
+                        "session_values", "devices", "seed"});
     auto chassis = std::make_unique<Chassis>();
     root.ifPresent("first_session_handle", [&](const Node& handle) {
         chassis->firstSessionHandle = handle.unsignedNumber(1, UINT32_MAX);
+    });
+    root.ifPresent("seed", [&](const Node& seed) {
+        seed.expect(seed.json().IsUint64(), "a whole number from 0 to 18446744073709551615");
+        chassis->life.seed = seed.json().GetUint64();
     });
     Enumerations enumerations;
     root.ifPresent("enums", [&](const Node& node) { enumerations = readEnumerations(node); });
@@ -160,6 +165,7 @@ std::unique_ptr<Chassis> parseChassis(std::string_view text) {
     root.member("devices", "an array of devices").forEachElement([&](const Node& element) {
         reader.read(element, Place::system);
     });
+    readLife(root, *chassis);
     return chassis;
 }
 

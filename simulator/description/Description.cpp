@@ -4,6 +4,8 @@
 
 #include <algorithm>
 
+#include "model/Values.h"
+
 namespace simulator {
 
 namespace {
@@ -126,6 +128,14 @@ uint32_t Node::unsignedNumber(uint32_t least, uint32_t most) const {
 int32_t Node::signedNumber() const {
     expect(value->IsInt(), "a whole number of 32 bits");
     return value->GetInt();
+}
+
+double Node::number(double least, double most) const {
+    if (!value->IsNumber() || value->GetDouble() < least || value->GetDouble() > most) {
+        fail("has the wrong type or range",
+             "must be a number from " + numberText(least) + " to " + numberText(most));
+    }
+    return value->GetDouble();
 }
 
 double Node::seconds() const {

@@ -74,6 +74,7 @@ class Node {
     std::string text() const;
     uint32_t unsignedNumber(uint32_t least, uint32_t most) const;
     int32_t signedNumber() const;
+    double number(double least, double most) const;
     // A time, 0 to a day.
     double seconds() const;
     bool flag() const;

@@ -128,7 +128,7 @@ void readResource(const Node& node, Category category, const Chassis& chassis,
 
 void readPhysChans(const Node& node, const Enumerations& enumerations, Chassis& chassis,
                    Device& device) {
-    node.expectMembers({"prefix", "count", "values", "properties", "commands"});
+    node.expectMembers({"prefix", "count", "values", "properties", "commands", "live"});
     const Node prefixNode = node.member("prefix", "the text in front of the channel's number");
     const std::string prefix = readName(prefixNode, nameFault);
     if (prefix.back() >= '0' && prefix.back() <= '9') {

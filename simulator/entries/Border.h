@@ -24,13 +24,16 @@ void withSimulator(qierr_Status* status, Describe describe, Body body) noexcept 
     }
     try {
         Simulator& simulator = Simulator::instance();
+        const auto act = [&](std::unique_lock<std::mutex>& lock) {
+            simulator.clock.noteCall();
+            body(simulator, lock);
+        };
         if (!simulator.isWatched()) {
             std::unique_lock<std::mutex> lock(simulator.mutex);
-            body(simulator, lock);
+            act(lock);
             return;
         }
-        WatchedCall watched(simulator, describe(), *status);
-        watched.run([&](std::unique_lock<std::mutex>& lock) { body(simulator, lock); });
+        WatchedCall(simulator, describe(), *status).run(act);
     } catch (...) {
         reportCurrentException(*status);
     }

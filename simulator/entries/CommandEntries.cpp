@@ -67,13 +67,22 @@ void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Ses
         longest = std::max(longest, task.command->seconds);
     }
     if (longest > 0.0 && timeout > 0.0) {
-        Wait wait(session);
-        waits.sleep(wait, std::min(longest, timeout), lock);
+        waits.spend(session, std::min(longest, timeout), lock);
     }
     if (longest > timeout) {
         throw Refusal(code::commandTimedOut)
             .usage(tag::command, tasks.front().command->name)
             .usage(tag::timeout, numberText(timeout));
+    }
+}
+
+// Lets what moves react.
+void noteOutcome(const Task& task, Simulator& simulator) {
+    Life& life = simulator.chassis->life;
+    if (task.command->resets) {
+        life.restart(*task.resource, simulator.clock.now());
+    } else {
+        life.noteChange(*task.resource, simulator.clock.now());
     }
 }
 
@@ -101,6 +110,7 @@ void nQITRMCAPI100_executeGenericCommand(nQITRMCAPI100_Session session, const ch
         spendTime(tasks, patience, session, simulator.waits, lock);
         for (const Task& task : tasks) {
             carryOut(*task.command, task.resource->properties);
+            noteOutcome(task, simulator);
         }
     });
 }

@@ -40,8 +40,7 @@ void spendConnectTime(const std::vector<Device*>& devices, double timeout,
         longest = std::max(longest, device->connectSeconds);
     }
     if (longest > 0.0 && timeout > 0.0) {
-        Wait wait(session);
-        waits.sleep(wait, std::min(longest, timeout), lock);
+        waits.spend(session, std::min(longest, timeout), lock);
     }
     if (longest > timeout) {
         throw Refusal(code::connectTimedOut).usage(tag::timeout, numberText(timeout));
@@ -116,6 +115,9 @@ void nQITRMCAPI100_resetDevices(nQITRMCAPI100_Session session, const char* devic
         }
         for (Device* device : wanted) {
             device->reset();
+            device->forEachResource([&](const Resource& resource) {
+                simulator.chassis->life.restart(resource, simulator.clock.now());
+            });
         }
     });
 }

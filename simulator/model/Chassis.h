@@ -7,6 +7,7 @@
 #include <string_view>
 #include <vector>
 
+#include "live/Life.h"
 #include "model/Commands.h"
 #include "model/Nvmem.h"
 #include "model/Properties.h"
@@ -116,6 +117,8 @@ class Chassis {
     PropertyStore systemProperties;
     // What every session begins with.
     PropertyStore sessionProperties;
+    // How properties move.
+    Life life;
 
   private:
     std::vector<std::unique_ptr<Device>> all;

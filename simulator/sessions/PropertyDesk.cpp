@@ -98,12 +98,14 @@ std::vector<PropertyDesk::Place> PropertyDesk::find(std::string_view resources,
 
 Elements PropertyDesk::readAll(const std::vector<Place>& places, DataType type) {
     Elements all = noElements(type);
+    const int64_t now = simulator.clock.now();
     for (const Place& place : places) {
         expectType(*place.definition, type, places.size());
         if (place.definition->access == PropertyAccess::writeOnly) {
             throw about(code::writeOnlyProperty, *place.definition);
         }
-        append(all, place.computed ? *place.computed : place.stored->value);
+        append(all, place.computed ? *place.computed
+                                   : simulator.chassis->life.valueAt(*place.stored, now));
     }
     return all;
 }
@@ -158,7 +160,14 @@ void PropertyDesk::writeAll(const std::vector<Place>& places, DataType type,
             places[i].stored->pending = Property::Pending{std::move(parts[i]), session.handle};
         } else {
             places[i].stored->value = std::move(parts[i]);
+            noteChange(places[i].resource);
         }
+    }
+}
+
+void PropertyDesk::noteChange(const Resource* resource) noexcept {
+    if (resource != nullptr) {
+        simulator.chassis->life.noteChange(*resource, simulator.clock.now());
     }
 }
 
@@ -183,9 +192,13 @@ void PropertyDesk::commit(std::string_view resources) {
     }
     for (Resource* resource : found) {
         if (resource->kind == Kind::device) {
-            resource->device->forEachResource([](Resource& part) { part.properties.commit(); });
+            resource->device->forEachResource([&](Resource& part) {
+                part.properties.commit();
+                noteChange(&part);
+            });
         } else {
             resource->properties.commit();
+            noteChange(resource);
         }
     }
 }

@@ -51,6 +51,8 @@ class PropertyDesk {
     Place find(Category category, Resource* resource, PropertyStore& store, std::string_view name);
     Elements readAll(const std::vector<Place>& places, DataType type);
     void writeAll(const std::vector<Place>& places, DataType type, const Elements& values);
+    // Null for the system and the session.
+    void noteChange(const Resource* resource) noexcept;
     void expectAcceptable(const Place& place, const Elements& value) const;
 
     Simulator& simulator;

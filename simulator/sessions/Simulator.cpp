@@ -13,7 +13,10 @@ namespace {
 struct Start {
     Start() {
         try {
-            simulator.emplace(loadChassis());
+            const Settings settings = readSettings();
+            auto chassis = loadChassis();
+            chassis->life.seed = settings.seed.value_or(chassis->life.seed);
+            simulator.emplace(std::move(chassis), settings.timeScale);
         } catch (const Refusal& refusal) {
             failure = refusal;
         }
@@ -33,8 +36,10 @@ Simulator& Simulator::instance() {
     return *start.simulator;
 }
 
-Simulator::Simulator(std::unique_ptr<Chassis> loaded)
+Simulator::Simulator(std::unique_ptr<Chassis> loaded, const TimeScale& timeScale)
     : chassis(std::move(loaded)),
+      clock(timeScale),
+      waits(clock),
       sessions(chassis->firstSessionHandle, chassis->sessionProperties),
       reservations(*chassis, waits) {}
 

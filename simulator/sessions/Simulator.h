@@ -4,6 +4,7 @@
 #include <mutex>
 
 #include "model/Chassis.h"
+#include "sessions/Clock.h"
 #include "sessions/HandleTable.h"
 #include "sessions/Reservations.h"
 #include "sessions/Resolver.h"
@@ -31,7 +32,7 @@ struct OpenCommand {
 // The chassis together with the state of all its users. There is one in the process, made at the
 // first use. Its parts are guarded by one mutex, which calls that wait give up.
 struct Simulator {
-    explicit Simulator(std::unique_ptr<Chassis> loaded);
+    Simulator(std::unique_ptr<Chassis> loaded, const TimeScale& timeScale);
 
     // The loaded simulator. Refuses with chassisNotLoaded when the chassis file is broken.
     static Simulator& instance();
@@ -49,6 +50,7 @@ struct Simulator {
     std::mutex mutex;
     const std::unique_ptr<Chassis> chassis;
     const Trace trace;
+    Clock clock;
     Waits waits;
     Sessions sessions;
     Reservations reservations;

@@ -30,9 +30,7 @@ void Wait::finish(End reason) noexcept {
 }
 
 bool Waits::sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock) {
-    const auto deadline =
-        std::chrono::steady_clock::now() + std::chrono::duration_cast<std::chrono::nanoseconds>(
-                                               std::chrono::duration<double>(seconds));
+    const auto deadline = std::chrono::steady_clock::now() + clock.realTime(seconds);
     const auto place = waiting.insert(waiting.end(), &wait);
     wait.wake.wait_until(lock, deadline, [&] { return wait.end != Wait::End::none; });
     waiting.erase(place);
@@ -43,6 +41,16 @@ bool Waits::sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock
         throw Refusal(code::unknownSession).usage(tag::sessionHandle, wait.session);
     }
     return wait.end == Wait::End::done;
+}
+
+void Waits::spend(nQITRMCAPI100_Session session, double seconds,
+                  std::unique_lock<std::mutex>& lock) {
+    if (clock.goesByCalls()) {
+        clock.skip(seconds);
+        return;
+    }
+    Wait wait(session);
+    sleep(wait, seconds, lock);
 }
 
 void Waits::endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept {

@@ -5,6 +5,7 @@
 #include <mutex>
 
 #include "Api.h"
+#include "sessions/Clock.h"
 
 namespace simulator {
 
@@ -28,14 +29,20 @@ struct Wait {
 // All calls that wait at the moment. Every operation needs the simulator's mutex to be held.
 class Waits {
   public:
-    // Sleeps, with the mutex given up, until the wait ends or the time is over. Returns whether
-    // the wait ended by Wait::End::done; refuses when the session was aborted or closed.
+    explicit Waits(Clock& clock) : clock(clock) {}
+
+    // Sleeps, with the mutex given up, until the wait ends or the simulated time is over. Returns
+    // whether the wait ended by Wait::End::done; refuses when the session was aborted or closed.
+    // Where time goes by calls it sleeps in real time, as nobody else would move time on.
     bool sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock);
+    // Lets the time pass that something takes. Refuses like sleep().
+    void spend(nQITRMCAPI100_Session session, double seconds, std::unique_lock<std::mutex>& lock);
 
     // Ends all waits of a session.
     void endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept;
 
   private:
+    Clock& clock;
     std::list<Wait*> waiting;
 };
 

@@ -1,0 +1,99 @@
+#include "description/LiveFile.h"
+
+#include "description/MotionFile.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr size_t longestChain = 16;
+
+// What was read, to be looked at when all of it is there.
+struct Moving {
+    Node node;
+    const Property* property;
+};
+
+// Reads the motions of one description.
+class LifeReader {
+  public:
+    explicit LifeReader(Chassis& chassis) : chassis(chassis) {}
+
+    void readDevice(const Node& node);
+    void expectSoundChains() const;
+
+  private:
+    void readResource(const Node& live, const MotionPlace& place);
+    void expectSoundChain(const Moving& moving) const;
+
+    Chassis& chassis;
+    std::vector<Moving> all;
+};
+
+void LifeReader::readResource(const Node& live, const MotionPlace& place) {
+    live.forEachMember([&](const std::string& name, const Node& node) {
+        const Property* property = place.resource.properties.find(name);
+        if (property == nullptr) {
+            node.fail("is not a stored property of the resource",
+                      "only properties that the resource has and that hold a value can move");
+        }
+        const ReadMotion read = readMotion(node, place, *property->definition, chassis);
+        chassis.life.add(place.resource, *property, read.motion, read.followed);
+        all.push_back({node, property});
+    });
+}
+
+void LifeReader::readDevice(const Node& node) {
+    const Device& device = *chassis.findDevice(node.member("name", "").text());
+    node.ifPresent("live", [&](const Node& live) { readResource(live, {device, ""}); });
+    node.ifPresent("channels", [&](const Node& channels) {
+        channels.ifPresent("live", [&](const Node& live) {
+            for (size_t i = 0; i < device.physChans.size(); ++i) {
+                readResource(live, {*device.physChans[i], std::to_string(i)});
+            }
+        });
+    });
+    node.ifPresent("modules", [&](const Node& modules) {
+        modules.forEachElement([&](const Node& element) { readDevice(element); });
+    });
+}
+
+void LifeReader::expectSoundChain(const Moving& moving) const {
+    const Motion* motion = chassis.life.find(*moving.property);
+    if (!motion->follows) {
+        return;
+    }
+    const Node follows = moving.node.member("follows", "");
+    const Motion* next = chassis.life.find(*motion->follows->source);
+    if (motion->follows->timeConstant > 0.0 && next != nullptr) {
+        follows.fail("follows a property that moves itself, with a time constant",
+                     "leave time_constant out, or follow a property that keeps still");
+    }
+    for (size_t length = 1; next != nullptr && next->follows; ++length) {
+        if (next == motion) {
+            follows.fail("follows itself", "must not go round in a circle");
+        }
+        if (length == longestChain) {
+            follows.fail("follows over more than 16 properties",
+                         "must be a shorter chain, and no circle");
+        }
+        next = chassis.life.find(*next->follows->source);
+    }
+}
+
+void LifeReader::expectSoundChains() const {
+    for (const Moving& moving : all) {
+        expectSoundChain(moving);
+    }
+}
+
+}  // namespace
+
+void readLife(const Node& root, Chassis& chassis) {
+    LifeReader reader(chassis);
+    root.member("devices", "").forEachElement([&](const Node& node) { reader.readDevice(node); });
+    reader.expectSoundChains();
+    chassis.life.settle();
+}
+
+}  // namespace simulator

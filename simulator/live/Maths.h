@@ -1,0 +1,30 @@
+#pragma once
+
+#include <cstdint>
+#include <string_view>
+
+// Functions that give the same bits on every platform, so that a run can be repeated anywhere. The
+// mathematical functions of the C library differ in the last digit between processors.
+namespace simulator {
+
+// Spreads a number over all 64 bits. Different numbers give different results.
+uint64_t mixed(uint64_t number);
+// A number for a text, for use with mixed().
+uint64_t keyOf(std::string_view text);
+
+// Random numbers that belong to a key: evenly spread over 0 (inclusive) to 1 (exclusive)...
+double uniform(uint64_t key);
+// ...and normally distributed, with standard deviation 1 and within -6 and 6.
+double gaussian(uint64_t key);
+
+// exp(-x) for x from 0 to infinity.
+double decay(double x);
+// The sine of a part of a turn, 0 to 1.
+double sineOfTurn(double turn);
+
+// Anything as a number with which sums and differences stay finite: at most 1e300 either side of
+// 0, and 0 for what is no number.
+double tame(double number);
+constexpr double largestTame = 1e300;
+
+}  // namespace simulator

@@ -1,0 +1,109 @@
+#include "live/Motion.h"
+
+#include <algorithm>
+#include <cmath>
+
+#include "live/Maths.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr double microseconds = 1e6;
+constexpr int64_t noiseTick = 1000;
+
+// What keeps the random numbers of one stream for different uses apart.
+enum class Use : uint64_t { drift = 1, noise, samples };
+
+uint64_t keyFor(Use use, const Dice& dice, int64_t tick) {
+    return mixed(mixed(dice.stream + static_cast<uint64_t>(use)) ^ static_cast<uint64_t>(tick));
+}
+
+// -1 to 1.
+double knotAt(const Dice& dice, int64_t knot) {
+    return 2.0 * uniform(keyFor(Use::drift, dice, knot)) - 1.0;
+}
+
+uint64_t keyOfSample(Use use, const Dice& dice, uint64_t index) {
+    return mixed(keyFor(use, dice, dice.elapsed / noiseTick) ^ index);
+}
+
+// -1 to 1, for a part of a period from 0 (inclusive) to 1 (exclusive).
+double shapeAt(Waveform::Shape shape, double phase) {
+    switch (shape) {
+        case Waveform::Shape::sawtooth:
+            return 2.0 * phase - 1.0;
+        case Waveform::Shape::sine:
+            return sineOfTurn(phase);
+        case Waveform::Shape::square:
+            return phase < 0.5 ? 1.0 : -1.0;
+        case Waveform::Shape::triangle:
+            return phase < 0.25   ? 4.0 * phase
+                   : phase < 0.75 ? 2.0 - 4.0 * phase
+                                  : 4.0 * phase - 4.0;
+        default:
+            return 0.0;
+    }
+}
+
+}  // namespace
+
+double driftAt(const Drift& drift, const Dice& dice) {
+    const double position = static_cast<double>(dice.elapsed) / (drift.period * microseconds);
+    const double knot = std::floor(position);
+    const double part = position - knot;
+    const double from = knotAt(dice, static_cast<int64_t>(knot));
+    const double to = knotAt(dice, static_cast<int64_t>(knot) + 1);
+    const double smooth = part * part * (3.0 - 2.0 * part);
+    return drift.amplitude * std::clamp(from + (to - from) * smooth, -1.0, 1.0);
+}
+
+double noiseAt(double deviation, const Dice& dice, uint64_t index) {
+    return deviation == 0.0 ? 0.0 : deviation * gaussian(keyOfSample(Use::noise, dice, index));
+}
+
+uint64_t countAt(const Counts& counts, int64_t elapsed) {
+    constexpr uint64_t million = 1000000;
+    const auto whole = static_cast<uint64_t>(counts.perSecond);
+    const double part = counts.perSecond - static_cast<double>(whole);
+    const uint64_t seconds = static_cast<uint64_t>(elapsed) / million;
+    const uint64_t rest = static_cast<uint64_t>(elapsed) % million * whole;
+    const double broken = static_cast<double>(rest % million) / microseconds +
+                          part * (static_cast<double>(elapsed) / microseconds);
+    return seconds * whole + rest / million + static_cast<uint64_t>(broken);
+}
+
+double sampleAt(const Waveform& waveform, double rate, const Dice& dice, uint64_t index) {
+    if (waveform.shape == Waveform::Shape::noise) {
+        const double random = uniform(keyOfSample(Use::samples, dice, index));
+        return waveform.offset + waveform.amplitude * (2.0 * random - 1.0);
+    }
+    const double periods =
+        rate > 0.0 ? tame(waveform.frequency * static_cast<double>(index) / rate) : 0.0;
+    return waveform.offset +
+           waveform.amplitude * shapeAt(waveform.shape, periods - std::floor(periods));
+}
+
+double laggedAt(const Follows& follows, int64_t now) {
+    const double elapsed = static_cast<double>(now - follows.changedAt) / microseconds;
+    return follows.target +
+           (follows.start - follows.target) * decay(elapsed / follows.timeConstant);
+}
+
+double firstNumber(const Elements& value) {
+    return std::visit(
+        [](const auto& list) {
+            if constexpr (std::is_same_v<std::decay_t<decltype(list)>, List<std::string>>) {
+                return 0.0;
+            } else {
+                return tame(static_cast<double>(list.front()));
+            }
+        },
+        value);
+}
+
+double numberOf(const Quantity& quantity) {
+    return quantity.property != nullptr ? firstNumber(quantity.property->value) : quantity.constant;
+}
+
+}  // namespace simulator

@@ -1,0 +1,39 @@
+#include "sessions/Clock.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace simulator {
+
+namespace {
+
+constexpr int64_t callStep = 1000;
+// A double has this number, and the next one is out of range.
+constexpr double latest = 9223372036854774784.0;
+
+}  // namespace
+
+int64_t Clock::now() const {
+    if (scale.byCalls) {
+        return stepped;
+    }
+    const std::chrono::duration<double, std::micro> passed = Real::now() - start;
+    return static_cast<int64_t>(std::min(passed.count() * scale.factor, latest));
+}
+
+void Clock::noteCall() {
+    if (scale.byCalls) {
+        stepped += callStep;
+    }
+}
+
+void Clock::skip(double seconds) {
+    stepped += std::llround(seconds * 1e6);
+}
+
+std::chrono::nanoseconds Clock::realTime(double seconds) const {
+    return std::chrono::duration_cast<std::chrono::nanoseconds>(
+        std::chrono::duration<double>(seconds / scale.factor));
+}
+
+}  // namespace simulator

@@ -1,0 +1,37 @@
+#pragma once
+
+#include <chrono>
+#include <cstdint>
+
+#include "description/Environment.h"
+
+namespace simulator {
+
+// The simulated time. Every operation needs the simulator's mutex to be held.
+class Clock {
+  public:
+    explicit Clock(const TimeScale& scale) : scale(scale) {}
+
+    // Microseconds since the chassis was loaded. The time never goes back; it stands still for
+    // good when it would pass the largest number, at the largest scale after 106 days.
+    int64_t now() const;
+    // A call of the driver begins: by calls, a millisecond has passed.
+    void noteCall();
+
+    // Whether what takes time is over at once, with the clock moved on by skip().
+    bool goesByCalls() const { return scale.byCalls; }
+    // Lets simulated seconds pass, 0 to a day.
+    void skip(double seconds);
+    // How long simulated seconds, 0 to a day, take in reality.
+    std::chrono::nanoseconds realTime(double seconds) const;
+
+  private:
+    using Real = std::chrono::steady_clock;
+
+    TimeScale scale;
+    Real::time_point start = Real::now();
+    // By calls, the time itself in microseconds.
+    int64_t stepped = 0;
+};
+
+}  // namespace simulator
