@@ -63,8 +63,8 @@ std::string environmentText(const char* variable) {
 }
 
 void refuseVariable(const char* variable, const std::string& right) {
-    const std::string words = std::string(variable) + " is \"" + environmentText(variable) +
-                              "\"; it must be " + right;
+    const std::string words =
+        std::string(variable) + " is \"" + environmentText(variable) + "\"; it must be " + right;
     std::fprintf(stderr, "qitrmcapi: %s\n", words.c_str());
     throw Refusal(code::chassisNotLoaded).usage(tag::explanation, words);
 }

@@ -122,8 +122,7 @@ Drift readDrift(const Node& node) {
     node.expectMembers({"amplitude", "period"});
     Drift drift;
     drift.amplitude = node.member("amplitude", "how far it goes").number(0.0, largestTame);
-    drift.period =
-        node.member("period", "a time in seconds").number(shortestPeriod, longestPeriod);
+    drift.period = node.member("period", "a time in seconds").number(shortestPeriod, longestPeriod);
     return drift;
 }
 
@@ -196,8 +195,8 @@ void expectSuitableType(const Node& node, const PropertyDefinition& definition) 
         expectType(node.member("counts", ""), isWholeNumber(type), definition,
                    "only whole numbers count");
         if (definition.access != PropertyAccess::readOnly) {
-            node.member("counts", "").fail("counts in a property that can be written",
-                                           "the access must be ReadOnly");
+            node.member("counts", "")
+                .fail("counts in a property that can be written", "the access must be ReadOnly");
         }
     } else {
         expectType(node, isNumber(type), definition, "only a single number moves like this");
@@ -214,9 +213,8 @@ ReadMotion readMotion(const Node& node, const MotionPlace& place,
     ReadMotion read;
     Motion& motion = read.motion;
     motion.key = keyOf(place.resource.fullName() + " " + definition.name);
-    node.ifPresent("follows", [&](const Node& follows) {
-        FollowsReader(follows, place, chassis).read(read);
-    });
+    node.ifPresent("follows",
+                   [&](const Node& follows) { FollowsReader(follows, place, chassis).read(read); });
     node.ifPresent("drift", [&](const Node& drift) { motion.drift = readDrift(drift); });
     readNumber(node, "noise", 0.0, largestTame, motion.noise);
     node.ifPresent("counts", [&](const Node& counts) { motion.counts = readCounts(counts); });

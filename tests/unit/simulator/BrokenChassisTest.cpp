@@ -1,48 +1,10 @@
 #include <array>
 
-#include "ChassisFile.h"
-#include "Driver.h"
+#include "ChassisProbe.h"
 
 using namespace drivertest;
 
 namespace {
-
-struct Probe {
-    std::string output;
-    std::string errors;
-};
-
-std::string contentOf(const std::string& path) {
-    std::ifstream file(path);
-    return std::string(std::istreambuf_iterator<char>(file), {});
-}
-
-// Opens a session in a new process that uses this chassis file.
-Probe openWith(const std::string& path) {
-    const ChassisFile output("");
-    const ChassisFile errors("");
-    const std::string command = "QITRMC_SIM_CHASSIS='" + path + "' " + OPEN_PROBE + " >" +
-                                output.path + " 2>" + errors.path;
-    EXPECT_EQ(std::system(command.c_str()), 0) << contentOf(errors.path);
-    return {contentOf(output.path), contentOf(errors.path)};
-}
-
-void expectFault(const std::string& text, const std::string& pointer, const std::string& words) {
-    const ChassisFile file(text);
-    const Probe probe = openWith(file.path);
-    EXPECT_EQ(probe.output,
-              "-250952\n" +
-                  detailsOf("chassisNotLoaded", usage("FileName", "\"" + file.path + "\"") + "," +
-                                                    usage("JsonDocPointer", "\"" + pointer + "\"") +
-                                                    "," + usage("Details", "\"" + words + "\"")) +
-                  "\n0 0 0\n");
-    EXPECT_EQ(probe.errors, "qitrmcapi: " + file.path + ": " + pointer +
-                                (pointer.empty() ? "" : " ") + words + "\n");
-}
-
-std::string device(const std::string& members) {
-    return "{\"devices\":[{\"name\":\"A\",\"category\":1" + members + "}]}";
-}
 
 TEST(BrokenChassisTest, TheHighestHandleIsFollowedByOne) {
     const ChassisFile file("{\"first_session_handle\":4294967294,\"devices\":[]}");
@@ -100,7 +62,7 @@ TEST(BrokenChassisTest, AMissingMemberIsNamedByItsPlace) {
 TEST(BrokenChassisTest, AMistypedMemberIsNamedWithTheOnesThatExist) {
     expectFault("{\"devises\":[]}", "/devises",
                 "is not a known member; the members here are first_session_handle, enums, "
-                "driver_properties, system_values, session_values, devices");
+                "driver_properties, system_values, session_values, devices, seed");
 }
 
 TEST(BrokenChassisTest, AMemberThatStandsTwiceIsRefused) {

@@ -165,6 +165,52 @@ TEST(MemoryTest, WritingSeveralChannelsWritesAllOrNone) {
     EXPECT_EQ(resetDevices(session, "Mod2"), 0);
 }
 
+TEST(MemoryTest, ReadingARecord) {
+    Session session;
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         double* array = nullptr;
+                         uint32_t count = 0;
+                         nQITRMCAPI100_getGenericPropertyDoubleArray(
+                             session, "Mod4/ch0", "DIG.Waveform", &array, &count, status);
+                         EXPECT_EQ(count, status->code == 0 ? 1024u : 0u);
+                         nQITRMCAPI100_freeArray(array);
+                     }),
+              0);
+}
+
+TEST(MemoryTest, ReadingWhatFollowsIsFollowedFurther) {
+    Session session;
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         double voltage = 0.0;
+                         nQITRMCAPI100_getGenericPropertyDouble(session, "Mod1/ch0", "DMM.Voltage",
+                                                                &voltage, status);
+                     }),
+              0);
+    // A read that failed has moved nothing: the output is off.
+    EXPECT_NEAR(get(getDouble, session, "Mod2/ch0", "PSU.MeasuredVoltage").value, 0.0, 6 * 0.0005);
+}
+
+TEST(MemoryTest, SwitchingOnWhatIsFollowed) {
+    Session session("Mod2");
+    EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 30.0).code, 0);
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_executeGenericCommand(session, "Mod2/ch0", "PSU.On", 1.0,
+                                                             status);
+                         const bool on = status->code == 0;
+                         allowed = -1;
+                         EXPECT_EQ(get(getBool, session, "Mod2/ch0", "PSU.OutputEnabled"),
+                                   static_cast<uint8_t>(on));
+                         const double measured =
+                             get(getDouble, session, "Mod2/ch0", "PSU.MeasuredVoltage").value;
+                         EXPECT_TRUE(on || measured < 6 * 0.0005) << measured;
+                     }),
+              0);
+    EXPECT_EQ(resetDevices(session, "Mod2"), 0);
+}
+
 TEST(MemoryTest, OpeningAProperty) {
     Session session;
     EXPECT_GT(starve(0,

@@ -329,7 +329,8 @@ TEST_F(PropertyTest, AResourceListsItsOwnPropertiesInOrder) {
               (Names{"DIG.SampleRate", "DIG.RecordLength"}));
     EXPECT_EQ(getTexts(session, "Mod2", "Dev.Properties"), Names());
     EXPECT_EQ(getTexts(session, "Mod2/ch1", "PhysChan.Properties"),
-              (Names{"PSU.Voltage", "PSU.CurrentLimit", "PSU.OutputEnabled"}));
+              (Names{"PSU.Voltage", "PSU.CurrentLimit", "PSU.OutputEnabled", "PSU.MeasuredVoltage",
+                     "PSU.MeasuredCurrent"}));
 }
 
 TEST_F(PropertyTest, TheChassisKnowsItsModulesAndItsAddress) {

@@ -54,11 +54,13 @@ def test_the_properties_of_the_session_stand_before_those_of_the_system(bench):
 
 
 @pytest.mark.parametrize("resource, answer", [
-    ('"device":"Bench"', lists(DEVICE_NAMES, '"Chassis.FanSpeed","Chassis.SlotCount"')),
+    ('"device":"Bench"', lists(DEVICE_NAMES, '"Chassis.FanSpeed","Chassis.SlotCount",'
+                                             '"Chassis.MeasuredFanSpeed"')),
     ('"device":"mod5"', lists(DEVICE_NAMES, '"SW.Routes","SW.RelayCycles"')),
     ('"device":"Mod2"', lists(DEVICE_NAMES, "")),
     ('"physical_channel":"Mod1/ch3"', lists(CHANNEL_NAMES,
-                                            '"DMM.InputImpedance","DMM.Coupling"')),
+                                            '"DMM.InputImpedance","DMM.Coupling",'
+                                            '"DMM.Voltage","DMM.SampleClock"')),
     ('"nvmem_area":"Mod1/user"', lists(AREA_NAMES)),
     ('"nvmem_area":"Mod1/user,Mod2/user"', lists(AREA_NAMES)),
     # The driver's own list is that of one resource; that it fails for others is not told.

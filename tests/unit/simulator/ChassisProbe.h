@@ -1,0 +1,48 @@
+#pragma once
+
+#include "ChassisFile.h"
+#include "Driver.h"
+
+// What a new process makes of a chassis file. OPEN_PROBE names the program.
+namespace drivertest {
+
+struct Probe {
+    std::string output;
+    std::string errors;
+};
+
+inline std::string contentOf(const std::string& path) {
+    std::ifstream file(path);
+    return std::string(std::istreambuf_iterator<char>(file), {});
+}
+
+// Opens a session in a new process that uses this chassis file, and further variables of the
+// environment, as a shell takes them.
+inline Probe openWith(const std::string& path, const std::string& variables = "") {
+    const ChassisFile output("");
+    const ChassisFile errors("");
+    const std::string command = variables + " QITRMC_SIM_CHASSIS='" + path + "' " + OPEN_PROBE +
+                                " >" + output.path + " 2>" + errors.path;
+    EXPECT_EQ(std::system(command.c_str()), 0) << contentOf(errors.path);
+    return {contentOf(output.path), contentOf(errors.path)};
+}
+
+inline void expectFault(const std::string& text, const std::string& pointer,
+                        const std::string& words) {
+    const ChassisFile file(text);
+    const Probe probe = openWith(file.path);
+    EXPECT_EQ(probe.output,
+              "-250952\n" +
+                  detailsOf("chassisNotLoaded", usage("FileName", "\"" + file.path + "\"") + "," +
+                                                    usage("JsonDocPointer", "\"" + pointer + "\"") +
+                                                    "," + usage("Details", "\"" + words + "\"")) +
+                  "\n0 0 0\n");
+    EXPECT_EQ(probe.errors, "qitrmcapi: " + file.path + ": " + pointer +
+                                (pointer.empty() ? "" : " ") + words + "\n");
+}
+
+inline std::string device(const std::string& members) {
+    return "{\"devices\":[{\"name\":\"A\",\"category\":1" + members + "}]}";
+}
+
+}  // namespace drivertest
