@@ -53,6 +53,33 @@ void setTimeout(Options& options, const std::string& option, const std::string& 
     options.timeout = parseNumber(option, text, 1, kLongestTimeout);
 }
 
+// The driver reads the texts that follow, so they are only looked at here.
+
+void setSeed(Options& options, const std::string& option, const std::string& text) {
+    uint64_t seed = 0;
+    const char* end = text.data() + text.size();
+    const auto [stop, error] = std::from_chars(text.data(), end, seed);
+    if (error != std::errc() || stop != end) {
+        throw UsageError(option + " takes a number from 0 to 18446744073709551615, not \"" + text +
+                         "\".");
+    }
+    options.seed = text;
+}
+
+void setTimeScale(Options& options, const std::string& option, const std::string& text) {
+    double factor = 0.0;
+    const char* end = text.data() + text.size();
+    const auto [stop, error] = std::from_chars(text.data(), end, factor);
+    const bool isFactor = error == std::errc() && stop == end && factor >= kSmallestTimeScale &&
+                          factor <= kLargestTimeScale;
+    if (!isFactor && text != "calls") {
+        throw UsageError(option +
+                         " takes a number from 0.001 to 1000000 or the word calls, not \"" + text +
+                         "\".");
+    }
+    options.timeScale = text;
+}
+
 template <std::string Options::*path>
 void setPath(Options& options, const std::string& option, const std::string& text) {
     if (text.empty())
@@ -71,6 +98,8 @@ constexpr OptionWithValue kOptionsWithValue[] = {
     {"--chassis", setPath<&Options::chassis>},
     {"--state", setPath<&Options::state>},
     {"--trace", setPath<&Options::trace>},
+    {"--seed", setSeed},
+    {"--time-scale", setTimeScale},
     {"--threads", setThreads},
     {"--max-body", setMaxBody},
     {"--timeout", setTimeout},

@@ -17,6 +17,8 @@ struct Options {
     std::string chassis;                  // path; empty: leave the driver's own choice
     std::string state;                    // path; empty: leave the driver's own choice
     std::string trace;                    // path; empty: leave the driver's own choice
+    std::string seed;                     // 64-bit number; empty: leave the driver's own choice
+    std::string timeScale;                // number or "calls"; empty: leave the driver's own choice
     uint32_t threads = 512;               // 1 to kMostThreads
     uint32_t maxBody = 16 * 1024 * 1024;  // bytes, 1 and more
     uint32_t timeout = 30;                // seconds, 1 to kLongestTimeout
@@ -27,6 +29,9 @@ struct Options {
 // Every connection takes a thread and a file descriptor, of which a process has 1024.
 constexpr uint32_t kMostThreads = 900;
 constexpr uint32_t kLongestTimeout = 86400;
+// Simulated seconds in one real second.
+constexpr double kSmallestTimeScale = 0.001;
+constexpr double kLargestTimeScale = 1000000.0;
 
 // Reads the arguments of the program, its own name not among them. Options are written as
 // "--name value" or "--name=value"; the last one of a name holds. --help and --version end the

@@ -51,6 +51,8 @@ void configureDriver(const Options& options) {
     setEnvironment("QITRMC_SIM_CHASSIS", options.chassis);
     setEnvironment("QITRMC_SIM_STATE", options.state);
     setEnvironment("QITRMC_SIM_TRACE", options.trace);
+    setEnvironment("QITRMC_SIM_SEED", options.seed);
+    setEnvironment("QITRMC_SIM_TIME_SCALE", options.timeScale);
 }
 
 host::ServerSettings settingsOf(const Options& options) {

@@ -31,6 +31,8 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
     EXPECT_EQ(options.chassis, "");
     EXPECT_EQ(options.state, "");
     EXPECT_EQ(options.trace, "");
+    EXPECT_EQ(options.seed, "");
+    EXPECT_EQ(options.timeScale, "");
     EXPECT_EQ(options.threads, 512u);
     EXPECT_EQ(options.maxBody, 16777216u);
     EXPECT_EQ(options.timeout, 30u);
@@ -40,15 +42,18 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
 
 TEST(Options, EachOptionSetsItsOwnField) {
     const Options options = parseOptions(
-        {"--listen",  "0.0.0.0:81", "--plugin",   "p.so",      "--chassis", "c.json",     "--state",
-         "s",         "--trace",    "t",          "--threads", "3",         "--max-body", "4",
-         "--timeout", "5",          "--tls-cert", "cert.pem",  "--tls-key", "key.pem"});
+        {"--listen",  "0.0.0.0:81", "--plugin",   "p.so",     "--chassis",    "c.json",
+         "--state",   "s",          "--seed",     "7",        "--time-scale", "8",
+         "--trace",   "t",          "--threads",  "3",        "--max-body",   "4",
+         "--timeout", "5",          "--tls-cert", "cert.pem", "--tls-key",    "key.pem"});
     EXPECT_EQ(options.address, "0.0.0.0");
     EXPECT_EQ(options.port, "81");
     EXPECT_EQ(options.plugin, "p.so");
     EXPECT_EQ(options.chassis, "c.json");
     EXPECT_EQ(options.state, "s");
     EXPECT_EQ(options.trace, "t");
+    EXPECT_EQ(options.seed, "7");
+    EXPECT_EQ(options.timeScale, "8");
     EXPECT_EQ(options.threads, 3u);
     EXPECT_EQ(options.maxBody, 4u);
     EXPECT_EQ(options.timeout, 5u);
@@ -110,6 +115,27 @@ TEST(Options, TextThatIsNoNumberIsRefused) {
         EXPECT_THAT(usageErrorOf({"--threads", text}), HasSubstr("--threads takes")) << text;
 }
 
+TEST(Options, ASeedHas64Bits) {
+    EXPECT_EQ(parseOptions({"--seed", "0"}).seed, "0");
+    EXPECT_EQ(parseOptions({"--seed", "18446744073709551615"}).seed, "18446744073709551615");
+    for (const char* text : {"", "x", "1x", " 1", "-1", "1.0", "18446744073709551616"}) {
+        EXPECT_EQ(usageErrorOf({"--seed", text}),
+                  std::string("--seed takes a number from 0 to 18446744073709551615, not \"") +
+                      text + "\".");
+    }
+}
+
+TEST(Options, ATimeScaleIsANumberOrTheWordCalls) {
+    for (const char* text : {"calls", "0.001", "1000000", "2.5"})
+        EXPECT_EQ(parseOptions({"--time-scale", text}).timeScale, text);
+    for (const char* text : {"", "x", "1x", "0", "-1", "0.0009", "1000000.1", "nan", "inf"}) {
+        EXPECT_EQ(usageErrorOf({"--time-scale", text}),
+                  std::string("--time-scale takes a number from 0.001 to 1000000 or the word "
+                              "calls, not \"") +
+                      text + "\".");
+    }
+}
+
 TEST(Options, AnEmptyPathIsRefused) {
     for (const char* option :
          {"--plugin", "--chassis", "--state", "--trace", "--tls-cert", "--tls-key"})
@@ -135,9 +161,9 @@ TEST(Options, ACertificateWithoutAKeyIsRefused) {
 }
 
 TEST(Options, TheHelpNamesEveryOption) {
-    for (const char* option :
-         {"--listen", "--plugin", "--chassis", "--state", "--trace", "--threads", "--max-body",
-          "--timeout", "--tls-cert", "--tls-key", "--help", "--version"}) {
+    for (const char* option : {"--listen", "--plugin", "--chassis", "--state", "--trace", "--seed",
+                               "--time-scale", "--threads", "--max-body", "--timeout", "--tls-cert",
+                               "--tls-key", "--help", "--version"}) {
         EXPECT_THAT(host::kHelpText, HasSubstr(std::string("  ") + option + " "));
     }
 }

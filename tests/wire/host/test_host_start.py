@@ -48,6 +48,20 @@ def test_hands_the_chassis_and_state_to_the_driver(start_host, tmp_path):
     assert f"state {tmp_path / 'state'}" in lines
 
 
+def test_hands_the_seed_and_the_time_scale_to_the_driver(start_host):
+    host = start_host("--seed", 18446744073709551615, "--time-scale", "calls")
+    lines = host.post(b"")[2].decode().splitlines()
+    assert "seed 18446744073709551615" in lines
+    assert "time scale calls" in lines
+
+
+def test_without_options_the_variables_of_the_driver_are_left_alone(start_host):
+    host = start_host(QITRMC_SIM_SEED="5", QITRMC_SIM_TIME_SCALE="10")
+    lines = host.post(b"")[2].decode().splitlines()
+    assert "seed 5" in lines
+    assert "time scale 10" in lines
+
+
 def test_help_goes_to_standard_output(run_host):
     result = run_host("--help")
     assert (result.returncode, result.stderr) == (0, "")
@@ -68,6 +82,9 @@ def test_version_is_one_line(run_host):
     (["--listen", "8080"],
      '--listen takes ADDR:PORT, such as 127.0.0.1:8080 or [::1]:8080, not "8080".'),
     (["--timeout", "soon"], '--timeout takes a number from 1 to 86400, not "soon".'),
+    (["--seed", "-1"], '--seed takes a number from 0 to 18446744073709551615, not "-1".'),
+    (["--time-scale", "fast"],
+     '--time-scale takes a number from 0.001 to 1000000 or the word calls, not "fast".'),
     (["--tls-key", "key.pem"], "--tls-cert and --tls-key are given together or not at all."),
 ])
 def test_a_wrong_command_line_ends_with_status_2(refused_start, arguments, message):
