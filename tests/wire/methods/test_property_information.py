@@ -75,7 +75,8 @@ def test_a_resource_has_properties_of_its_kind_and_of_its_own(bench, resource, a
 @pytest.mark.parametrize("params, answer", [
     ('{"devices":"Mod5"}', lists(DEVICE_NAMES, '"SW.Routes","SW.RelayCycles"')),
     ('{"physical_channels":"Mod1/ch0"}', lists(CHANNEL_NAMES,
-                                               '"DMM.InputImpedance","DMM.Coupling"')),
+                                               '"DMM.InputImpedance","DMM.Coupling",'
+                                               '"DMM.Voltage","DMM.SampleClock"')),
     ('{"nvmem_areas":"Mod1/user"}', lists(AREA_NAMES)),
 ])
 def test_the_default_resource_stands_in_for_none(client, params, answer):
