@@ -17,8 +17,8 @@ The service answers POST requests at /qitrmc/Call.
                       (QITRMC_SIM_TRACE)
   --seed N            where the random numbers of the simulated chassis come from: the same seed
                       gives the same numbers (QITRMC_SIM_SEED; 0 to 18446744073709551615)
-  --time-scale X      simulated seconds in one real second (QITRMC_SIM_TIME_SCALE; 0.001 to 1000000),
-                      or "calls": time goes by the calls of the driver alone
+  --time-scale X      simulated seconds in one real second (QITRMC_SIM_TIME_SCALE; 0.001 to
+                      1000000), or "calls": time goes by the calls of the driver alone
   --threads N         most connections at once, each with a thread of its own (512; 1 to 900)
   --max-body BYTES    largest request body; a larger one is answered with 413 (16777216)
   --timeout SECONDS   how long a client may stay idle, and how long it may take to send the head of
