@@ -1,11 +1,10 @@
 #include "description/Environment.h"
 
 #include <charconv>
-#include <cstdio>
 #include <cstdlib>
 #include <system_error>
 
-#include "status/Refusal.h"
+#include "description/StartRefusal.h"
 
 namespace simulator {
 
@@ -63,10 +62,7 @@ std::string environmentText(const char* variable) {
 }
 
 void refuseVariable(const char* variable, const std::string& right) {
-    const std::string words =
-        std::string(variable) + " is \"" + environmentText(variable) + "\"; it must be " + right;
-    std::fprintf(stderr, "qitrmcapi: %s\n", words.c_str());
-    throw Refusal(code::chassisNotLoaded).usage(tag::explanation, words);
+    refuseStart(variable, {"", "is \"" + environmentText(variable) + "\"", "must be " + right});
 }
 
 Settings readSettings() {

@@ -24,8 +24,7 @@ struct Settings {
 // The value of a variable of the environment; empty when it is not set.
 std::string environmentText(const char* variable);
 
-// Tells on standard error, in one line, that a variable has a wrong value, and refuses with
-// chassisNotLoaded. `right` goes on behind "must be".
+// Refuses to start because a variable has a wrong value. `right` goes on behind "must be".
 [[noreturn]] void refuseVariable(const char* variable, const std::string& right);
 
 // Reads QITRMC_SIM_SEED and QITRMC_SIM_TIME_SCALE.

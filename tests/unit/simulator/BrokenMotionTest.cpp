@@ -196,14 +196,16 @@ TEST(BrokenMotionTest, TheSeedIsAWholeNumber) {
 void expectVariableFault(const std::string& variable, const std::string& value,
                          const std::string& right) {
     const Probe probe = openWith("", variable + "='" + value + "'");
-    EXPECT_EQ(probe.output,
-              "-250952\n" +
-                  detailsOf("chassisNotLoaded",
-                            usage("Details", "\"" + variable + " is \\\"" + value +
-                                                 "\\\"; it must be " + right + "\"")) +
-                  "\n0 0 0\n");
+    EXPECT_EQ(
+        probe.output,
+        "-250952\n" +
+            detailsOf("chassisNotLoaded",
+                      usage("FileName", "\"" + variable + "\"") + "," +
+                          usage("JsonDocPointer", "\"\"") + "," +
+                          usage("Details", "\"is \\\"" + value + "\\\"; must be " + right + "\"")) +
+            "\n0 0 0\n");
     EXPECT_EQ(probe.errors,
-              "qitrmcapi: " + variable + " is \"" + value + "\"; it must be " + right + "\n");
+              "qitrmcapi: " + variable + ": is \"" + value + "\"; must be " + right + "\n");
 }
 
 TEST(BrokenMotionTest, ASeedInTheEnvironmentIsAWholeNumber) {
