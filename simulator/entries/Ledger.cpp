@@ -5,7 +5,8 @@
 namespace simulator {
 
 Ledger& Ledger::instance() {
-    static Ledger ledger;
+    // Never destroyed: things may come back until the very end of the process.
+    static Ledger& ledger = *new Ledger;
     return ledger;
 }
 

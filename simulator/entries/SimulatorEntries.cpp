@@ -34,7 +34,7 @@ void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
         counts->openProperties = simulator.openProperties.size();
         counts->openCommands = simulator.openCommands.size();
         counts->sessions = simulator.sessions.size();
-    } catch (const Refusal&) {
+    } catch (...) {
         // A simulator that did not start has opened nothing.
     }
 }
