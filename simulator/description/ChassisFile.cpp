@@ -151,7 +151,7 @@ std::unique_ptr<Chassis> parseChassis(std::string_view text) {
         seed.expect(seed.json().IsUint64(), "a whole number from 0 to 18446744073709551615");
         chassis->life.seed = seed.json().GetUint64();
     });
-    Enumerations enumerations;
+    Enumerations& enumerations = chassis->enumerations;
     root.ifPresent("enums", [&](const Node& node) { enumerations = readEnumerations(node); });
     readBuiltInCatalogue(chassis->catalogue);
     root.ifPresent("driver_properties", [&](const Node& node) {

@@ -1,15 +1,11 @@
 #pragma once
 
-#include <map>
-#include <memory>
 #include <string>
 
 #include "description/Description.h"
 #include "model/Properties.h"
 
 namespace simulator {
-
-using Enumerations = std::map<std::string, std::shared_ptr<const Enumeration>>;
 
 // Reads the enumerations of a description: an object of objects of item name to number.
 Enumerations readEnumerations(const Node& node);

@@ -113,6 +113,8 @@ class Chassis {
     uint32_t firstSessionHandle = 1;
     // How often a name has changed.
     uint64_t changes = 0;
+    // Those that the description gives.
+    Enumerations enumerations;
     Catalogue catalogue;
     PropertyStore systemProperties;
     // What every session begins with.

@@ -29,6 +29,9 @@ struct Enumeration {
     bool has(int32_t value) const;
 };
 
+// By their names.
+using Enumerations = std::map<std::string, std::shared_ptr<const Enumeration>>;
+
 // Everything about a property but its value.
 struct PropertyDefinition {
     std::string name;

@@ -94,10 +94,14 @@ void Details::addCause(int32_t code, const char* constant, const Details& detail
 }
 
 std::string Details::members(const char* constant) const {
-    std::string out = "\"error_constant\":" + quoted(constant) +
-                      ",\"component\":\"qitrmcapi\",\"translator\":\"mxlator_qitrmc\""
-                      ",\"translator_info\":{\"ordered_data\":[" +
-                      entries + "]}";
+    std::string out;
+    if (constant != nullptr) {
+        out = "\"error_constant\":" + quoted(constant) + ",";
+    }
+    out +=
+        "\"component\":\"qitrmcapi\",\"translator\":\"mxlator_qitrmc\""
+        ",\"translator_info\":{\"ordered_data\":[" +
+        entries + "]}";
     if (causes.size() == 1) {
         out += ",\"nested_error\":" + causes.front();
     } else if (!causes.empty()) {

@@ -26,7 +26,8 @@ class Details {
     void addHeader(std::string_view term);
     // An empty line.
     void addEmpty();
-    // A failure that led to this one. One cause is written as an object, several as an array.
+    // A failure that led to this one. `constant` may be null, here and below. One cause is written
+    // as an object, several as an array.
     void addCause(int32_t code, const char* constant, const Details& details);
 
     // The whole JSON text of a status.

@@ -1,6 +1,15 @@
 #include "status/Refusal.h"
 
+#include <utility>
+
 namespace simulator {
+
+Refusal::Refusal(int32_t code, std::optional<std::string> name) : reason{code, nullptr} {
+    if (name) {
+        constant = std::make_shared<const std::string>(std::move(*name));
+        reason.constant = constant->c_str();
+    }
+}
 
 Refusal& Refusal::usageEnum(std::string_view tag, int32_t value, uint32_t id) {
     details.addUsageEnum(tag, value, id);
@@ -24,6 +33,11 @@ Refusal& Refusal::empty() {
 
 Refusal& Refusal::cause(const Refusal& other) {
     details.addCause(other.reason.number, other.reason.constant, other.details);
+    return *this;
+}
+
+Refusal& Refusal::ownText(std::string text) {
+    whole = std::move(text);
     return *this;
 }
 

@@ -1,8 +1,9 @@
 #pragma once
 
+#include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
-#include <vector>
 
 #include "Codes.h"
 #include "status/Details.h"
@@ -14,6 +15,9 @@ namespace simulator {
 class Refusal {
   public:
     explicit Refusal(const Code& code) : reason(code) {}
+    // A status that the driver itself does not know. `name` is what its details carry as
+    // its constant; they can do without.
+    Refusal(int32_t code, std::optional<std::string> name);
 
     template <typename Value>
     Refusal& usage(std::string_view tag, const Value& value) {
@@ -24,14 +28,20 @@ class Refusal {
     Refusal& elaboration(std::string_view term);
     Refusal& header(std::string_view term);
     Refusal& empty();
+    // The other one must not have a text of its own.
     Refusal& cause(const Refusal& other);
+    // Gives this text as it stands instead of the details. It need not be JSON.
+    Refusal& ownText(std::string text);
 
     int32_t code() const { return reason.number; }
-    std::string text() const { return details.text(reason.constant); }
+    std::string text() const { return whole ? *whole : details.text(reason.constant); }
 
   private:
     Code reason;
     Details details;
+    // What the constant of a status points to that is not the driver's own.
+    std::shared_ptr<const std::string> constant;
+    std::optional<std::string> whole;
 };
 
 }  // namespace simulator
