@@ -11,6 +11,7 @@
 #include "description/LiveFile.h"
 #include "description/PartsFile.h"
 #include "description/PropertyFile.h"
+#include "description/RegisterFile.h"
 #include "description/StartRefusal.h"
 #include "model/NameText.h"
 
@@ -89,7 +90,8 @@ Device& DeviceReader::read(const Node& node, Place place) {
             [&](const Node& element) { readNvmemArea(element, enumerations, chassis, device); });
     });
     node.ifPresent("registers", [&](const Node& blocks) {
-        blocks.forEachElement([&](const Node& block) { readRegisterBlock(block, device); });
+        blocks.forEachElement(
+            [&](const Node& block) { readRegisterBlock(block, chassis, device); });
     });
     node.ifPresent("modules", [&](const Node& modules) {
         if (device.category != chassisCategory || place == Place::slot) {

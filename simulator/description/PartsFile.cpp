@@ -1,5 +1,6 @@
 #include "description/PartsFile.h"
 
+#include "description/CommandFile.h"
 #include "model/NameText.h"
 
 namespace simulator {
@@ -19,8 +20,27 @@ int hexDigit(char c) {
     return c >= 'A' && c <= 'F' ? c - 'A' + 10 : -1;
 }
 
-// Reads the members "size" and "bytes": so many bytes, the first of them given in hexadecimal
-// digits and the others 0.
+bool readWritable(const Node& node) {
+    if (!node.has("access")) {
+        return true;
+    }
+    const Node access = node.member("access", "");
+    const std::string name = access.text();
+    access.expect(name == "ReadOnly" || name == "ReadWrite", "ReadOnly or ReadWrite");
+    return name == "ReadWrite";
+}
+
+}  // namespace
+
+std::string readName(const Node& node, std::string (*faultOf)(std::string_view)) {
+    const std::string name = node.text();
+    const std::string fault = faultOf(name);
+    if (!fault.empty()) {
+        node.fail("is not a name", fault);
+    }
+    return name;
+}
+
 std::vector<uint8_t> readBytes(const Node& node) {
     const Node sizeNode = node.member("size", "the number of bytes");
     std::vector<uint8_t> bytes(sizeNode.unsignedNumber(1, mostBytes));
@@ -41,72 +61,6 @@ std::vector<uint8_t> readBytes(const Node& node) {
     return bytes;
 }
 
-bool readWritable(const Node& node) {
-    if (!node.has("access")) {
-        return true;
-    }
-    const Node access = node.member("access", "");
-    const std::string name = access.text();
-    access.expect(name == "ReadOnly" || name == "ReadWrite", "ReadOnly or ReadWrite");
-    return name == "ReadWrite";
-}
-
-const Property& effectTarget(const Node& node, const std::string& name,
-                             const PropertyStore& properties) {
-    const Property* property = properties.find(name);
-    if (property == nullptr) {
-        node.fail("is not a stored property of the resource",
-                  "a command changes properties of its own resource");
-    }
-    return *property;
-}
-
-void readEffects(const Node& node, CommandEffect::Action action, const PropertyStore& properties,
-                 Command& command) {
-    node.forEachMember([&](const std::string& name, const Node& value) {
-        const PropertyDefinition& definition = *effectTarget(value, name, properties).definition;
-        if (action == CommandEffect::Action::set) {
-            command.effects.push_back({action, name, readValue(definition, value)});
-            return;
-        }
-        if (isArray(definition.type) || definition.type == DataType::text ||
-            definition.type == DataType::boolean) {
-            value.fail("cannot be added to", "only single numbers can");
-        }
-        PropertyDefinition number;
-        number.type = definition.type;
-        command.effects.push_back({action, name, readValue(number, value)});
-    });
-}
-
-Command readCommand(const std::string& name, const Node& node, const PropertyStore& properties) {
-    node.expectMembers({"description", "document", "seconds", "resets", "sets", "adds"});
-    Command command;
-    command.name = name;
-    node.ifPresent("description", [&](const Node& text) { command.description = text.text(); });
-    node.ifPresent("document", [&](const Node& text) { command.document = text.text(); });
-    node.ifPresent("seconds", [&](const Node& time) { command.seconds = time.seconds(); });
-    node.ifPresent("resets", [&](const Node& resets) { command.resets = resets.flag(); });
-    node.ifPresent("sets", [&](const Node& effects) {
-        readEffects(effects, CommandEffect::Action::set, properties, command);
-    });
-    node.ifPresent("adds", [&](const Node& effects) {
-        readEffects(effects, CommandEffect::Action::add, properties, command);
-    });
-    return command;
-}
-
-}  // namespace
-
-std::string readName(const Node& node, std::string (*faultOf)(std::string_view)) {
-    const std::string name = node.text();
-    const std::string fault = faultOf(name);
-    if (!fault.empty()) {
-        node.fail("is not a name", fault);
-    }
-    return name;
-}
-
 void readResource(const Node& node, Category category, const Chassis& chassis,
                   const Enumerations& enumerations, Resource& resource) {
     if (node.has("values")) {
@@ -121,7 +75,7 @@ void readResource(const Node& node, Category category, const Chassis& chassis,
     });
     node.ifPresent("commands", [&](const Node& commands) {
         commands.forEachMember([&](const std::string& name, const Node& entry) {
-            resource.commands.push_back(readCommand(name, entry, resource.properties));
+            resource.commands.push_back(readCommand(name, entry, resource, enumerations));
         });
     });
 }
@@ -164,19 +118,6 @@ void readNvmemArea(const Node& node, const Enumerations& enumerations, Chassis& 
     });
     area.memory = NvmemMemory(readBytes(node), std::move(guard));
     readResource(node, Category::nvmemArea, chassis, enumerations, area);
-}
-
-void readRegisterBlock(const Node& node, Device& device) {
-    node.expectMembers({"address", "size", "bytes", "access"});
-    RegisterBlock block;
-    block.address = node.member("address", "the first address").unsignedNumber(0, UINT32_MAX);
-    block.writable = readWritable(node);
-    block.initial = readBytes(node);
-    block.bytes = block.initial;
-    if (!device.registers.add(std::move(block))) {
-        node.fail("overlaps other registers or the end of the addresses",
-                  "each address may stand for one register");
-    }
 }
 
 }  // namespace simulator

@@ -16,8 +16,10 @@ void readPhysChans(const Node& node, const Enumerations& enumerations, Chassis& 
                    Device& device);
 void readNvmemArea(const Node& node, const Enumerations& enumerations, Chassis& chassis,
                    Device& device);
-void readRegisterBlock(const Node& node, Device& device);
 
+// Reads the members "size" and "bytes": so many bytes, the first of them given in hexadecimal
+// digits and the others 0.
+std::vector<uint8_t> readBytes(const Node& node);
 // Reads a text that can serve as a name; `faultOf` says why not.
 std::string readName(const Node& node, std::string (*faultOf)(std::string_view));
 

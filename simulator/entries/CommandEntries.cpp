@@ -2,15 +2,11 @@
 
 #include "entries/Attributes.h"
 #include "entries/TypedValues.h"
+#include "sessions/CommandRun.h"
 
 using namespace simulator;
 
 namespace {
-
-struct Task {
-    Resource* resource;
-    const Command* command;
-};
 
 // One task for each resource, however often it is named.
 std::vector<Task> findTasks(const Resolver& resolver, std::string_view resources,
@@ -19,7 +15,7 @@ std::vector<Task> findTasks(const Resolver& resolver, std::string_view resources
     expectSome(found);
     std::vector<Task> tasks;
     for (Resource* resource : found) {
-        const Command* known = resource->command(command);
+        Command* known = resource->command(command);
         if (known == nullptr) {
             throw Refusal(code::unknownCommand)
                 .usage(tag::command, command)
@@ -51,14 +47,6 @@ class Occupation {
     const std::vector<Task>& tasks;
 };
 
-void expectReady(const Task& task, const Reservations& reservations,
-                 nQITRMCAPI100_Session session) {
-    reservations.expectWritable(session, *task.resource->device);
-    if (task.resource->busy) {
-        throw Refusal(code::resourceBusy).usage(tag::resource, task.resource->fullName());
-    }
-}
-
 // Lets the time of the commands pass; they run side by side.
 void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Session session,
                Waits& waits, std::unique_lock<std::mutex>& lock) {
@@ -73,16 +61,6 @@ void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Ses
         throw Refusal(code::commandTimedOut)
             .usage(tag::command, tasks.front().command->name)
             .usage(tag::timeout, numberText(timeout));
-    }
-}
-
-// Lets what moves react.
-void noteOutcome(const Task& task, Simulator& simulator) {
-    Life& life = simulator.chassis->life;
-    if (task.command->resets) {
-        life.restart(*task.resource, simulator.clock.now());
-    } else {
-        life.noteChange(*task.resource, simulator.clock.now());
     }
 }
 
@@ -104,13 +82,12 @@ void nQITRMCAPI100_executeGenericCommand(nQITRMCAPI100_Session session, const ch
                                      required(command, "command"));
         const double patience = checkedTimeout(timeout);
         for (const Task& task : tasks) {
-            expectReady(task, simulator.reservations, session);
+            expectReady(*task.resource, simulator, session);
         }
         const Occupation occupation(tasks);
         spendTime(tasks, patience, session, simulator.waits, lock);
-        for (const Task& task : tasks) {
-            carryOut(*task.command, task.resource->properties);
-            noteOutcome(task, simulator);
+        if (const Refusal* warning = finish(tasks, simulator)) {
+            report(*warning, *status);
         }
     });
 }

@@ -1,4 +1,5 @@
 #include "entries/Border.h"
+#include "sessions/RegisterDesk.h"
 
 using namespace simulator;
 
@@ -16,8 +17,9 @@ void readRegister(const char* function, nQITRMCAPI100_Session session, const cha
             .out("value", value);
     };
     withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
-        const Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
-        *value = static_cast<Number>(found.registers.read(address, sizeof(Number)));
+        Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
+        RegisterDesk desk(simulator, owner);
+        *value = static_cast<Number>(desk.read(found, address, sizeof(Number)));
     });
 }
 
@@ -33,8 +35,10 @@ void writeRegister(const char* function, nQITRMCAPI100_Session session, const ch
     };
     withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
-        simulator.reservations.expectWritable(session, found);
-        found.registers.write(address, sizeof(Number), value);
+        RegisterDesk desk(simulator, owner);
+        if (const Refusal* warning = desk.write(found, address, sizeof(Number), value)) {
+            report(*warning, *status);
+        }
     });
 }
 

@@ -9,8 +9,8 @@ std::string Resource::fullName() const {
     return kind == Kind::device ? name : device->name + "/" + name;
 }
 
-const Command* Resource::command(std::string_view commandName) const {
-    for (const Command& command : commands) {
+Command* Resource::command(std::string_view commandName) {
+    for (Command& command : commands) {
         if (command.name == commandName) {
             return &command;
         }

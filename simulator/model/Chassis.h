@@ -30,7 +30,7 @@ struct Resource {
     // "Mod1" for a device, "Mod1/ch0" for what belongs to one.
     std::string fullName() const;
     // Returns null when there is no such command.
-    const Command* command(std::string_view commandName) const;
+    Command* command(std::string_view commandName);
 
     Kind kind;
     // The part of the name behind the slash, or the whole name of a device.

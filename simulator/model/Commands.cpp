@@ -1,6 +1,7 @@
 #include "model/Commands.h"
 
 #include <type_traits>
+#include <utility>
 
 namespace simulator {
 
@@ -31,16 +32,37 @@ void addNumber(Elements& value, const Elements& added) {
 
 }  // namespace
 
-void carryOut(const Command& command, PropertyStore& properties) {
+PropertyChanges::Change& PropertyChanges::of(Property& property) {
+    const auto found = changes.find(&property);
+    return found != changes.end()
+               ? found->second
+               : changes.emplace(&property, Change{property.value, false}).first->second;
+}
+
+void PropertyChanges::add(const Command& command, PropertyStore& own, PropertyStore& device) {
     if (command.resets) {
-        properties.reset();
+        own.forEach([&](Property& property) {
+            Change& change = of(property);
+            change.value = property.initial;
+            change.dropsPending = true;
+        });
     }
     for (const CommandEffect& effect : command.effects) {
-        Property& property = *properties.find(effect.property);
+        PropertyStore& store = effect.owner == CommandEffect::Owner::device ? device : own;
+        Change& change = of(*store.find(effect.property));
         if (effect.action == CommandEffect::Action::add) {
-            addNumber(property.value, effect.value);
+            addNumber(change.value, effect.value);
         } else {
-            property.value = effect.value;
+            change.value = effect.value;
+        }
+    }
+}
+
+void PropertyChanges::carryOut() noexcept {
+    for (auto& [property, change] : changes) {
+        property->value = std::move(change.value);
+        if (change.dropsPending) {
+            property->pending.reset();
         }
     }
 }

@@ -1,20 +1,43 @@
 #pragma once
 
+#include <cstdint>
+#include <map>
+#include <optional>
 #include <string>
 #include <vector>
 
 #include "model/Properties.h"
+#include "status/Refusal.h"
 
 namespace simulator {
 
-// What a command does to one property of its resource when it is through.
+// What a command does to one property when it is through.
 struct CommandEffect {
     enum class Action { set, add };
+    // Whose property it is.
+    enum class Owner { resource, device };
 
     Action action;
+    Owner owner;
     std::string property;
     // The new value, or one number to be added to a scalar.
     Elements value;
+};
+
+// When a command gives a status of its own. All of the conditions must hold.
+struct CommandFailure {
+    struct State {
+        // A stored property of the resource, and the value it must have.
+        std::string property;
+        Elements value;
+    };
+
+    // A failure leaves the command without effect; a warning, with a code above 0, does not.
+    Refusal status;
+    std::optional<State> when{};
+    double probability = 1.0;
+    // Only executions whose number is a multiple of this, which is at least 1.
+    uint32_t every = 1;
 };
 
 struct Command {
@@ -26,9 +49,31 @@ struct Command {
     // Puts the properties of the resource into their state after power-on first.
     bool resets = false;
     std::vector<CommandEffect> effects;
+    std::optional<CommandFailure> fails;
+    // Tells this command of this resource from all others when chance decides.
+    uint64_t place = 0;
+    // How often it came to the end of its time. A reset does not change it.
+    uint64_t executions = 0;
 };
 
-// Does to the properties of a resource what the command is for.
-void carryOut(const Command& command, PropertyStore& properties);
+// What commands are going to do to properties. Everything that may run out of memory is done while
+// it is prepared. The properties must stay where they are.
+class PropertyChanges {
+  public:
+    // Adds what a command does to the properties of its resource and of the resource's device, on
+    // top of what was added before.
+    void add(const Command& command, PropertyStore& own, PropertyStore& device);
+    void carryOut() noexcept;
+
+  private:
+    struct Change {
+        Elements value;
+        bool dropsPending = false;
+    };
+
+    Change& of(Property& property);
+
+    std::map<Property*, Change> changes;
+};
 
 }  // namespace simulator

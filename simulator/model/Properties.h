@@ -87,6 +87,14 @@ class PropertyStore {
     // The names of the properties that the driver does not define, in the order of addition.
     const std::vector<std::string>& ownNames() const { return own; }
 
+    // Calls visit(Property&) for each.
+    template <typename Visit>
+    void forEach(Visit visit) {
+        for (auto& [name, property] : all) {
+            visit(property);
+        }
+    }
+
     void reset();
     void commit();
     // Forgets what a session wrote and did not commit.

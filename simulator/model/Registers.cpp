@@ -1,5 +1,7 @@
 #include "model/Registers.h"
 
+#include <algorithm>
+
 #include "status/Refusal.h"
 
 namespace simulator {
@@ -14,28 +16,60 @@ uint64_t endOf(const RegisterBlock& block) {
 
 }  // namespace
 
+uint64_t RegisterBlock::read(uint32_t from, uint32_t count) {
+    const size_t offset = from - address;
+    uint64_t value = 0;
+    for (uint32_t i = count; i > 0; --i) {
+        uint8_t& byte = bytes[offset + i - 1];
+        value = value << 8 | byte;
+        if (clearsOnRead) {
+            byte = 0;
+        }
+    }
+    return value;
+}
+
+void RegisterBlock::write(uint32_t to, uint32_t count, uint64_t value) {
+    const size_t offset = to - address;
+    for (uint32_t i = 0; i < count; ++i) {
+        uint8_t& byte = bytes[offset + i];
+        const auto written = static_cast<uint8_t>(value >> (8 * i));
+        byte = onesClear ? static_cast<uint8_t>(byte & ~written) : written;
+    }
+}
+
+size_t Registers::firstBehind(uint32_t address) const {
+    const auto behind = std::upper_bound(
+        blocks.begin(), blocks.end(), address,
+        [](uint32_t left, const RegisterBlock& right) { return left < right.address; });
+    return static_cast<size_t>(behind - blocks.begin());
+}
+
 bool Registers::add(RegisterBlock block) {
     if (endOf(block) > addressCount) {
         return false;
     }
-    for (const RegisterBlock& other : blocks) {
-        if (block.address < endOf(other) && other.address < endOf(block)) {
-            return false;
-        }
+    const size_t next = firstBehind(block.address);
+    if ((next > 0 && endOf(blocks[next - 1]) > block.address) ||
+        (next < blocks.size() && endOf(block) > blocks[next].address)) {
+        return false;
     }
-    blocks.push_back(std::move(block));
+    blocks.insert(blocks.begin() + static_cast<std::ptrdiff_t>(next), std::move(block));
     return true;
 }
 
-size_t Registers::find(uint32_t address, uint32_t width) const {
+RegisterBlock& Registers::find(uint32_t address, uint32_t width) {
     if (address % width != 0) {
         throw Refusal(code::misalignedRegister)
             .usage(tag::registerAddress, address)
             .usage(tag::registerWidth, width * 8);
     }
-    for (size_t i = 0; i < blocks.size(); ++i) {
-        if (address >= blocks[i].address && uint64_t{address} + width <= endOf(blocks[i])) {
-            return i;
+    const size_t next = firstBehind(address);
+    if (next > 0) {
+        RegisterBlock& block = blocks[next - 1];
+        const bool fits = block.width == 0 || block.width == width;
+        if (fits && uint64_t{address} + width <= endOf(block)) {
+            return block;
         }
     }
     throw Refusal(code::unmappedRegister)
@@ -43,30 +77,9 @@ size_t Registers::find(uint32_t address, uint32_t width) const {
         .usage(tag::registerWidth, width * 8);
 }
 
-uint64_t Registers::read(uint32_t address, uint32_t width) const {
-    const RegisterBlock& block = blocks[find(address, width)];
-    const size_t offset = address - block.address;
-    uint64_t value = 0;
-    for (uint32_t i = width; i > 0; --i) {
-        value = value << 8 | block.bytes[offset + i - 1];
-    }
-    return value;
-}
-
-void Registers::write(uint32_t address, uint32_t width, uint64_t value) {
-    RegisterBlock& block = blocks[find(address, width)];
-    if (!block.writable) {
-        throw Refusal(code::readOnlyRegister).usage(tag::registerAddress, address);
-    }
-    const size_t offset = address - block.address;
-    for (uint32_t i = 0; i < width; ++i) {
-        block.bytes[offset + i] = static_cast<uint8_t>(value >> (8 * i));
-    }
-}
-
 void Registers::reset() {
     for (RegisterBlock& block : blocks) {
-        block.bytes = block.initial;
+        std::copy(block.initial.begin(), block.initial.end(), block.bytes.begin());
     }
 }
 

@@ -2,18 +2,40 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <string>
 #include <vector>
 
 namespace simulator {
 
+struct Property;
+struct Resource;
+
 // A run of registers of one device. Wider registers are the bytes of the narrower ones, the lowest
 // byte first.
 struct RegisterBlock {
-    uint32_t address;
-    bool writable;
+    uint32_t address = 0;
+    bool readable = true;
+    bool writable = true;
+    // The only width in bytes that is allowed, or 0 for any.
+    uint32_t width = 0;
     // After power-on, and now. Of the same length, which is at least 1.
     std::vector<uint8_t> initial;
     std::vector<uint8_t> bytes;
+    // Bytes become 0 when they have been read.
+    bool clearsOnRead = false;
+    // A bit written as 1 becomes 0, and one written as 0 stays.
+    bool onesClear = false;
+    // The command of the device that a write carries out. Empty for none.
+    std::string command;
+    // The stored property whose value stands here instead of `bytes`, which then give no more than
+    // the size, and whose it is. Null for none.
+    Resource* owner = nullptr;
+    Property* property = nullptr;
+
+    uint32_t size() const { return static_cast<uint32_t>(bytes.size()); }
+    // Move width bytes (1, 2, 4 or 8) that lie in the block, with what this does to them.
+    uint64_t read(uint32_t from, uint32_t count);
+    void write(uint32_t to, uint32_t count, uint64_t value);
 };
 
 // The registers of one device. An access must be aligned to its width and lie in one block.
@@ -22,16 +44,17 @@ class Registers {
     // Adds a block. Returns false when it would overlap another or pass the end of the addresses.
     bool add(RegisterBlock block);
 
-    // Move width bytes (1, 2, 4 or 8). Refuse with unmappedRegister, misalignedRegister and
-    // readOnlyRegister.
-    uint64_t read(uint32_t address, uint32_t width) const;
-    void write(uint32_t address, uint32_t width, uint64_t value);
+    // The block in which an access of width bytes (1, 2, 4 or 8) lies. Refuses with
+    // misalignedRegister and unmappedRegister.
+    RegisterBlock& find(uint32_t address, uint32_t width);
 
     void reset();
 
   private:
-    size_t find(uint32_t address, uint32_t width) const;
+    // The first block behind an address.
+    size_t firstBehind(uint32_t address) const;
 
+    // In the order of their addresses.
     std::vector<RegisterBlock> blocks;
 };
 

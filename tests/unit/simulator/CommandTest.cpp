@@ -4,18 +4,13 @@ using namespace drivertest;
 
 namespace {
 
-Outcome execute(Handle session, const char* resources, const char* command, double timeout) {
-    Status status;
-    nQITRMCAPI100_executeGenericCommand(session, resources, command, timeout, &status);
-    return {status.code, status.text()};
-}
-
 using CommandTest = BenchTest;
 
 TEST_F(CommandTest, ResourcesListTheirCommands) {
     EXPECT_EQ(getTexts(session, "Mod1", "Dev.Commands"),
               (Names{"DMM.SelfTest", "DMM.Trigger", "DMM.Calibrate", "DMM.Defaults"}));
-    EXPECT_EQ(getTexts(session, "Mod2/ch0", "PhysChan.Commands"), (Names{"PSU.On", "PSU.Off"}));
+    EXPECT_EQ(getTexts(session, "Mod2/ch0", "PhysChan.Commands"),
+              (Names{"PSU.On", "PSU.Off", "PSU.Calibrate"}));
     EXPECT_EQ(getTexts(session, "Mod4/ch0", "PhysChan.Commands"), Names());
 }
 

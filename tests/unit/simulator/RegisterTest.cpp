@@ -1,47 +1,10 @@
-#include "Values.h"
+#include "Registers.h"
 
 using namespace drivertest;
 
 namespace {
 
-template <typename Number>
-Answer<Number> read(void (*function)(Handle, const char*, uint32_t, Number*, qierr_Status*),
-                    Handle session, const char* device, uint32_t address) {
-    Answer<Number> answer;
-    answer.value = 99;
-    Status status;
-    function(session, device, address, &answer.value, &status);
-    answer.code = status.code;
-    answer.text = status.text();
-    return answer;
-}
-
-template <typename Number>
-int32_t write(void (*function)(Handle, const char*, uint32_t, Number, qierr_Status*),
-              Handle session, const char* device, uint32_t address, Number value) {
-    Status status;
-    function(session, device, address, value, &status);
-    return status.code;
-}
-
-constexpr auto read8 = nQITRMCAPI100_readRegisterUInt8;
-constexpr auto read16 = nQITRMCAPI100_readRegisterUInt16;
-constexpr auto read32 = nQITRMCAPI100_readRegisterUInt32;
-constexpr auto read64 = nQITRMCAPI100_readRegisterUInt64;
-constexpr auto write8 = nQITRMCAPI100_writeRegisterUInt8;
-constexpr auto write16 = nQITRMCAPI100_writeRegisterUInt16;
-constexpr auto write32 = nQITRMCAPI100_writeRegisterUInt32;
-constexpr auto write64 = nQITRMCAPI100_writeRegisterUInt64;
-
 using RegisterTest = BenchTest;
-
-std::string where(uint32_t address, uint32_t bits) {
-    return "{\"type\":\"usage\",\"usage\":\"kUsageTypeRegisterAddress\",\"value\":" +
-           std::to_string(address) +
-           ",\"value_type\":\"uint32_t\"},{\"type\":\"usage\",\"usage\":"
-           "\"kUsageTypeRegisterWidth\",\"value\":" +
-           std::to_string(bits) + ",\"value_type\":\"uint32_t\"}";
-}
 
 // The identification of Mod1 is the bytes 4d 4f 44 31 00 51 10 0c from address 0.
 TEST_F(RegisterTest, WiderRegistersAreTheBytesOfNarrowerOnes) {

@@ -137,6 +137,12 @@ constexpr ArraySetter<uint32_t> setUInt32s = nQITRMCAPI100_setGenericPropertyUIn
 constexpr ArraySetter<uint64_t> setUInt64s = nQITRMCAPI100_setGenericPropertyUInt64Array;
 constexpr ArraySetter<const char*> setTexts = nQITRMCAPI100_setGenericPropertyStringArray;
 
+inline Outcome execute(Handle session, const char* resources, const char* command, double timeout) {
+    Status status;
+    nQITRMCAPI100_executeGenericCommand(session, resources, command, timeout, &status);
+    return {status.code, status.text()};
+}
+
 // Puts devices back to their state after power-on.
 inline int32_t resetDevices(Handle session, const char* devices) {
     Status status;

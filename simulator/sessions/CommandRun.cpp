@@ -1,0 +1,85 @@
+#include "sessions/CommandRun.h"
+
+#include "live/Maths.h"
+
+namespace simulator {
+
+namespace {
+
+bool isInState(const Resource& resource, const CommandFailure::State& state,
+               const Simulator& simulator) {
+    const Property& property = *resource.properties.find(state.property);
+    return simulator.chassis->life.valueAt(property, simulator.clock.now()) == state.value;
+}
+
+// From 0 to below 1, the same in every run: the seed chooses the sequence, and the place tells
+// commands apart.
+double chance(uint64_t seed, uint64_t place, uint64_t number) {
+    return uniform(mixed(mixed(mixed(seed) + place) + number));
+}
+
+// The status that a command gives at the end of its time, or null.
+const Refusal* outcome(const Task& task, const Simulator& simulator) {
+    const Command& command = *task.command;
+    const uint64_t number = command.executions + 1;
+    if (!command.fails || number % command.fails->every != 0 ||
+        chance(simulator.chassis->life.seed, command.place, number) >= command.fails->probability) {
+        return nullptr;
+    }
+    const auto& when = command.fails->when;
+    const bool happens = !when || isInState(*task.resource, *when, simulator);
+    return happens ? &command.fails->status : nullptr;
+}
+
+// Lets what moves react.
+void noteOutcome(const Task& task, Simulator& simulator) noexcept {
+    Life& life = simulator.chassis->life;
+    const int64_t now = simulator.clock.now();
+    if (task.command->resets) {
+        life.restart(*task.resource, now);
+    } else {
+        life.noteChange(*task.resource, now);
+    }
+    if (task.resource != task.resource->device) {
+        life.noteChange(*task.resource->device, now);
+    }
+}
+
+void countExecutions(const std::vector<Task>& tasks) noexcept {
+    for (const Task& task : tasks) {
+        ++task.command->executions;
+    }
+}
+
+}  // namespace
+
+void expectReady(const Resource& resource, const Simulator& simulator,
+                 nQITRMCAPI100_Session session) {
+    simulator.reservations.expectWritable(session, *resource.device);
+    if (resource.busy) {
+        throw Refusal(code::resourceBusy).usage(tag::resource, resource.fullName());
+    }
+}
+
+const Refusal* finish(const std::vector<Task>& tasks, Simulator& simulator) {
+    PropertyChanges changes;
+    const Refusal* warning = nullptr;
+    for (const Task& task : tasks) {
+        const Refusal* status = outcome(task, simulator);
+        if (status != nullptr && status->code() < 0) {
+            Refusal failure = *status;
+            countExecutions(tasks);
+            throw failure;
+        }
+        warning = warning != nullptr ? warning : status;
+        changes.add(*task.command, task.resource->properties, task.resource->device->properties);
+    }
+    countExecutions(tasks);
+    changes.carryOut();
+    for (const Task& task : tasks) {
+        noteOutcome(task, simulator);
+    }
+    return warning;
+}
+
+}  // namespace simulator
