@@ -211,6 +211,87 @@ TEST(MemoryTest, SwitchingOnWhatIsFollowed) {
     EXPECT_EQ(resetDevices(session, "Mod2"), 0);
 }
 
+// Reads a property of a bench's own with all the memory it wants.
+template <typename Number>
+Number valueOf(Getter<Number> getter, Handle session, const char* resource, const char* property) {
+    allowed = -1;
+    return get(getter, session, resource, property).value;
+}
+
+TEST(MemoryTest, ARegisterRunsItsCommandOrIsNotWritten) {
+    Session session("Mod1");
+    uint64_t count = 0;
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_writeRegisterUInt32(session, "Mod1", 1028, 1, status);
+                         count += status->code == 0 ? 1 : 0;
+                         EXPECT_EQ(valueOf(getUInt64, session, "Mod1", "DMM.TriggerCount"), count);
+                     }),
+              0);
+    EXPECT_EQ(resetDevices(session, "Mod1"), 0);
+}
+
+TEST(MemoryTest, ARegisterWritesItsPropertyOrNothing) {
+    Session session("Mod2");
+    constexpr uint64_t two = 0x4000000000000000;
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_writeRegisterUInt64(session, "Mod2", 1032, two, status);
+                         EXPECT_EQ(valueOf(getDouble, session, "Mod2/ch1", "PSU.Voltage"),
+                                   status->code == 0 ? 2.0 : 0.0);
+                     }),
+              0);
+    EXPECT_EQ(resetDevices(session, "Mod2"), 0);
+}
+
+TEST(MemoryTest, ReadingARegisterThatShowsAProperty) {
+    Session session("Mod1");
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         uint64_t value = 9;
+                         nQITRMCAPI100_readRegisterUInt64(session, "Mod1", 1032, &value, status);
+                         EXPECT_EQ(value, 0u);
+                     }),
+              0);
+}
+
+TEST(MemoryTest, ACommandActsOnAllChannelsOrNone) {
+    Session session("Mod2");
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_executeGenericCommand(session, "Mod2/ch0:1", "PSU.On", 0.0,
+                                                             status);
+                         const uint8_t on = status->code == 0 ? 1 : 0;
+                         EXPECT_EQ(valueOf(getBool, session, "Mod2/ch0", "PSU.OutputEnabled"), on);
+                         EXPECT_EQ(valueOf(getBool, session, "Mod2/ch1", "PSU.OutputEnabled"), on);
+                     }),
+              0);
+    EXPECT_GT(starve(-250936,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_executeGenericCommand(session, "Mod2/ch0:1", "PSU.Calibrate",
+                                                             1.0, status);
+                     }),
+              0);
+    EXPECT_EQ(resetDevices(session, "Mod2"), 0);
+}
+
+TEST(MemoryTest, AResettingCommandResetsEverythingOrNothing) {
+    Session session("Mod1");
+    EXPECT_EQ(set(setDouble, session, "Mod1", "DMM.Range", 1.0).code, 0);
+    EXPECT_EQ(set(setText, session, "Mod1", "Dev.Comment", "a comment that is long enough").code,
+              0);
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         nQITRMCAPI100_executeGenericCommand(session, "Mod1", "DMM.Defaults", 0.0,
+                                                             status);
+                         EXPECT_EQ(valueOf(getDouble, session, "Mod1", "DMM.Range"),
+                                   status->code == 0 ? 10.0 : 1.0);
+                         EXPECT_EQ(getText(session, "Mod1", "Dev.Comment").value.empty(),
+                                   status->code == 0);
+                     }),
+              0);
+}
+
 TEST(MemoryTest, OpeningAProperty) {
     Session session;
     EXPECT_GT(starve(0,

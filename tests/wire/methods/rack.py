@@ -1,7 +1,7 @@
 """A chassis that shows what the simulator's own one lacks.
 
 Unit1, Unit2  properties of every type without limits, on the device and on the channels ch0 to ch3;
-              registers at both ends of the addresses; NVMEM areas of 1 byte, of 1 MiB and guarded
+              registers at both ends of the addresses and such that do something; NVMEM areas of 1 byte, of 1 MiB and guarded
               in every way. Unit2 has no serial number.
 Crate         a chassis whose modules stand out of order: Four in slot 4, then One in slot 1, which
               is a chassis itself, then Last in slot 64
@@ -54,6 +54,11 @@ UNIT = {
     "registers": [
         {"address": 0, "size": 16},
         {"address": 1024, "size": 8, "access": "ReadOnly", "bytes": "0123456789abcdef"},
+        {"address": 3072, "size": 8, "access": "WriteOnly"},
+        {"address": 3080, "size": 4, "width": 32, "runs": "Unit.Bare"},
+        {"address": 3084, "size": 4, "shows": "Info.Mode"},
+        {"address": 3088, "size": 8, "shows": "Info.Limited"},
+        {"address": 3096, "size": 8, "shows": "Info.Plain"},
         {"address": 4294967288, "size": 8},
     ],
     "nvmem_areas": [

@@ -190,6 +190,16 @@ def test_an_abort_ends_the_waits_of_its_own_session_only(session, running):
 
 
 @pytest.mark.concurrent
+def test_a_register_starts_no_command_of_a_device_that_is_busy(session, running):
+    waiting, busy = running
+    register = '"device":"Unit1","address":3080,"size":32,"data":1'
+    assert session.ask("writeRegister", register) == BUSY
+    assert session.client.ask_whole(busy.body("abortSession")) == DONE
+    assert waiting.receive_whole() == ABORTED
+    assert session.ask("writeRegister", register) == result_response('{"next_address":3081}')
+
+
+@pytest.mark.concurrent
 def test_a_command_ends_with_its_session(rack_host, rack, session):
     with Client(rack_host) as waiting:
         busy = Session(waiting, waiting.open_session())

@@ -101,12 +101,16 @@ FAILURES = {
     "getCommandInformation": [*with_more(bad_names("device"), COMMAND), no_resource(COMMAND),
                               (-250975, f'"command":"No.Such",{ONE_UNIT}')],
     "readRegister": [*with_more([*bad_names("device"), (-250966, BOTH_UNITS)], REGISTER),
-                     no_resource(REGISTER), (-250978, f'{ONE_UNIT},"address":16,"size":8'),
+                     no_resource(REGISTER), (-250935, f'{ONE_UNIT},"address":3072,"size":8'),
+                     (-250978, f'{ONE_UNIT},"address":16,"size":8'),
                      (-250979, f'{ONE_UNIT},"address":1,"size":16')],
     "writeRegister": [*with_more([*bad_names("device"), (-250966, BOTH_UNITS)],
                                  f'{REGISTER},"data":1'), no_resource(REGISTER, '"data":1'),
                       (-250811, f'{ONE_UNIT},{REGISTER},"data":1', TAKEN),
                       (-250860, f'{ONE_UNIT},{REGISTER},"data":65536'),
+                      (-250968, f'{ONE_UNIT},"address":3096,"size":64,"data":0'),
+                      (-250970, f'{ONE_UNIT},"address":3084,"size":32,"data":4'),
+                      (-250971, f'{ONE_UNIT},"address":3088,"size":64,"data":0'),
                       (-250972, f'{ONE_UNIT},{REGISTER},"data":1', READING),
                       (-250978, f'{ONE_UNIT},"address":16,"size":8,"data":1'),
                       (-250979, f'{ONE_UNIT},"address":1,"size":16,"data":1'),
@@ -148,7 +152,7 @@ FAILURES = {
 # What takes two connections or a hundred sessions, and has a test of its own; and -250987, which would
 # take ten seconds and has one with the driver alone.
 PROVOKED_ELSEWHERE = {"initializeSession": {-250901}, "connectToDevices": {-250963, -250987},
-                      "executeCommand": {-250963, -250977}}
+                      "executeCommand": {-250963, -250977}, "writeRegister": {-250977}}
 
 
 @pytest.mark.parametrize("method, code, params, setting", [

@@ -7,6 +7,7 @@ What the first one finds is compared with the description that the simulator is 
 import itertools
 import json
 import pathlib
+import struct
 
 import pytest
 
@@ -159,14 +160,39 @@ def explore_areas(walker, device):
             "data": list(content), "next_address": 1}
 
 
+# How a value of each type stands in registers of eight and of four bytes.
+PACKED = {("Double", 8): "<d", ("UInt64", 8): "<Q", ("Int32", 4): "<i"}
+
+
+def content_of(block, device):
+    """The bytes of a register block after power-on."""
+    if "shows" not in block:
+        return bytes.fromhex(block.get("bytes", "")).ljust(block["size"], b"\0")
+    shown = block["shows"]
+    owner = device if isinstance(shown, str) else device["channels"]
+    about = owner["properties"][shown if isinstance(shown, str) else shown["property"]]
+    return struct.pack(PACKED[about["type"], block["size"]], about["value"])
+
+
 def explore_registers(walker, device):
     for block in device.get("registers", []):
-        content = bytes.fromhex(block.get("bytes", "")).ljust(block["size"], b"\0")
-        for offset in range(0, block["size"], 8):
+        content = content_of(block, device)
+        width = min(8, block["size"])
+        for offset in range(0, block["size"], width):
             address = block["address"] + offset
-            assert walker.do("readRegister", device=device["name"], address=address, size=64) == {
-                "next_address": address + 1,
-                "data": int.from_bytes(content[offset:offset + 8], "little")}
+
+            def read():
+                return walker.do("readRegister", device=device["name"], address=address,
+                                 size=8 * width)
+
+            if block.get("access") == "WriteOnly":
+                with pytest.raises(Failed) as refused:
+                    read()
+                assert refused.value.args[0]["data"]["qitrmc_code"] == -250935
+            else:
+                assert read() == {
+                    "next_address": address + 1,
+                    "data": int.from_bytes(content[offset:offset + width], "little")}
 
 
 @pytest.mark.parametrize("device", described_devices(), ids=lambda device: device["name"])
