@@ -140,6 +140,9 @@ void addToCatalogue(const std::string& name, const Node& node, Category category
     if (definition->needsCommit && !ofResource) {
         node.fail("can never be committed", "only properties of resources are committed");
     }
+    if (definition->lasting && category == Category::session) {
+        node.fail("can never last", "sessions end, and their properties with them");
+    }
     catalogue.add(category, definition);
 }
 
@@ -178,14 +181,15 @@ Elements readValue(const PropertyDefinition& definition, const Node& node) {
 
 PropertyDefinition readDefinition(const std::string& name, const Node& node,
                                   const Enumerations& enumerations) {
-    node.expectMembers({"type", "access", "computed", "needs_commit", "description", "document",
-                        "unit", "min", "max", "enum", "value"});
+    node.expectMembers({"type", "access", "computed", "needs_commit", "lasting", "description",
+                        "document", "unit", "min", "max", "enum", "value"});
     PropertyDefinition definition;
     definition.name = name;
     definition.type = readType(node);
     definition.access = readAccess(node);
     node.ifPresent("computed", [&](const Node& flag) { definition.computed = flag.flag(); });
     node.ifPresent("needs_commit", [&](const Node& flag) { definition.needsCommit = flag.flag(); });
+    node.ifPresent("lasting", [&](const Node& flag) { definition.lasting = flag.flag(); });
     node.ifPresent("description", [&](const Node& text) { definition.description = text.text(); });
     node.ifPresent("document", [&](const Node& text) { definition.document = text.text(); });
     node.ifPresent("unit", [&](const Node& text) { definition.unit = text.text(); });

@@ -132,6 +132,8 @@ void nQITRMCAPI100_renameDevice(nQITRMCAPI100_Session session, const char* devic
         const std::string name(required(newName, "newName"));
         expectFreeName(*simulator.chassis, found, name);
         simulator.reservations.expectWritable(session, found);
-        simulator.chassis->rename(found, name);
+        Change change = simulator.lasting.change();
+        change.name(found, name, simulator.chassis->changes + 1);
+        simulator.chassis->rename(found, name, [&] { simulator.lasting.keep(change); });
     });
 }

@@ -89,6 +89,11 @@ void nQITRMCAPI100_commitNvmemGeneric(nQITRMCAPI100_Session session, const char*
         for (const NvmemArea* area : areas) {
             simulator.reservations.expectWritable(session, *area->device);
         }
+        Change change = simulator.lasting.change();
+        for (const NvmemArea* area : areas) {
+            change.content(*area);
+        }
+        simulator.lasting.keep(change);
         for (NvmemArea* area : areas) {
             area->memory.commit();
         }

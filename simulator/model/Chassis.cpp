@@ -9,6 +9,10 @@ std::string Resource::fullName() const {
     return kind == Kind::device ? name : device->name + "/" + name;
 }
 
+std::string Resource::describedName() const {
+    return kind == Kind::device ? device->firstName : device->firstName + "/" + name;
+}
+
 Command* Resource::command(std::string_view commandName) {
     for (Command& command : commands) {
         if (command.name == commandName) {
@@ -19,7 +23,9 @@ Command* Resource::command(std::string_view commandName) {
 }
 
 void Device::reset() {
-    forEachResource([](Resource& resource) { resource.properties.reset(); });
+    PropertyChanges changes;
+    forEachResource([&](Resource& resource) { changes.addReset(resource); });
+    changes.carryOut();
     for (const auto& area : nvmemAreas) {
         area->memory.drop();
     }
@@ -51,16 +57,27 @@ NvmemArea& Chassis::addNvmemArea(Device& device, const std::string& name) {
     return *device.nvmemAreas.back();
 }
 
-void Chassis::rename(Device& device, const std::string& newName) {
+void Chassis::rename(Device& device, const std::string& newName,
+                     const std::function<void()>& keep) {
     std::string name = newName;
-    const std::string folded = foldName(newName);
     const std::string old = foldName(device.name);
-    byName.emplace(folded, &device);
-    if (folded != old) {
-        byName.erase(old);
-    }
+    std::map<std::string, Device*, std::less<>> entry;
+    entry.emplace(foldName(newName), &device);
+    keep();
+    byName.erase(old);
+    byName.merge(entry);
     device.name.swap(name);
     ++changes;
+}
+
+void Chassis::rename(const std::map<Device*, std::string>& names) {
+    for (const auto& [device, name] : names) {
+        device->name = name;
+    }
+    byName.clear();
+    for (const auto& device : all) {
+        byName.emplace(foldName(device->name), device.get());
+    }
 }
 
 Device* Chassis::findDevice(std::string_view name) const {

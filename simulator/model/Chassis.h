@@ -1,6 +1,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <map>
 #include <memory>
 #include <string>
@@ -29,6 +30,8 @@ struct Resource {
 
     // "Mod1" for a device, "Mod1/ch0" for what belongs to one.
     std::string fullName() const;
+    // The same with the name that the description gives the device, which never changes.
+    std::string describedName() const;
     // Returns null when there is no such command.
     Command* command(std::string_view commandName);
 
@@ -52,8 +55,11 @@ struct NvmemArea : Resource {
 };
 
 struct Device : Resource {
-    explicit Device(std::string name) : Resource(Kind::device, std::move(name), *this) {}
+    explicit Device(const std::string& name)
+        : Resource(Kind::device, name, *this), firstName(name) {}
 
+    // The name in the description.
+    const std::string firstName;
     uint32_t slot = 0;
     int32_t category = 0;
     std::vector<std::unique_ptr<Resource>> physChans;
@@ -78,8 +84,8 @@ struct Device : Resource {
             visit(static_cast<Resource&>(*area));
         }
     }
-    // Puts everything but the names and the lasting content of the NVMEM areas into the state
-    // after power-on.
+    // Puts everything into the state after power-on, but what lasts: the names, the lasting
+    // properties and the committed content of the NVMEM areas.
     void reset();
     // Forgets what a session wrote to the device and its parts and did not commit.
     void dropPending(nQITRMCAPI100_Session session);
@@ -93,8 +99,11 @@ class Chassis {
     // Add a part to a device. The name must be free on that device.
     Resource& addPhysChan(Device& device, const std::string& name);
     NvmemArea& addNvmemArea(Device& device, const std::string& name);
-    // Gives a device a name that no other device has.
-    void rename(Device& device, const std::string& newName);
+    // Gives a device a name that no other device has. keep() is called when nothing else can fail
+    // any more; when it throws, nothing has changed.
+    void rename(Device& device, const std::string& newName, const std::function<void()>& keep);
+    // Gives devices names, after which no two have the same. This counts as no change.
+    void rename(const std::map<Device*, std::string>& names);
 
     // Return null when there is no such resource.
     Device* findDevice(std::string_view name) const;

@@ -3,6 +3,8 @@
 #include <type_traits>
 #include <utility>
 
+#include "model/Chassis.h"
+
 namespace simulator {
 
 namespace {
@@ -32,35 +34,45 @@ void addNumber(Elements& value, const Elements& added) {
 
 }  // namespace
 
-PropertyChanges::Change& PropertyChanges::of(Property& property) {
-    const auto found = changes.find(&property);
-    return found != changes.end()
-               ? found->second
-               : changes.emplace(&property, Change{property.value, false}).first->second;
+PropertyChanges::Change& PropertyChanges::of(const Resource& owner, Property& property) {
+    return changes.try_emplace(&property, Change{&owner, std::nullopt, false}).first->second;
 }
 
-void PropertyChanges::add(const Command& command, PropertyStore& own, PropertyStore& device) {
-    if (command.resets) {
-        own.forEach([&](Property& property) {
-            Change& change = of(property);
+void PropertyChanges::addReset(Resource& resource) {
+    resource.properties.forEach([&](Property& property) {
+        Change& change = of(resource, property);
+        change.dropsPending = true;
+        if (!property.definition->lasting) {
             change.value = property.initial;
-            change.dropsPending = true;
-        });
+        }
+    });
+}
+
+void PropertyChanges::add(const Command& command, Resource& resource) {
+    if (command.resets) {
+        addReset(resource);
     }
     for (const CommandEffect& effect : command.effects) {
-        PropertyStore& store = effect.owner == CommandEffect::Owner::device ? device : own;
-        Change& change = of(*store.find(effect.property));
-        if (effect.action == CommandEffect::Action::add) {
-            addNumber(change.value, effect.value);
-        } else {
+        Resource& owner =
+            effect.owner == CommandEffect::Owner::device ? *resource.device : resource;
+        Property& property = *owner.properties.find(effect.property);
+        Change& change = of(owner, property);
+        if (effect.action == CommandEffect::Action::set) {
             change.value = effect.value;
+            continue;
         }
+        if (!change.value) {
+            change.value = property.value;
+        }
+        addNumber(*change.value, effect.value);
     }
 }
 
 void PropertyChanges::carryOut() noexcept {
     for (auto& [property, change] : changes) {
-        property->value = std::move(change.value);
+        if (change.value) {
+            property->value = std::move(*change.value);
+        }
         if (change.dropsPending) {
             property->pending.reset();
         }

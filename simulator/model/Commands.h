@@ -11,6 +11,8 @@
 
 namespace simulator {
 
+struct Resource;
+
 // What a command does to one property when it is through.
 struct CommandEffect {
     enum class Action { set, add };
@@ -46,7 +48,7 @@ struct Command {
     std::string document;
     // How long it takes.
     double seconds = 0.0;
-    // Puts the properties of the resource into their state after power-on first.
+    // Resets the properties of the resource first, and forgets what nobody committed.
     bool resets = false;
     std::vector<CommandEffect> effects;
     std::optional<CommandFailure> fails;
@@ -62,16 +64,32 @@ class PropertyChanges {
   public:
     // Adds what a command does to the properties of its resource and of the resource's device, on
     // top of what was added before.
-    void add(const Command& command, PropertyStore& own, PropertyStore& device);
+    void add(const Command& command, Resource& resource);
+    // Adds a reset: the properties get their values after power-on, but for those that last, and
+    // what nobody committed is forgotten.
+    void addReset(Resource& resource);
+
+    // Calls visit(const Resource&, const PropertyDefinition&, const Elements&) for each property
+    // that gets a value.
+    template <typename Visit>
+    void forEachValue(Visit visit) const {
+        for (const auto& [property, change] : changes) {
+            if (change.value) {
+                visit(*change.owner, *property->definition, *change.value);
+            }
+        }
+    }
+
     void carryOut() noexcept;
 
   private:
     struct Change {
-        Elements value;
+        const Resource* owner;
+        std::optional<Elements> value;
         bool dropsPending = false;
     };
 
-    Change& of(Property& property);
+    Change& of(const Resource& owner, Property& property);
 
     std::map<Property*, Change> changes;
 };

@@ -17,8 +17,7 @@ void NvmemMemory::expectInside(uint32_t address, uint32_t count) const {
 
 void NvmemMemory::read(uint32_t address, uint8_t* buffer, uint32_t count) const {
     expectInside(address, count);
-    const std::vector<uint8_t>& content = pending ? pending->content : lasting;
-    std::copy_n(content.begin() + address, count, buffer);
+    std::copy_n(current().begin() + address, count, buffer);
 }
 
 void NvmemMemory::write(nQITRMCAPI100_Session session, uint32_t address, const uint8_t* bytes,

@@ -26,9 +26,15 @@ class NvmemMemory {
     NvmemMemory(std::vector<uint8_t> content, Guard guard)
         : lasting(std::move(content)), guard(std::move(guard)) {}
 
+    // Takes lasting content of the same size.
+    void restore(const std::vector<uint8_t>& content) { lasting = content; }
+
     uint32_t size() const { return static_cast<uint32_t>(lasting.size()); }
     bool hasPending() const { return pending.has_value(); }
     const Guard& guardian() const { return guard; }
+
+    // What is read: the lasting content with what was written since.
+    const std::vector<uint8_t>& current() const { return pending ? pending->content : lasting; }
 
     // Refuse with nvmemOutOfRange when the bytes do not lie in the area.
     void read(uint32_t address, uint8_t* buffer, uint32_t count) const;

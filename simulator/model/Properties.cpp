@@ -63,13 +63,6 @@ const Property* PropertyStore::find(std::string_view name) const {
     return found == all.end() ? nullptr : &found->second;
 }
 
-void PropertyStore::reset() {
-    for (auto& [name, property] : all) {
-        property.value = property.initial;
-        property.pending.reset();
-    }
-}
-
 void PropertyStore::commit() {
     for (auto& [name, property] : all) {
         if (property.pending) {

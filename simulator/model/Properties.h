@@ -41,6 +41,8 @@ struct PropertyDefinition {
     bool computed = false;
     // Written values take effect at a commit.
     bool needsCommit = false;
+    // The value outlasts resets and restarts; of a property that needs a commit, the committed one.
+    bool lasting = false;
     std::string description;
     std::string document;
     std::string unit;
@@ -66,7 +68,7 @@ struct Property {
     };
 
     DefinitionPointer definition;
-    // The value after power-on.
+    // The value after power-on, unless the property is a lasting one.
     Elements initial;
     Elements value;
     std::optional<Pending> pending;
@@ -87,15 +89,13 @@ class PropertyStore {
     // The names of the properties that the driver does not define, in the order of addition.
     const std::vector<std::string>& ownNames() const { return own; }
 
-    // Calls visit(Property&) for each.
+    // Calls visit(Property&) for each property.
     template <typename Visit>
     void forEach(Visit visit) {
         for (auto& [name, property] : all) {
             visit(property);
         }
     }
-
-    void reset();
     void commit();
     // Forgets what a session wrote and did not commit.
     void dropPending(nQITRMCAPI100_Session session);

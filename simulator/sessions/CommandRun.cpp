@@ -45,6 +45,15 @@ void noteOutcome(const Task& task, Simulator& simulator) noexcept {
     }
 }
 
+void keep(const PropertyChanges& changes, LastingState& lasting) {
+    Change change = lasting.change();
+    changes.forEachValue(
+        [&](const Resource& owner, const PropertyDefinition& definition, const Elements& value) {
+            change.property(&owner, definition, value);
+        });
+    lasting.keep(change);
+}
+
 void countExecutions(const std::vector<Task>& tasks) noexcept {
     for (const Task& task : tasks) {
         ++task.command->executions;
@@ -72,8 +81,9 @@ const Refusal* finish(const std::vector<Task>& tasks, Simulator& simulator) {
             throw failure;
         }
         warning = warning != nullptr ? warning : status;
-        changes.add(*task.command, task.resource->properties, task.resource->device->properties);
+        changes.add(*task.command, *task.resource);
     }
+    keep(changes, simulator.lasting);
     countExecutions(tasks);
     changes.carryOut();
     for (const Task& task : tasks) {

@@ -57,6 +57,18 @@ void expectType(const PropertyDefinition& definition, DataType type, size_t plac
     throw refusal;
 }
 
+// Calls visit(Resource&) for resources, and for all parts of the devices among them.
+template <typename Visit>
+void forEachPart(const std::vector<Resource*>& resources, Visit visit) {
+    for (Resource* resource : resources) {
+        if (resource->kind == Kind::device) {
+            resource->device->forEachResource(visit);
+        } else {
+            visit(*resource);
+        }
+    }
+}
+
 }  // namespace
 
 PropertyDesk::Place PropertyDesk::find(Category category, Resource* resource, PropertyStore& store,
@@ -152,6 +164,13 @@ void PropertyDesk::writeAll(const std::vector<Place>& places, DataType type,
         parts.push_back(places.size() > 1 ? elementAt(values, i) : values);
         expectAcceptable(places[i], parts.back());
     }
+    Change change = simulator.lasting.change();
+    for (size_t i = 0; i < places.size(); ++i) {
+        if (places[i].stored != nullptr && !places[i].definition->needsCommit) {
+            change.property(places[i].resource, *places[i].definition, parts[i]);
+        }
+    }
+    simulator.lasting.keep(change);
     for (size_t i = 0; i < places.size(); ++i) {
         if (places[i].stored == nullptr) {
             setDefaultResources(simulator.resolver(session), session, places[i].definition->name,
@@ -190,17 +209,19 @@ void PropertyDesk::commit(std::string_view resources) {
     for (const Resource* resource : found) {
         simulator.reservations.expectWritable(session.handle, *resource->device);
     }
-    for (Resource* resource : found) {
-        if (resource->kind == Kind::device) {
-            resource->device->forEachResource([&](Resource& part) {
-                part.properties.commit();
-                noteChange(&part);
-            });
-        } else {
-            resource->properties.commit();
-            noteChange(resource);
-        }
-    }
+    Change change = simulator.lasting.change();
+    forEachPart(found, [&](Resource& part) {
+        part.properties.forEach([&](const Property& property) {
+            if (property.pending) {
+                change.property(&part, *property.definition, property.pending->value);
+            }
+        });
+    });
+    simulator.lasting.keep(change);
+    forEachPart(found, [&](Resource& part) {
+        part.properties.commit();
+        noteChange(&part);
+    });
 }
 
 OpenProperty PropertyDesk::openDriverDefined(std::string_view name) {

@@ -38,10 +38,14 @@ Simulator& Simulator::instance() {
 
 Simulator::Simulator(std::unique_ptr<Chassis> loaded, const TimeScale& timeScale)
     : chassis(std::move(loaded)),
+      lasting(*chassis),
       clock(timeScale),
       waits(clock),
       sessions(chassis->firstSessionHandle, chassis->sessionProperties),
-      reservations(*chassis, waits) {}
+      reservations(*chassis, waits) {
+    // What follows a value that was restored has followed it long ago.
+    chassis->life.settle();
+}
 
 void Simulator::close(nQITRMCAPI100_Session session) {
     const auto isOfSession = [&](const auto& item) { return item.session == session; };

@@ -10,6 +10,7 @@
 #include "sessions/Resolver.h"
 #include "sessions/Sessions.h"
 #include "sessions/Waits.h"
+#include "state/LastingState.h"
 #include "trace/Trace.h"
 
 namespace simulator {
@@ -32,9 +33,11 @@ struct OpenCommand {
 // The chassis together with the state of all its users. There is one in the process, made at the
 // first use. Its parts are guarded by one mutex, which calls that wait give up.
 struct Simulator {
+    // Puts what lasts into the chassis.
     Simulator(std::unique_ptr<Chassis> loaded, const TimeScale& timeScale);
 
-    // The loaded simulator. Refuses with chassisNotLoaded when the chassis file is broken.
+    // The loaded simulator. Refuses with chassisNotLoaded when the chassis file is broken, and with
+    // stateNotUsable when the state folder is, or when another process has it.
     static Simulator& instance();
 
     Resolver resolver(const Session& session) const {
@@ -49,6 +52,7 @@ struct Simulator {
 
     std::mutex mutex;
     const std::unique_ptr<Chassis> chassis;
+    LastingState lasting;
     const Trace trace;
     Clock clock;
     Waits waits;

@@ -53,14 +53,23 @@ TEST_F(DeviceTest, ConnectionsNeedDevices) {
 
 TEST_F(DeviceTest, AResetPutsPropertiesOfAllPartsBack) {
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 5.0).code, 0);
-    EXPECT_EQ(set(setText, session, "Mod2", "Dev.Comment", "x").code, 0);
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.CurrentLimit", 1.0).code, 0);
-    EXPECT_EQ(resetDevices(session, "Mod2"), 0);
+    EXPECT_EQ(set(setDouble, session, "Mod1", "DMM.Range", 1.0).code, 0);
+    EXPECT_EQ(resetDevices(session, "Mod1,Mod2"), 0);
+    EXPECT_EQ(get(getDouble, session, "Mod1", "DMM.Range"), 10.0);
     EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.Voltage"), 0.0);
-    EXPECT_EQ(getText(session, "Mod2", "Dev.Comment"), std::string(""));
     Status status;
     nQITRMCAPI100_commitPropertiesGeneric(session, "Mod2", &status);
     EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.CurrentLimit"), 0.1);
+}
+
+TEST_F(DeviceTest, AResetLeavesTheTextsOfTheOwner) {
+    EXPECT_EQ(set(setText, session, "Mod2", "Dev.Comment", "lent").code, 0);
+    EXPECT_EQ(set(setText, session, "Mod2/ch0", "PhysChan.Comment", "worn").code, 0);
+    EXPECT_EQ(resetDevices(session, "Mod2"), 0);
+    EXPECT_EQ(getText(session, "Mod2", "Dev.Comment"), std::string("lent"));
+    EXPECT_EQ(getText(session, "Mod2/ch0", "PhysChan.Comment"), std::string("worn"));
+    EXPECT_EQ(set(setText, session, "Mod2/ch0", "PhysChan.Comment", "").code, 0);
 }
 
 TEST_F(DeviceTest, AResetNeedsDevicesThatMayBeWritten) {

@@ -150,12 +150,13 @@ inline int32_t resetDevices(Handle session, const char* devices) {
     return status.code;
 }
 
-// A test with a session on all modules, which leaves them as they are after power-on.
+// A test with a session on all modules, which leaves their properties as they are described.
 class BenchTest : public testing::Test {
   protected:
     ~BenchTest() override {
         session.reserve("Mod1,Mod2,Mod4,Mod5");
         EXPECT_EQ(resetDevices(session, "Bench,Mod1,Mod2,Mod4,Mod5"), 0);
+        setArray(setTexts, session, "Mod1,Mod2,Mod4,Mod5", "Dev.Comment", {"", "", "", ""});
     }
 
     Session session{"Mod1,Mod2,Mod4,Mod5"};

@@ -1,0 +1,198 @@
+#include "state/StateFolder.h"
+
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <array>
+#include <cerrno>
+#include <charconv>
+#include <cstdio>
+#include <cstring>
+#include <filesystem>
+
+#include "status/Refusal.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr const char* usableFolder = "QITRMC_SIM_STATE must name a folder that can be written";
+constexpr const char* lockName = "lock";
+// What is being written. Never read: a process that ends meanwhile leaves a part of a file here.
+constexpr const char* unfinishedName = "unfinished";
+constexpr std::string_view prefix = "change-";
+
+using FileName = std::array<char, 32>;
+
+FileName fileName(uint64_t generation) noexcept {
+    FileName name{};
+    char* const end = std::copy(prefix.begin(), prefix.end(), name.data());
+    std::to_chars(end, name.data() + name.size() - 1, generation);
+    return name;
+}
+
+// Returns 0 for the name of another file.
+uint64_t generationOf(const std::string& name) {
+    uint64_t generation = 0;
+    if (name.compare(0, prefix.size(), prefix) == 0) {
+        std::from_chars(name.data() + prefix.size(), name.data() + name.size(), generation);
+    }
+    return name == fileName(generation).data() ? generation : 0;
+}
+
+int openFolder(const std::string& path) {
+    return open(path.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC);
+}
+
+int makeFolder(const std::string& path) {
+    const int folder = openFolder(path);
+    if (folder >= 0 || errno != ENOENT) {
+        return folder;
+    }
+    std::error_code failure;
+    std::filesystem::create_directories(path, failure);
+    errno = failure.value();
+    return failure ? -1 : openFolder(path);
+}
+
+bool writeAll(int file, std::string_view content) {
+    while (!content.empty()) {
+        const ssize_t written = ::write(file, content.data(), content.size());
+        if (written < 0 && errno != EINTR) {
+            return false;
+        }
+        content.remove_prefix(written > 0 ? static_cast<size_t>(written) : 0);
+    }
+    return true;
+}
+
+bool writeFile(int folder, const char* name, std::string_view content) {
+    const Descriptor file(
+        openat(folder, name, O_WRONLY | O_CREAT | O_TRUNC | O_CLOEXEC | O_NOFOLLOW, 0666));
+    return file >= 0 && writeAll(file, content) && fsync(file) == 0;
+}
+
+[[noreturn]] void refuseWriting(const std::string& path, const std::string& reason) {
+    throw Refusal(code::stateNotWritten).usage(tag::fileName, path).usage(tag::explanation, reason);
+}
+
+}  // namespace
+
+Descriptor::~Descriptor() {
+    if (number >= 0) {
+        close(number);
+    }
+}
+
+StateFolder::StateFolder(const std::string& path)
+    : path(path),
+      owner(getpid()),
+      folder(makeFolder(path)),
+      lockFile(folder < 0 ? -1 : openat(folder, lockName, O_RDWR | O_CREAT | O_CLOEXEC, 0666)) {
+    if (lockFile < 0) {
+        throw StateFault{path, std::string("cannot be used: ") + std::strerror(errno),
+                         usableFolder};
+    }
+    lock();
+    unlinkat(folder, unfinishedName, 0);
+}
+
+void StateFolder::lock() const {
+    struct flock wanted = {};
+    wanted.l_type = F_WRLCK;
+    wanted.l_whence = SEEK_SET;
+    if (fcntl(lockFile, F_SETLK, &wanted) == 0) {
+        return;
+    }
+    if (errno != EACCES && errno != EAGAIN) {
+        throw StateFault{path, std::string("cannot be locked: ") + std::strerror(errno),
+                         usableFolder};
+    }
+    // The holder may have ended since, or live where its number means nothing here.
+    const bool known =
+        fcntl(lockFile, F_GETLK, &wanted) == 0 && wanted.l_type != F_UNLCK && wanted.l_pid > 0;
+    const std::string holder =
+        known ? "process " + std::to_string(wanted.l_pid) : "another process";
+    throw StateFault{path, "is in use by " + holder,
+                     "end that process, or name another folder in QITRMC_SIM_STATE"};
+}
+
+std::string StateFolder::filePath(uint64_t generation) const {
+    return path + "/" + fileName(generation).data();
+}
+
+std::vector<uint64_t> StateFolder::generations() const {
+    std::vector<uint64_t> found;
+    std::error_code failure;
+    for (std::filesystem::directory_iterator file(path, failure), end; !failure && file != end;
+         file.increment(failure)) {
+        const uint64_t generation = generationOf(file->path().filename().string());
+        if (generation != 0) {
+            found.push_back(generation);
+        }
+    }
+    if (failure) {
+        throw StateFault{path, "cannot be listed: " + failure.message(), usableFolder};
+    }
+    std::sort(found.begin(), found.end());
+    return found;
+}
+
+std::string StateFolder::read(uint64_t generation) const {
+    const auto refuse = [&] {
+        throw StateFault{filePath(generation),
+                         std::string("cannot be read: ") + std::strerror(errno),
+                         "must be a readable file"};
+    };
+    const Descriptor file(openat(folder, fileName(generation).data(), O_RDONLY | O_CLOEXEC));
+    struct stat facts = {};
+    if (file < 0 || fstat(file, &facts) != 0) {
+        refuse();
+    }
+    if (!S_ISREG(facts.st_mode)) {
+        errno = EINVAL;
+        refuse();
+    }
+    std::string content(static_cast<size_t>(facts.st_size), '\0');
+    size_t done = 0;
+    while (done < content.size()) {
+        const ssize_t count = ::read(file, content.data() + done, content.size() - done);
+        if (count == 0) {
+            break;
+        }
+        if (count < 0 && errno != EINTR) {
+            refuse();
+        }
+        done += count > 0 ? static_cast<size_t>(count) : 0;
+    }
+    content.resize(done);
+    return content;
+}
+
+void StateFolder::write(uint64_t generation, std::string_view content) const {
+    const FileName name = fileName(generation);
+    const std::string whole = filePath(generation);
+    if (getpid() != owner) {
+        refuseWriting(whole, "the folder belongs to process " + std::to_string(owner));
+    }
+    int reason = 0;
+    if (!writeFile(folder, unfinishedName, content) ||
+        renameat(folder, unfinishedName, folder, name.data()) != 0) {
+        reason = errno;
+        unlinkat(folder, unfinishedName, 0);
+    } else if (fsync(folder) != 0) {
+        reason = errno;
+        remove(generation);
+    }
+    if (reason != 0) {
+        refuseWriting(whole, std::strerror(reason));
+    }
+}
+
+void StateFolder::remove(uint64_t generation) const noexcept {
+    unlinkat(folder, fileName(generation).data(), 0);
+}
+
+}  // namespace simulator

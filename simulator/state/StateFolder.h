@@ -1,0 +1,57 @@
+#pragma once
+
+#include <sys/types.h>
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "state/StateFile.h"
+
+namespace simulator {
+
+// A file descriptor that is closed at the end of its scope; below 0 when there is none.
+class Descriptor {
+  public:
+    explicit Descriptor(int number) : number(number) {}
+    Descriptor(const Descriptor&) = delete;
+    Descriptor& operator=(const Descriptor&) = delete;
+    ~Descriptor();
+
+    operator int() const { return number; }
+
+  private:
+    int number;
+};
+
+// The folder in which one process keeps what lasts: a file for each change that still matters,
+// "change-1" and so on. Other files in it are left alone.
+class StateFolder {
+  public:
+    // Makes the folder if it is missing and locks it for as long as this object and its process
+    // live. Throws a StateFault, for one when another process has it.
+    explicit StateFolder(const std::string& path);
+
+    std::string filePath(uint64_t generation) const;
+    // The generations of the files that are there, the oldest first. Throws a StateFault.
+    std::vector<uint64_t> generations() const;
+    // The content of a file. Throws a StateFault.
+    std::string read(uint64_t generation) const;
+
+    // Makes a file. It is whole and on the disk when this returns. Refuses with stateNotWritten,
+    // and then there is no such file.
+    void write(uint64_t generation, std::string_view content) const;
+    // Removes a file if that can be done.
+    void remove(uint64_t generation) const noexcept;
+
+  private:
+    void lock() const;
+
+    const std::string path;
+    const pid_t owner;
+    const Descriptor folder;
+    const Descriptor lockFile;
+};
+
+}  // namespace simulator
