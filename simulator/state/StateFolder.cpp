@@ -1,5 +1,6 @@
 #include "state/StateFolder.h"
 
+#include <dirent.h>
 #include <fcntl.h>
 #include <sys/stat.h>
 #include <unistd.h>
@@ -10,7 +11,7 @@
 #include <charconv>
 #include <cstdio>
 #include <cstring>
-#include <filesystem>
+#include <memory>
 
 #include "status/Refusal.h"
 
@@ -34,7 +35,7 @@ FileName fileName(uint64_t generation) noexcept {
 }
 
 // Returns 0 for the name of another file.
-uint64_t generationOf(const std::string& name) {
+uint64_t generationOf(std::string_view name) {
     uint64_t generation = 0;
     if (name.compare(0, prefix.size(), prefix) == 0) {
         std::from_chars(name.data() + prefix.size(), name.data() + name.size(), generation);
@@ -51,10 +52,10 @@ int makeFolder(const std::string& path) {
     if (folder >= 0 || errno != ENOENT) {
         return folder;
     }
-    std::error_code failure;
-    std::filesystem::create_directories(path, failure);
-    errno = failure.value();
-    return failure ? -1 : openFolder(path);
+    for (size_t end = path.find('/', 1); end != std::string::npos; end = path.find('/', end + 1)) {
+        mkdir(path.substr(0, end).c_str(), 0777);
+    }
+    return mkdir(path.c_str(), 0777) == 0 || errno == EEXIST ? openFolder(path) : -1;
 }
 
 bool writeAll(int file, std::string_view content) {
@@ -124,17 +125,19 @@ std::string StateFolder::filePath(uint64_t generation) const {
 }
 
 std::vector<uint64_t> StateFolder::generations() const {
+    // Not std::filesystem, which ends the process when it runs out of memory here.
+    const std::unique_ptr<DIR, int (*)(DIR*)> list(opendir(path.c_str()), closedir);
     std::vector<uint64_t> found;
-    std::error_code failure;
-    for (std::filesystem::directory_iterator file(path, failure), end; !failure && file != end;
-         file.increment(failure)) {
-        const uint64_t generation = generationOf(file->path().filename().string());
+    errno = list ? 0 : errno;
+    while (const dirent* file = list ? readdir(list.get()) : nullptr) {
+        const uint64_t generation = generationOf(file->d_name);
         if (generation != 0) {
             found.push_back(generation);
         }
     }
-    if (failure) {
-        throw StateFault{path, "cannot be listed: " + failure.message(), usableFolder};
+    if (errno != 0) {
+        throw StateFault{path, std::string("cannot be listed: ") + std::strerror(errno),
+                         usableFolder};
     }
     std::sort(found.begin(), found.end());
     return found;
@@ -146,13 +149,10 @@ std::string StateFolder::read(uint64_t generation) const {
                          std::string("cannot be read: ") + std::strerror(errno),
                          "must be a readable file"};
     };
-    const Descriptor file(openat(folder, fileName(generation).data(), O_RDONLY | O_CLOEXEC));
+    const Descriptor file(
+        openat(folder, fileName(generation).data(), O_RDONLY | O_NONBLOCK | O_CLOEXEC));
     struct stat facts = {};
     if (file < 0 || fstat(file, &facts) != 0) {
-        refuse();
-    }
-    if (!S_ISREG(facts.st_mode)) {
-        errno = EINVAL;
         refuse();
     }
     std::string content(static_cast<size_t>(facts.st_size), '\0');

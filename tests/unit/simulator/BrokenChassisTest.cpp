@@ -186,6 +186,11 @@ TEST(BrokenChassisTest, DriverPropertiesKeepTheirMeaning) {
         "\"needs_commit\":true}}},\"devices\":[]}",
         "/driver_properties/system/Sys.A",
         "can never be committed; only properties of resources are committed");
+    expectFault(
+        "{\"driver_properties\":{\"session\":{\"Session.A\":{\"type\":\"Bool\","
+        "\"lasting\":true}}},\"devices\":[]}",
+        "/driver_properties/session/Session.A",
+        "can never last; sessions end, and their properties with them");
 }
 
 TEST(BrokenChassisTest, CommandsActOnWhatIsThere) {

@@ -1,0 +1,112 @@
+"""What the simulated chassis remembers from one run of the host to the next."""
+
+import signal
+import subprocess
+
+import pytest
+
+from hostlib import BUILD_DIR, Host, clean_host
+from jsonrpc import Client, call, error_response, result_response
+
+NOTHING = result_response()
+
+
+@pytest.fixture
+def folder(tmp_path):
+    return tmp_path / "state"
+
+
+class Bench:
+    """A session on a host with a state folder."""
+
+    def __init__(self, client, session_id):
+        self.client = client
+        self.session_id = session_id
+
+    def ask(self, method, params):
+        return self.client.ask(call(method, {"session_id": self.session_id, **params}))
+
+    def read(self, area, size):
+        return self.ask("getNvmemBytes", {"nvmem_area": area, "address": 0, "size": size})
+
+    def write(self, area, values):
+        answer = self.ask("setNvmemBytes", {"nvmem_area": area, "address": 0, "data": values})
+        assert answer == result_response('{"next_address":1}')
+
+    def devices(self):
+        return self.ask("getProperty", {"property": "Sys.Devices"})
+
+
+def run(folder, use):
+    """Runs a host on the folder, lets use(Bench) act and ends the host as a service manager does."""
+    with clean_host(options=("--state", folder)) as host, Client(host) as client:
+        with client.session() as session_id:
+            use(Bench(client, session_id))
+
+
+def expect(answer, wanted):
+    assert answer == wanted
+
+
+def data(*values):
+    listed = ",".join(map(str, values))
+    return result_response(f'{{"data":[{listed}],"next_address":1}}')
+
+
+def test_committed_bytes_are_there_after_a_restart(folder):
+    def commit(bench):
+        bench.write("Mod1/user", [1, 2, 255])
+        assert bench.ask("commitNvmemAreas", {"nvmem_areas": ["Mod1/user"]}) == NOTHING
+
+    run(folder, commit)
+    run(folder, lambda bench: expect(bench.read("Mod1/user", 4), data(1, 2, 255, 0)))
+
+
+def test_bytes_without_a_commit_are_the_old_ones_after_a_restart(folder):
+    def write(bench):
+        bench.write("Mod1/user", [7])
+        expect(bench.read("Mod1/user", 1), data(7))
+
+    run(folder, write)
+    run(folder, lambda bench: expect(bench.read("Mod1/user", 1), data(0)))
+
+
+def test_new_names_are_there_after_a_restart(folder):
+    names = result_response('{"data_type":"StringArray","value":'
+                            '["Lab","Lab-Mod1","Lab-Mod2","Lab-Mod4","Lab-Mod5"]}')
+
+    def rename(bench):
+        bench.ask("renameChassisAndAllConnectedModules",
+                  {"old_chassis_name": "Bench", "new_chassis_name": "Lab"})
+        expect(bench.devices(), names)
+
+    run(folder, rename)
+    run(folder, lambda bench: expect(bench.devices(), names))
+
+
+def test_a_commit_that_cannot_be_written_fails_and_stays_pending(folder):
+    def commit(bench):
+        bench.write("Mod1/user", [9])
+        (folder / "unfinished").mkdir()
+        commit = ("commitNvmemAreas", {"nvmem_areas": ["Mod1/user"]})
+        expect(bench.ask(*commit), error_response("1", -250931))
+        (folder / "unfinished").rmdir()
+        expect(bench.ask(*commit), NOTHING)
+
+    run(folder, commit)
+    run(folder, lambda bench: expect(bench.read("Mod1/user", 1), data(9)))
+
+
+def test_a_host_that_was_killed_leaves_the_folder_to_the_next(folder):
+    with Host(options=("--state", folder)) as host:
+        host.post(call("initializeSession"))
+        result = subprocess.run(
+            [BUILD_DIR / "bin" / "qitrmc-host", "--listen", "127.0.0.1:0", "--state", folder],
+            capture_output=True, text=True, timeout=60)
+        assert (result.returncode, result.stdout) == (1, "")
+        assert result.stderr.splitlines()[0] == (
+            f"qitrmcapi: {folder}: is in use by process {host.process.pid}; end that process, or "
+            "name another folder in QITRMC_SIM_STATE")
+        host.process.send_signal(signal.SIGKILL)
+        host.process.wait()
+    run(folder, lambda bench: expect(bench.read("Mod1/user", 1), data(0)))
