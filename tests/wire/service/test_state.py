@@ -99,7 +99,6 @@ def test_a_commit_that_cannot_be_written_fails_and_stays_pending(folder):
 
 def test_a_host_that_was_killed_leaves_the_folder_to_the_next(folder):
     with Host(options=("--state", folder)) as host:
-        host.post(call("initializeSession"))
         result = subprocess.run(
             [BUILD_DIR / "bin" / "qitrmc-host", "--listen", "127.0.0.1:0", "--state", folder],
             capture_output=True, text=True, timeout=60)
