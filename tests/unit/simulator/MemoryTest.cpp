@@ -197,7 +197,7 @@ TEST(MemoryTest, ACommandActsOnAllChannelsOrNone) {
 TEST(MemoryTest, AResettingCommandResetsEverythingOrNothing) {
     Session session("Mod1");
     EXPECT_EQ(set(setDouble, session, "Mod1", "DMM.Range", 1.0).code, 0);
-    EXPECT_EQ(set(setText, session, "Mod1", "Dev.Comment", "a comment that is long enough").code,
+    EXPECT_EQ(set(setText, session, "Mod1", "DMM.Note", "a comment that is long enough").code,
               0);
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
@@ -205,7 +205,7 @@ TEST(MemoryTest, AResettingCommandResetsEverythingOrNothing) {
                                                              status);
                          EXPECT_EQ(valueOf(getDouble, session, "Mod1", "DMM.Range"),
                                    status->code == 0 ? 10.0 : 1.0);
-                         EXPECT_EQ(getText(session, "Mod1", "Dev.Comment").value.empty(),
+                         EXPECT_EQ(getText(session, "Mod1", "DMM.Note").value.empty(),
                                    status->code == 0);
                      }),
               0);

@@ -149,10 +149,14 @@ FAILURES = {
         (-250966, "", {"opening": '{"devices":"Unit1,Unit2"}'})],
 }
 
-# What takes two connections or a hundred sessions, and has a test of its own; and -250987, which would
-# take ten seconds and has one with the driver alone.
+# What takes two connections, a hundred sessions or a state folder, and has a test of its own; and
+# -250987, which would take ten seconds and has one with the driver alone.
 PROVOKED_ELSEWHERE = {"initializeSession": {-250901}, "connectToDevices": {-250963, -250987},
-                      "executeCommand": {-250963, -250977}, "writeRegister": {-250977}}
+                      "executeCommand": {-250931, -250963, -250977}, "renameDevice": {-250931},
+                      "setProperty": {-250931}, "commitProperties": {-250931},
+                      "commitNvmemAreas": {-250931},
+                      "renameChassisAndAllConnectedModules": {-250931},
+                      "writeRegister": {-250931, -250977}}
 
 
 @pytest.mark.parametrize("method, code, params, setting", [

@@ -10,6 +10,23 @@ from jsonrpc import Client, call, error_response, result_response
 
 NOTHING = result_response()
 
+ONE_CHASSIS = """{"devices": [
+    {"name": "A", "category": 1,
+     "properties": {"P": {"type": "Int32", "access": "ReadWrite", "lasting": true,
+                          "needs_commit": true, "value": 0}},
+     "commands": {"Note": {"sets": {"Dev.Comment": "noted"}}},
+     "nvmem_areas": [{"name": "user", "size": 4}]}]}"""
+
+# Each method that changes what lasts, with its parameters.
+LASTING_CHANGES = {
+    "renameDevice": {"device": "A", "new_device_name": "B"},
+    "setProperty": {"property": "Dev.Comment", "value": "x", "devices": "A"},
+    "commitProperties": {"devices": "A"},
+    "executeCommand": {"command": "Note", "devices": "A", "timeout": 1},
+    "commitNvmemAreas": {"nvmem_areas": "A/user"},
+    "renameChassisAndAllConnectedModules": {"old_chassis_name": "A", "new_chassis_name": "B"},
+}
+
 
 @pytest.fixture
 def folder(tmp_path):
@@ -37,9 +54,9 @@ class Bench:
         return self.ask("getProperty", {"property": "Sys.Devices"})
 
 
-def run(folder, use):
-    """Runs a host on the folder, lets use(Bench) act and ends the host as a service manager does."""
-    with clean_host(options=("--state", folder)) as host, Client(host) as client:
+def run(folder, use, options=()):
+    """Runs a host on the folder, lets use(Bench) act, and ends it as a service manager does."""
+    with clean_host(options=("--state", folder, *options)) as host, Client(host) as client:
         with client.session() as session_id:
             use(Bench(client, session_id))
 
@@ -95,6 +112,20 @@ def test_a_commit_that_cannot_be_written_fails_and_stays_pending(folder):
 
     run(folder, commit)
     run(folder, lambda bench: expect(bench.read("Mod1/user", 1), data(9)))
+
+
+def test_each_change_of_what_lasts_fails_when_it_cannot_be_written(folder, tmp_path):
+    (tmp_path / "chassis.json").write_text(ONE_CHASSIS)
+
+    def change(bench):
+        bench.write("A/user", [9])
+        number = {"property": "P", "value": 1, "devices": "A"}
+        expect(bench.ask("setProperty", number), result_response('{"data_type":"Int32"}'))
+        (folder / "unfinished").mkdir()
+        for method, params in LASTING_CHANGES.items():
+            assert bench.ask(method, params) == error_response("1", -250931), method
+
+    run(folder, change, ("--chassis", tmp_path / "chassis.json"))
 
 
 def test_a_host_that_was_killed_leaves_the_folder_to_the_next(folder):
