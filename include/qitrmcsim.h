@@ -12,6 +12,9 @@
 extern "C" {
 #endif
 
+/* ---- Start and supervision --------------------------------------------------------------------
+ */
+
 /*
  * Starts the simulator, as the first call of the driver would, and takes no session's number.
  * Returns 0, or the status code that all calls of the driver fail with. *text is then a summary of
@@ -32,6 +35,21 @@ typedef struct {
 
 /* Counts what is outstanding at this moment; all 0 before the start. Any thread may call this. */
 void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts);
+
+/* ---- Faults --------------------------------------------------------------------------------- */
+
+/*
+ * Replaces all faults and events by those of a JSON text, whose form the simulator's README tells;
+ * "{}" has none. Counts and times begin anew. A file that QITRMC_SIM_FAULTS names takes over again
+ * when it changes.
+ *
+ * Returns 0, or the negative code of a status; then everything is as it was: -250942 when the text
+ * is not as it should be, -250954 when it is null, -250952 when the simulator itself cannot start,
+ * -250950 without memory.
+ * reason: set to null, or to words about a failure, to be given back through
+ * nQITRMCAPI100_freeString. May be null when nobody wants to know.
+ */
+int32_t qitrmcsim_setFaults(const char* json, char** reason);
 
 #ifdef __cplusplus
 }

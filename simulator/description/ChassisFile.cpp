@@ -1,10 +1,6 @@
 #include "description/ChassisFile.h"
 
-#include <array>
-#include <cerrno>
 #include <cstdlib>
-#include <cstring>
-#include <fstream>
 
 #include "EmbeddedTexts.h"
 #include "description/Description.h"
@@ -13,6 +9,7 @@
 #include "description/PropertyFile.h"
 #include "description/RegisterFile.h"
 #include "description/StartRefusal.h"
+#include "description/TextFile.h"
 #include "model/NameText.h"
 
 namespace simulator {
@@ -21,7 +18,6 @@ namespace {
 
 constexpr int32_t chassisCategory = 1;
 constexpr uint32_t mostSlots = 64;
-constexpr size_t largestFile = size_t{16} << 20;
 
 enum class Place { system, slot };
 
@@ -116,27 +112,6 @@ void fillFrom(const Node& root, const char* member, Category category, const Cat
     fillStore(category, catalogue, nullptr, store);
 }
 
-[[noreturn]] void refuseFile(const std::string& wrong) {
-    throw DescriptionFault{"", wrong, "QITRMC_SIM_CHASSIS must name a readable file"};
-}
-
-std::string readFile(const char* path) {
-    errno = 0;
-    std::ifstream file(path, std::ios::binary);
-    std::string content;
-    std::array<char, 4096> piece;
-    while (file.read(piece.data(), piece.size()) || file.gcount() > 0) {
-        content.append(piece.data(), static_cast<size_t>(file.gcount()));
-        if (content.size() > largestFile) {
-            refuseFile("is larger than 16 MiB");
-        }
-    }
-    if (!file.eof()) {
-        refuseFile(std::string("cannot be read: ") + std::strerror(errno));
-    }
-    return content;
-}
-
 }  // namespace
 
 std::unique_ptr<Chassis> parseChassis(std::string_view text) {
@@ -175,7 +150,9 @@ std::unique_ptr<Chassis> loadChassis() {
     const char* path = std::getenv("QITRMC_SIM_CHASSIS");
     const bool fromFile = path != nullptr && *path != '\0';
     try {
-        return parseChassis(fromFile ? readFile(path) : std::string(embedded::bench));
+        return parseChassis(
+            fromFile ? readTextFile(path, "QITRMC_SIM_CHASSIS must name a readable file").text
+                     : std::string(embedded::bench));
     } catch (const DescriptionFault& fault) {
         refuseStart(fromFile ? path : "(built-in chassis)", fault);
     }

@@ -44,7 +44,7 @@ void refuseHugeExponents(std::string_view text) {
 
 }  // namespace
 
-void parseDescription(std::string_view text, JsonDocument& document) {
+void parseDescription(std::string_view text, JsonDocument& document, const char* right) {
     refuseHugeExponents(text);
     constexpr unsigned flags = rapidjson::kParseIterativeFlag |
                                rapidjson::kParseValidateEncodingFlag |
@@ -54,7 +54,7 @@ void parseDescription(std::string_view text, JsonDocument& document) {
         throw DescriptionFault{"",
                                "is not JSON at " + lineAndColumn(text, document.GetErrorOffset()) +
                                    ": " + rapidjson::GetParseError_En(document.GetParseError()),
-                               "a chassis description is one JSON object"};
+                               right};
     }
 }
 

@@ -48,8 +48,9 @@ struct DescriptionFault {
     std::string right;
 };
 
-// Parses a text, or throws a fault.
-void parseDescription(std::string_view text, JsonDocument& document);
+// Parses a text, or throws a fault, in which `right` says what the text has to be.
+void parseDescription(std::string_view text, JsonDocument& document,
+                      const char* right = "a chassis description is one JSON object");
 
 // One value of a description together with its place, for reading it with plain words about what
 // is wrong. The reading functions throw DescriptionFault.

@@ -6,10 +6,13 @@
 
 namespace simulator {
 
+void tellFault(const std::string& source, const DescriptionFault& fault) noexcept {
+    std::fprintf(stderr, "qitrmcapi: %s: %s%s%s; %s\n", source.c_str(), fault.pointer.c_str(),
+                 fault.pointer.empty() ? "" : " ", fault.wrong.c_str(), fault.right.c_str());
+}
+
 void refuseStart(const std::string& source, const DescriptionFault& fault) {
-    const std::string place = fault.pointer.empty() ? "" : fault.pointer + " ";
-    std::fprintf(stderr, "qitrmcapi: %s: %s%s; %s\n", source.c_str(), place.c_str(),
-                 fault.wrong.c_str(), fault.right.c_str());
+    tellFault(source, fault);
     throw Refusal(code::chassisNotLoaded)
         .usage(tag::fileName, source)
         .usage(tag::jsonPointer, fault.pointer)

@@ -47,6 +47,14 @@ class Occupation {
     const std::vector<Task>& tasks;
 };
 
+std::vector<Device*> devicesOf(const std::vector<Task>& tasks) {
+    std::vector<Device*> devices;
+    for (const Task& task : tasks) {
+        devices.push_back(task.resource->device);
+    }
+    return devices;
+}
+
 // Lets the time of the commands pass; they run side by side.
 void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Session session,
                Waits& waits, std::unique_lock<std::mutex>& lock) {
@@ -55,7 +63,8 @@ void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Ses
         longest = std::max(longest, task.command->seconds);
     }
     if (longest > 0.0 && timeout > 0.0) {
-        waits.spend(session, std::min(longest, timeout), lock);
+        const auto devices = devicesOf(tasks);
+        waits.spend(session, devices, std::min(longest, timeout), lock);
     }
     if (longest > timeout) {
         throw Refusal(code::commandTimedOut)

@@ -17,7 +17,9 @@ bool contains(const std::vector<Device*>& devices, const Device* device) {
 void expectAnswers(const std::vector<Device*>& devices, double timeout) {
     std::vector<const Device*> silent;
     std::copy_if(devices.begin(), devices.end(), std::back_inserter(silent),
-                 [](const Device* device) { return !device->reachable; });
+                 [](const Device* device) {
+                     return !device->reachable || device->absence != Absence::none;
+                 });
     if (silent.empty()) {
         return;
     }
@@ -40,7 +42,7 @@ void spendConnectTime(const std::vector<Device*>& devices, double timeout,
         longest = std::max(longest, device->connectSeconds);
     }
     if (longest > 0.0 && timeout > 0.0) {
-        waits.spend(session, std::min(longest, timeout), lock);
+        waits.spend(session, devices, std::min(longest, timeout), lock);
     }
     if (longest > timeout) {
         throw Refusal(code::connectTimedOut).usage(tag::timeout, numberText(timeout));
@@ -69,7 +71,7 @@ void nQITRMCAPI100_connectToDevices(nQITRMCAPI100_Session session, const char* d
     };
     withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
         Session& owner = simulator.sessions.get(session);
-        auto wanted = simulator.resolver(owner).devices(required(devices, "devices"));
+        auto wanted = simulator.resolver(owner).devicesToConnect(required(devices, "devices"));
         const double patience = timeout < 0.0 ? usualConnectTime : checkedTimeout(timeout);
         const auto isConnected = [&](const Device* device) {
             return contains(owner.connectedDevices, device);
@@ -114,10 +116,7 @@ void nQITRMCAPI100_resetDevices(nQITRMCAPI100_Session session, const char* devic
             simulator.reservations.expectWritable(session, *device);
         }
         for (Device* device : wanted) {
-            device->reset();
-            device->forEachResource([&](const Resource& resource) {
-                simulator.chassis->life.restart(resource, simulator.clock.now());
-            });
+            simulator.chassis->reset(*device, simulator.clock.now());
         }
     });
 }

@@ -127,7 +127,7 @@ void nQITRMCAPI100_getDevicePropertyString(nQITRMCAPI100_Session session, const 
     const auto call = [&, function = __func__] {
         return Call(function)
             .session(session)
-            .resources("device", device)
+            .resources("device", device, "$DefaultDevices")
             .in("property", property)
             .out("value", value);
     };

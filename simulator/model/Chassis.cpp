@@ -39,6 +39,22 @@ void Device::dropPending(nQITRMCAPI100_Session session) {
     }
 }
 
+void Device::dropAllPending() noexcept {
+    forEachResource([](Resource& resource) { resource.properties.dropAllPending(); });
+    for (const auto& area : nvmemAreas) {
+        area->memory.drop();
+    }
+}
+
+void expectPresent(const Device& device, Absence absence) {
+    if (absence == Absence::removed) {
+        throw Refusal(code::deviceRemoved).usage(tag::device, device.name);
+    }
+    if (absence == Absence::connectionLost) {
+        throw Refusal(code::connectionLost).usage(tag::device, device.name);
+    }
+}
+
 Device& Chassis::addDevice(const std::string& name) {
     all.push_back(std::make_unique<Device>(name));
     byName.emplace(foldName(name), all.back().get());
@@ -55,6 +71,11 @@ NvmemArea& Chassis::addNvmemArea(Device& device, const std::string& name) {
     device.nvmemAreas.push_back(std::make_unique<NvmemArea>(name, device));
     device.parts.emplace(foldName(name), device.nvmemAreas.back().get());
     return *device.nvmemAreas.back();
+}
+
+void Chassis::reset(Device& device, int64_t now) {
+    device.reset();
+    device.forEachResource([&](const Resource& resource) { life.restart(resource, now); });
 }
 
 void Chassis::rename(Device& device, const std::string& newName,

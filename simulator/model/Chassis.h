@@ -20,6 +20,9 @@ enum class Kind { device, physChan, nvmemArea };
 
 struct Device;
 
+// What keeps a device from answering at the moment.
+enum class Absence { none, connectionLost, removed };
+
 // Something that clients name. Resources live as long as the chassis; their addresses identify
 // them, while their names may change.
 struct Resource {
@@ -72,6 +75,8 @@ struct Device : Resource {
     // How long it takes to connect, and whether the device answers then.
     double connectSeconds = 0.0;
     bool reachable = true;
+    // Whoever names the device or its parts while this is not none is refused.
+    Absence absence = Absence::none;
 
     // Calls visit(Resource&) for the device itself and all its parts.
     template <typename Visit>
@@ -89,7 +94,12 @@ struct Device : Resource {
     void reset();
     // Forgets what a session wrote to the device and its parts and did not commit.
     void dropPending(nQITRMCAPI100_Session session);
+    // Forgets what anybody wrote to the device and its parts and did not commit.
+    void dropAllPending() noexcept;
 };
+
+// Refuses with connectionLost or deviceRemoved, unless nothing keeps a device from answering.
+void expectPresent(const Device& device, Absence absence);
 
 // All resources of the system. Names are looked up without regard to letter case.
 class Chassis {
@@ -99,6 +109,9 @@ class Chassis {
     // Add a part to a device. The name must be free on that device.
     Resource& addPhysChan(Device& device, const std::string& name);
     NvmemArea& addNvmemArea(Device& device, const std::string& name);
+    // Puts a device into its state after power-on, but for what lasts. `now` is in microseconds of
+    // the simulated time.
+    void reset(Device& device, int64_t now);
     // Gives a device a name that no other device has. keep() is called when nothing else can fail
     // any more; when it throws, nothing has changed.
     void rename(Device& device, const std::string& newName, const std::function<void()>& keep);

@@ -80,6 +80,12 @@ void PropertyStore::dropPending(nQITRMCAPI100_Session session) {
     }
 }
 
+void PropertyStore::dropAllPending() noexcept {
+    for (auto& [name, property] : all) {
+        property.pending.reset();
+    }
+}
+
 void Catalogue::add(Category category, const DefinitionPointer& definition) {
     all[category].push_back(definition);
 }

@@ -99,6 +99,7 @@ class PropertyStore {
     void commit();
     // Forgets what a session wrote and did not commit.
     void dropPending(nQITRMCAPI100_Session session);
+    void dropAllPending() noexcept;
 
   private:
     std::map<std::string, Property, std::less<>> all;

@@ -32,6 +32,18 @@ std::vector<std::string> namesOf(const List& resources) {
     return names;
 }
 
+// Devices that stand in no slot any more are in no list of the system.
+template <typename List>
+std::vector<std::string> namesOfPresent(const List& devices) {
+    std::vector<std::string> names;
+    for (const auto& device : devices) {
+        if (device->absence != Absence::removed) {
+            names.push_back(device->name);
+        }
+    }
+    return names;
+}
+
 template <Category category>
 Value propertyNames(const Subject& subject) {
     return subject.simulator.chassis->catalogue.names(category);
@@ -59,7 +71,7 @@ Value modules(const Subject& subject) {
     if (subject.device().category != chassisCategory || isModule(subject.device())) {
         return std::nullopt;
     }
-    return namesOf(subject.device().modules);
+    return namesOfPresent(subject.device().modules);
 }
 
 Value slotNumber(const Subject& subject) {
@@ -71,7 +83,9 @@ Value slotNumber(const Subject& subject) {
 
 constexpr Entry entries[] = {
     {Category::system, "Sys.Devices",
-     [](const Subject& subject) -> Value { return namesOf(subject.simulator.chassis->devices()); }},
+     [](const Subject& subject) -> Value {
+         return namesOfPresent(subject.simulator.chassis->devices());
+     }},
     {Category::system, "Sys.ConfigChangeCount",
      [](const Subject& subject) -> Value {
          return List<uint64_t>{subject.simulator.chassis->changes};

@@ -32,6 +32,13 @@ class HandleTable {
     // Returns whether there was such an item.
     bool remove(uint32_t handle) noexcept { return items.erase(handle) != 0; }
 
+    template <typename Visit>
+    void forEach(Visit visit) {
+        for (auto& [handle, item] : items) {
+            visit(item);
+        }
+    }
+
     template <typename Condition>
     void removeIf(Condition condition) {
         for (auto place = items.begin(); place != items.end();) {

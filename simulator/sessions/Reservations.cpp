@@ -13,7 +13,10 @@ bool Holding::conflictsWith(const Holding& other) const {
 }
 
 Reservations::Request::Request(const std::vector<Device*>& devices, const Holding& wanted)
-    : devices(devices), wanted(wanted), prepared(devices.size(), wanted), wait(wanted.session) {}
+    : devices(devices),
+      wanted(wanted),
+      prepared(devices.size(), wanted),
+      wait(wanted.session, &devices) {}
 
 Reservations::Reservations(const Chassis& chassis, Waits& waits) : waits(waits) {
     for (const auto& device : chassis.devices()) {

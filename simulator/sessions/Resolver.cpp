@@ -16,6 +16,13 @@ std::vector<Resource*> asResources(const std::vector<Derived*>& list) {
     return std::vector<Resource*>(list.begin(), list.end());
 }
 
+std::vector<Resource*> present(std::vector<Resource*> resources) {
+    for (const Resource* resource : resources) {
+        expectPresent(*resource->device, resource->device->absence);
+    }
+    return resources;
+}
+
 }  // namespace
 
 void expectSome(const std::vector<Resource*>& resources) {
@@ -116,7 +123,7 @@ std::vector<Resource*> Resolver::collect(std::string_view joined, Find find) con
     return found;
 }
 
-std::vector<Resource*> Resolver::resources(Kind kind, std::string_view joined) const {
+std::vector<Resource*> Resolver::ofKind(Kind kind, std::string_view joined) const {
     auto found =
         collect(joined, [&](const std::string& name) -> Resource& { return named(kind, name); });
     for (const Resource* resource : found) {
@@ -127,14 +134,48 @@ std::vector<Resource*> Resolver::resources(Kind kind, std::string_view joined) c
     return found;
 }
 
+std::vector<Resource*> Resolver::resources(Kind kind, std::string_view joined) const {
+    return present(ofKind(kind, joined));
+}
+
 std::vector<Resource*> Resolver::anyResources(std::string_view joined) const {
-    return collect(joined, [&](const std::string& name) -> Resource& { return named(name); });
+    return present(
+        collect(joined, [&](const std::string& name) -> Resource& { return named(name); }));
+}
+
+std::vector<Resource*> Resolver::mentioned(std::string_view joined) const {
+    std::vector<Resource*> found;
+    try {
+        forEachName(joined, [&](const std::string& name) {
+            if (const auto list = tokenResources(name)) {
+                found.insert(found.end(), list->begin(), list->end());
+            } else if (Resource* resource = chassis.find(name)) {
+                found.push_back(resource);
+            }
+        });
+    } catch (const Refusal&) {
+        // The call itself is refused for this range.
+    }
+    return found;
 }
 
 std::vector<Device*> Resolver::devices(std::string_view joined) const {
     const auto found = resources(Kind::device, joined);
     expectSome(found);
     return owners(found);
+}
+
+std::vector<Device*> Resolver::devicesToConnect(std::string_view joined) const {
+    const auto found = owners(ofKind(Kind::device, joined));
+    for (const Device* device : found) {
+        if (device->absence == Absence::removed) {
+            expectPresent(*device, device->absence);
+        }
+    }
+    if (found.empty()) {
+        throw Refusal(code::noResources);
+    }
+    return found;
 }
 
 Device& Resolver::oneDevice(std::string_view joined) const {

@@ -18,12 +18,15 @@ class Resolver {
         : chassis(chassis), reservations(reservations), session(session) {}
 
     // The resources of a joined text in its order, each as often as it is named. A name that is
-    // unknown or of another kind is refused with the status of the kind.
+    // unknown or of another kind is refused with the status of the kind, and one that belongs to
+    // a device which does not answer with connectionLost or deviceRemoved.
     std::vector<Resource*> resources(Kind kind, std::string_view joined) const;
     // As above for resources of any kind.
     std::vector<Resource*> anyResources(std::string_view joined) const;
     // Devices, each once. Refuses with noResources when there is none.
     std::vector<Device*> devices(std::string_view joined) const;
+    // As above, together with devices whose connection is lost.
+    std::vector<Device*> devicesToConnect(std::string_view joined) const;
 
     // The one resource that a text must name. Refuse with noResources and severalResources.
     Device& oneDevice(std::string_view joined) const;
@@ -31,10 +34,14 @@ class Resolver {
 
     std::vector<Device*> reservedDevices() const;
 
+    // Those resources of a joined text that there are, up to a range that is not valid.
+    std::vector<Resource*> mentioned(std::string_view joined) const;
+
   private:
     std::optional<std::vector<Resource*>> tokenResources(std::string_view name) const;
     Resource& named(Kind kind, std::string_view name) const;
     Resource& named(std::string_view name) const;
+    std::vector<Resource*> ofKind(Kind kind, std::string_view joined) const;
     template <typename Find>
     std::vector<Resource*> collect(std::string_view joined, Find find) const;
 

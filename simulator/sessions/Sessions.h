@@ -31,6 +31,13 @@ class Sessions {
     Session& make();
     // Refuses with unknownSession when the handle is dead or its session is still opening.
     Session& get(nQITRMCAPI100_Session handle);
+    // Returns null when the handle is dead.
+    Session* find(nQITRMCAPI100_Session handle) { return table.find(handle); }
+    // Calls visit(Session&) for all sessions, those that are still opening too.
+    template <typename Visit>
+    void forEach(Visit visit) {
+        table.forEach(visit);
+    }
     void remove(nQITRMCAPI100_Session handle) noexcept { table.remove(handle); }
 
     // With those that are still opening.

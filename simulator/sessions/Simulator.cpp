@@ -42,7 +42,8 @@ Simulator::Simulator(std::unique_ptr<Chassis> loaded, const TimeScale& timeScale
       clock(timeScale),
       waits(clock),
       sessions(chassis->firstSessionHandle, chassis->sessionProperties),
-      reservations(*chassis, waits) {
+      reservations(*chassis, waits),
+      faults(*chassis, sessions, waits, clock) {
     // What follows a value that was restored has followed it long ago.
     chassis->life.settle();
 }

@@ -3,6 +3,7 @@
 #include <memory>
 #include <mutex>
 
+#include "faults/Faults.h"
 #include "model/Chassis.h"
 #include "sessions/Clock.h"
 #include "sessions/HandleTable.h"
@@ -45,7 +46,7 @@ struct Simulator {
     }
 
     // Whether anybody wants to know of calls.
-    bool isWatched() const { return trace.isOn(); }
+    bool isWatched() const { return trace.isOn() || faults.isOn(); }
 
     // Ends a session with all that it has.
     void close(nQITRMCAPI100_Session session);
@@ -60,6 +61,7 @@ struct Simulator {
     Reservations reservations;
     HandleTable<OpenProperty> openProperties;
     HandleTable<OpenCommand> openCommands;
+    Faults faults;
 };
 
 }  // namespace simulator

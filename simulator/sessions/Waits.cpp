@@ -29,28 +29,74 @@ void Wait::finish(End reason) noexcept {
     }
 }
 
-bool Waits::sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock) {
-    const auto deadline = std::chrono::steady_clock::now() + clock.realTime(seconds);
-    const auto place = waiting.insert(waiting.end(), &wait);
-    wait.wake.wait_until(lock, deadline, [&] { return wait.end != Wait::End::none; });
-    waiting.erase(place);
+namespace {
+
+// Stands in the list of those who wait for as long as it lives.
+class Waiting {
+  public:
+    Waiting(std::list<Wait*>& list, Wait& wait)
+        : list(list), place(list.insert(list.end(), &wait)) {}
+    Waiting(const Waiting&) = delete;
+    Waiting& operator=(const Waiting&) = delete;
+    ~Waiting() { list.erase(place); }
+
+  private:
+    std::list<Wait*>& list;
+    const std::list<Wait*>::iterator place;
+};
+
+}  // namespace
+
+Waits::Deadline Waits::wakeBefore(Deadline deadline) const {
+    if (agenda == nullptr || agenda->next() == Agenda::never || clock.goesByCalls()) {
+        return deadline;
+    }
+    const double seconds = static_cast<double>(agenda->next() - clock.now()) / 1e6;
+    const auto ahead = clock.realTime(std::clamp(seconds, 0.0, longestWait));
+    return std::min(deadline, std::chrono::steady_clock::now() + ahead);
+}
+
+void Waits::sleepUntil(Deadline deadline, Wait& wait, std::unique_lock<std::mutex>& lock) {
+    const Waiting isWaiting(waiting, wait);
+    while (wait.end == Wait::End::none && std::chrono::steady_clock::now() < deadline) {
+        wait.wake.wait_until(lock, wakeBefore(deadline));
+        if (agenda != nullptr) {
+            agenda->catchUp();
+        }
+    }
+}
+
+void Waits::expectUndisturbed(const Wait& wait) const {
+    if (wait.end == Wait::End::deviceAbsent) {
+        expectPresent(*wait.absentDevice, wait.absence);
+    }
     if (wait.end == Wait::End::aborted) {
         throw Refusal(code::aborted);
     }
     if (wait.end == Wait::End::closed) {
         throw Refusal(code::unknownSession).usage(tag::sessionHandle, wait.session);
     }
+}
+
+bool Waits::sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock) {
+    sleepUntil(std::chrono::steady_clock::now() + clock.realTime(seconds), wait, lock);
+    expectUndisturbed(wait);
     return wait.end == Wait::End::done;
 }
 
-void Waits::spend(nQITRMCAPI100_Session session, double seconds,
-                  std::unique_lock<std::mutex>& lock) {
-    if (clock.goesByCalls()) {
-        clock.skip(seconds);
+void Waits::spend(nQITRMCAPI100_Session session, const std::vector<Device*>& devices,
+                  double seconds, std::unique_lock<std::mutex>& lock) {
+    Wait wait(session, &devices);
+    if (!clock.goesByCalls()) {
+        sleep(wait, seconds, lock);
         return;
     }
-    Wait wait(session);
-    sleep(wait, seconds, lock);
+    const Waiting isWaiting(waiting, wait);
+    clock.skip(seconds);
+    if (agenda != nullptr) {
+        agenda->catchUp();
+    }
+    expectUndisturbed(wait);
 }
 
 void Waits::endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept {
@@ -58,6 +104,24 @@ void Waits::endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept {
         if (wait->session == session) {
             wait->finish(reason);
         }
+    }
+}
+
+void Waits::endAbout(const Device& device) noexcept {
+    for (Wait* wait : waiting) {
+        if (wait->end == Wait::End::none && wait->devices != nullptr &&
+            std::find(wait->devices->begin(), wait->devices->end(), &device) !=
+                wait->devices->end()) {
+            wait->absentDevice = &device;
+            wait->absence = device.absence;
+            wait->finish(Wait::End::deviceAbsent);
+        }
+    }
+}
+
+void Waits::lookAgain() noexcept {
+    for (Wait* wait : waiting) {
+        wait->wake.notify_one();
     }
 }
 

@@ -1,10 +1,15 @@
 #pragma once
 
+#include <chrono>
 #include <condition_variable>
+#include <cstdint>
+#include <limits>
 #include <list>
 #include <mutex>
+#include <vector>
 
 #include "Api.h"
+#include "model/Chassis.h"
 #include "sessions/Clock.h"
 
 namespace simulator {
@@ -13,16 +18,35 @@ namespace simulator {
 // than a day counts as a day.
 double checkedTimeout(double seconds);
 
+// Things that happen at their time. Needs the simulator's mutex to be held.
+class Agenda {
+  public:
+    // When nothing is to happen any more.
+    static constexpr int64_t never = std::numeric_limits<int64_t>::max();
+
+    virtual ~Agenda() = default;
+    // When the next thing is to happen, in microseconds of the simulated time.
+    virtual int64_t next() const = 0;
+    // Lets everything happen whose time has come.
+    virtual void catchUp() = 0;
+};
+
 // One call of a session that waits. It lives on the stack of the waiting thread.
 struct Wait {
-    enum class End { none, done, aborted, closed };
+    enum class End { none, done, aborted, closed, deviceAbsent };
 
-    explicit Wait(nQITRMCAPI100_Session session) : session(session) {}
+    // devices: what the call is about, for as long as it waits. May be null.
+    explicit Wait(nQITRMCAPI100_Session session, const std::vector<Device*>* devices = nullptr)
+        : session(session), devices(devices) {}
     // Ends the wait if nothing has ended it before.
     void finish(End reason) noexcept;
 
     const nQITRMCAPI100_Session session;
+    const std::vector<Device*>* const devices;
     End end = End::none;
+    // What ended the wait with End::deviceAbsent.
+    const Device* absentDevice = nullptr;
+    Absence absence = Absence::none;
     std::condition_variable wake;
 };
 
@@ -32,18 +56,34 @@ class Waits {
     explicit Waits(Clock& clock) : clock(clock) {}
 
     // Sleeps, with the mutex given up, until the wait ends or the simulated time is over. Returns
-    // whether the wait ended by Wait::End::done; refuses when the session was aborted or closed.
-    // Where time goes by calls it sleeps in real time, as nobody else would move time on.
+    // whether the wait ended by Wait::End::done; refuses when the session was aborted or closed,
+    // and when one of the wait's devices does not answer any more. Where time goes by calls it
+    // sleeps in real time, as nobody else would move time on.
     bool sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock);
-    // Lets the time pass that something takes. Refuses like sleep().
-    void spend(nQITRMCAPI100_Session session, double seconds, std::unique_lock<std::mutex>& lock);
+    // Lets the time pass that something takes on devices. Refuses like sleep().
+    void spend(nQITRMCAPI100_Session session, const std::vector<Device*>& devices, double seconds,
+               std::unique_lock<std::mutex>& lock);
 
     // Ends all waits of a session.
     void endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept;
+    // Ends all waits about a device that has ceased to answer.
+    void endAbout(const Device& device) noexcept;
+
+    // Whoever waits keeps to an agenda, which lives as long as this object is in use.
+    void follow(Agenda& followed) { agenda = &followed; }
+    // To be called when the agenda has changed.
+    void lookAgain() noexcept;
 
   private:
+    using Deadline = std::chrono::steady_clock::time_point;
+
+    Deadline wakeBefore(Deadline deadline) const;
+    void sleepUntil(Deadline deadline, Wait& wait, std::unique_lock<std::mutex>& lock);
+    void expectUndisturbed(const Wait& wait) const;
+
     Clock& clock;
     std::list<Wait*> waiting;
+    Agenda* agenda = nullptr;
 };
 
 }  // namespace simulator

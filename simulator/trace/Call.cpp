@@ -17,8 +17,8 @@ Call& Call::session(nQITRMCAPI100_Session session) {
     return add("session", session);
 }
 
-Call& Call::resources(const char* name, const char* joined) {
-    resourceText = joined;
+Call& Call::resources(const char* name, const char* joined, const char* otherwise) {
+    resourceText = joined != nullptr ? joined : otherwise;
     return add(name, joined);
 }
 

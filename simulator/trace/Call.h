@@ -62,8 +62,9 @@ class Call {
 
     // Add an argument behind those present; at most `most`.
     Call& session(nQITRMCAPI100_Session handle);
-    // The argument that names the resources that the call is about.
-    Call& resources(const char* name, const char* joined);
+    // The argument that names the resources that the call is about. When it is null, `otherwise`
+    // names them.
+    Call& resources(const char* name, const char* joined, const char* otherwise = nullptr);
     template <typename Item>
     Call& in(const char* name, Item item) {
         return add(name, item);

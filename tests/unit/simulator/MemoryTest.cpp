@@ -197,8 +197,7 @@ TEST(MemoryTest, ACommandActsOnAllChannelsOrNone) {
 TEST(MemoryTest, AResettingCommandResetsEverythingOrNothing) {
     Session session("Mod1");
     EXPECT_EQ(set(setDouble, session, "Mod1", "DMM.Range", 1.0).code, 0);
-    EXPECT_EQ(set(setText, session, "Mod1", "DMM.Note", "a comment that is long enough").code,
-              0);
+    EXPECT_EQ(set(setText, session, "Mod1", "DMM.Note", "a comment that is long enough").code, 0);
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
                          nQITRMCAPI100_executeGenericCommand(session, "Mod1", "DMM.Defaults", 0.0,

@@ -1,0 +1,40 @@
+#pragma once
+
+#include <sys/stat.h>
+#include <sys/types.h>
+
+#include <cstdint>
+#include <string>
+
+namespace simulator {
+
+// By which two states of a file are told apart.
+struct FileVersion {
+    FileVersion() = default;
+    explicit FileVersion(const struct stat& state);
+
+    bool operator==(const FileVersion& other) const;
+    bool operator!=(const FileVersion& other) const { return !(*this == other); }
+
+    // All others mean something only when the file is there.
+    bool exists = false;
+    dev_t device = 0;
+    ino_t inode = 0;
+    off_t size = 0;
+    int64_t seconds = 0;
+    int64_t nanoseconds = 0;
+};
+
+// The present version of a file. One that cannot be asked for it counts as missing.
+FileVersion versionOf(const std::string& path) noexcept;
+
+struct TextFile {
+    std::string text;
+    FileVersion version;
+};
+
+// Reads a file of at most 16 MiB. Throws DescriptionFault, in which `right` says what the file has
+// to be.
+TextFile readTextFile(const std::string& path, const char* right);
+
+}  // namespace simulator

@@ -1,0 +1,76 @@
+#pragma once
+
+#include <cstdint>
+#include <limits>
+#include <optional>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "model/Chassis.h"
+#include "status/Refusal.h"
+
+namespace simulator {
+
+// What becomes of the texts and arrays that a call gives out.
+struct OutputFault {
+    // Both are null; a count stands beside the null array.
+    bool isNull = false;
+    // The texts in arrays are null.
+    bool hasNullItems = false;
+    // The length of every text in bytes, and the elements of every array.
+    std::optional<uint32_t> textSize;
+    std::optional<uint32_t> count;
+};
+
+// Which calls a fault strikes, and what it does to them.
+class Fault {
+  public:
+    // The name of a function without its prefix, or the beginning of such names.
+    std::string function;
+    bool isBeginning = true;
+    // Null for calls about anything.
+    const Resource* resource = nullptr;
+    // Of the calls that match: the first that is struck, the distance from one to the next, and how
+    // many.
+    uint64_t first = 1;
+    uint64_t every = 1;
+    uint64_t count = std::numeric_limits<uint64_t>::max();
+    // Of these calls again, the part that is struck, 0 to 1.
+    double probability = 1.0;
+
+    // Seconds.
+    double delay = 0.0;
+    // A failure or a warning.
+    std::optional<Refusal> status;
+    // Whether a call that fails is carried out before.
+    bool failsAfterwards = false;
+    std::optional<OutputFault> output;
+
+    bool matchesFunction(std::string_view name) const;
+    // Counts a call that matches. Returns whether it is struck. The same seed, the same place in
+    // the plan and the same number of calls give the same result.
+    bool takeTurn(uint32_t seed, size_t place);
+
+  private:
+    uint64_t matched = 0;
+};
+
+// What keeps a device from answering for a while.
+struct DeviceEvent {
+    const Device* device;
+    Absence absence;
+    // Seconds since the plan came into force.
+    double begin;
+    double end;
+};
+
+struct FaultPlan {
+    bool isEmpty() const { return faults.empty() && events.empty(); }
+
+    uint32_t seed = 0;
+    std::vector<Fault> faults;
+    std::vector<DeviceEvent> events;
+};
+
+}  // namespace simulator

@@ -1,0 +1,176 @@
+#include "faults/FaultReader.h"
+
+#include <algorithm>
+
+#include "DriverFunctions.h"
+#include "description/Description.h"
+#include "description/StatusFile.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr uint32_t mostBytes = 1u << 30;
+constexpr uint32_t mostElements = 1u << 24;
+
+void readFunction(const Node& node, Fault& fault) {
+    std::string name = node.text();
+    fault.isBeginning = !name.empty() && name.back() == '*';
+    if (fault.isBeginning) {
+        name.pop_back();
+    }
+    fault.function = std::move(name);
+    if (std::none_of(std::begin(driverFunctions), std::end(driverFunctions),
+                     [&](std::string_view known) { return fault.matchesFunction(known); })) {
+        node.fail("is not a function of the driver that has a status",
+                  "must be the name of one without nQITRMCAPI100_, or its beginning with a star");
+    }
+}
+
+const Resource& readResource(const Node& node, const Chassis& chassis) {
+    const Resource* resource = chassis.find(node.text());
+    if (resource == nullptr) {
+        node.fail("is not a resource of the chassis",
+                  "must be the name of a device, or of a channel or area such as Mod1/ch0");
+    }
+    return *resource;
+}
+
+void readTurns(const Node& node, Fault& fault) {
+    node.expectMembers({"first", "count", "every"});
+    const auto read = [&](const char* name, uint64_t& number) {
+        node.ifPresent(name,
+                       [&](const Node& value) { number = value.unsignedNumber(1, UINT32_MAX); });
+    };
+    read("first", fault.first);
+    read("count", fault.count);
+    read("every", fault.every);
+}
+
+double readProbability(const Node& node) {
+    const JsonValue& json = node.json();
+    node.expect(json.IsNumber() && json.GetDouble() >= 0.0 && json.GetDouble() <= 1.0,
+                "a number from 0 to 1");
+    return json.GetDouble();
+}
+
+bool readIsAfter(const Node& node) {
+    const std::string moment = node.text();
+    node.expect(moment == "before" || moment == "after", "before or after");
+    return moment == "after";
+}
+
+OutputFault readOutput(const Node& node) {
+    node.expectMembers({"null", "null_items", "text_size", "count"});
+    OutputFault output;
+    node.ifPresent("null", [&](const Node& flag) { output.isNull = flag.flag(); });
+    node.ifPresent("null_items", [&](const Node& flag) { output.hasNullItems = flag.flag(); });
+    node.ifPresent("text_size",
+                   [&](const Node& size) { output.textSize = size.unsignedNumber(0, mostBytes); });
+    node.ifPresent("count", [&](const Node& count) {
+        output.count = count.unsignedNumber(0, output.isNull ? UINT32_MAX : mostElements);
+    });
+    if (int{output.isNull} + int{output.hasNullItems} + int{output.textSize.has_value()} > 1) {
+        node.fail("says several things about one text",
+                  "must have one of null, null_items and text_size");
+    }
+    if (!output.isNull && !output.hasNullItems && !output.textSize && !output.count) {
+        node.fail("changes nothing", "must have null, null_items, text_size or count");
+    }
+    if (output.textSize && output.count && uint64_t{*output.textSize} * *output.count > mostBytes) {
+        node.fail("is too large", "text_size times count must be at most 1073741824");
+    }
+    return output;
+}
+
+// Makes sure that the members of a fault go together.
+void expectSense(const Node& node, const Fault& fault) {
+    const bool fails = fault.status && fault.status->code() < 0;
+    if (!node.has("delay") && !fault.status && !fault.output) {
+        node.fail("does nothing", "must have delay, status or output");
+    }
+    if (node.has("moment") && !fails) {
+        node.member("moment", "")
+            .fail("belongs to no failure",
+                  "only with a status below 0 there is a moment of failing");
+    }
+    if (fault.output && fails) {
+        node.member("output", "")
+            .fail("belongs to a call that fails", "a call that fails gives nothing out");
+    }
+}
+
+Fault readFault(const Node& node, const Chassis& chassis) {
+    node.expectMembers(
+        {"function", "resource", "calls", "probability", "delay", "status", "moment", "output"});
+    Fault fault;
+    node.ifPresent("function", [&](const Node& name) { readFunction(name, fault); });
+    node.ifPresent("resource",
+                   [&](const Node& name) { fault.resource = &readResource(name, chassis); });
+    node.ifPresent("calls", [&](const Node& turns) { readTurns(turns, fault); });
+    node.ifPresent("probability",
+                   [&](const Node& number) { fault.probability = readProbability(number); });
+    node.ifPresent("delay", [&](const Node& time) { fault.delay = time.seconds(); });
+    node.ifPresent("status", [&](const Node& status) {
+        fault.status = readStatus(status, chassis.enumerations);
+    });
+    node.ifPresent("moment",
+                   [&](const Node& moment) { fault.failsAfterwards = readIsAfter(moment); });
+    node.ifPresent("output", [&](const Node& output) { fault.output = readOutput(output); });
+    expectSense(node, fault);
+    return fault;
+}
+
+const Device& readDevice(const Node& node, const Chassis& chassis) {
+    const Device* device = chassis.findDevice(node.text());
+    if (device == nullptr) {
+        node.fail("is not a device of the chassis", "must be the name of one");
+    }
+    return *device;
+}
+
+Absence readAbsence(const Node& node, const Device& device) {
+    const std::string name = node.text();
+    node.expect(name == "pulled" || name == "connection_lost", "pulled or connection_lost");
+    if (name == "connection_lost") {
+        return Absence::connectionLost;
+    }
+    if (device.slot == 0) {
+        node.fail("befalls a device that is no module", "only what stands in a slot can be pulled");
+    }
+    return Absence::removed;
+}
+
+DeviceEvent readEvent(const Node& node, const Chassis& chassis) {
+    node.expectMembers({"device", "event", "after", "lasts"});
+    const Device& device = readDevice(node.member("device", "the name of a device"), chassis);
+    DeviceEvent event{&device,
+                      readAbsence(node.member("event", "pulled or connection_lost"), device), 0.0,
+                      std::numeric_limits<double>::infinity()};
+    node.ifPresent("after", [&](const Node& time) { event.begin = time.seconds(); });
+    node.ifPresent("lasts", [&](const Node& time) { event.end = event.begin + time.seconds(); });
+    return event;
+}
+
+}  // namespace
+
+FaultPlan readFaults(std::string_view text, const Chassis& chassis) {
+    JsonDocument document;
+    parseDescription(text, document, "a description of faults is one JSON object");
+    const Node root(document);
+    root.expectMembers({"seed", "faults", "events"});
+    FaultPlan plan;
+    root.ifPresent("seed",
+                   [&](const Node& seed) { plan.seed = seed.unsignedNumber(0, UINT32_MAX); });
+    root.ifPresent("faults", [&](const Node& faults) {
+        faults.forEachElement(
+            [&](const Node& fault) { plan.faults.push_back(readFault(fault, chassis)); });
+    });
+    root.ifPresent("events", [&](const Node& events) {
+        events.forEachElement(
+            [&](const Node& event) { plan.events.push_back(readEvent(event, chassis)); });
+    });
+    return plan;
+}
+
+}  // namespace simulator

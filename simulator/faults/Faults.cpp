@@ -1,0 +1,149 @@
+#include "faults/Faults.h"
+
+#include <algorithm>
+#include <cmath>
+#include <cstdlib>
+#include <utility>
+
+#include "description/StartRefusal.h"
+#include "faults/FaultReader.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr const char* variable = "QITRMC_SIM_FAULTS";
+
+std::string pathFromEnvironment() {
+    const char* path = std::getenv(variable);
+    return path != nullptr ? path : "";
+}
+
+}  // namespace
+
+Faults::Faults(Chassis& chassis, Sessions& sessions, Waits& waits, const Clock& clock)
+    : chassis(chassis),
+      sessions(sessions),
+      waits(waits),
+      clock(clock),
+      path(pathFromEnvironment()),
+      current(std::make_shared<FaultPlan>()),
+      start(clock.now()) {
+    waits.follow(*this);
+    noteWatching();
+    try {
+        readFile();
+    } catch (const DescriptionFault& fault) {
+        refuseStart(path, fault);
+    }
+}
+
+void Faults::noteWatching() {
+    on = !path.empty() || !current->isEmpty();
+}
+
+void Faults::readFile() {
+    const FileVersion present = path.empty() ? FileVersion() : versionOf(path);
+    if (present == version) {
+        return;
+    }
+    if (!present.exists) {
+        replace({});
+        version = present;
+        return;
+    }
+    try {
+        const TextFile file = readTextFile(path, "QITRMC_SIM_FAULTS must name a readable file");
+        replace(readFaults(file.text, chassis));
+        version = file.version;
+    } catch (const DescriptionFault&) {
+        version = present;
+        throw;
+    }
+}
+
+void Faults::refresh() {
+    try {
+        readFile();
+    } catch (const DescriptionFault& fault) {
+        tellFault(path, {fault.pointer, fault.wrong, fault.right + "; the former faults stay"});
+    }
+    catchUp();
+}
+
+void Faults::replace(FaultPlan fresh) {
+    auto former = std::make_shared<FaultPlan>(std::move(fresh));
+    const int64_t formerStart = std::exchange(start, clock.now());
+    current.swap(former);
+    due = start;
+    try {
+        catchUp();
+    } catch (...) {
+        current.swap(former);
+        start = formerStart;
+        throw;
+    }
+    noteWatching();
+    waits.lookAgain();
+}
+
+int64_t Faults::timeOf(double seconds) const {
+    // A time that nobody lives to see is as good as never.
+    constexpr double century = 100.0 * 366.0 * 24.0 * 60.0 * 60.0;
+    return seconds < century ? start + std::llround(seconds * 1e6) : never;
+}
+
+Absence Faults::absenceAt(const Device& device, int64_t time) const {
+    Absence absence = Absence::none;
+    for (const DeviceEvent& event : current->events) {
+        if (event.device == &device && timeOf(event.begin) <= time && time < timeOf(event.end)) {
+            absence = std::max(absence, event.absence);
+        }
+    }
+    return absence;
+}
+
+void Faults::catchUp() {
+    if (due == never) {
+        return;
+    }
+    const int64_t now = clock.now();
+    if (now < due) {
+        return;
+    }
+    for (const auto& device : chassis.devices()) {
+        change(*device, absenceAt(*device, now));
+    }
+    due = never;
+    for (const DeviceEvent& event : current->events) {
+        for (const int64_t time : {timeOf(event.begin), timeOf(event.end)}) {
+            due = time > now ? std::min(due, time) : due;
+        }
+    }
+}
+
+void Faults::change(Device& device, Absence absence) {
+    if (device.absence == absence) {
+        return;
+    }
+    if (device.absence == Absence::removed) {
+        chassis.reset(device, clock.now());
+    }
+    if (absence == Absence::removed) {
+        device.dropAllPending();
+    }
+    if (absence == Absence::removed || device.absence == Absence::removed) {
+        ++chassis.changes;
+    }
+    device.absence = absence;
+    if (absence != Absence::none) {
+        sessions.forEach([&](Session& session) {
+            auto& connected = session.connectedDevices;
+            connected.erase(std::remove(connected.begin(), connected.end(), &device),
+                            connected.end());
+        });
+        waits.endAbout(device);
+    }
+}
+
+}  // namespace simulator

@@ -1,0 +1,60 @@
+#pragma once
+
+#include <atomic>
+#include <memory>
+#include <string>
+
+#include "description/TextFile.h"
+#include "faults/FaultPlan.h"
+#include "sessions/Sessions.h"
+#include "sessions/Waits.h"
+
+namespace simulator {
+
+// The faults and events that are in force. Needs the simulator's mutex to be held, except for
+// isOn().
+class Faults : public Agenda {
+  public:
+    // Reads the file that QITRMC_SIM_FAULTS names. A file that is missing has no faults. Refuses
+    // with chassisNotLoaded when it is broken.
+    Faults(Chassis& chassis, Sessions& sessions, Waits& waits, const Clock& clock);
+
+    // Whether calls have to be shown to this object.
+    bool isOn() const noexcept { return on.load(); }
+
+    // To be called at the beginning of each call. Reads the file again when it is another one than
+    // the last time, and lets events happen. A file that is broken by then leaves everything as it
+    // is, and is told on standard error once.
+    void refresh();
+    // Puts another plan into force. Its time begins now.
+    void replace(FaultPlan fresh);
+
+    // The plan lives on while somebody holds it.
+    const std::shared_ptr<FaultPlan>& plan() const { return current; }
+
+    int64_t next() const override { return due; }
+    void catchUp() override;
+
+  private:
+    void readFile();
+    void noteWatching();
+    void change(Device& device, Absence absence);
+    Absence absenceAt(const Device& device, int64_t time) const;
+    int64_t timeOf(double seconds) const;
+
+    Chassis& chassis;
+    Sessions& sessions;
+    Waits& waits;
+    const Clock& clock;
+    // Empty when none is named.
+    const std::string path;
+    FileVersion version;
+    std::shared_ptr<FaultPlan> current;
+    // When the plan came into force, and when its next event begins or ends, in microseconds of the
+    // simulated time.
+    int64_t start;
+    int64_t due = never;
+    std::atomic<bool> on{false};
+};
+
+}  // namespace simulator

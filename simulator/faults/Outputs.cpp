@@ -1,0 +1,171 @@
+#include "faults/Outputs.h"
+
+#include <algorithm>
+#include <cstdlib>
+#include <new>
+#include <utility>
+
+#include "entries/Lending.h"
+
+namespace simulator {
+
+namespace {
+
+constexpr size_t mostTextBytes = size_t{1} << 30;
+
+void takeBack(char* text) noexcept {
+    std::free(text);
+}
+
+template <typename Number>
+void takeBack(Number* array, uint32_t) noexcept {
+    std::free(array);
+}
+
+void takeBack(char** array, uint32_t count) noexcept {
+    takeBackTexts(array, array == nullptr ? 0 : count);
+}
+
+template <typename Item>
+void lendInstead(const WantedArray<Item>& wanted, Item* array, uint32_t count) noexcept {
+    takeBack(std::exchange(*wanted.place, array), std::exchange(*wanted.count, count));
+}
+
+// The items of an array, repeated until there are `count` of them.
+template <typename Number>
+Number* repeated(const Number* items, uint32_t present, uint32_t count) {
+    std::vector<Number> list(count);
+    for (uint32_t i = 0; i < count && present > 0; ++i) {
+        list[i] = items[i % present];
+    }
+    return lendNumbers(list);
+}
+
+// A function object for each kind of output.
+class Distortion {
+  public:
+    explicit Distortion(const OutputFault& output) : output(output) {}
+
+    void operator()(const Wanted<char*>& wanted) const {
+        if (output.isNull) {
+            takeBack(std::exchange(*wanted.place, nullptr));
+        } else if (output.textSize) {
+            takeBack(std::exchange(*wanted.place, lendText(longText())));
+        }
+    }
+    template <typename Number>
+    void operator()(const WantedArray<Number>& wanted) const {
+        if (output.isNull) {
+            lendInstead(wanted, static_cast<Number*>(nullptr), output.count.value_or(0));
+        } else if (output.count) {
+            lendInstead(wanted, repeated(*wanted.place, *wanted.count, *output.count),
+                        *output.count);
+        }
+    }
+    void operator()(const WantedArray<char*>& wanted) const {
+        if (output.isNull) {
+            lendInstead(wanted, static_cast<char**>(nullptr), output.count.value_or(0));
+        } else {
+            const uint32_t count = output.count.value_or(*wanted.count);
+            lendInstead(wanted, textsInsteadOf(*wanted.place, *wanted.count, count), count);
+        }
+    }
+    // Numbers, and what the caller gives.
+    template <typename Other>
+    void operator()(const Other&) const {}
+
+  private:
+    std::string longText() const { return std::string(*output.textSize, 'x'); }
+
+    std::string textInsteadOf(char* const* texts, uint32_t present, uint32_t index) const {
+        if (output.textSize) {
+            return longText();
+        }
+        return present > 0 ? texts[index % present] : "";
+    }
+
+    char** textsInsteadOf(char* const* texts, uint32_t present, uint32_t count) const {
+        if (count == 0) {
+            return nullptr;
+        }
+        auto** array = static_cast<char**>(std::calloc(count, sizeof(char*)));
+        if (array == nullptr) {
+            throw std::bad_alloc();
+        }
+        try {
+            fill(array, count, texts, present);
+        } catch (...) {
+            takeBackTexts(array, count);
+            throw;
+        }
+        return array;
+    }
+
+    void fill(char** array, uint32_t count, char* const* texts, uint32_t present) const {
+        size_t bytes = 0;
+        for (uint32_t i = 0; i < count && !output.hasNullItems; ++i) {
+            const std::string text = textInsteadOf(texts, present, i);
+            if (text.size() > mostTextBytes - bytes) {
+                throw std::bad_alloc();
+            }
+            bytes += text.size();
+            array[i] = lendText(text);
+        }
+    }
+
+    const OutputFault& output;
+};
+
+// Takes back an output of any kind.
+struct TakingBack {
+    void operator()(const Wanted<char*>& wanted) const {
+        takeBack(std::exchange(*wanted.place, nullptr));
+    }
+    template <typename Number>
+    void operator()(const Wanted<Number>& wanted) const {
+        *wanted.place = Number{};
+    }
+    template <typename Item>
+    void operator()(const WantedArray<Item>& wanted) const {
+        lendInstead(wanted, static_cast<Item*>(nullptr), 0);
+    }
+    void operator()(const WantedBytes& wanted) const {
+        std::fill_n(wanted.buffer, wanted.size, uint8_t{0});
+    }
+    template <typename Other>
+    void operator()(const Other&) const {}
+};
+
+bool beginsWith(std::string_view name, std::string_view beginning) {
+    return name.substr(0, beginning.size()) == beginning;
+}
+
+// Closes what a function that opens something has given its caller a handle of.
+void closeOpened(Simulator& simulator, std::string_view function, uint32_t handle) noexcept {
+    if (beginsWith(function, "initializeSession")) {
+        simulator.close(handle);
+    } else if (function == "openGenericCommand") {
+        simulator.openCommands.remove(handle);
+    } else if (beginsWith(function, "open")) {
+        simulator.openProperties.remove(handle);
+    }
+}
+
+}  // namespace
+
+void distortOutputs(const Call& call, const OutputFault& output) {
+    for (const Argument& argument : call) {
+        std::visit(Distortion(output), argument.value);
+    }
+}
+
+void takeBackOutputs(Simulator& simulator, const Call& call) noexcept {
+    for (const Argument& argument : call) {
+        if (const auto* number = std::get_if<Wanted<uint32_t>>(&argument.value)) {
+            closeOpened(simulator, call.function(), *number->place);
+        }
+        std::visit(TakingBack(), argument.value);
+    }
+}
+
+}  // namespace simulator

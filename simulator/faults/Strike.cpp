@@ -1,0 +1,96 @@
+#include "faults/Strike.h"
+
+#include <algorithm>
+
+#include "faults/Outputs.h"
+
+namespace simulator {
+
+namespace {
+
+bool isAbout(const Resource& mentioned, const Resource& resource) {
+    return &mentioned == &resource ||
+           (resource.kind == Kind::device && mentioned.device == resource.device);
+}
+
+// The resources that a call names, found once and only when a fault asks for them.
+class Subjects {
+  public:
+    Subjects(Simulator& simulator, const Call& call) : simulator(simulator), call(call) {}
+
+    bool include(const Resource& resource) {
+        if (!areFound) {
+            find();
+        }
+        return std::any_of(found.begin(), found.end(), [&](const Resource* mentioned) {
+            return isAbout(*mentioned, resource);
+        });
+    }
+
+  private:
+    void find() {
+        if (call.resourceNames() != nullptr) {
+            const Session none;
+            const Session* session = simulator.sessions.find(call.sessionHandle());
+            found = simulator.resolver(session != nullptr ? *session : none)
+                        .mentioned(call.resourceNames());
+        }
+        areFound = true;
+    }
+
+    Simulator& simulator;
+    const Call& call;
+    bool areFound = false;
+    std::vector<Resource*> found;
+};
+
+}  // namespace
+
+Strike::Strike(Simulator& simulator, const Call& call)
+    : simulator(simulator), call(call), plan(simulator.faults.plan()) {
+    Subjects subjects(simulator, call);
+    for (size_t place = 0; place < plan->faults.size(); ++place) {
+        Fault& candidate = plan->faults[place];
+        if (candidate.matchesFunction(call.function()) &&
+            (candidate.resource == nullptr || subjects.include(*candidate.resource)) &&
+            candidate.takeTurn(plan->seed, place) && fault == nullptr) {
+            fault = &candidate;
+        }
+    }
+}
+
+void Strike::before(std::unique_lock<std::mutex>& lock) const {
+    if (fault == nullptr) {
+        return;
+    }
+    if (fault->delay > 0.0) {
+        simulator.waits.spend(call.sessionHandle(), {}, fault->delay, lock);
+    }
+    if (fault->status && fault->status->code() < 0 && !fault->failsAfterwards) {
+        throw Refusal(*fault->status);
+    }
+}
+
+void Strike::after() const {
+    if (fault == nullptr) {
+        return;
+    }
+    try {
+        if (fault->output) {
+            distortOutputs(call, *fault->output);
+        }
+        if (fault->status) {
+            throw Refusal(*fault->status);
+        }
+    } catch (const Refusal& refusal) {
+        if (refusal.code() < 0) {
+            takeBackOutputs(simulator, call);
+        }
+        throw;
+    } catch (...) {
+        takeBackOutputs(simulator, call);
+        throw;
+    }
+}
+
+}  // namespace simulator
