@@ -97,6 +97,7 @@ constexpr OptionWithValue kOptionsWithValue[] = {
     {"--plugin", setPath<&Options::plugin>},
     {"--chassis", setPath<&Options::chassis>},
     {"--state", setPath<&Options::state>},
+    {"--faults", setPath<&Options::faults>},
     {"--trace", setPath<&Options::trace>},
     {"--seed", setSeed},
     {"--time-scale", setTimeScale},

@@ -16,6 +16,7 @@ struct Options {
     std::string plugin;                   // path; empty: look beside the program
     std::string chassis;                  // path; empty: leave the driver's own choice
     std::string state;                    // path; empty: leave the driver's own choice
+    std::string faults;                   // path; empty: leave the driver's own choice
     std::string trace;                    // path; empty: leave the driver's own choice
     std::string seed;                     // 64-bit number; empty: leave the driver's own choice
     std::string timeScale;                // number or "calls"; empty: leave the driver's own choice

@@ -13,6 +13,8 @@ The service answers POST requests at /qitrmc/Call.
   --plugin PATH       the plug-in (libqitrmcsvc.so in ../lib beside the program's folder, or in it)
   --chassis FILE      the chassis that the simulated driver shows (QITRMC_SIM_CHASSIS)
   --state DIR         where the simulated driver keeps its state (QITRMC_SIM_STATE)
+  --faults FILE       what the simulated driver does wrong on purpose (QITRMC_SIM_FAULTS); the file
+                      may change, come and go while the host runs
   --trace FILE        where the simulated driver notes each call of it, "-" for standard error
                       (QITRMC_SIM_TRACE)
   --seed N            where the random numbers of the simulated chassis come from: the same seed

@@ -50,6 +50,7 @@ void configureDriver(const Options& options) {
         readFile(options.chassis, "chassis file", "--chassis");
     setEnvironment("QITRMC_SIM_CHASSIS", options.chassis);
     setEnvironment("QITRMC_SIM_STATE", options.state);
+    setEnvironment("QITRMC_SIM_FAULTS", options.faults);
     setEnvironment("QITRMC_SIM_TRACE", options.trace);
     setEnvironment("QITRMC_SIM_SEED", options.seed);
     setEnvironment("QITRMC_SIM_TIME_SCALE", options.timeScale);

@@ -64,7 +64,8 @@ void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Ses
     }
     if (longest > 0.0 && timeout > 0.0) {
         const auto devices = devicesOf(tasks);
-        waits.spend(session, devices, std::min(longest, timeout), lock);
+        Wait wait(session, &devices);
+        waits.spend(wait, std::min(longest, timeout), lock);
     }
     if (longest > timeout) {
         throw Refusal(code::commandTimedOut)

@@ -42,7 +42,8 @@ void spendConnectTime(const std::vector<Device*>& devices, double timeout,
         longest = std::max(longest, device->connectSeconds);
     }
     if (longest > 0.0 && timeout > 0.0) {
-        waits.spend(session, devices, std::min(longest, timeout), lock);
+        Wait wait(session, &devices);
+        waits.spend(wait, std::min(longest, timeout), lock);
     }
     if (longest > timeout) {
         throw Refusal(code::connectTimedOut).usage(tag::timeout, numberText(timeout));

@@ -84,7 +84,21 @@ void Faults::replace(FaultPlan fresh) {
         throw;
     }
     noteWatching();
+    for (Wait* wait : delays) {
+        wait->finish(Wait::End::done);
+    }
     waits.lookAgain();
+}
+
+void Faults::delay(nQITRMCAPI100_Session session, double seconds,
+                   std::unique_lock<std::mutex>& lock) {
+    Wait wait(session);
+    struct Delaying {
+        ~Delaying() { list.erase(place); }
+        std::list<Wait*>& list;
+        const std::list<Wait*>::iterator place;
+    } const isDelaying{delays, delays.insert(delays.end(), &wait)};
+    waits.spend(wait, seconds, lock);
 }
 
 int64_t Faults::timeOf(double seconds) const {

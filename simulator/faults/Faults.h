@@ -1,7 +1,9 @@
 #pragma once
 
 #include <atomic>
+#include <list>
 #include <memory>
+#include <mutex>
 #include <string>
 
 #include "description/TextFile.h"
@@ -29,6 +31,10 @@ class Faults : public Agenda {
     // Puts another plan into force. Its time begins now.
     void replace(FaultPlan fresh);
 
+    // Lets time pass, with the mutex given up, until other faults come into force. Refuses when the
+    // session is aborted or closed meanwhile.
+    void delay(nQITRMCAPI100_Session session, double seconds, std::unique_lock<std::mutex>& lock);
+
     // The plan lives on while somebody holds it.
     const std::shared_ptr<FaultPlan>& plan() const { return current; }
 
@@ -54,6 +60,7 @@ class Faults : public Agenda {
     // simulated time.
     int64_t start;
     int64_t due = never;
+    std::list<Wait*> delays;
     std::atomic<bool> on{false};
 };
 

@@ -63,8 +63,10 @@ void Strike::before(std::unique_lock<std::mutex>& lock) const {
     if (fault == nullptr) {
         return;
     }
-    if (fault->delay > 0.0) {
-        simulator.waits.spend(call.sessionHandle(), {}, fault->delay, lock);
+    // A call on a session that is not open fails by itself, and nothing could end its delay.
+    const nQITRMCAPI100_Session session = call.sessionHandle();
+    if (fault->delay > 0.0 && (session == 0 || simulator.sessions.find(session) != nullptr)) {
+        simulator.faults.delay(session, fault->delay, lock);
     }
     if (fault->status && fault->status->code() < 0 && !fault->failsAfterwards) {
         throw Refusal(*fault->status);

@@ -84,9 +84,7 @@ bool Waits::sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock
     return wait.end == Wait::End::done;
 }
 
-void Waits::spend(nQITRMCAPI100_Session session, const std::vector<Device*>& devices,
-                  double seconds, std::unique_lock<std::mutex>& lock) {
-    Wait wait(session, &devices);
+void Waits::spend(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock) {
     if (!clock.goesByCalls()) {
         sleep(wait, seconds, lock);
         return;

@@ -60,9 +60,8 @@ class Waits {
     // and when one of the wait's devices does not answer any more. Where time goes by calls it
     // sleeps in real time, as nobody else would move time on.
     bool sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock);
-    // Lets the time pass that something takes on devices. Refuses like sleep().
-    void spend(nQITRMCAPI100_Session session, const std::vector<Device*>& devices, double seconds,
-               std::unique_lock<std::mutex>& lock);
+    // Lets the time pass that something takes, unless the wait ends. Refuses like sleep().
+    void spend(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock);
 
     // Ends all waits of a session.
     void endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept;

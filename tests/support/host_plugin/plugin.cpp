@@ -70,6 +70,7 @@ void describe(ws_Request* request, const std::string& entry) {
     write(request, "body " + std::to_string(body(request).size()) + "\n");
     write(request, "chassis " + environment("QITRMC_SIM_CHASSIS") + "\n");
     write(request, "state " + environment("QITRMC_SIM_STATE") + "\n");
+    write(request, "faults " + environment("QITRMC_SIM_FAULTS") + "\n");
     write(request, "seed " + environment("QITRMC_SIM_SEED") + "\n");
     write(request, "time scale " + environment("QITRMC_SIM_TIME_SCALE") + "\n");
 }

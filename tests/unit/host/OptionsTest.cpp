@@ -30,6 +30,7 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
     EXPECT_EQ(options.plugin, "");
     EXPECT_EQ(options.chassis, "");
     EXPECT_EQ(options.state, "");
+    EXPECT_EQ(options.faults, "");
     EXPECT_EQ(options.trace, "");
     EXPECT_EQ(options.seed, "");
     EXPECT_EQ(options.timeScale, "");
@@ -41,16 +42,18 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
 }
 
 TEST(Options, EachOptionSetsItsOwnField) {
-    const Options options = parseOptions(
-        {"--listen",  "0.0.0.0:81", "--plugin",   "p.so",     "--chassis",    "c.json",
-         "--state",   "s",          "--seed",     "7",        "--time-scale", "8",
-         "--trace",   "t",          "--threads",  "3",        "--max-body",   "4",
-         "--timeout", "5",          "--tls-cert", "cert.pem", "--tls-key",    "key.pem"});
+    const Options options =
+        parseOptions({"--listen",     "0.0.0.0:81", "--plugin",  "p.so",   "--chassis",  "c.json",
+                      "--state",      "s",          "--faults",  "f.json", "--seed",     "7",
+                      "--time-scale", "8",          "--trace",   "t",      "--threads",  "3",
+                      "--max-body",   "4",          "--timeout", "5",      "--tls-cert", "cert.pem",
+                      "--tls-key",    "key.pem"});
     EXPECT_EQ(options.address, "0.0.0.0");
     EXPECT_EQ(options.port, "81");
     EXPECT_EQ(options.plugin, "p.so");
     EXPECT_EQ(options.chassis, "c.json");
     EXPECT_EQ(options.state, "s");
+    EXPECT_EQ(options.faults, "f.json");
     EXPECT_EQ(options.trace, "t");
     EXPECT_EQ(options.seed, "7");
     EXPECT_EQ(options.timeScale, "8");
@@ -138,7 +141,7 @@ TEST(Options, ATimeScaleIsANumberOrTheWordCalls) {
 
 TEST(Options, AnEmptyPathIsRefused) {
     for (const char* option :
-         {"--plugin", "--chassis", "--state", "--trace", "--tls-cert", "--tls-key"})
+         {"--plugin", "--chassis", "--state", "--faults", "--trace", "--tls-cert", "--tls-key"})
         EXPECT_EQ(usageErrorOf({option, ""}),
                   std::string(option) + " takes a path, not an empty text.");
 }
@@ -161,9 +164,9 @@ TEST(Options, ACertificateWithoutAKeyIsRefused) {
 }
 
 TEST(Options, TheHelpNamesEveryOption) {
-    for (const char* option : {"--listen", "--plugin", "--chassis", "--state", "--trace", "--seed",
-                               "--time-scale", "--threads", "--max-body", "--timeout", "--tls-cert",
-                               "--tls-key", "--help", "--version"}) {
+    for (const char* option : {"--listen", "--plugin", "--chassis", "--state", "--faults",
+                               "--trace", "--seed", "--time-scale", "--threads", "--max-body",
+                               "--timeout", "--tls-cert", "--tls-key", "--help", "--version"}) {
         EXPECT_THAT(host::kHelpText, HasSubstr(std::string("  ") + option + " "));
     }
 }

@@ -53,6 +53,24 @@ TEST(BrokenChassisTest, AnExponentOutOfRangeIsRefusedBeforeItIsRead) {
                 "exponents have at most 4 digits");
 }
 
+TEST(BrokenChassisTest, ABrokenFileOfFaultsIsRefusedLikeABrokenChassis) {
+    const ChassisFile file("{\"faults\":[{}]}");
+    const Probe probe = openWith("", "QITRMC_SIM_FAULTS='" + file.path + "'");
+    const std::string words = "does nothing; must have delay, status or output";
+    EXPECT_EQ(probe.output,
+              "-250952\n" +
+                  detailsOf("chassisNotLoaded", usage("FileName", "\"" + file.path + "\"") + "," +
+                                                    usage("JsonDocPointer", "\"/faults/0\"") + "," +
+                                                    usage("Details", "\"" + words + "\"")) +
+                  "\n0 0 0\n");
+    EXPECT_EQ(probe.errors, "qitrmcapi: " + file.path + ": /faults/0 " + words + "\n");
+}
+
+TEST(BrokenChassisTest, AFileOfFaultsMayBeMissing) {
+    EXPECT_EQ(openWith("", "QITRMC_SIM_FAULTS=/nonexistent/faults.json").output, "0\n\n1 2 3\n");
+    EXPECT_EQ(openWith("", "QITRMC_SIM_FAULTS=").output, "0\n\n1 2 3\n");
+}
+
 TEST(BrokenChassisTest, AMissingMemberIsNamedByItsPlace) {
     expectFault("{}", "/devices", "is missing; must be an array of devices");
     expectFault("{\"devices\":[{}]}", "/devices/0/name",

@@ -1,8 +1,17 @@
+#include "FaultsInForce.h"
 #include "Starvation.h"
 
 using namespace drivertest;
 
 namespace {
+
+// For functions that return their code, so that starve() finds what it finds elsewhere.
+void putNoDetails(qierr_Status* status) {
+    if (status->code != 0) {
+        status->reallocJson(status, 4);
+        std::memcpy(status->json, "{}", 2);
+    }
+}
 
 TEST(MemoryTest, OpeningASession) {
     Session warm("Mod1");
@@ -247,6 +256,116 @@ TEST(MemoryTest, WritingNvmem) {
                      }),
               0);
     EXPECT_EQ(resetDevices(session, "Mod5"), 0);
+}
+
+// The faults that are asked for replace the former ones, or these stay in force.
+TEST(MemoryTest, SettingFaults) {
+    Session session;
+    const std::string json =
+        "{\"faults\":[{\"function\":\"abortSession\",\"resource\":\"Mod1\",\"status\":{"
+        "\"code\":-5,\"constant\":\"kConstantOfTheStatus\",\"details\":[{\"header\":\"kA\"}],"
+        "\"causes\":[{\"code\":-6}]}},{\"function\":\"abortSession\",\"status\":{\"code\":-78}}],"
+        "\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"}]}";
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         status->code = qitrmcsim_setFaults(json.c_str(), nullptr);
+                         allowed = -1;
+                         EXPECT_EQ(session.abort(), status->code == 0 ? -78 : 0);
+                         putNoDetails(status);
+                     }),
+              0);
+    EXPECT_EQ(qitrmcsim_setFaults("{}", nullptr), 0);
+}
+
+TEST(MemoryTest, AModuleThatComesBack) {
+    Session session;
+    const FaultsInForce faults("{\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"}]}");
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         status->code = qitrmcsim_setFaults("{}", nullptr);
+                         allowed = -1;
+                         EXPECT_EQ(session.systemList("Sys.Devices").size(),
+                                   status->code == 0 ? 5u : 4u);
+                         putNoDetails(status);
+                     }),
+              0);
+}
+
+TEST(MemoryTest, AFailureByAFault) {
+    Session session;
+    const FaultsInForce faults(
+        oneFault("\"resource\":\"Mod2\",\"moment\":\"after\",\"status\":{\"code\":-77,"
+                 "\"json\":\"{}\"}"));
+    EXPECT_GT(starve(-77,
+                     [&](qierr_Status* status) {
+                         char** array = nullptr;
+                         uint32_t count = 0;
+                         nQITRMCAPI100_getGenericPropertyStringArray(
+                             session, "Mod1,Mod2", "Dev.ProductName", &array, &count, status);
+                         EXPECT_EQ(array, nullptr);
+                         EXPECT_EQ(count, 0u);
+                     }),
+              0);
+}
+
+TEST(MemoryTest, OutputsOfAFault) {
+    Session session;
+    for (const char* output : {"\"count\":5", "\"text_size\":100,\"count\":3"}) {
+        const FaultsInForce faults(oneFault("\"output\":{" + std::string(output) + "}"));
+        EXPECT_GT(starve(0,
+                         [&](qierr_Status* status) {
+                             char** array = nullptr;
+                             uint32_t count = 0;
+                             nQITRMCAPI100_getGenericPropertyStringArray(
+                                 session, "Mod1", "DMM.Labels", &array, &count, status);
+                             EXPECT_EQ(array == nullptr, status->code != 0);
+                             nQITRMCAPI100_freeStringArray(array, count);
+                         }),
+                  0);
+        EXPECT_GT(starve(0,
+                         [&](qierr_Status* status) {
+                             double* array = nullptr;
+                             uint32_t count = 0;
+                             nQITRMCAPI100_getGenericPropertyDoubleArray(
+                                 session, "Mod1", "DMM.Readings", &array, &count, status);
+                             EXPECT_EQ(array == nullptr, status->code != 0);
+                             nQITRMCAPI100_freeArray(array);
+                         }),
+                  0);
+    }
+}
+
+TEST(MemoryTest, ADelay) {
+    Session session;
+    const FaultsInForce faults(oneFault("\"function\":\"readRegister*\",\"delay\":0.001"));
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         uint8_t value = 0;
+                         nQITRMCAPI100_readRegisterUInt8(session, "Mod1", 0, &value, status);
+                     }),
+              0);
+}
+
+TEST(MemoryTest, AnOpeningThatIsToWarnLeavesNothingOpenWhenItFails) {
+    FaultsInForce faults("{}");
+    EXPECT_GT(starve(77,
+                     [&](qierr_Status* status) {
+                         const long left = allowed.exchange(-1);
+                         faults.replace(
+                             oneFault("\"function\":\"initialize*\",\"status\":{"
+                                      "\"code\":77,\"json\":\"{}\"}"));
+                         allowed = left;
+                         Handle handle = 0;
+                         nQITRMCAPI100_initializeSessionWithDevices(&handle, "Mod5", 60.0, 3, "",
+                                                                    0.0, status);
+                         allowed = -1;
+                         EXPECT_EQ(handle == 0, status->code < 0);
+                         faults.replace("{}");
+                         Status closing;
+                         nQITRMCAPI100_closeSession(handle, &closing);
+                         const Session next("Mod5");
+                     }),
+              0);
 }
 
 }  // namespace

@@ -39,13 +39,15 @@ def test_initialises_the_plugin_before_it_listens_and_finalises_it_once(start_ho
     assert log.read_text() == "init\nrun Nothing\nfinalize\n"
 
 
-def test_hands_the_chassis_and_state_to_the_driver(start_host, tmp_path):
+def test_hands_the_chassis_state_and_faults_to_the_driver(start_host, tmp_path):
     chassis = tmp_path / "chassis.json"
     chassis.write_text("")
-    host = start_host("--chassis", chassis, "--state", tmp_path / "state")
+    host = start_host("--chassis", chassis, "--state", tmp_path / "state",
+                      "--faults", tmp_path / "faults.json")
     lines = host.post(b"")[2].decode().splitlines()
     assert f"chassis {chassis}" in lines
     assert f"state {tmp_path / 'state'}" in lines
+    assert f"faults {tmp_path / 'faults.json'}" in lines
 
 
 def test_hands_the_seed_and_the_time_scale_to_the_driver(start_host):

@@ -1,0 +1,262 @@
+// Devices that are pulled out of their slots or lose their connection.
+
+#include <algorithm>
+#include <functional>
+
+#include "FaultsInForce.h"
+#include "Values.h"
+
+using namespace drivertest;
+
+namespace {
+
+constexpr int32_t deviceRemoved = -250940;
+constexpr int32_t connectionLost = -250941;
+constexpr int32_t deviceUnreachable = -250988;
+
+const std::string pulled = "{\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"}]}";
+const std::string lost = "{\"events\":[{\"device\":\"Mod2\",\"event\":\"connection_lost\"}]}";
+
+class DeviceEventTest : public BenchTest {
+  protected:
+    int32_t readTemperature(const char* device) {
+        return get(getDouble, session, device, "Dev.Temperature").code;
+    }
+    int32_t connect(const char* devices) {
+        Status status;
+        nQITRMCAPI100_connectToDevices(session, devices, 0.0, &status);
+        return status.code;
+    }
+    int32_t codeOf(void (*function)(Handle, const char*, qierr_Status*), const char* names) {
+        Status status;
+        function(session, names, &status);
+        return status.code;
+    }
+    uint64_t changeCount() {
+        Status status;
+        uint64_t count = 0;
+        nQITRMCAPI100_getSystemPropertyUInt64(session, "Sys.ConfigChangeCount", &count, &status);
+        return count;
+    }
+    // Every kind of operation on Mod2 and its parts.
+    std::vector<int32_t> codesOfOperations() {
+        Status writing;
+        nQITRMCAPI100_writeRegisterUInt8(session, "Mod2", 256, 1, &writing);
+        Status executing;
+        nQITRMCAPI100_executeGenericCommand(session, "Mod2/ch0", "PSU.On", 1.0, &executing);
+        Status opening;
+        nQITRMCAPI100_Property property = 0;
+        nQITRMCAPI100_openGenericProperty(session, "Mod2/ch0", "PSU.Voltage", &property, &opening);
+        Status renaming;
+        nQITRMCAPI100_renameDevice(session, "Mod2", "Other", &renaming);
+        Handle handle = 0;
+        Status starting;
+        nQITRMCAPI100_initializeSessionWithPhysChans(&handle, "Mod2/ch0", 60.0, 1, "", 0.0,
+                                                     &starting);
+        return {readTemperature("Mod2"),
+                readTemperature("Mod1,Mod2"),
+                get(getDouble, session, "Mod2/ch0", "PSU.Voltage").code,
+                get(getUInt32, session, "mod2/user", "NVMEMArea.Size").code,
+                set(setDouble, session, "Mod2/ch1", "PSU.Voltage", 1.0).code,
+                writing.code,
+                executing.code,
+                opening.code,
+                renaming.code,
+                starting.code,
+                session.reserve("Mod2"),
+                session.unreserve("Mod2"),
+                codeOf(nQITRMCAPI100_resetDevices, "Mod2"),
+                codeOf(nQITRMCAPI100_commitPropertiesGeneric, "Mod2"),
+                codeOf(nQITRMCAPI100_commitNvmemGeneric, "Mod2/user"),
+                codeOf(nQITRMCAPI100_disconnectFromDevices, "Mod2")};
+    }
+};
+
+TEST_F(DeviceEventTest, OperationsOnAPulledModuleFail) {
+    const FaultsInForce faults(pulled);
+    EXPECT_EQ(codesOfOperations(), std::vector<int32_t>(16, deviceRemoved));
+    EXPECT_EQ(connect("Mod2"), deviceRemoved);
+    EXPECT_EQ(get(getDouble, session, "Mod2", "Dev.Temperature").text,
+              detailsOf("deviceRemoved", usage("Device", "\"Mod2\"")));
+    EXPECT_EQ(readTemperature("Mod1"), 0);
+}
+
+TEST_F(DeviceEventTest, OperationsOnALostDeviceFail) {
+    const FaultsInForce faults(lost);
+    EXPECT_EQ(codesOfOperations(), std::vector<int32_t>(16, connectionLost));
+    EXPECT_EQ(get(getDouble, session, "Mod2/ch1", "PSU.Voltage").text,
+              detailsOf("connectionLost", usage("Device", "\"Mod2\"")));
+    EXPECT_EQ(readTemperature("Mod1"), 0);
+}
+
+TEST_F(DeviceEventTest, APulledModuleIsInNoListOfTheSystem) {
+    const FaultsInForce faults(pulled);
+    EXPECT_EQ(session.systemList("Sys.Devices"), (Names{"Bench", "Mod1", "Mod4", "Mod5"}));
+    EXPECT_EQ(session.deviceList("Bench", "Dev.Modules"), (Names{"Mod1", "Mod4", "Mod5"}));
+}
+
+TEST_F(DeviceEventTest, ALostDeviceStaysInTheListsOfTheSystem) {
+    const FaultsInForce faults(lost);
+    EXPECT_EQ(session.systemList("Sys.Devices"), (Names{"Bench", "Mod1", "Mod2", "Mod4", "Mod5"}));
+    EXPECT_EQ(session.deviceList("Bench", "Dev.Modules"), (Names{"Mod1", "Mod2", "Mod4", "Mod5"}));
+}
+
+TEST_F(DeviceEventTest, TokensThatStandForIt) {
+    ASSERT_EQ(connect("Mod1,Mod2"), 0);
+    for (const auto& [plan, code] : {std::pair(pulled, deviceRemoved), {lost, connectionLost}}) {
+        const FaultsInForce faults(plan);
+        EXPECT_EQ(readTemperature("$DefaultDevices"), code);
+        EXPECT_EQ(readTemperature("$ReservedDevices"), code);
+        EXPECT_EQ(readTemperature("$ConnectedDevices"), 0);
+    }
+}
+
+TEST_F(DeviceEventTest, ReservationsStay) {
+    {
+        const FaultsInForce faults(pulled);
+        EXPECT_EQ(session.list("Session.ReservedDevices"), (Names{"Mod1", "Mod2", "Mod4", "Mod5"}));
+        EXPECT_EQ(session.list("Session.DefaultDevices"), (Names{"Mod1", "Mod2", "Mod4", "Mod5"}));
+    }
+    Session other;
+    EXPECT_EQ(other.reserve("Mod2"), -250811);
+}
+
+TEST_F(DeviceEventTest, AllSessionsLoseTheConnection) {
+    Session other;
+    Status connecting;
+    nQITRMCAPI100_connectToDevices(other, "Mod2,Mod4", 0.0, &connecting);
+    ASSERT_EQ(connecting.code, 0);
+    for (const std::string& plan : {lost, pulled}) {
+        ASSERT_EQ(connect("Mod1,Mod2"), 0);
+        {
+            const FaultsInForce faults(plan);
+            EXPECT_EQ(session.list("Session.ConnectedDevices"), Names{"Mod1"});
+            EXPECT_EQ(other.list("Session.ConnectedDevices"), Names{"Mod4"});
+        }
+        EXPECT_EQ(session.list("Session.ConnectedDevices"), Names{"Mod1"});
+    }
+}
+
+TEST_F(DeviceEventTest, ALostDeviceCannotBeConnected) {
+    {
+        const FaultsInForce faults(lost);
+        Status status;
+        nQITRMCAPI100_connectToDevices(session, "Mod1,Mod2", 0.0, &status);
+        EXPECT_EQ(status.code, deviceUnreachable);
+        EXPECT_NE(status.text().find(usage("Device", "\"Mod2\"")), std::string::npos);
+        EXPECT_EQ(status.text().find("Mod1"), std::string::npos);
+    }
+    EXPECT_EQ(connect("Mod2"), 0);
+}
+
+TEST_F(DeviceEventTest, ALostDeviceKeepsItsStateAndAnswersAfterwards) {
+    ASSERT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 5.0).code, 0);
+    ASSERT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.CurrentLimit", 2.0).code, 0);
+    FaultsInForce(lost).replace("{}");
+    EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.Voltage"), 5.0);
+    EXPECT_EQ(codeOf(nQITRMCAPI100_commitPropertiesGeneric, "Mod2"), 0);
+    EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.CurrentLimit"), 2.0);
+}
+
+TEST_F(DeviceEventTest, AModuleComesBackAsAfterPowerOn) {
+    ASSERT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 5.0).code, 0);
+    ASSERT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.CurrentLimit", 2.0).code, 0);
+    Status writing;
+    nQITRMCAPI100_writeRegisterUInt8(session, "Mod2", 256, 7, &writing);
+    const uint8_t bytes[] = {1, 2};
+    nQITRMCAPI100_setNvmemBytes(session, "Mod2/user", 0, bytes, 1, "", "", &writing);
+    nQITRMCAPI100_commitNvmemGeneric(session, "Mod2/user", &writing);
+    nQITRMCAPI100_setNvmemBytes(session, "Mod2/user", 1, bytes + 1, 1, "", "", &writing);
+    nQITRMCAPI100_renameDevice(session, "Mod2", "Supply", &writing);
+    ASSERT_EQ(writing.code, 0) << writing.text();
+    FaultsInForce("{\"events\":[{\"device\":\"Supply\",\"event\":\"pulled\"}]}").replace("{}");
+    EXPECT_EQ(get(getDouble, session, "Supply/ch0", "PSU.Voltage"), 0.0);
+    EXPECT_EQ(codeOf(nQITRMCAPI100_commitPropertiesGeneric, "Supply"), 0);
+    EXPECT_EQ(get(getDouble, session, "Supply/ch0", "PSU.CurrentLimit"), 0.1);
+    Status reading;
+    uint8_t value = 9;
+    nQITRMCAPI100_readRegisterUInt8(session, "Supply", 256, &value, &reading);
+    EXPECT_EQ(value, 0);
+    uint8_t content[] = {9, 9};
+    nQITRMCAPI100_getNvmemBytes(session, "Supply/user", 0, content, 2, &reading);
+    EXPECT_EQ(reading.code, 0) << reading.text();
+    EXPECT_EQ(std::vector<int>(content, content + 2), (std::vector<int>{1, 0}));
+    const uint8_t nothing = 0;
+    nQITRMCAPI100_setNvmemBytes(session, "Supply/user", 0, &nothing, 1, "", "", &reading);
+    nQITRMCAPI100_commitNvmemGeneric(session, "Supply/user", &reading);
+    nQITRMCAPI100_renameDevice(session, "Supply", "Mod2", &reading);
+    EXPECT_EQ(reading.code, 0) << reading.text();
+}
+
+TEST_F(DeviceEventTest, TheNameOfAPulledModuleStaysTaken) {
+    const FaultsInForce faults(pulled);
+    Status status;
+    nQITRMCAPI100_renameDevice(session, "Mod1", "MOD2", &status);
+    EXPECT_EQ(status.code, -250986);
+}
+
+TEST_F(DeviceEventTest, PullingAndReturningChangeTheConfiguration) {
+    const uint64_t before = changeCount();
+    {
+        const FaultsInForce faults(pulled);
+        EXPECT_EQ(changeCount(), before + 1);
+    }
+    EXPECT_EQ(changeCount(), before + 2);
+    FaultsInForce(lost).replace("{}");
+    EXPECT_EQ(changeCount(), before + 2);
+}
+
+TEST_F(DeviceEventTest, AnEventOfBothPlansGoesOn) {
+    FaultsInForce faults(pulled);
+    const uint64_t before = changeCount();
+    faults.replace(pulled);
+    EXPECT_EQ(changeCount(), before);
+    EXPECT_EQ(readTemperature("Mod2"), deviceRemoved);
+    faults.replace(lost);
+    EXPECT_EQ(readTemperature("Mod2"), connectionLost);
+}
+
+TEST_F(DeviceEventTest, APulledModuleIsNotMerelyLost) {
+    const FaultsInForce faults(
+        "{\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"},"
+        "{\"device\":\"Mod2\",\"event\":\"connection_lost\"}]}");
+    EXPECT_EQ(readTemperature("Mod2"), deviceRemoved);
+}
+
+TEST_F(DeviceEventTest, ALostChassisKeepsItsModules) {
+    const FaultsInForce faults(
+        "{\"events\":[{\"device\":\"Bench\",\"event\":\"connection_lost\"}]}");
+    EXPECT_EQ(readTemperature("Mod2"), 0);
+    EXPECT_EQ(getText(session, "Bench", "Dev.ProductName").code, connectionLost);
+}
+
+TEST_F(DeviceEventTest, EventsBeginAndEndInTheirTime) {
+    const FaultsInForce faults(
+        "{\"events\":[{\"device\":\"Mod2\",\"event\":\"connection_lost\",\"after\":0.02,"
+        "\"lasts\":0.02},{\"device\":\"Mod2\",\"event\":\"pulled\",\"after\":0.06,"
+        "\"lasts\":0.02}]}");
+    std::vector<int32_t> codes{0};
+    while (std::count(codes.begin(), codes.end(), 0) < 3) {
+        const int32_t code = readTemperature("Mod2");
+        if (code != codes.back()) {
+            codes.push_back(code);
+        }
+    }
+    EXPECT_EQ(codes, (std::vector<int32_t>{0, connectionLost, 0, deviceRemoved, 0}));
+}
+
+TEST_F(DeviceEventTest, AnEventMayLastNoTimeAtAll) {
+    const FaultsInForce faults(
+        "{\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\",\"lasts\":0}]}");
+    EXPECT_EQ(readTemperature("Mod2"), 0);
+}
+
+TEST_F(DeviceEventTest, FaultsAndEventsGoTogether) {
+    const FaultsInForce faults(
+        "{\"faults\":[{\"resource\":\"Mod2\",\"calls\":{\"count\":1},\"status\":{\"code\":-77}}],"
+        "\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"}]}");
+    EXPECT_EQ(readTemperature("Mod2"), -77);
+    EXPECT_EQ(readTemperature("Mod2"), deviceRemoved);
+}
+
+}  // namespace

@@ -1,0 +1,45 @@
+#pragma once
+
+#include "Driver.h"
+#include "qitrmcsim.h"
+
+namespace drivertest {
+
+// What qitrmcsim_setFaults came to: the code, and the words about it.
+struct Setting {
+    int32_t code;
+    std::string reason;
+};
+
+inline std::ostream& operator<<(std::ostream& out, const Setting& setting) {
+    return out << setting.code << " " << setting.reason;
+}
+
+inline Setting setFaults(const std::string& json) {
+    char* reason = nullptr;
+    const int32_t code = qitrmcsim_setFaults(json.c_str(), &reason);
+    const Setting setting{code, reason != nullptr ? reason : ""};
+    nQITRMCAPI100_freeString(reason);
+    return setting;
+}
+
+// Faults that end with their scope.
+class FaultsInForce {
+  public:
+    explicit FaultsInForce(const std::string& json) { replace(json); }
+    FaultsInForce(const FaultsInForce&) = delete;
+    FaultsInForce& operator=(const FaultsInForce&) = delete;
+    ~FaultsInForce() { replace("{}"); }
+
+    void replace(const std::string& json) {
+        const Setting setting = setFaults(json);
+        EXPECT_EQ(setting.code, 0) << setting.reason << " in " << json;
+    }
+};
+
+// A description with one fault.
+inline std::string oneFault(const std::string& members) {
+    return "{\"faults\":[{" + members + "}]}";
+}
+
+}  // namespace drivertest
