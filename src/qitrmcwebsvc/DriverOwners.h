@@ -2,8 +2,10 @@
 
 #include <qitrmcapi.h>
 
+#include <cstddef>
 #include <cstdint>
 #include <cstdlib>
+#include <iterator>
 #include <new>
 #include <string>
 
@@ -14,9 +16,31 @@ namespace nQITRMCWEBSVC100 {
 // Owners of what the driver lends. Each is filled through its out pointers by a driver call and
 // gives everything back at its end, whether the call succeeded or not.
 
-// An array of texts.
+// An array of texts. A text that the driver left out is read as an empty one.
 class DriverStringArray {
   public:
+    class Iterator {
+      public:
+        using iterator_category = std::input_iterator_tag;
+        using value_type = const char*;
+        using difference_type = std::ptrdiff_t;
+        using pointer = const char* const*;
+        using reference = const char*;
+
+        explicit Iterator(char* const* place) : place(place) {}
+        const char* operator*() const { return *place != nullptr ? *place : ""; }
+        Iterator& operator++() {
+            ++place;
+            return *this;
+        }
+        Iterator operator++(int) { return Iterator(place++); }
+        bool operator==(const Iterator& other) const { return place == other.place; }
+        bool operator!=(const Iterator& other) const { return place != other.place; }
+
+      private:
+        char* const* place;
+    };
+
     DriverStringArray() = default;
     ~DriverStringArray() { nQITRMCAPI100_freeStringArray(array, count); }
     DriverStringArray(const DriverStringArray&) = delete;
@@ -25,8 +49,8 @@ class DriverStringArray {
     char*** outArray() { return &array; }
     std::uint32_t* outCount() { return &count; }
 
-    char* const* begin() const { return array; }
-    char* const* end() const { return array + (array != nullptr ? count : 0); }
+    Iterator begin() const { return Iterator(array); }
+    Iterator end() const { return Iterator(array + (array != nullptr ? count : 0)); }
 
   private:
     char** array = nullptr;
