@@ -167,15 +167,16 @@ def test_two_clients_see_a_device_leave_and_come_back(faulty, client, event, cod
             each.ask(call("closeSession", {"session_id": session}))
 
 
-def test_a_fault_of_one_device_leaves_the_rest_of_a_batch(faulty, client):
+def test_a_batch_stops_at_the_request_that_a_fault_strikes(faulty, client):
     session = client.open_session()
     faulty.put({"faults": [{"resource": "Mod2", "function": "getGeneric*",
                             "status": {"code": -77777}}]})
-    one = [call("getProperty", {"session_id": session, "devices": device,
-                                "property": "Dev.ProductName"}, str(id))
-           for id, device in enumerate(("Mod1", "Mod2", "Mod4"))]
-    answers = json.loads(client.ask_whole(batch(*one)))
-    assert ["error" in answer for answer in answers] == [False, True, False]
+    requests = [call("getProperty", {"session_id": session, "devices": device,
+                                     "property": "Dev.ProductName"})
+                for device in ("Mod1", "Mod2", "Mod4")]
+    first, *others = json.loads(client.ask_whole(batch(*requests)))
+    assert first["result"]["value"] == "Multimeter"
+    assert [answer["error"]["data"]["qitrmc_code"] for answer in others] == [-77777, -32001]
     client.ask(call("closeSession", {"session_id": session}))
 
 
