@@ -17,12 +17,6 @@ void* allocate(size_t size) {
     return memory;
 }
 
-char* copyOf(const std::string& text) {
-    auto* copy = static_cast<char*>(allocate(text.size() + 1));
-    std::memcpy(copy, text.c_str(), text.size() + 1);
-    return copy;
-}
-
 void freeTexts(char** array, size_t count) noexcept {
     for (size_t i = 0; i < count; ++i) {
         std::free(array[i]);
@@ -39,6 +33,13 @@ void complain(const char* function, const char* item) noexcept {
 
 }  // namespace
 
+char* copyOf(std::string_view text) {
+    auto* copy = static_cast<char*>(allocate(text.size() + 1));
+    std::memcpy(copy, text.data(), text.size());
+    copy[text.size()] = '\0';
+    return copy;
+}
+
 char* lendText(const std::string& text) {
     char* copy = copyOf(text);
     try {
@@ -51,14 +52,18 @@ char* lendText(const std::string& text) {
 }
 
 char** lendTexts(const std::vector<std::string>& texts) {
-    if (texts.empty()) {
+    return lendTexts(texts.size(), [&](size_t index) { return copyOf(texts[index]); });
+}
+
+char** lendTexts(size_t count, const std::function<char*(size_t)>& makeText) {
+    if (count == 0) {
         return nullptr;
     }
-    auto** array = static_cast<char**>(allocate(texts.size() * sizeof(char*)));
+    auto** array = static_cast<char**>(allocate(count * sizeof(char*)));
     size_t made = 0;
     try {
-        for (; made < texts.size(); ++made) {
-            array[made] = copyOf(texts[made]);
+        for (; made < count; ++made) {
+            array[made] = makeText(made);
         }
         Ledger::instance().lend(array, Ledger::Item::texts);
     } catch (...) {

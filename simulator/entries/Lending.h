@@ -3,7 +3,9 @@
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
+#include <functional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace simulator {
@@ -13,6 +15,10 @@ namespace simulator {
 char* lendText(const std::string& text);
 // An empty list is lent as null.
 char** lendTexts(const std::vector<std::string>& texts);
+// Lends an array of as many texts as count says; 0 is lent as null. makeText(index) makes them by
+// copyOf(), or leaves one null.
+char** lendTexts(size_t count, const std::function<char*(size_t)>& makeText);
+char* copyOf(std::string_view text);
 
 // Memory for an array of numbers that is lent. size is in bytes and not 0.
 void* lendNumberMemory(size_t size);

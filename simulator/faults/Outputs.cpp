@@ -1,7 +1,6 @@
 #include "faults/Outputs.h"
 
 #include <algorithm>
-#include <cstdlib>
 #include <new>
 #include <utility>
 
@@ -13,17 +12,13 @@ namespace {
 
 constexpr size_t mostTextBytes = size_t{1} << 30;
 
-void takeBack(char* text) noexcept {
-    std::free(text);
-}
-
 template <typename Number>
 void takeBack(Number* array, uint32_t) noexcept {
-    std::free(array);
+    takeBackNumbers(array);
 }
 
 void takeBack(char** array, uint32_t count) noexcept {
-    takeBackTexts(array, array == nullptr ? 0 : count);
+    takeBackTexts(array, count);
 }
 
 template <typename Item>
@@ -48,9 +43,9 @@ class Distortion {
 
     void operator()(const Wanted<char*>& wanted) const {
         if (output.isNull) {
-            takeBack(std::exchange(*wanted.place, nullptr));
+            takeBackText(std::exchange(*wanted.place, nullptr));
         } else if (output.textSize) {
-            takeBack(std::exchange(*wanted.place, lendText(longText())));
+            takeBackText(std::exchange(*wanted.place, lendText(longText())));
         }
     }
     template <typename Number>
@@ -77,7 +72,7 @@ class Distortion {
   private:
     std::string longText() const { return std::string(*output.textSize, 'x'); }
 
-    std::string textInsteadOf(char* const* texts, uint32_t present, uint32_t index) const {
+    std::string textInsteadOf(char* const* texts, uint32_t present, size_t index) const {
         if (output.textSize) {
             return longText();
         }
@@ -85,32 +80,18 @@ class Distortion {
     }
 
     char** textsInsteadOf(char* const* texts, uint32_t present, uint32_t count) const {
-        if (count == 0) {
-            return nullptr;
-        }
-        auto** array = static_cast<char**>(std::calloc(count, sizeof(char*)));
-        if (array == nullptr) {
-            throw std::bad_alloc();
-        }
-        try {
-            fill(array, count, texts, present);
-        } catch (...) {
-            takeBackTexts(array, count);
-            throw;
-        }
-        return array;
-    }
-
-    void fill(char** array, uint32_t count, char* const* texts, uint32_t present) const {
         size_t bytes = 0;
-        for (uint32_t i = 0; i < count && !output.hasNullItems; ++i) {
-            const std::string text = textInsteadOf(texts, present, i);
-            if (text.size() > mostTextBytes - bytes) {
+        return lendTexts(count, [&](size_t index) -> char* {
+            if (output.hasNullItems) {
+                return nullptr;
+            }
+            const std::string text = textInsteadOf(texts, present, index);
+            bytes += text.size();
+            if (bytes > mostTextBytes) {
                 throw std::bad_alloc();
             }
-            bytes += text.size();
-            array[i] = lendText(text);
-        }
+            return copyOf(text);
+        });
     }
 
     const OutputFault& output;
@@ -119,7 +100,7 @@ class Distortion {
 // Takes back an output of any kind.
 struct TakingBack {
     void operator()(const Wanted<char*>& wanted) const {
-        takeBack(std::exchange(*wanted.place, nullptr));
+        takeBackText(std::exchange(*wanted.place, nullptr));
     }
     template <typename Number>
     void operator()(const Wanted<Number>& wanted) const {

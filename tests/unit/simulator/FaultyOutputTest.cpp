@@ -72,7 +72,7 @@ TEST_F(FaultyOutputTest, NullArraysMayHaveACount) {
 
 TEST_F(FaultyOutputTest, NumbersStayAsTheyAre) {
     const FaultsInForce faults(output("\"null\":true,\"count\":5"));
-    EXPECT_EQ(get(getDouble, session, "Mod2", "Dev.Temperature"), 41.0);
+    EXPECT_EQ(get(getDouble, session, "Mod1", "DMM.Range"), 10.0);
     EXPECT_EQ(get(getUInt32, session, "Mod1/user", "NVMEMArea.Size"), 256u);
     uint8_t bytes[4] = {};
     Status status;
