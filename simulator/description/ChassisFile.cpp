@@ -41,8 +41,10 @@ class DeviceReader {
 Device& DeviceReader::addDevice(const Node& node) {
     const Node nameNode = node.member("name", "the name of the device");
     const std::string name = readName(nameNode, nameFault);
-    if (chassis.findDevice(name) != nullptr) {
-        nameNode.fail("is the name of two devices", "names must differ in more than letter case");
+    if (const Device* other = chassis.findDevice(name)) {
+        nameNode.fail(
+            "is " + nameNode.shown() + ", and there is a device \"" + other->name + "\" already",
+            "names must differ in more than letter case");
     }
     return chassis.addDevice(name);
 }
@@ -60,7 +62,9 @@ void DeviceReader::readModules(const Node& node, Device& owner) {
         Device& module = read(element, Place::slot);
         for (const Device* other : owner.modules) {
             if (other->slot == module.slot) {
-                element.fail("stands in a slot that is taken", "slots hold one module each");
+                element.member("slot", "")
+                    .fail("is the slot of \"" + other->name + "\" already",
+                          "slots hold one module each");
             }
         }
         owner.modules.push_back(&module);
@@ -102,7 +106,7 @@ Device& DeviceReader::read(const Node& node, Place place) {
 void readBuiltInCatalogue(Catalogue& catalogue) {
     JsonDocument document;
     parseDescription(embedded::catalogue, document);
-    readCatalogue(Node(document), {}, catalogue);
+    readCatalogue(Node(document), {}, Origin::driver, catalogue);
 }
 
 void fillFrom(const Node& root, const char* member, Category category, const Catalogue& catalogue,
@@ -118,8 +122,9 @@ std::unique_ptr<Chassis> parseChassis(std::string_view text) {
     JsonDocument document;
     parseDescription(text, document);
     const Node root(document);
-    root.expectMembers({"first_session_handle", "enums", "driver_properties", "system_values",
-                        "session_values", "devices", "seed"});
+    root.expectMembers({"$schema", "first_session_handle", "enums", "driver_properties",
+                        "system_values", "session_values", "devices", "seed"});
+    root.ifPresent("$schema", [](const Node& schema) { schema.text(); });
     auto chassis = std::make_unique<Chassis>();
     root.ifPresent("first_session_handle", [&](const Node& handle) {
         chassis->firstSessionHandle = handle.unsignedNumber(1, UINT32_MAX);
@@ -132,7 +137,7 @@ std::unique_ptr<Chassis> parseChassis(std::string_view text) {
     root.ifPresent("enums", [&](const Node& node) { enumerations = readEnumerations(node); });
     readBuiltInCatalogue(chassis->catalogue);
     root.ifPresent("driver_properties", [&](const Node& node) {
-        readCatalogue(node, enumerations, chassis->catalogue);
+        readCatalogue(node, enumerations, Origin::file, chassis->catalogue);
     });
     fillFrom(root, "system_values", Category::system, chassis->catalogue,
              chassis->systemProperties);

@@ -1,5 +1,6 @@
 #include "description/CommandFile.h"
 
+#include "description/Nearest.h"
 #include "description/PropertyFile.h"
 #include "description/StatusFile.h"
 #include "live/Maths.h"
@@ -14,14 +15,17 @@ using Owner = CommandEffect::Owner;
 const Property& effectTarget(const Node& node, const std::string& name, Owner owner,
                              const Resource& resource) {
     const bool ofDevice = owner == Owner::device;
-    const Property* property = (ofDevice ? *resource.device : resource).properties.find(name);
+    const PropertyStore& properties = (ofDevice ? *resource.device : resource).properties;
+    const Property* property = properties.find(name);
     if (property == nullptr && ofDevice) {
         node.fail("is not a stored property of the device",
-                  "on_device changes properties of the device that the resource belongs to");
+                  perhapsMeant(name, properties.names()) +
+                      "on_device changes properties of the device that the resource belongs to");
     }
     if (property == nullptr) {
         node.fail("is not a stored property of the resource",
-                  "a command changes properties of its own resource");
+                  perhapsMeant(name, properties.names()) +
+                      "a command changes properties of its own resource");
     }
     return *property;
 }
@@ -64,7 +68,8 @@ CommandFailure::State readState(const Node& node, const Resource& resource) {
     const Property* property = resource.properties.find(name);
     if (property == nullptr) {
         nameNode.fail("is not a stored property of the resource",
-                      "a command looks at properties of its own resource");
+                      perhapsMeant(name, resource.properties.names()) +
+                          "a command looks at properties of its own resource");
     }
     const Node valueNode = node.member("is", "the value at which the command fails");
     return {name, readValue(*property->definition, valueNode)};

@@ -1,9 +1,9 @@
 #include "description/Description.h"
 
-#include <rapidjson/error/en.h>
-
 #include <algorithm>
 
+#include "description/Nearest.h"
+#include "description/SyntaxFault.h"
 #include "model/Values.h"
 
 namespace simulator {
@@ -11,50 +11,99 @@ namespace simulator {
 namespace {
 
 constexpr size_t mostExponentDigits = 4;
-
-std::string lineAndColumn(std::string_view text, size_t offset) {
-    const std::string_view before = text.substr(0, std::min(offset, text.size()));
-    const auto line = 1 + std::count(before.begin(), before.end(), '\n');
-    const size_t lastBreak = before.rfind('\n');
-    const size_t column =
-        lastBreak == std::string_view::npos ? before.size() + 1 : before.size() - lastBreak;
-    return "line " + std::to_string(line) + ", column " + std::to_string(column);
-}
+constexpr size_t mostDigitsOfZero = 20;
 
 // The JSON library overflows its own arithmetic on numbers with huge exponents.
-void refuseHugeExponents(std::string_view text) {
+bool hasHugeExponent(std::string_view number) {
+    const size_t exponent = number.find_first_of("eE");
+    const size_t digits = number.find_first_not_of("+-", exponent + 1);
+    return exponent != std::string_view::npos && digits != std::string_view::npos &&
+           number.size() - digits > mostExponentDigits;
+}
+
+// It also takes the logarithm of a zero that is not written plainly.
+bool isLongZero(std::string_view number) {
+    const std::string_view digits = number.substr(0, number.find_first_of("eE"));
+    return digits.find_first_of("123456789") == std::string_view::npos &&
+           (digits.size() < number.size() || digits.size() > mostDigitsOfZero);
+}
+
+void refuseOddNumber(std::string_view text, size_t place, std::string_view number) {
+    if (hasHugeExponent(number)) {
+        throw DescriptionFault{"", "holds a number out of range at " + lineAndColumn(text, place),
+                               "exponents have at most 4 digits"};
+    }
+    if (isLongZero(number)) {
+        throw DescriptionFault{"", "holds a zero of many signs at " + lineAndColumn(text, place),
+                               "must be written as 0"};
+    }
+}
+
+void refuseOddNumbers(std::string_view text) {
     bool inString = false;
     for (size_t i = 0; i < text.size(); ++i) {
         if (text[i] == '\\' && inString) {
             ++i;
         } else if (text[i] == '"') {
             inString = !inString;
-        } else if (!inString && (text[i] == 'e' || text[i] == 'E')) {
-            const size_t digits = text.find_first_not_of("+-", i + 1);
-            const size_t end = text.find_first_not_of("0123456789", digits);
-            if (digits != std::string_view::npos &&
-                std::min(end, text.size()) - digits > mostExponentDigits) {
-                throw DescriptionFault{"",
-                                       "holds a number out of range at " + lineAndColumn(text, i),
-                                       "exponents have at most 4 digits"};
-            }
+        } else if (!inString && text[i] >= '0' && text[i] <= '9') {
+            const size_t end = text.find_first_not_of("0123456789.eE+-", i);
+            const std::string_view number = text.substr(i, end - i);
+            refuseOddNumber(text, i, number);
+            i += number.size() - 1;
         }
     }
 }
 
+// The beginning of a text, cut between characters.
+std::string beginning(std::string_view text) {
+    constexpr size_t most = 40;
+    size_t end = std::min(most, text.size());
+    while (end < text.size() && end > 0 &&
+           (static_cast<unsigned char>(text[end]) & 0xC0u) == 0x80u) {
+        --end;
+    }
+    return "\"" + oneLine(text.substr(0, end)) + (end < text.size() ? "...\"" : "\"");
+}
+
+std::string shownNumber(const JsonValue& number) {
+    if (number.IsInt64()) {
+        return std::to_string(number.GetInt64());
+    }
+    if (number.IsUint64()) {
+        return std::to_string(number.GetUint64());
+    }
+    const std::string digits = numberText(number.GetDouble());
+    const bool looksWhole = digits.find_first_not_of("-0123456789") == std::string::npos;
+    return looksWhole ? digits + ".0" : digits;
+}
+
 }  // namespace
 
-void parseDescription(std::string_view text, JsonDocument& document, const char* right) {
-    refuseHugeExponents(text);
+std::string oneLine(std::string_view text) {
+    std::string line(text);
+    std::replace_if(
+        line.begin(), line.end(), [](unsigned char c) { return c < 0x20 || c == 0x7F; }, '?');
+    return line;
+}
+
+std::string listed(const std::vector<std::string>& names) {
+    std::string all;
+    for (const std::string& name : names) {
+        all += all.empty() ? "" : ", ";
+        all += name;
+    }
+    return all;
+}
+
+void parseDescription(std::string_view text, JsonDocument& document, const char* what) {
+    refuseOddNumbers(text);
     constexpr unsigned flags = rapidjson::kParseIterativeFlag |
                                rapidjson::kParseValidateEncodingFlag |
                                rapidjson::kParseFullPrecisionFlag;
     document.Parse<flags>(text.data(), text.size());
     if (document.HasParseError()) {
-        throw DescriptionFault{"",
-                               "is not JSON at " + lineAndColumn(text, document.GetErrorOffset()) +
-                                   ": " + rapidjson::GetParseError_En(document.GetParseError()),
-                               right};
+        throw syntaxFault(text, document.GetErrorOffset(), document.GetParseError(), what);
     }
 }
 
@@ -72,25 +121,38 @@ std::string Node::childPointer(std::string_view name) const {
     return child;
 }
 
+std::string Node::shown() const {
+    if (value->IsString()) {
+        return "the text " + beginning({value->GetString(), value->GetStringLength()});
+    }
+    if (value->IsNumber()) {
+        return shownNumber(*value);
+    }
+    if (value->IsBool()) {
+        return value->GetBool() ? "true" : "false";
+    }
+    if (value->IsNull()) {
+        return "null";
+    }
+    return value->IsArray() ? "an array" : "an object";
+}
+
 void Node::fail(std::string wrong, std::string right) const {
     throw DescriptionFault{pointer, std::move(wrong), std::move(right)};
 }
 
 void Node::expect(bool condition, const char* right) const {
     if (!condition) {
-        fail("has the wrong type or range", std::string("must be ") + right);
+        fail("is " + shown(), std::string("must be ") + right);
     }
 }
 
 void Node::expectMembers(std::initializer_list<std::string_view> allowed) const {
-    std::string known;
-    for (const std::string_view name : allowed) {
-        known += known.empty() ? "" : ", ";
-        known += name;
-    }
     forEachMember([&](const std::string& name, const Node& member) {
         if (std::find(allowed.begin(), allowed.end(), name) == allowed.end()) {
-            member.fail("is not a known member", "the members here are " + known);
+            const std::vector<std::string> known(allowed.begin(), allowed.end());
+            member.fail("is not a known member",
+                        perhapsMeant(name, known) + "the members here are " + listed(known));
         }
     });
 }
@@ -107,6 +169,11 @@ Node Node::member(const char* name, const char* right) const {
     return Node(found->value, childPointer(name));
 }
 
+Node Node::element(size_t index) const {
+    return Node((*value)[static_cast<rapidjson::SizeType>(index)],
+                pointer + "/" + std::to_string(index));
+}
+
 std::string Node::text() const {
     expect(value->IsString(), "a text");
     if (std::string_view(value->GetString(), value->GetStringLength()).find('\0') !=
@@ -120,7 +187,7 @@ uint32_t Node::unsignedNumber(uint32_t least, uint32_t most) const {
     const std::string right =
         "must be a whole number from " + std::to_string(least) + " to " + std::to_string(most);
     if (!value->IsUint() || value->GetUint() < least || value->GetUint() > most) {
-        fail("has the wrong type or range", right);
+        fail("is " + shown(), right);
     }
     return value->GetUint();
 }
@@ -132,7 +199,7 @@ int32_t Node::signedNumber() const {
 
 double Node::number(double least, double most) const {
     if (!value->IsNumber() || value->GetDouble() < least || value->GetDouble() > most) {
-        fail("has the wrong type or range",
+        fail("is " + shown(),
              "must be a number from " + numberText(least) + " to " + numberText(most));
     }
     return value->GetDouble();

@@ -7,6 +7,7 @@
 #include <set>
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include <rapidjson/document.h>
 
@@ -48,9 +49,15 @@ struct DescriptionFault {
     std::string right;
 };
 
-// Parses a text, or throws a fault, in which `right` says what the text has to be.
+// A text with question marks in place of its control characters.
+std::string oneLine(std::string_view text);
+
+// Names with commas between them.
+std::string listed(const std::vector<std::string>& names);
+
+// Parses a text, or throws a fault. `what` says what the text is.
 void parseDescription(std::string_view text, JsonDocument& document,
-                      const char* right = "a chassis description is one JSON object");
+                      const char* what = "a chassis description");
 
 // One value of a description together with its place, for reading it with plain words about what
 // is wrong. The reading functions throw DescriptionFault.
@@ -80,12 +87,14 @@ class Node {
     double seconds() const;
     bool flag() const;
 
+    // The element of an array at an index that it has.
+    Node element(size_t index) const;
     // Calls visit(Node) for the elements of an array, in order.
     template <typename Visit>
     void forEachElement(Visit visit) const {
         expect(value->IsArray(), "an array");
         for (rapidjson::SizeType i = 0; i < value->Size(); ++i) {
-            visit(Node((*value)[i], pointer + "/" + std::to_string(i)));
+            visit(element(i));
         }
     }
     // Calls visit(name, Node) for the members of an object, in order. None may stand there twice.
@@ -106,7 +115,9 @@ class Node {
     const JsonValue& json() const { return *value; }
 
     [[noreturn]] void fail(std::string wrong, std::string right) const;
-    // Fails with "has the wrong type" unless the condition holds.
+    // What the value is, for messages.
+    std::string shown() const;
+    // Fails with what the value is and what it must be unless the condition holds.
     void expect(bool condition, const char* right) const;
 
   private:

@@ -1,6 +1,7 @@
 #include "description/LiveFile.h"
 
 #include "description/MotionFile.h"
+#include "description/Nearest.h"
 
 namespace simulator {
 
@@ -35,7 +36,8 @@ void LifeReader::readResource(const Node& live, const MotionPlace& place) {
         const Property* property = place.resource.properties.find(name);
         if (property == nullptr) {
             node.fail("is not a stored property of the resource",
-                      "only properties that the resource has and that hold a value can move");
+                      perhapsMeant(name, place.resource.properties.names()) +
+                          "only properties that the resource has and that hold a value can move");
         }
         const ReadMotion read = readMotion(node, place, *property->definition, chassis);
         chassis.life.add(place.resource, *property, read.motion, read.followed);

@@ -3,6 +3,7 @@
 #include <array>
 #include <utility>
 
+#include "description/Nearest.h"
 #include "live/Maths.h"
 
 namespace simulator {
@@ -57,7 +58,8 @@ const Property& propertyOf(const Resource& resource, const Node& node) {
     const Property* property = resource.properties.find(node.text());
     if (property == nullptr) {
         node.fail("is not a stored property of " + resource.fullName(),
-                  "must be a property that holds a value");
+                  perhapsMeant(node.text(), resource.properties.names()) +
+                      "must be a property that holds a value");
     }
     return *property;
 }
@@ -80,14 +82,14 @@ class FollowsReader {
 };
 
 const Resource* FollowsReader::followed() const {
+    bool optional = false;
+    node.ifPresent("optional", [&](const Node& flag) { optional = flag.flag(); });
     if (!node.has("resource")) {
         return &place.resource;
     }
     const Node nameNode = node.member("resource", "");
     const std::string name = withNumber(nameNode.text(), place.number);
     const Resource* found = chassis.find(name);
-    bool optional = false;
-    node.ifPresent("optional", [&](const Node& flag) { optional = flag.flag(); });
     if (found == nullptr && !optional) {
         nameNode.fail("is not a known resource: " + name,
                       "must be the full name of a device, a channel or an NVMEM area, or optional");
@@ -103,6 +105,8 @@ void FollowsReader::read(ReadMotion& into) const {
     readNumber(node, "offset", -largestTame, largestTame, follows.offset);
     readNumber(node, "time_constant", 0.0, day, follows.timeConstant);
     const Node propertyNode = node.member("property", "the name of a property");
+    propertyNode.text();
+    node.ifPresent("while", [](const Node& name) { name.text(); });
     into.followed = followed();
     if (into.followed == nullptr) {
         return;
@@ -153,7 +157,12 @@ Waveform::Shape readShape(const Node& node) {
             return shape;
         }
     }
-    node.fail("is not a known shape", "must be dc, noise, sawtooth, sine, square or triangle");
+    std::vector<std::string> known;
+    for (const auto& [shape, value] : shapes) {
+        known.emplace_back(shape);
+    }
+    node.fail("is not a known shape",
+              perhapsMeant(name, known) + "must be dc, noise, sawtooth, sine, square or triangle");
 }
 
 Waveform readWaveform(const Node& node, const MotionPlace& place) {

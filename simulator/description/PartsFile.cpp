@@ -1,6 +1,7 @@
 #include "description/PartsFile.h"
 
 #include "description/CommandFile.h"
+#include "description/Nearest.h"
 #include "model/NameText.h"
 
 namespace simulator {
@@ -26,7 +27,10 @@ bool readWritable(const Node& node) {
     }
     const Node access = node.member("access", "");
     const std::string name = access.text();
-    access.expect(name == "ReadOnly" || name == "ReadWrite", "ReadOnly or ReadWrite");
+    if (name != "ReadOnly" && name != "ReadWrite") {
+        access.fail("is " + access.shown(), perhapsMeant(name, {"ReadOnly", "ReadWrite"}) +
+                                                "must be ReadOnly or ReadWrite");
+    }
     return name == "ReadWrite";
 }
 
@@ -36,7 +40,7 @@ std::string readName(const Node& node, std::string (*faultOf)(std::string_view))
     const std::string name = node.text();
     const std::string fault = faultOf(name);
     if (!fault.empty()) {
-        node.fail("is not a name", fault);
+        node.fail("is " + node.shown() + ", which is not a name", fault);
     }
     return name;
 }
@@ -50,12 +54,14 @@ std::vector<uint8_t> readBytes(const Node& node) {
     const Node textNode = node.member("bytes", "");
     const std::string text = textNode.text();
     if (text.size() % 2 != 0 || text.size() / 2 > bytes.size()) {
-        textNode.fail("has the wrong length", "must be two digits for each byte, at most size");
+        textNode.fail("has " + std::to_string(text.size()) + " digits",
+                      "must be two digits for each byte, at most " +
+                          std::to_string(2 * bytes.size()) + " for this size");
     }
     for (size_t i = 0; i < text.size(); i += 2) {
         const int high = hexDigit(text[i]);
         const int low = hexDigit(text[i + 1]);
-        textNode.expect(high >= 0 && low >= 0, "hexadecimal digits");
+        textNode.expect(high >= 0 && low >= 0, "hexadecimal digits without blanks or 0x");
         bytes[i / 2] = static_cast<uint8_t>(high * 16 + low);
     }
     return bytes;
@@ -75,6 +81,7 @@ void readResource(const Node& node, Category category, const Chassis& chassis,
     });
     node.ifPresent("commands", [&](const Node& commands) {
         commands.forEachMember([&](const std::string& name, const Node& entry) {
+            expectWritableName(name, entry);
             resource.commands.push_back(readCommand(name, entry, resource, enumerations));
         });
     });
@@ -103,7 +110,9 @@ void readNvmemArea(const Node& node, const Enumerations& enumerations, Chassis& 
     const Node nameNode = node.member("name", "the name of the area");
     const std::string name = readName(nameNode, partNameFault);
     if (chassis.findPart(device, name) != nullptr) {
-        nameNode.fail("is the name of two parts of the device", "names must differ");
+        nameNode.fail("is " + nameNode.shown() +
+                          ", and the device has a channel or an area of this name already",
+                      "names must differ in more than letter case");
     }
     NvmemArea& area = chassis.addNvmemArea(device, name);
     NvmemMemory::Guard guard;

@@ -4,6 +4,8 @@
 #include <array>
 #include <utility>
 
+#include "description/Nearest.h"
+
 namespace simulator {
 
 namespace {
@@ -50,15 +52,27 @@ void readElement(const Node& node, List<uint64_t>& list) {
     list.push_back(node.json().GetUint64());
 }
 
+// "Off (0), On (1)"
+std::string itemsOf(const Enumeration& enumeration) {
+    std::vector<std::string> items;
+    for (const auto& [name, number] : enumeration.items) {
+        items.push_back(name + " (" + std::to_string(number) + ")");
+    }
+    return listed(items);
+}
+
 void readItem(const Enumeration& enumeration, const Node& node, Elements& elements) {
     const std::string name = node.text();
-    for (const auto& [item, number] : enumeration.items) {
-        if (item == name) {
-            std::get<List<int32_t>>(elements).push_back(number);
-            return;
-        }
+    if (const auto number = enumeration.numberOf(name)) {
+        std::get<List<int32_t>>(elements).push_back(*number);
+        return;
     }
-    node.fail("is not an item of the enumeration", "must be an item of " + enumeration.name);
+    std::vector<std::string> known;
+    for (const auto& [item, number] : enumeration.items) {
+        known.push_back(item);
+    }
+    node.fail("is " + node.shown() + ", no item of the enumeration " + enumeration.name,
+              perhapsMeant(name, known) + "the items are " + itemsOf(enumeration));
 }
 
 void readInto(const PropertyDefinition& definition, const Node& node, Elements& elements) {
@@ -87,6 +101,38 @@ std::optional<Elements> readLimit(const char* member, const PropertyDefinition& 
     return elements;
 }
 
+void expectOrder(const PropertyDefinition& definition, const Node& node) {
+    if (definition.least && definition.most && definition.firstOutOfRange(*definition.least)) {
+        const Node limit = node.member("min", "");
+        limit.fail("is " + limit.shown() + ", and above max", "must not be above max");
+    }
+}
+
+std::string limitWords(const PropertyDefinition& definition) {
+    const std::string least = definition.least ? " from " + firstText(*definition.least) : "";
+    const std::string most = definition.most ? " up to " + firstText(*definition.most) : "";
+    return "must be within the limits of the property," + least + most;
+}
+
+// The node of one element of a value.
+Node elementNode(const PropertyDefinition& definition, const Node& node, size_t index) {
+    return isArray(definition.type) ? node.element(index) : node;
+}
+
+void expectAllowed(const PropertyDefinition& definition, const Elements& elements,
+                   const Node& node) {
+    if (const auto index = definition.firstWithoutItem(elements)) {
+        const Node place = elementNode(definition, node, *index);
+        place.fail(
+            "is " + place.shown() + ", no item of the enumeration " + definition.enumeration->name,
+            "the items are " + itemsOf(*definition.enumeration));
+    }
+    if (const auto index = definition.firstOutOfRange(elements)) {
+        const Node place = elementNode(definition, node, *index);
+        place.fail("is " + place.shown(), limitWords(definition));
+    }
+}
+
 PropertyAccess readAccess(const Node& node) {
     if (!node.has("access")) {
         return PropertyAccess::readOnly;
@@ -99,16 +145,34 @@ PropertyAccess readAccess(const Node& node) {
     if (name == "WriteOnly") {
         return PropertyAccess::writeOnly;
     }
-    access.expect(name == "ReadWrite", "ReadOnly, WriteOnly or ReadWrite");
+    if (name != "ReadWrite") {
+        access.fail("is " + access.shown(),
+                    perhapsMeant(name, {"ReadOnly", "WriteOnly", "ReadWrite"}) +
+                        "must be ReadOnly, WriteOnly or ReadWrite");
+    }
     return PropertyAccess::readWrite;
 }
 
+constexpr const char* typeWords =
+    "Bool, Double, Int32, Int64, String, UInt32 or UInt64, or one of these with Array behind it";
+
+std::vector<std::string> typeNames() {
+    std::vector<std::string> names;
+    for (auto number = static_cast<int32_t>(DataType::boolean);
+         number <= static_cast<int32_t>(DataType::uint64Array); ++number) {
+        names.push_back(typeName(static_cast<DataType>(number)));
+    }
+    return names;
+}
+
 DataType readType(const Node& node) {
-    const Node typeNode = node.member("type", "a data type");
-    const auto type = typeNamed(typeNode.text());
-    typeNode.expect(type.has_value(),
-                    "Bool, Double, Int32, Int64, String, UInt32 or UInt64, or one of these "
-                    "with Array behind it");
+    const Node typeNode = node.member("type", typeWords);
+    const std::string name = typeNode.text();
+    const auto type = typeNamed(name);
+    if (!type) {
+        typeNode.fail("is " + typeNode.shown(),
+                      perhapsMeant(name, typeNames()) + "must be " + typeWords);
+    }
     return *type;
 }
 
@@ -119,9 +183,15 @@ std::shared_ptr<const Enumeration> readEnumerationOf(const PropertyDefinition& d
         return nullptr;
     }
     const Node nameNode = node.member("enum", "");
-    const auto found = enumerations.find(nameNode.text());
+    const std::string name = nameNode.text();
+    const auto found = enumerations.find(name);
     if (found == enumerations.end()) {
-        nameNode.fail("is not a known enumeration", "must be a member of /enums");
+        std::vector<std::string> known;
+        for (const auto& [other, enumeration] : enumerations) {
+            known.push_back(other);
+        }
+        nameNode.fail("is " + nameNode.shown() + ", which is not a known enumeration",
+                      perhapsMeant(name, known) + "must be a member of /enums");
     }
     if (elementType(definition.type) != DataType::int32) {
         nameNode.fail("enumerates what is no Int32", "the type must be Int32 or Int32Array");
@@ -129,13 +199,34 @@ std::shared_ptr<const Enumeration> readEnumerationOf(const PropertyDefinition& d
     return found->second;
 }
 
+// What is computed comes from the driver alone.
+void expectStored(const Node& node) {
+    node.ifPresent("computed", [](const Node& flag) {
+        flag.fail("is for built-in properties alone", "must be left out");
+    });
+}
+
+std::vector<std::string> storedNames(Category category, const Catalogue& catalogue) {
+    std::vector<std::string> names;
+    for (const DefinitionPointer& definition : catalogue.definitions(category)) {
+        if (!definition->computed) {
+            names.push_back(definition->name);
+        }
+    }
+    return names;
+}
+
 void addToCatalogue(const std::string& name, const Node& node, Category category,
-                    const Enumerations& enumerations, Catalogue& catalogue) {
+                    const Enumerations& enumerations, Origin origin, Catalogue& catalogue) {
+    expectWritableName(name, node);
     if (catalogue.find(category, name) != nullptr) {
         node.fail("is defined already", "each property is defined once");
     }
     const auto definition =
         std::make_shared<const PropertyDefinition>(readDefinition(name, node, enumerations));
+    if (origin == Origin::file) {
+        expectStored(node);
+    }
     const bool ofResource = category != Category::system && category != Category::session;
     if (definition->needsCommit && !ofResource) {
         node.fail("can never be committed", "only properties of resources are committed");
@@ -148,14 +239,22 @@ void addToCatalogue(const std::string& name, const Node& node, Category category
 
 }  // namespace
 
+void expectWritableName(const std::string& name, const Node& node) {
+    if (name.empty() || name.find('\0') != std::string::npos) {
+        node.fail("has no name that can be written", "must not be empty nor hold a NUL character");
+    }
+}
+
 Enumerations readEnumerations(const Node& node) {
     Enumerations enumerations;
     node.forEachMember([&](const std::string& name, const Node& itemsNode) {
+        expectWritableName(name, itemsNode);
         auto enumeration = std::make_shared<Enumeration>();
         enumeration->name = name;
         enumeration->id = firstEnumerationId + static_cast<uint32_t>(enumerations.size());
         itemsNode.forEachMember([&](const std::string& item, const Node& number) {
-            enumeration->items.emplace_back(item, number.signedNumber());
+            expectWritableName(item, number);
+            enumeration->add(item, number.signedNumber());
         });
         enumerations.emplace(name, std::move(enumeration));
     });
@@ -169,13 +268,7 @@ Elements readValue(const PropertyDefinition& definition, const Node& node) {
     } else {
         readInto(definition, node, elements);
     }
-    if (definition.firstWithoutItem(elements)) {
-        node.fail("is not an item of the enumeration",
-                  "must be an item of " + definition.enumeration->name);
-    }
-    if (definition.firstOutOfRange(elements)) {
-        node.fail("is out of range", "must be within the limits of the property");
-    }
+    expectAllowed(definition, elements, node);
     return elements;
 }
 
@@ -195,18 +288,20 @@ PropertyDefinition readDefinition(const std::string& name, const Node& node,
     node.ifPresent("unit", [&](const Node& text) { definition.unit = text.text(); });
     definition.least = readLimit("min", definition, node);
     definition.most = readLimit("max", definition, node);
+    expectOrder(definition, node);
     definition.enumeration = readEnumerationOf(definition, node, enumerations);
     node.ifPresent("value",
                    [&](const Node& value) { definition.initial = readValue(definition, value); });
     return definition;
 }
 
-void readCatalogue(const Node& node, const Enumerations& enumerations, Catalogue& catalogue) {
+void readCatalogue(const Node& node, const Enumerations& enumerations, Origin origin,
+                   Catalogue& catalogue) {
     node.expectMembers({"system", "session", "device", "phys_chan", "nvmem_area"});
     for (const auto& [member, category] : categories) {
         node.ifPresent(member, [&, category = category](const Node& definitions) {
             definitions.forEachMember([&](const std::string& name, const Node& entry) {
-                addToCatalogue(name, entry, category, enumerations, catalogue);
+                addToCatalogue(name, entry, category, enumerations, origin, catalogue);
             });
         });
     }
@@ -219,7 +314,8 @@ void fillStore(Category category, const Catalogue& catalogue, const Node* values
             const DefinitionPointer definition = catalogue.find(category, name);
             if (definition == nullptr || definition->computed) {
                 value.fail("is not a property whose value can be given",
-                           "must be a stored property that the driver defines for this kind");
+                           perhapsMeant(name, storedNames(category, catalogue)) +
+                               "must be a stored property that the driver defines for this kind");
             }
             store.add(definition, readValue(*definition, value));
         });
@@ -236,14 +332,12 @@ void addOwnProperties(const Node& node, Category category, const Catalogue& cata
     node.forEachMember([&](const std::string& name, const Node& entry) {
         auto definition =
             std::make_shared<PropertyDefinition>(readDefinition(name, entry, enumerations));
-        if (name.empty() || catalogue.find(category, name) != nullptr ||
-            store.find(name) != nullptr) {
+        expectWritableName(name, entry);
+        if (catalogue.find(category, name) != nullptr || store.find(name) != nullptr) {
             entry.fail("is no name for a property of its own",
-                       "must not be empty, nor a property that there is already");
+                       "must not be a property that the driver defines itself");
         }
-        if (definition->computed) {
-            entry.fail("claims to be computed", "only built-in properties are computed");
-        }
+        expectStored(entry);
         if (!definition->initial) {
             entry.fail("has no value", "must give a value");
         }

@@ -14,11 +14,18 @@ Enumerations readEnumerations(const Node& node);
 PropertyDefinition readDefinition(const std::string& name, const Node& node,
                                   const Enumerations& enumerations);
 
+// Makes sure that clients can write the name of a property, a command or the like.
+void expectWritableName(const std::string& name, const Node& node);
+
 // Reads a value that the property may have. Items of an enumeration may be given by name.
 Elements readValue(const PropertyDefinition& definition, const Node& node);
 
+// Who defines a property. What is computed can come from the driver alone.
+enum class Origin { driver, file };
+
 // Adds the driver-defined properties of an object of categories to a catalogue.
-void readCatalogue(const Node& node, const Enumerations& enumerations, Catalogue& catalogue);
+void readCatalogue(const Node& node, const Enumerations& enumerations, Origin origin,
+                   Catalogue& catalogue);
 
 // Fills a store with the driver-defined properties of a category that have a value: one from
 // `values`, which may be null, or the initial one of the definition.

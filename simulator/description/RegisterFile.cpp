@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "description/Nearest.h"
 #include "description/PartsFile.h"
 #include "model/RegisterValues.h"
 
@@ -14,8 +15,11 @@ void readAccess(const Node& node, RegisterBlock& block) {
         const std::string name = access.text();
         block.readable = name != "WriteOnly";
         block.writable = name != "ReadOnly";
-        access.expect(name == "ReadWrite" || !block.readable || !block.writable,
-                      "ReadOnly, WriteOnly or ReadWrite");
+        if (name != "ReadWrite" && block.readable && block.writable) {
+            access.fail("is " + access.shown(),
+                        perhapsMeant(name, {"ReadOnly", "WriteOnly", "ReadWrite"}) +
+                            "must be ReadOnly, WriteOnly or ReadWrite");
+        }
     });
 }
 
@@ -87,7 +91,8 @@ void readProperty(const Node& node, Resource& owner, RegisterBlock& block) {
     block.property = owner.properties.find(name);
     if (block.property == nullptr) {
         node.fail("is not a stored property of the resource",
-                  "a register shows a property that is there");
+                  perhapsMeant(name, owner.properties.names()) +
+                      "a register shows a property that is there");
     }
     const PropertyDefinition& definition = *block.property->definition;
     if (block.readable && definition.access == PropertyAccess::writeOnly) {
@@ -139,9 +144,12 @@ void readRegisterBlock(const Node& node, const Chassis& chassis, Device& device)
         expectNothingElse(node);
         readShown(shown, chassis, device, block);
     });
+    const uint64_t last = uint64_t{block.address} + block.size() - 1;
+    const std::string addresses = std::to_string(block.address) + " to " + std::to_string(last);
     if (!device.registers.add(std::move(block))) {
-        node.fail("overlaps other registers or the end of the addresses",
-                  "each address may stand for one register");
+        node.fail(
+            "has the addresses " + addresses + ", which overlap other registers or pass 4294967295",
+            "each address may stand for one register");
     }
 }
 

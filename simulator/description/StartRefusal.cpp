@@ -6,9 +6,10 @@
 
 namespace simulator {
 
-void tellFault(const std::string& source, const DescriptionFault& fault) noexcept {
-    std::fprintf(stderr, "qitrmcapi: %s: %s%s%s; %s\n", source.c_str(), fault.pointer.c_str(),
-                 fault.pointer.empty() ? "" : " ", fault.wrong.c_str(), fault.right.c_str());
+void tellFault(const std::string& source, const DescriptionFault& fault) {
+    const std::string place = fault.pointer.empty() ? "" : oneLine(fault.pointer) + " ";
+    std::fprintf(stderr, "qitrmcapi: %s: %s%s; %s\n", source.c_str(), place.c_str(),
+                 oneLine(fault.wrong).c_str(), oneLine(fault.right).c_str());
 }
 
 void refuseStart(const std::string& source, const DescriptionFault& fault) {

@@ -7,7 +7,7 @@
 namespace simulator {
 
 // Says on standard error, in one line, what is wrong with a file.
-void tellFault(const std::string& source, const DescriptionFault& fault) noexcept;
+void tellFault(const std::string& source, const DescriptionFault& fault);
 
 // Says on standard error, in one line, why the simulator cannot start, and throws a Refusal with
 // chassisNotLoaded. source: the file, or the environment variable, that is not as it should be.

@@ -156,7 +156,7 @@ DeviceEvent readEvent(const Node& node, const Chassis& chassis) {
 
 FaultPlan readFaults(std::string_view text, const Chassis& chassis) {
     JsonDocument document;
-    parseDescription(text, document, "a description of faults is one JSON object");
+    parseDescription(text, document, "a description of faults");
     const Node root(document);
     root.expectMembers({"seed", "faults", "events"});
     FaultPlan plan;

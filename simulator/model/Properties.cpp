@@ -4,9 +4,15 @@
 
 namespace simulator {
 
-bool Enumeration::has(int32_t value) const {
-    return std::any_of(items.begin(), items.end(),
-                       [&](const auto& item) { return item.second == value; });
+void Enumeration::add(const std::string& item, int32_t number) {
+    items.emplace_back(item, number);
+    byName.emplace(item, number);
+    numbers.insert(number);
+}
+
+std::optional<int32_t> Enumeration::numberOf(std::string_view item) const {
+    const auto found = byName.find(item);
+    return found == byName.end() ? std::nullopt : std::optional(found->second);
 }
 
 std::optional<size_t> PropertyDefinition::firstOutOfRange(const Elements& value) const {
@@ -63,6 +69,14 @@ const Property* PropertyStore::find(std::string_view name) const {
     return found == all.end() ? nullptr : &found->second;
 }
 
+std::vector<std::string> PropertyStore::names() const {
+    std::vector<std::string> names;
+    for (const auto& [name, property] : all) {
+        names.push_back(name);
+    }
+    return names;
+}
+
 void PropertyStore::commit() {
     for (auto& [name, property] : all) {
         if (property.pending) {
@@ -88,6 +102,7 @@ void PropertyStore::dropAllPending() noexcept {
 
 void Catalogue::add(Category category, const DefinitionPointer& definition) {
     all[category].push_back(definition);
+    byName[category].emplace(definition->name, definition);
 }
 
 const std::vector<DefinitionPointer>& Catalogue::definitions(Category category) const {
@@ -105,12 +120,12 @@ std::vector<std::string> Catalogue::names(Category category) const {
 }
 
 DefinitionPointer Catalogue::find(Category category, std::string_view name) const {
-    for (const DefinitionPointer& definition : definitions(category)) {
-        if (definition->name == name) {
-            return definition;
-        }
+    const auto names = byName.find(category);
+    if (names == byName.end()) {
+        return nullptr;
     }
-    return nullptr;
+    const auto found = names->second.find(name);
+    return found == names->second.end() ? nullptr : found->second;
 }
 
 }  // namespace simulator

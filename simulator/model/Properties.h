@@ -3,6 +3,7 @@
 #include <map>
 #include <memory>
 #include <optional>
+#include <set>
 #include <string>
 #include <string_view>
 #include <utility>
@@ -26,7 +27,15 @@ struct Enumeration {
     // In the order of the description.
     std::vector<std::pair<std::string, int32_t>> items;
 
-    bool has(int32_t value) const;
+    // Adds an item. The name must be free.
+    void add(const std::string& item, int32_t number);
+    bool has(int32_t value) const { return numbers.count(value) != 0; }
+    // Returns nothing when there is no such item.
+    std::optional<int32_t> numberOf(std::string_view item) const;
+
+  private:
+    std::map<std::string, int32_t, std::less<>> byName;
+    std::set<int32_t> numbers;
 };
 
 // By their names.
@@ -86,6 +95,8 @@ class PropertyStore {
     Property* find(std::string_view name);
     const Property* find(std::string_view name) const;
 
+    // The names of all properties, sorted.
+    std::vector<std::string> names() const;
     // The names of the properties that the driver does not define, in the order of addition.
     const std::vector<std::string>& ownNames() const { return own; }
 
@@ -117,7 +128,9 @@ class Catalogue {
     DefinitionPointer find(Category category, std::string_view name) const;
 
   private:
+    // In the order of addition, and to be found by name.
     std::map<Category, std::vector<DefinitionPointer>> all;
+    std::map<Category, std::map<std::string, DefinitionPointer, std::less<>>> byName;
 };
 
 }  // namespace simulator

@@ -49,7 +49,7 @@ TEST(BrokenChassisTest, TextThatIsNotJsonIsToldWithItsLine) {
 
 TEST(BrokenChassisTest, AnExponentOutOfRangeIsRefusedBeforeItIsRead) {
     expectFault("{\"devices\": 0.1e-2147483639}", "",
-                "holds a number out of range at line 1, column 16; "
+                "holds a number out of range at line 1, column 13; "
                 "exponents have at most 4 digits");
 }
 
@@ -79,8 +79,9 @@ TEST(BrokenChassisTest, AMissingMemberIsNamedByItsPlace) {
 
 TEST(BrokenChassisTest, AMistypedMemberIsNamedWithTheOnesThatExist) {
     expectFault("{\"devises\":[]}", "/devises",
-                "is not a known member; the members here are first_session_handle, enums, "
-                "driver_properties, system_values, session_values, devices, seed");
+                "is not a known member; perhaps \"devices\" is meant; the members here are "
+                "$schema, first_session_handle, enums, driver_properties, system_values, "
+                "session_values, devices, seed");
 }
 
 TEST(BrokenChassisTest, AMemberThatStandsTwiceIsRefused) {
@@ -98,25 +99,30 @@ TEST(BrokenChassisTest, NamesThatClientsCannotWriteAreRefused) {
         return "{\"devices\":[{\"name\":\"" + name + "\",\"category\":1}]}";
     };
     expectFault(named("A,B"), "/devices/0/name",
-                "is not a name; a name must not hold a comma, a slash or a colon");
-    expectFault(named(""), "/devices/0/name", "is not a name; a name must not be empty");
+                "is the text \"A,B\", which is not a name; "
+                "a name must not hold a comma, a slash or a colon");
+    expectFault(named(""), "/devices/0/name",
+                "is the text \"\", which is not a name; a name must not be empty");
     expectFault(named("$A"), "/devices/0/name",
-                "is not a name; names that begin with a dollar sign are reserved");
+                "is the text \"$A\", which is not a name; names that begin with a dollar sign are "
+                "reserved");
     expectFault(named(std::string(65, 'x')), "/devices/0/name",
-                "is not a name; a name has at most 64 bytes");
+                "is the text \"" + std::string(40, 'x') +
+                    "...\", which is not a name; a name has at most 64 bytes");
 }
 
 TEST(BrokenChassisTest, NamesThatDifferInLetterCaseAloneAreRefused) {
     expectFault("{\"devices\":[{\"name\":\"A\",\"category\":2},{\"name\":\"a\",\"category\":2}]}",
                 "/devices/1/name",
-                "is the name of two devices; names must differ in more than letter case");
+                "is the text \"a\", and there is a device \"A\" already; names must differ in more "
+                "than letter case");
 }
 
 TEST(BrokenChassisTest, ASlotHoldsOneModule) {
     expectFault(device(",\"modules\":[{\"name\":\"B\",\"category\":2,\"slot\":1},"
                        "{\"name\":\"C\",\"category\":2,\"slot\":1}]"),
-                "/devices/0/modules/1",
-                "stands in a slot that is taken; slots hold one module each");
+                "/devices/0/modules/1/slot",
+                "is the slot of \"B\" already; slots hold one module each");
 }
 
 TEST(BrokenChassisTest, ModulesHaveNoModules) {
@@ -127,16 +133,19 @@ TEST(BrokenChassisTest, ModulesHaveNoModules) {
 }
 
 TEST(BrokenChassisTest, AnAreaMustNotBeCalledLikeAChannel) {
-    expectFault(device(",\"channels\":{\"prefix\":\"ch\",\"count\":2},"
-                       "\"nvmem_areas\":[{\"name\":\"CH1\"}]"),
-                "/devices/0/nvmem_areas/0/name",
-                "is the name of two parts of the device; names must differ");
+    expectFault(
+        device(",\"channels\":{\"prefix\":\"ch\",\"count\":2},"
+               "\"nvmem_areas\":[{\"name\":\"CH1\"}]"),
+        "/devices/0/nvmem_areas/0/name",
+        "is the text \"CH1\", and the device has a channel or an area of this name already; "
+        "names must differ in more than letter case");
 }
 
 TEST(BrokenChassisTest, APartThatARangeCannotNameIsRefused) {
-    expectFault(device(",\"nvmem_areas\":[{\"name\":\"cal01\"}]"), "/devices/0/nvmem_areas/0/name",
-                "is not a name; the number at its end must not begin with 0, "
-                "or a range could not name it");
+    expectFault(
+        device(",\"nvmem_areas\":[{\"name\":\"cal01\"}]"), "/devices/0/nvmem_areas/0/name",
+        "is the text \"cal01\", which is not a name; the number at its end must not begin with 0, "
+        "or a range could not name it");
 }
 
 TEST(BrokenChassisTest, DeepNestingIsReadWithoutHarm) {
@@ -153,25 +162,26 @@ void expectPropertyFault(const std::string& members, const std::string& place,
 
 TEST(BrokenChassisTest, PropertiesThatMakeNoSenseAreRefused) {
     expectPropertyFault("\"type\":\"Float\"", "/type",
-                        "has the wrong type or range; must be Bool, Double, Int32, Int64, String, "
+                        "is the text \"Float\"; must be Bool, Double, Int32, Int64, String, "
                         "UInt32 or UInt64, or one of these with Array behind it");
     expectPropertyFault("\"type\":\"Bool\"", "", "has no value; must give a value");
     expectPropertyFault("\"type\":\"UInt32\",\"value\":-1", "/value",
-                        "has the wrong type or range; "
+                        "is -1; "
                         "must be a whole number from 0 to 4294967295");
     expectPropertyFault("\"type\":\"Int32\",\"max\":4,\"value\":5", "/value",
-                        "is out of range; must be within the limits of the property");
+                        "is 5; must be within the limits of the property, up to 4");
     expectPropertyFault("\"type\":\"String\",\"min\":1,\"value\":\"\"", "/min",
                         "limits what is no number; only numbers have limits");
-    expectPropertyFault("\"type\":\"Int32\",\"enum\":\"E\",\"value\":5", "/enum",
-                        "is not a known enumeration; must be a member of /enums");
+    expectPropertyFault(
+        "\"type\":\"Int32\",\"enum\":\"E\",\"value\":5", "/enum",
+        "is the text \"E\", which is not a known enumeration; must be a member of /enums");
     expectPropertyFault("\"type\":\"BoolArray\",\"value\":[true,1]", "/value/1",
-                        "has the wrong type or range; must be true or false");
+                        "is 1; must be true or false");
     expectPropertyFault("\"type\":\"Bool\",\"access\":\"None\",\"value\":true", "/access",
-                        "has the wrong type or range; "
+                        "is the text \"None\"; "
                         "must be ReadOnly, WriteOnly or ReadWrite");
-    expectPropertyFault("\"type\":\"Bool\",\"computed\":true,\"value\":true", "",
-                        "claims to be computed; only built-in properties are computed");
+    expectPropertyFault("\"type\":\"Bool\",\"computed\":true,\"value\":true", "/computed",
+                        "is for built-in properties alone; must be left out");
     expectPropertyFault("\"type\":\"String\",\"value\":\"a\\u0000b\"", "/value",
                         "holds a NUL character; texts must not hold one");
 }
@@ -180,18 +190,20 @@ TEST(BrokenChassisTest, AnItemThatTheEnumerationLacksIsRefused) {
     expectFault(
         "{\"enums\":{\"E\":{\"On\":1}},\"devices\":[{\"name\":\"A\",\"category\":2,"
         "\"properties\":{\"P\":{\"type\":\"Int32\",\"enum\":\"E\",\"value\":\"Off\"}}}]}",
-        "/devices/0/properties/P/value", "is not an item of the enumeration; must be an item of E");
+        "/devices/0/properties/P/value",
+        "is the text \"Off\", no item of the enumeration E; the items are On (1)");
     expectFault(
         "{\"enums\":{\"E\":{\"On\":1}},\"devices\":[{\"name\":\"A\",\"category\":2,"
         "\"properties\":{\"P\":{\"type\":\"Int32\",\"enum\":\"E\",\"value\":2}}}]}",
-        "/devices/0/properties/P/value", "is not an item of the enumeration; must be an item of E");
+        "/devices/0/properties/P/value",
+        "is 2, no item of the enumeration E; the items are On (1)");
 }
 
 TEST(BrokenChassisTest, DriverPropertiesKeepTheirMeaning) {
     expectFault(device(",\"properties\":{\"Dev.Name\":{\"type\":\"Bool\",\"value\":true}}"),
                 "/devices/0/properties/Dev.Name",
                 "is no name for a property of its own; "
-                "must not be empty, nor a property that there is already");
+                "must not be a property that the driver defines itself");
     expectFault(device(",\"values\":{\"Dev.Name\":\"B\"}"), "/devices/0/values/Dev.Name",
                 "is not a property whose value can be given; "
                 "must be a stored property that the driver defines for this kind");
@@ -220,18 +232,19 @@ TEST(BrokenChassisTest, CommandsActOnWhatIsThere) {
                 "/devices/0/commands/C/adds/Dev.Comment",
                 "cannot be added to; only single numbers can");
     expectFault(device(",\"commands\":{\"C\":{\"seconds\":-1}}"), "/devices/0/commands/C/seconds",
-                "has the wrong type or range; must be a time in seconds, from 0 to a day");
+                "is -1; must be a time in seconds, from 0 to a day");
 }
 
 TEST(BrokenChassisTest, RegistersDoNotOverlap) {
     expectFault(device(",\"registers\":[{\"address\":0,\"size\":8},"
                        "{\"address\":7,\"size\":1}]"),
                 "/devices/0/registers/1",
-                "overlaps other registers or the end of the addresses; "
+                "has the addresses 7 to 7, which overlap other registers or pass 4294967295; "
                 "each address may stand for one register");
     expectFault(device(",\"registers\":[{\"address\":4294967295,\"size\":2}]"),
                 "/devices/0/registers/0",
-                "overlaps other registers or the end of the addresses; "
+                "has the addresses 4294967295 to 4294967296, which overlap other registers or pass "
+                "4294967295; "
                 "each address may stand for one register");
 }
 
@@ -240,11 +253,12 @@ TEST(BrokenChassisTest, BytesAreGivenInHexadecimalDigits) {
         return device(",\"registers\":[{\"address\":0,\"size\":2,\"bytes\":\"" + bytes + "\"}]");
     };
     const std::string place = "/devices/0/registers/0/bytes";
-    expectFault(block("0g"), place, "has the wrong type or range; must be hexadecimal digits");
+    expectFault(block("0g"), place,
+                "is the text \"0g\"; must be hexadecimal digits without blanks or 0x");
     expectFault(block("000"), place,
-                "has the wrong length; must be two digits for each byte, at most size");
+                "has 3 digits; must be two digits for each byte, at most 4 for this size");
     expectFault(block("000000"), place,
-                "has the wrong length; must be two digits for each byte, at most size");
+                "has 6 digits; must be two digits for each byte, at most 4 for this size");
 }
 
 TEST(BrokenChassisTest, AGuardedAreaNeedsASerialNumberToCompareWith) {

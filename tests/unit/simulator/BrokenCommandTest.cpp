@@ -38,8 +38,9 @@ TEST(BrokenCommandTest, EffectsOnTheDeviceAreThoseOfItsProperties) {
         "on_device changes properties of the device that the resource belongs to");
     expectCommandFault("\"on_device\":{\"adds\":{\"T\":1}}", "/on_device/adds/T",
                        "cannot be added to; only single numbers can");
-    expectCommandFault("\"on_device\":{\"resets\":true}", "/on_device/resets",
-                       "is not a known member; the members here are sets, adds");
+    expectCommandFault(
+        "\"on_device\":{\"resets\":true}", "/on_device/resets",
+        "is not a known member; perhaps \"sets\" is meant; the members here are sets, adds");
 }
 
 TEST(BrokenCommandTest, AFailureHasAStatus) {
@@ -57,43 +58,42 @@ TEST(BrokenCommandTest, AFailureLooksAtAPropertyOfItsResource) {
     expectFailureFault(status + "\"when\":{\"property\":\"P\"}", "/when/is",
                        "is missing; must be the value at which the command fails");
     expectFailureFault(status + "\"when\":{\"property\":\"P\",\"is\":10}", "/when/is",
-                       "is out of range; must be within the limits of the property");
+                       "is 10; must be within the limits of the property, up to 9");
     expectFailureFault(status + "\"when\":{\"is\":1}", "/when/property",
                        "is missing; must be the name of a property of the resource");
 }
 
 TEST(BrokenCommandTest, AProbabilityIsAShare) {
-    const std::string words = "has the wrong type or range; must be a number from 0 to 1";
-    for (const char* const number : {"-0.01", "1.01", "\"1\"", "true"}) {
+    const std::pair<const char*, std::string> numbers[] = {
+        {"-0.01", "-0.01"}, {"1.01", "1.01"}, {"\"1\"", "the text \"1\""}, {"true", "true"}};
+    for (const auto& [number, shown] : numbers) {
         expectFailureFault("\"status\":{\"code\":-1},\"probability\":" + std::string(number),
-                           "/probability", words);
+                           "/probability", "is " + shown + "; must be a number from 0 to 1");
     }
 }
 
 TEST(BrokenCommandTest, ExecutionsAreCountedFromOne) {
-    const std::string words =
-        "has the wrong type or range; must be a whole number from 1 to 4294967295";
-    for (const char* const number : {"0", "-1", "1.5", "4294967296"}) {
-        expectFailureFault("\"status\":{\"code\":-1},\"every\":" + std::string(number), "/every",
-                           words);
+    const std::string right = "; must be a whole number from 1 to 4294967295";
+    for (const std::string number : {"0", "-1", "1.5", "4294967296"}) {
+        expectFailureFault("\"status\":{\"code\":-1},\"every\":" + number, "/every",
+                           "is " + number + right);
     }
 }
 
 TEST(BrokenCommandTest, AStatusHasACodeOtherThanSuccess) {
     expectStatusFault("", "/code", "is missing; must be the number of the status");
     expectStatusFault("\"code\":0", "/code",
-                      "has the wrong type or range; "
+                      "is 0; "
                       "must be a number other than 0, which means success");
     expectStatusFault("\"code\":2147483648", "/code",
-                      "has the wrong type or range; must be a whole number of 32 bits");
+                      "is 2147483648; must be a whole number of 32 bits");
     expectStatusFault("\"json\":\"{}\"", "/code", "is missing; must be the number of the status");
 }
 
 TEST(BrokenCommandTest, AStatusHasEitherDetailsOrATextOfItsOwn) {
     expectStatusFault("\"code\":-1,\"json\":\"{}\",\"details\":[]", "/details",
                       "is not a known member; the members here are code, json");
-    expectStatusFault("\"code\":-1,\"json\":{}", "/json",
-                      "has the wrong type or range; must be a text");
+    expectStatusFault("\"code\":-1,\"json\":{}", "/json", "is an object; must be a text");
     expectStatusFault("\"code\":-1,\"json\":\"a\\u0000\"", "/json",
                       "holds a NUL character; texts must not hold one");
     expectStatusFault("\"code\":-1,\"causes\":[{\"code\":-2,\"json\":\"{}\"}]", "/causes/0/json",
@@ -109,15 +109,14 @@ TEST(BrokenCommandTest, AnEntryOfTheDetailsIsOfOneKind) {
     expectEntryFault("\"usage\":\"\",\"value\":1", "/usage",
                      "is empty; must be the key of a label or phrase");
     expectEntryFault("\"usage\":\"kU\",\"value\":-1", "/value",
-                     "has the wrong type or range; must be a text, a whole number of 32 bits that "
+                     "is -1; must be a text, a whole number of 32 bits that "
                      "is not below 0, or an array of texts");
-    expectEntryFault("\"usage\":\"kU\",\"value\":[\"a\",1]", "/value/1",
-                     "has the wrong type or range; must be a text");
+    expectEntryFault("\"usage\":\"kU\",\"value\":[\"a\",1]", "/value/1", "is 1; must be a text");
     expectEntryFault("\"header\":\"kA\",\"value\":1", "/value",
                      "is not a known member; the members here are header");
     expectEntryFault("\"elaboration\":\"kA\",\"header\":\"kA\"", "/header",
                      "is not a known member; the members here are elaboration");
-    expectEntryFault("\"empty\":false", "/empty", "has the wrong type or range; must be true");
+    expectEntryFault("\"empty\":false", "/empty", "is false; must be true");
 }
 
 TEST(BrokenCommandTest, AnItemBelongsToAnEnumerationOfTheChassis) {

@@ -20,19 +20,20 @@ void expectBlockFault(const std::string& members, const std::string& place,
 
 TEST(BrokenRegisterTest, TheMembersOfABlockAreTold) {
     expectBlockFault("\"size\":4,\"show\":\"I\"", "/show",
-                     "is not a known member; the members here are address, size, bytes, access, "
+                     "is not a known member; perhaps \"shows\" is meant; the members here are "
+                     "address, size, bytes, access, "
                      "width, on_read, on_write, runs, shows");
 }
 
 TEST(BrokenRegisterTest, TheAccessIsOneOfThree) {
     expectBlockFault("\"size\":4,\"access\":\"None\"", "/access",
-                     "has the wrong type or range; must be ReadOnly, WriteOnly or ReadWrite");
+                     "is the text \"None\"; must be ReadOnly, WriteOnly or ReadWrite");
 }
 
 TEST(BrokenRegisterTest, AWidthIsThatOfARegister) {
-    const std::string range = "has the wrong type or range; must be ";
-    expectBlockFault("\"size\":4,\"width\":24", "/width", range + "8, 16, 32 or 64");
-    expectBlockFault("\"size\":4,\"width\":1", "/width", range + "a whole number from 8 to 64");
+    expectBlockFault("\"size\":4,\"width\":24", "/width", "is 24; must be 8, 16, 32 or 64");
+    expectBlockFault("\"size\":4,\"width\":1", "/width",
+                     "is 1; must be a whole number from 8 to 64");
     const std::string divides =
         "does not divide the block; address and size must be multiples of the width in bytes";
     expectBlockFault("\"size\":4,\"width\":32", "/width", divides);
@@ -40,10 +41,11 @@ TEST(BrokenRegisterTest, AWidthIsThatOfARegister) {
 }
 
 TEST(BrokenRegisterTest, SideEffectsAreNamedByTheirWord) {
-    const std::string range = "has the wrong type or range; must be ";
-    expectBlockFault("\"size\":4,\"on_read\":\"ones_clear\"", "/on_read", range + "clear");
-    expectBlockFault("\"size\":4,\"on_write\":\"clear\"", "/on_write", range + "ones_clear");
-    expectBlockFault("\"size\":4,\"on_read\":true", "/on_read", range + "a text");
+    expectBlockFault("\"size\":4,\"on_read\":\"ones_clear\"", "/on_read",
+                     "is the text \"ones_clear\"; must be clear");
+    expectBlockFault("\"size\":4,\"on_write\":\"clear\"", "/on_write",
+                     "is the text \"clear\"; must be ones_clear");
+    expectBlockFault("\"size\":4,\"on_read\":true", "/on_read", "is true; must be a text");
 }
 
 TEST(BrokenRegisterTest, WhatNeverHappensIsRefused) {
@@ -77,7 +79,7 @@ TEST(BrokenRegisterTest, AShownPropertyIsThere) {
     expectBlockFault("\"size\":4,\"shows\":{}", "/shows/property",
                      "is missing; must be the name of the property");
     expectBlockFault("\"size\":4,\"shows\":[]", "/shows",
-                     "has the wrong type or range; "
+                     "is an array; "
                      "must be a text, or an object with property and resource");
 }
 
@@ -109,11 +111,16 @@ TEST(BrokenRegisterTest, BlocksMayStandInAnyOrderButNotOverlap) {
         "{\"address\":8,\"size\":8}";
     const ChassisFile file(device(far + "]"));
     EXPECT_EQ(openWith(file.path).output, "0\n\n1 2 3\n");
-    for (const char* const block : {"{\"address\":4,\"size\":1}", "{\"address\":16,\"size\":49}",
-                                    "{\"address\":71,\"size\":1}", "{\"address\":15,\"size\":2}"}) {
+    const std::pair<const char*, const char*> blocks[] = {
+        {"{\"address\":4,\"size\":1}", "4 to 4"},
+        {"{\"address\":16,\"size\":49}", "16 to 64"},
+        {"{\"address\":71,\"size\":1}", "71 to 71"},
+        {"{\"address\":15,\"size\":2}", "15 to 16"}};
+    for (const auto& [block, addresses] : blocks) {
         expectFault(device(far + "," + block + "]"), "/devices/0/registers/3",
-                    "overlaps other registers or the end of the addresses; "
-                    "each address may stand for one register");
+                    "has the addresses " + std::string(addresses) +
+                        ", which overlap other registers or pass 4294967295; "
+                        "each address may stand for one register");
     }
 }
 

@@ -27,16 +27,25 @@ inline Probe openWith(const std::string& path, const std::string& variables = ""
     return {contentOf(output.path), contentOf(errors.path)};
 }
 
+// A text as it stands inside of a JSON text.
+inline std::string escaped(const std::string& text) {
+    std::string inside;
+    for (const char c : text) {
+        inside += c == '"' || c == '\\' ? std::string{'\\', c} : std::string{c};
+    }
+    return inside;
+}
+
 inline void expectFault(const std::string& text, const std::string& pointer,
                         const std::string& words) {
     const ChassisFile file(text);
     const Probe probe = openWith(file.path);
-    EXPECT_EQ(probe.output,
-              "-250952\n" +
-                  detailsOf("chassisNotLoaded", usage("FileName", "\"" + file.path + "\"") + "," +
-                                                    usage("JsonDocPointer", "\"" + pointer + "\"") +
-                                                    "," + usage("Details", "\"" + words + "\"")) +
-                  "\n0 0 0\n");
+    EXPECT_EQ(probe.output, "-250952\n" +
+                                detailsOf("chassisNotLoaded",
+                                          usage("FileName", "\"" + file.path + "\"") + "," +
+                                              usage("JsonDocPointer", "\"" + pointer + "\"") + "," +
+                                              usage("Details", "\"" + escaped(words) + "\"")) +
+                                "\n0 0 0\n");
     EXPECT_EQ(probe.errors, "qitrmcapi: " + file.path + ": " + pointer +
                                 (pointer.empty() ? "" : " ") + words + "\n");
 }
