@@ -1,91 +1,24 @@
-"""Walks through the chassis Bench as clients would take them: one that knows nothing and asks, and
-one that works with its modules.
+"""Walks through the chassis that ship as clients would take them: one that knows nothing and asks,
+and one that works with the modules of the chassis Bench.
 
-What the first one finds is compared with the description that the simulator is built from.
+What the first one finds is compared with the description that the simulator reads.
 """
 
-import itertools
 import json
 import pathlib
-import struct
 
 import pytest
 
+from hostlib import clean_host
 from jsonrpc import Client, batch, call
+from walker import Failed, Walker, channels_of, devices_of, explore_device
 
-BENCH = json.loads((pathlib.Path(__file__).resolve().parents[3]
-                    / "simulator" / "chassis" / "bench.json"
-                    ).read_text(encoding="utf-8"))
-
-
-class Failed(Exception):
-    """Carries the error object of an answer."""
-
-
-class Walker:
-    """A client that makes Python values of the answers."""
-
-    def __init__(self, client):
-        self.client = client
-        self.ids = itertools.count(1)
-        self.session = {}
-
-    def do(self, method, **params):
-        id = next(self.ids)
-        answer = json.loads(self.client.ask(call(method, {**self.session, **params}, str(id))))
-        assert (answer["jsonrpc"], answer["id"]) == ("2.0", id)
-        if "error" in answer:
-            raise Failed(answer["error"])
-        return answer["result"]
-
-    def open(self, **params):
-        self.session = {}
-        self.session = self.do("initializeSession", **params)
-
-    def read(self, name, **resource):
-        return self.do("getProperty", property=name, **resource)["value"]
-
-    def write(self, name, value, **resource):
-        return self.do("setProperty", property=name, value=value, **resource)["data_type"]
+CHASSIS = pathlib.Path(__file__).resolve().parents[3] / "simulator" / "chassis"
 
 
 @pytest.fixture
 def walker(own_bench):
     return Walker(own_bench)
-
-
-def described_devices():
-    for chassis in BENCH["devices"]:
-        yield chassis
-        yield from chassis["modules"]
-
-
-class Number:
-    """Equals every text of one number: how the driver writes limits is its own affair."""
-
-    def __init__(self, value):
-        self.value = value
-
-    def __eq__(self, text):
-        return isinstance(text, str) and float(text) == self.value
-
-
-def expected_information(description):
-    """What getPropertyInformation has to tell of a property of its own."""
-    told = {name: description[name] for name in ("description", "document") if name in description}
-    told |= {f"{name}_value": Number(description[name]) for name in ("max", "min") if name in description}
-    if "unit" in description:
-        told["unit"] = description["unit"]
-    told |= {"data_type": description["type"], "access": description.get("access", "ReadOnly"),
-             "driver_defined": False, "pending_changes": False}
-    if "enum" in description:
-        told["enum"] = {"name": description["enum"], "values": BENCH["enums"][description["enum"]]}
-    return told
-
-
-def expected_value(description):
-    value = description["value"]
-    return BENCH["enums"][description["enum"]][value] if "enum" in description else value
 
 
 class Near:
@@ -117,7 +50,7 @@ class Wave:
         return len(values) == self.samples and all(abs(v) <= self.distance for v in values)
 
 
-# What moves while all settings are as after power-on. Noise goes six deviations away at most.
+# What moves on the chassis Bench while all settings are as after power-on. Noise goes six deviations away at most.
 MOVING = {
     ("Bench", "Dev.Temperature"): Near(31.5, 0.5 + 0.12),
     ("Mod1", "Dev.Temperature"): Near(36.25, 0.75 + 0.12),
@@ -133,96 +66,66 @@ MOVING = {
 }
 
 
-def explore_resource(walker, device, one, many, description):
-    """Asks for all that a resource has, and compares it with its description."""
-    properties = description.get("properties", {})
-    assert walker.do("getDevicePropertyList", **one)["dynamic_properties"] == list(properties)
-    for name, about in properties.items():
-        told = walker.do("getPropertyInformation", property=name, **one)
-        assert list(told.items()) == list(expected_information(about).items())
-        if about.get("access") != "WriteOnly":
-            value = MOVING.get((device, name), expected_value(about))
-            assert walker.read(name, **many) == value
-    commands = description.get("commands", {})
-    assert walker.do("getCommandList", **one)["commands"] == list(commands)
-    for name, about in commands.items():
-        assert walker.do("getCommandInformation", command=name, **one) == {
-            "description": about.get("description", ""), "document": about.get("document", "")}
+def described(name):
+    return json.loads((CHASSIS / f"{name}.json").read_text(encoding="utf-8"))
 
 
-def explore_areas(walker, device):
-    names = [f"{device['name']}/{area['name']}" for area in device.get("nvmem_areas", [])]
-    assert walker.read("Dev.NVMEM.Areas", devices=device["name"]) == names
-    for name, area in zip(names, device.get("nvmem_areas", [])):
-        content = bytes.fromhex(area.get("bytes", "")).ljust(area["size"], b"\0")
-        assert walker.read("NVMEMArea.Size", nvmem_areas=name) == area["size"]
-        assert walker.do("getNvmemBytes", nvmem_area=name, address=0, size=area["size"]) == {
-            "data": list(content), "next_address": 1}
+@pytest.fixture(scope="module", params=["bench", "small", "full"])
+def shipped(request):
+    """A walker through a chassis that ships, and the description of it."""
+    path = CHASSIS / f"{request.param}.json"
+    with clean_host(("--chassis", path)) as host, Client(host) as client:
+        yield Walker(client), described(request.param)
 
 
-# How a value of each type stands in registers of eight and of four bytes.
-PACKED = {("Double", 8): "<d", ("UInt64", 8): "<Q", ("Int32", 4): "<i"}
+def test_the_full_chassis_is_one():
+    chassis, = described("full")["devices"]
+    slots = [module["slot"] for module in chassis["modules"]]
+    assert chassis["properties"]["Chassis.SlotCount"]["value"] == 18
+    assert len(set(slots)) >= 17 and set(slots) <= set(range(1, 19))
+    assert sum(len(channels_of(device)) for device in devices_of(described("full"))) >= 100
 
 
-def content_of(block, device):
-    """The bytes of a register block after power-on."""
-    if "shows" not in block:
-        return bytes.fromhex(block.get("bytes", "")).ljust(block["size"], b"\0")
-    shown = block["shows"]
-    owner = device if isinstance(shown, str) else device["channels"]
-    about = owner["properties"][shown if isinstance(shown, str) else shown["property"]]
-    return struct.pack(PACKED[about["type"], block["size"]], about["value"])
+def test_the_small_chassis_is_one():
+    chassis, = described("small")["devices"]
+    assert chassis["properties"]["Chassis.SlotCount"]["value"] == 2
+    assert [module["slot"] for module in chassis["modules"]] == [1]
 
 
-def explore_registers(walker, device):
-    for block in device.get("registers", []):
-        content = content_of(block, device)
-        width = min(8, block["size"])
-        for offset in range(0, block["size"], width):
-            address = block["address"] + offset
-
-            def read():
-                return walker.do("readRegister", device=device["name"], address=address,
-                                 size=8 * width)
-
-            if block.get("access") == "WriteOnly":
-                with pytest.raises(Failed) as refused:
-                    read()
-                assert refused.value.args[0]["data"]["qitrmc_code"] == -250935
-            else:
-                assert read() == {
-                    "next_address": address + 1,
-                    "data": int.from_bytes(content[offset:offset + width], "little")}
-
-
-@pytest.mark.parametrize("device", described_devices(), ids=lambda device: device["name"])
-def test_a_client_that_knows_nothing_finds_everything(walker, device):
+def test_a_client_that_knows_nothing_finds_everything(shipped):
+    walker, description = shipped
     walker.open()
-    name = device["name"]
-    assert name in walker.read("Sys.Devices")
-    for prop, value in device["values"].items():
-        assert walker.read(prop, devices=name) == MOVING.get((name, prop), value)
-    assert walker.read("Dev.ProductCategory", devices=name) == device["category"]
-    explore_resource(walker, name, {"device": name}, {"devices": name}, device)
-    channels = device.get("channels", {"count": 0})
-    named = [f"{name}/{channels['prefix']}{number}" for number in range(channels["count"])]
-    assert walker.read("Dev.PhysChans", devices=name) == named
-    for channel in named:
-        explore_resource(walker, name, {"physical_channel": channel},
-                         {"physical_channels": channel}, channels)
-    explore_areas(walker, device)
-    explore_registers(walker, device)
+    assert walker.read("Sys.Devices") == [device["name"] for device in devices_of(description)]
+    for device in devices_of(description):
+        moving = {prop: value for (name, prop), value in MOVING.items() if name == device["name"]}
+        explore_device(walker, device, description.get("enums", {}), moving)
+    walker.do("closeSession")
 
 
-def test_the_slots_of_the_chassis_are_found_one_by_one(walker):
-    walker.open(devices="Bench")
+def test_every_name_opens_a_session(shipped):
+    walker, description = shipped
+    for device in devices_of(description):
+        walker.open(devices=device["name"])
+        walker.do("closeSession")
+        channels = [channel.name for channel in channels_of(device)]
+        for name in channels:
+            walker.open(physical_channels=name)
+            assert walker.read("Session.DefaultPhysChans") == [name]
+            walker.do("closeSession")
+
+
+def test_the_slots_of_the_chassis_are_found_one_by_one(shipped):
+    walker, description = shipped
+    chassis, = description["devices"]
+    walker.open(devices=chassis["name"])
     found = {}
     for slot in range(1, walker.read("Chassis.SlotCount") + 1):
         module = walker.do("getModuleName", slot_number=slot)
         if module["present"]:
             found[slot] = module["module"]
-    assert found == {module["slot"]: module["name"] for module in BENCH["devices"][0]["modules"]}
+    assert found == {module["slot"]: module["name"] for module in chassis["modules"]}
     assert walker.read("Dev.Modules") == list(found.values())
+    walker.do("closeSession")
 
 
 def test_a_client_works_with_its_modules(walker, own_host):
