@@ -21,6 +21,7 @@ const std::map<std::string, void (*)(std::string_view)> harnesses = {
     {"parseNames", fuzz::parseNames},
     {"editStatus", fuzz::editStatus},
     {"readIni", fuzz::readIni},
+    {"parseChassis", fuzz::parseChassis},
 };
 
 // The inputs of all harnesses, each as "<harness>/<file>".

@@ -34,4 +34,7 @@ void editStatus(std::string_view input);
 // A character whose bits are the settings of the reader, and the text of an ini file.
 void readIni(std::string_view input);
 
+// The text of a chassis file of the simulated driver.
+void parseChassis(std::string_view input);
+
 }  // namespace fuzz

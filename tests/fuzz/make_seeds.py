@@ -1,5 +1,6 @@
 #!/usr/bin/python3
-"""Writes first inputs for the harnesses that take requests, and a dictionary of the words in them.
+"""Writes first inputs for the harnesses that take requests and chassis files, and a dictionary of
+the words in them.
 
 Usage: make_seeds.py FOLDER. Writes FOLDER/<harness>/* and FOLDER/words.dict.
 """
@@ -10,6 +11,7 @@ import sys
 from pathlib import Path
 
 UNIT_TESTS = Path(__file__).resolve().parents[1] / "unit"
+CHASSIS = Path(__file__).resolve().parents[2] / "simulator" / "chassis"
 sys.path[:0] = [str(UNIT_TESTS / "embedded"), str(UNIT_TESTS / "qitrmcwebsvc")]
 from parameter_model import INLINE, METHODS  # noqa: E402
 from test_random_requests import random_params, request_text  # noqa: E402
@@ -43,9 +45,25 @@ def write_requests(folder: Path):
         write(folder / "handleRequest", number, f"[{','.join(batch)}]")
 
 
+def write_chassis(folder: Path):
+    for number, name in enumerate(["bench", "full", "small"]):
+        text = (CHASSIS / f"{name}.json").read_text(encoding="utf-8")
+        write(folder / "parseChassis", number, text)
+
+
+def members_of(schema) -> set[str]:
+    """The names of all members that a JSON Schema tells of."""
+    if isinstance(schema, list):
+        return set().union(*map(members_of, schema))
+    if not isinstance(schema, dict):
+        return set()
+    return set(schema.get("properties", {})).union(*map(members_of, schema.values()))
+
+
 def write_words(path: Path):
+    chassis = json.loads((CHASSIS / "chassis.schema.json").read_text(encoding="utf-8"))
     words = {method.name for method in METHODS}.union(
-        *(method.members for method in METHODS), ENVELOPE
+        *(method.members for method in METHODS), ENVELOPE, members_of(chassis)
     )
     words |= {str(item) for shape in INLINE.values() for item in getattr(shape, "items", ())}
     path.write_text("".join(f"{json.dumps(word)}\n" for word in sorted(words)), encoding="utf-8")
@@ -54,4 +72,5 @@ def write_words(path: Path):
 if __name__ == "__main__":
     target = Path(sys.argv[1])
     write_requests(target)
+    write_chassis(target)
     write_words(target / "words.dict")
