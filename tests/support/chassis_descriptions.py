@@ -205,7 +205,7 @@ MEMBERS = ["name", "category", "slot", "modules", "values", "properties", "comma
            "document", "computed", "seconds", "resets", "sets", "adds", "size", "bytes", "address",
            "serial_number_wanted", "password", "devices", "enums", "$schema", "Dev.Comment",
            "Dev.Name", "Own.a", "live", "seed", "noise", "drift", "counts", "follows", "waveform", "shape", "property", "resource",
-           "while", "samples", "per_second", "period", "fails", "status",
+           "while", "samples", "per_second", "period", "fails", "status", "lasting",
            "code", "when", "is", "details", "usage", "runs", "shows", "on_read", "width", "json", "colour", ""]
 
 
