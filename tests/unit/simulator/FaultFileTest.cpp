@@ -98,7 +98,7 @@ TEST_F(FaultFileTest, ABrokenFileLeavesTheFormerFaultsAndIsToldOnce) {
     EXPECT_EQ(session.abort(), -71);
     EXPECT_EQ(session.abort(), -71);
     EXPECT_EQ(errors.take(), "qitrmcapi: " + file.path.string() +
-                                 ": /faults/0/delay has the wrong type or range; must be a time in "
+                                 ": /faults/0/delay is the text \"long\"; must be a time in "
                                  "seconds, from 0 to a day; the former faults stay\n");
     Errors again;
     file.replace("{");

@@ -31,15 +31,16 @@ TEST(FaultReaderTest, WhatIsNotJsonIsRefused) {
 }
 
 TEST(FaultReaderTest, WhatIsNoObjectIsRefused) {
-    expectRefused("[]", "has the wrong type or range; must be an object");
-    expectRefused("{\"faults\":{}}", "/faults has the wrong type or range; must be an array");
-    expectRefused("{\"events\":7}", "/events has the wrong type or range; must be an array");
-    expectRefused("{\"faults\":[7]}", "/faults/0 has the wrong type or range; must be an object");
+    expectRefused("[]", "is an array; must be an object");
+    expectRefused("{\"faults\":{}}", "/faults is an object; must be an array");
+    expectRefused("{\"events\":7}", "/events is 7; must be an array");
+    expectRefused("{\"faults\":[7]}", "/faults/0 is 7; must be an object");
 }
 
 TEST(FaultReaderTest, MembersThatAreNotKnownAreRefused) {
     expectRefused("{\"fault\":[]}",
-                  "/fault is not a known member; the members here are seed, faults, events");
+                  "/fault is not a known member; perhaps \"faults\" is meant; the members here are "
+                  "seed, faults, events");
     expectMemberRefused("\"chance\":1",
                         "chance is not a known member; the members here are function, resource, "
                         "calls, probability, delay, status, moment, output");
@@ -50,14 +51,14 @@ TEST(FaultReaderTest, MembersThatAreNotKnownAreRefused) {
                         "output/size is not a known member; the members here are null, null_items, "
                         "text_size, count");
     expectRefused(event("\"devices\":\"Mod1\""),
-                  "/events/0/devices is not a known member; the members here are device, event, "
+                  "/events/0/devices is not a known member; perhaps \"device\" is meant; the "
+                  "members here are device, event, "
                   "after, lasts");
 }
 
 TEST(FaultReaderTest, ASeedHas32Bits) {
     EXPECT_EQ(setFaults("{\"seed\":4294967295}").code, 0);
-    expectRefused("{\"seed\":-1}",
-                  "/seed has the wrong type or range; must be a whole number from 0 to 4294967295");
+    expectRefused("{\"seed\":-1}", "/seed is -1; must be a whole number from 0 to 4294967295");
 }
 
 TEST(FaultReaderTest, AFunctionMustBeOneOfTheDriver) {
@@ -89,22 +90,22 @@ TEST(FaultReaderTest, CallsAreCountedFrom1) {
     for (const char* name : {"first", "count", "every"}) {
         expectMemberRefused("\"calls\":{\"" + std::string(name) + "\":0}",
                             "calls/" + std::string(name) +
-                                " has the wrong type or range; must be a whole number from 1 to "
+                                " is 0; must be a whole number from 1 to "
                                 "4294967295");
     }
 }
 
 TEST(FaultReaderTest, AProbabilityLiesBetween0And1) {
-    for (const char* number : {"-0.1", "1.01", "\"1\"", "true"}) {
-        expectMemberRefused("\"probability\":" + std::string(number),
-                            "probability has the wrong type or range; must be a number from 0 to "
-                            "1");
+    const std::string rule = "; must be a number from 0 to 1";
+    for (const std::string number : {"-0.1", "1.01", "true"}) {
+        expectMemberRefused("\"probability\":" + number, "probability is " + number + rule);
     }
+    expectMemberRefused("\"probability\":\"1\"", "probability is the text \"1\"" + rule);
 }
 
 TEST(FaultReaderTest, ADelayIsATime) {
     expectRefused(oneFault("\"delay\":-1"),
-                  "/faults/0/delay has the wrong type or range; must be a time in seconds, from 0 "
+                  "/faults/0/delay is -1; must be a time in seconds, from 0 "
                   "to a day");
 }
 
@@ -112,13 +113,13 @@ TEST(FaultReaderTest, AStatusMustBeOne) {
     expectRefused(oneFault("\"status\":{}"),
                   "/faults/0/status/code is missing; must be the number of the status");
     expectRefused(oneFault("\"status\":{\"code\":0}"),
-                  "/faults/0/status/code has the wrong type or range; must be a number other than "
+                  "/faults/0/status/code is 0; must be a number other than "
                   "0, which means success");
 }
 
 TEST(FaultReaderTest, AMomentIsOneOfTwoAndBelongsToAFailure) {
     expectMemberRefused("\"status\":{\"code\":-1},\"moment\":\"later\"",
-                        "moment has the wrong type or range; must be before or after");
+                        "moment is the text \"later\"; must be before or after");
     for (const char* status : {"", "\"status\":{\"code\":1},"}) {
         expectMemberRefused(status + std::string("\"moment\":\"after\""),
                             "moment belongs to no failure; only with a status below 0 there is a "
@@ -144,10 +145,10 @@ TEST(FaultReaderTest, OutputsMustBePossible) {
 
 TEST(FaultReaderTest, OutputsAreBounded) {
     expectMemberRefused("\"output\":{\"text_size\":1073741825}",
-                        "output/text_size has the wrong type or range; must be a whole number from "
+                        "output/text_size is 1073741825; must be a whole number from "
                         "0 to 1073741824");
     expectMemberRefused("\"output\":{\"count\":16777217}",
-                        "output/count has the wrong type or range; must be a whole number from 0 "
+                        "output/count is 16777217; must be a whole number from 0 "
                         "to 16777216");
     expectMemberRefused("\"output\":{\"count\":2,\"text_size\":536870913}",
                         "output is too large; text_size times count must be at most 1073741824");
@@ -168,13 +169,13 @@ TEST(FaultReaderTest, AnEventNeedsADeviceAndAKind) {
     expectRefused(event("\"device\":\"Mod1\""),
                   "/events/0/event is missing; must be pulled or connection_lost");
     expectRefused(event("\"device\":\"Mod1\",\"event\":\"burnt\""),
-                  "/events/0/event has the wrong type or range; must be pulled or "
+                  "/events/0/event is the text \"burnt\"; must be pulled or "
                   "connection_lost");
     expectRefused(event("\"device\":\"Mod1\",\"event\":\"pulled\",\"after\":-1"),
-                  "/events/0/after has the wrong type or range; must be a time in seconds, from 0 "
+                  "/events/0/after is -1; must be a time in seconds, from 0 "
                   "to a day");
     expectRefused(event("\"device\":\"Mod1\",\"event\":\"pulled\",\"lasts\":\"long\""),
-                  "/events/0/lasts has the wrong type or range; must be a time in seconds, from 0 "
+                  "/events/0/lasts is the text \"long\"; must be a time in seconds, from 0 "
                   "to a day");
 }
 
