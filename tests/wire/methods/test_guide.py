@@ -7,35 +7,20 @@ replaced.
 
 import json
 import pathlib
-import re
 
 from jsonrpc import Client, call
+from pages import blocks_of, compact, id_of
 
 GUIDE = pathlib.Path(__file__).resolve().parents[3] / "docs" / "guide.md"
-
-BLOCK = re.compile(r"^```json (request|answer)\n(.*?)^```$", re.MULTILINE | re.DOTALL)
-TEXT_OR_BLANKS = re.compile(r'("(?:[^"\\]|\\.)*")|\s+')
 
 BUSY, OUT_OF_TIME = -250977, -250976
 
 
-def compact(text):
-    """JSON without the blanks outside of its texts."""
-    return TEXT_OR_BLANKS.sub(lambda match: match[1] or "", text)
-
-
 def exchanges():
-    """The blocks of the guide in their order, as (kind, JSON text) pairs."""
-    guide = GUIDE.read_text(encoding="utf-8")
-    blocks = BLOCK.findall(guide)
-    assert guide.count("```json") == len(blocks), "a block is neither a request nor an answer"
+    """The blocks of the guide in their order."""
+    blocks = blocks_of(GUIDE)
+    assert {kind for kind, _ in blocks} == {"request", "answer"}
     return blocks
-
-
-def id_of(text):
-    """What an answer has in common with its request."""
-    message = json.loads(text)
-    return message["id"] if isinstance(message, dict) else tuple(one["id"] for one in message)
 
 
 def wait_until_busy(host, request):
