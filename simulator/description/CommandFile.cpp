@@ -3,6 +3,7 @@
 #include "description/Nearest.h"
 #include "description/PropertyFile.h"
 #include "description/StatusFile.h"
+#include "description/ValueFile.h"
 #include "live/Maths.h"
 
 namespace simulator {

@@ -17,9 +17,6 @@ PropertyDefinition readDefinition(const std::string& name, const Node& node,
 // Makes sure that clients can write the name of a property, a command or the like.
 void expectWritableName(const std::string& name, const Node& node);
 
-// Reads a value that the property may have. Items of an enumeration may be given by name.
-Elements readValue(const PropertyDefinition& definition, const Node& node);
-
 // Who defines a property. What is computed can come from the driver alone.
 enum class Origin { driver, file };
 
