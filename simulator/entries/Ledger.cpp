@@ -1,12 +1,15 @@
 #include "entries/Ledger.h"
 
 #include <algorithm>
+#include <new>
 
 namespace simulator {
 
 Ledger& Ledger::instance() {
-    // Never destroyed: things may come back until the very end of the process.
-    static Ledger& ledger = *new Ledger;
+    // Never destroyed, as things may come back until the very end of the process; and made without
+    // any memory, as giving back cannot fail.
+    alignas(Ledger) static unsigned char place[sizeof(Ledger)];
+    static Ledger& ledger = *new (place) Ledger;
     return ledger;
 }
 
