@@ -27,7 +27,7 @@ LOOKUP = call("closeSession", {"session_id": "_session999999"})
 WAITING = call("initializeSession", {"devices": "Mod1", "reservation_timeout": SLOW})
 
 # How often the claims are tried that hold only when the requests arrive in the order of sending.
-ATTEMPTS = 4
+ATTEMPTS = 20
 
 
 @pytest.fixture(autouse=True)
