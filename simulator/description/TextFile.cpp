@@ -49,6 +49,7 @@ class OpenFile {
 
 FileVersion::FileVersion(const struct stat& state)
     : exists(true),
+      isPipe(S_ISFIFO(state.st_mode)),
       device(state.st_dev),
       inode(state.st_ino),
       size(state.st_size),
@@ -62,7 +63,12 @@ bool FileVersion::operator==(const FileVersion& other) const {
 
 FileVersion versionOf(const std::string& path) noexcept {
     struct stat state;
-    return stat(path.c_str(), &state) == 0 ? FileVersion(state) : FileVersion();
+    if (stat(path.c_str(), &state) == 0) {
+        return FileVersion(state);
+    }
+    FileVersion unknown;
+    unknown.exists = errno != ENOENT && errno != ENOTDIR;
+    return unknown;
 }
 
 TextFile readTextFile(const std::string& path, const char* right) {

@@ -18,6 +18,7 @@ struct FileVersion {
 
     // All others mean something only when the file is there.
     bool exists = false;
+    bool isPipe = false;
     dev_t device = 0;
     ino_t inode = 0;
     off_t size = 0;
@@ -25,7 +26,7 @@ struct FileVersion {
     int64_t nanoseconds = 0;
 };
 
-// The present version of a file. One that cannot be asked for it counts as missing.
+// The present version of a file. One that cannot be asked for it is there, but has no more to tell.
 FileVersion versionOf(const std::string& path) noexcept;
 
 struct TextFile {

@@ -27,8 +27,15 @@ void readFunction(const Node& node, Fault& fault) {
     }
 }
 
+// By its present name, or else by its name in the description, which it has again in a file that
+// was written before it was renamed.
+const Resource* findResource(const Chassis& chassis, std::string_view name) {
+    const Resource* resource = chassis.find(name);
+    return resource != nullptr ? resource : chassis.findDescribed(name);
+}
+
 const Resource& readResource(const Node& node, const Chassis& chassis) {
-    const Resource* resource = chassis.find(node.text());
+    const Resource* resource = findResource(chassis, node.text());
     if (resource == nullptr) {
         node.fail("is not a resource of the chassis",
                   "must be the name of a device, or of a channel or area such as Mod1/ch0");
@@ -122,7 +129,9 @@ Fault readFault(const Node& node, const Chassis& chassis) {
 }
 
 const Device& readDevice(const Node& node, const Chassis& chassis) {
-    const Device* device = chassis.findDevice(node.text());
+    const Resource* found = findResource(chassis, node.text());
+    const Device* device =
+        found != nullptr && found->kind == Kind::device ? found->device : nullptr;
     if (device == nullptr) {
         node.fail("is not a device of the chassis", "must be the name of one");
     }

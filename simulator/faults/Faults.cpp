@@ -53,6 +53,10 @@ void Faults::readFile() {
         return;
     }
     try {
+        if (present.isPipe) {
+            throw DescriptionFault{"", "is a pipe, which is read but once",
+                                   "QITRMC_SIM_FAULTS must name a file on a disk"};
+        }
         const TextFile file = readTextFile(path, "QITRMC_SIM_FAULTS must name a readable file");
         replace(readFaults(file.text, chassis));
         version = file.version;
@@ -118,20 +122,20 @@ Absence Faults::absenceAt(const Device& device, int64_t time) const {
 }
 
 void Faults::catchUp() {
-    if (due == never) {
-        return;
-    }
     const int64_t now = clock.now();
-    if (now < due) {
-        return;
+    while (due != never && due <= now) {
+        passTime(due);
     }
+}
+
+void Faults::passTime(int64_t time) {
     for (const auto& device : chassis.devices()) {
-        change(*device, absenceAt(*device, now));
+        change(*device, absenceAt(*device, time));
     }
     due = never;
     for (const DeviceEvent& event : current->events) {
-        for (const int64_t time : {timeOf(event.begin), timeOf(event.end)}) {
-            due = time > now ? std::min(due, time) : due;
+        for (const int64_t next : {timeOf(event.begin), timeOf(event.end)}) {
+            due = next > time ? std::min(due, next) : due;
         }
     }
 }
@@ -150,6 +154,8 @@ void Faults::change(Device& device, Absence absence) {
         ++chassis.changes;
     }
     device.absence = absence;
+    device.forEachResource(
+        [&](const Resource& resource) { chassis.life.noteChange(resource, clock.now()); });
     if (absence != Absence::none) {
         sessions.forEach([&](Session& session) {
             auto& connected = session.connectedDevices;

@@ -44,6 +44,8 @@ class Faults : public Agenda {
   private:
     void readFile();
     void noteWatching();
+    // Lets happen what belongs to one time, and finds the next.
+    void passTime(int64_t time);
     void change(Device& device, Absence absence);
     Absence absenceAt(const Device& device, int64_t time) const;
     int64_t timeOf(double seconds) const;

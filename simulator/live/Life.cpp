@@ -6,6 +6,7 @@
 #include <type_traits>
 
 #include "live/Maths.h"
+#include "model/Chassis.h"
 
 namespace simulator {
 
@@ -15,8 +16,14 @@ bool holds(const Property* condition) {
     return condition == nullptr || std::get<List<uint8_t>>(condition->value).front() != 0;
 }
 
+bool isThere(const Resource* owner) {
+    return owner == nullptr || owner->device->absence != Absence::removed;
+}
+
 double targetOf(const Follows& follows, double source) {
-    return holds(follows.condition) ? tame(follows.factor * source + follows.offset) : 0.0;
+    return isThere(follows.owner) && holds(follows.condition)
+               ? tame(follows.factor * source + follows.offset)
+               : 0.0;
 }
 
 double lagTarget(const Follows& follows) {
@@ -50,17 +57,10 @@ Elements limitedValue(const PropertyDefinition& definition, Fill fill) {
             using Items = std::decay_t<decltype(list)>;
             if constexpr (!std::is_same_v<Items, List<std::string>>) {
                 fill(list);
-                for (auto& item : list) {
-                    if (definition.least) {
-                        item = std::max(item, std::get<Items>(*definition.least).front());
-                    }
-                    if (definition.most) {
-                        item = std::min(item, std::get<Items>(*definition.most).front());
-                    }
-                }
             }
         },
         value);
+    definition.limit(value);
     return value;
 }
 
@@ -80,6 +80,9 @@ void Life::add(const Resource& owner, const Property& property, const Motion& mo
                const Resource* followed) {
     Motion& added = motions.emplace(&property, motion).first->second;
     owned[&owner].push_back(&added);
+    if (added.follows) {
+        added.follows->owner = followed;
+    }
     if (followed != nullptr && added.follows && added.follows->timeConstant > 0.0) {
         followers[followed].push_back(&added);
     }

@@ -9,6 +9,8 @@
 // comment says otherwise.
 namespace simulator {
 
+struct Resource;
+
 // A waveform has no more samples than this, whatever a property asks for: 8 MiB of numbers, of
 // which a small controller must hold some copies.
 constexpr uint32_t mostSamples = 1u << 20;
@@ -16,6 +18,8 @@ constexpr uint32_t mostSamples = 1u << 20;
 // Takes its number from another property, instead of the stored value.
 struct Follows {
     const Property* source = nullptr;
+    // To which the source belongs. While its device is not in its slot the number is 0.
+    const Resource* owner = nullptr;
     // A Bool; while it is false the number is 0. May be null.
     const Property* condition = nullptr;
     double factor = 1.0;

@@ -120,6 +120,18 @@ Resource* Chassis::find(std::string_view fullName) const {
     return findPart(*device, fullName.substr(slash + 1));
 }
 
+Resource* Chassis::findDescribed(std::string_view fullName) const {
+    const size_t slash = fullName.find('/');
+    const std::string folded = foldName(fullName.substr(0, slash));
+    for (const auto& device : all) {
+        if (foldName(device->firstName) == folded) {
+            return slash == std::string_view::npos ? device.get()
+                                                   : findPart(*device, fullName.substr(slash + 1));
+        }
+    }
+    return nullptr;
+}
+
 Device& Chassis::device(std::string_view name) const {
     Device* found = findDevice(name);
     if (found == nullptr) {

@@ -121,8 +121,9 @@ class Chassis {
     // Return null when there is no such resource.
     Device* findDevice(std::string_view name) const;
     Resource* findPart(const Device& device, std::string_view name) const;
-    // Finds a resource of any kind by its full name.
+    // Find a resource of any kind by its full name, or by the one that it has in the description.
     Resource* find(std::string_view fullName) const;
+    Resource* findDescribed(std::string_view fullName) const;
 
     // Find a resource of one kind, or refuse with a status of that kind.
     Device& device(std::string_view name) const;

@@ -65,6 +65,7 @@ void PropertyChanges::add(const Command& command, Resource& resource) {
             change.value = property.value;
         }
         addNumber(*change.value, effect.value);
+        property.definition->limit(*change.value);
     }
 }
 

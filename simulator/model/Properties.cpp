@@ -1,6 +1,8 @@
 #include "model/Properties.h"
 
 #include <algorithm>
+#include <limits>
+#include <type_traits>
 
 namespace simulator {
 
@@ -13,6 +15,23 @@ void Enumeration::add(const std::string& item, int32_t number) {
 std::optional<int32_t> Enumeration::numberOf(std::string_view item) const {
     const auto found = byName.find(item);
     return found == byName.end() ? std::nullopt : std::optional(found->second);
+}
+
+void PropertyDefinition::limit(Elements& value) const {
+    std::visit(
+        [&](auto& list) {
+            using Items = std::decay_t<decltype(list)>;
+            using Number = typename Items::value_type;
+            if constexpr (!std::is_same_v<Items, List<std::string>>) {
+                for (Number& item : list) {
+                    item = std::max(item, least ? std::get<Items>(*least).front()
+                                                : std::numeric_limits<Number>::lowest());
+                    item = std::min(item, most ? std::get<Items>(*most).front()
+                                               : std::numeric_limits<Number>::max());
+                }
+            }
+        },
+        value);
 }
 
 std::optional<size_t> PropertyDefinition::firstOutOfRange(const Elements& value) const {

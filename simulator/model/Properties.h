@@ -61,6 +61,8 @@ struct PropertyDefinition {
     std::shared_ptr<const Enumeration> enumeration;
     std::optional<Elements> initial;
 
+    // Brings each number between the limits, and what is infinite to the largest number there is.
+    void limit(Elements& value) const;
     // The index of the first element outside of the limits, or that is no item of the enumeration.
     // The elements are of the property's type.
     std::optional<size_t> firstOutOfRange(const Elements& value) const;

@@ -30,9 +30,7 @@ void RegisterDesk::writeProperty(const RegisterBlock& block, uint32_t address, u
     image.address = block.address;
     image.bytes.resize(block.size());
     // The bytes around those that are written are those of the value that was written last.
-    const Elements before = property.pending
-                                ? property.pending->value
-                                : simulator.chassis->life.valueAt(property, simulator.clock.now());
+    const Elements& before = property.pending ? property.pending->value : property.value;
     image.write(block.address, block.size(), toRegister(before, block.size()));
     image.write(address, width, value);
     PropertyDesk(simulator, session)

@@ -22,12 +22,18 @@ constexpr const char* description = R"({
             "Phase": {"type": "Int32", "access": "ReadWrite", "enum": "Phase", "value": "Idle"},
             "Secret": {"type": "UInt32", "access": "WriteOnly", "value": 0},
             "Runs": {"type": "UInt32", "value": 0},
+            "Steps": {"type": "UInt32", "value": 1, "min": 1, "max": 10},
+            "Big": {"type": "Double", "value": 1e308},
+            "Jittery": {"type": "UInt32", "access": "ReadWrite", "value": 0},
             "Cycles": {"type": "UInt64", "value": 0},
             "Texts": {"type": "StringArray", "access": "ReadWrite", "value": ["a"]},
             "Note": {"type": "String", "access": "ReadWrite", "value": ""}
         },
+        "live": {"Jittery": {"noise": 6}},
         "commands": {
             "Run": {"adds": {"Runs": 1}},
+            "Raise": {"adds": {"Steps": 20}},
+            "Grow": {"adds": {"Big": 1e308}},
             "Slow": {"seconds": 86400, "adds": {"Runs": 1}},
             "Short": {"seconds": 0.05, "adds": {"Runs": 1},
                       "fails": {"status": {"code": -7}}},
@@ -81,6 +87,7 @@ constexpr const char* description = R"({
         },
         "registers": [
             {"address": 512, "size": 8, "shows": {"property": "Level", "resource": "ch1"}},
+            {"address": 640, "size": 4, "shows": "Jittery"},
             {"address": 0, "size": 16, "bytes": "0102030405060708090a0b0c0d0e0f10",
              "on_read": "clear"},
             {"address": 16, "size": 8, "bytes": "ffffffffffffffff", "on_write": "ones_clear"},

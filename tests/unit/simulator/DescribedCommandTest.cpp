@@ -1,4 +1,5 @@
 #include <chrono>
+#include <limits>
 
 #include "ChassisFile.h"
 #include "Values.h"
@@ -20,6 +21,16 @@ class DescribedCommandTest : public testing::Test {
 
     Session session{"Unit"};
 };
+
+TEST_F(DescribedCommandTest, WhatIsAddedStaysWithinTheLimits) {
+    EXPECT_EQ(run("Raise"), 0);
+    EXPECT_EQ(get(getUInt32, session, "Unit", "Steps"), 10u);
+}
+
+TEST_F(DescribedCommandTest, WhatIsAddedStaysFinite) {
+    EXPECT_EQ(run("Grow"), 0);
+    EXPECT_EQ(get(getDouble, session, "Unit", "Big"), std::numeric_limits<double>::max());
+}
 
 TEST_F(DescribedCommandTest, AFailureLeavesNoEffect) {
     EXPECT_EQ(run("Always"), -1);

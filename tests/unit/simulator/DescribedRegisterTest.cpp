@@ -56,6 +56,15 @@ TEST_F(DescribedRegisterTest, BytesAreClearedWhenTheyHaveBeenRead) {
     EXPECT_EQ(at(0, 32), 0u);
 }
 
+TEST_F(DescribedRegisterTest, BytesThatAreNotWrittenKeepNoNoise) {
+    for (int i = 0; i < 20; ++i) {
+        EXPECT_EQ(write(write32, session, "Unit", 640, uint32_t{0x100}), 0);
+        EXPECT_EQ(write(write8, session, "Unit", 640, uint8_t{0x50}), 0);
+        // What is read has noise with a deviation of 6, at most six times that.
+        EXPECT_NEAR(static_cast<double>(at(640, 32)), 0x150, 36.0);
+    }
+}
+
 TEST_F(DescribedRegisterTest, OnesThatAreWrittenClearTheirBits) {
     EXPECT_EQ(write(write8, session, "Unit", 16, uint8_t{0x0f}), 0);
     EXPECT_EQ(write(write16, session, "Unit", 18, uint16_t{0x8001}), 0);

@@ -89,6 +89,17 @@ TEST_F(DeviceEventTest, OperationsOnALostDeviceFail) {
     EXPECT_EQ(readTemperature("Mod1"), 0);
 }
 
+TEST_F(DeviceEventTest, WhatFollowsAPulledModuleIsNothing) {
+    EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 20.0).code, 0);
+    EXPECT_EQ(execute(session, "Mod2/ch0", "PSU.On", 1.0).code, 0);
+    const auto measured = [&] { return get(getDouble, session, "Mod1/ch0", "DMM.Voltage").value; };
+    while (measured() < 19.0) {
+    }
+    const FaultsInForce faults(pulled);
+    // But for the noise of the multimeter, at most six deviations.
+    EXPECT_NEAR(measured(), 0.0, 6 * 0.00005);
+}
+
 TEST_F(DeviceEventTest, APulledModuleIsInNoListOfTheSystem) {
     const FaultsInForce faults(pulled);
     EXPECT_EQ(session.systemList("Sys.Devices"), (Names{"Bench", "Mod1", "Mod4", "Mod5"}));

@@ -117,6 +117,29 @@ TEST_F(FaultFileTest, AFolderIsNoFile) {
                                  "readable file; the former faults stay\n");
 }
 
+TEST_F(FaultFileTest, APipeIsNotWaitedFor) {
+    file.replace(failingWith(-71));
+    EXPECT_EQ(session.abort(), -71);
+    Errors errors;
+    file.remove();
+    ASSERT_EQ(mkfifo(file.path.c_str(), 0600), 0);
+    EXPECT_EQ(session.abort(), -71);
+    EXPECT_EQ(errors.take(), "qitrmcapi: " + file.path.string() +
+                                 ": is a pipe, which is read but once; QITRMC_SIM_FAULTS must name "
+                                 "a file on a disk; the former faults stay\n");
+}
+
+TEST_F(FaultFileTest, AFileThatCannotBeLookedAtLeavesTheFormerFaults) {
+    file.replace(failingWith(-71));
+    EXPECT_EQ(session.abort(), -71);
+    Errors errors;
+    file.remove();
+    std::filesystem::create_symlink(file.path, file.path);
+    EXPECT_EQ(session.abort(), -71);
+    EXPECT_NE(errors.take().find("cannot be read: Too many levels of symbolic links"),
+              std::string::npos);
+}
+
 TEST_F(FaultFileTest, FaultsThatTheProgramSetsLastUntilTheFileChanges) {
     file.replace(failingWith(-71));
     EXPECT_EQ(session.abort(), -71);

@@ -38,6 +38,24 @@ TEST_F(FaultTest, AFaultOfAFunctionStrikesThatFunctionAlone) {
     EXPECT_EQ(getArray(getDoubles, session, "Mod1", "DMM.Readings").code, 0);
 }
 
+TEST_F(FaultTest, ARenamedDeviceIsFoundByItsDescribedNameToo) {
+    Status status;
+    nQITRMCAPI100_renameDevice(session, "Mod1", "Meter", &status);
+    EXPECT_EQ(status.code, 0);
+    {
+        const FaultsInForce faults(oneFault("\"resource\":\"Mod1\"," + failing));
+        EXPECT_EQ(readTemperature("Meter"), failure);
+        EXPECT_EQ(readTemperature("Mod2"), 0);
+    }
+    {
+        const FaultsInForce faults(
+            "{\"events\":[{\"device\":\"mod1\",\"event\":\"connection_lost\"}]}");
+        EXPECT_EQ(readTemperature("Meter"), -250941);
+    }
+    nQITRMCAPI100_renameDevice(session, "Meter", "Mod1", &status);
+    EXPECT_EQ(status.code, 0);
+}
+
 TEST_F(FaultTest, AStarStandsForAnyEnding) {
     const FaultsInForce faults(oneFault("\"function\":\"getGenericPropertyDouble*\"," + failing));
     EXPECT_EQ(readTemperature(), failure);

@@ -4,6 +4,7 @@
 #include <thread>
 
 #include "ChassisFile.h"
+#include "FaultsInForce.h"
 #include "Values.h"
 
 using namespace drivertest;
@@ -414,6 +415,15 @@ TEST_F(LiveTest, NoiseGoesWithAWaveform) {
     EXPECT_NEAR(moments.correlation, 0.0, 5.0 / 64.0);
     // Another record has other noise.
     EXPECT_NE(record("Scope", "Direct"), samples);
+}
+
+TEST_F(LiveTest, AnEventThatIsOverAtTheEndOfACommandEndsIt) {
+    const FaultsInForce faults(
+        R"({"events": [{"device": "Mover", "event": "connection_lost", "after": 0.01,
+                        "lasts": 0.01}]})");
+    Status status;
+    nQITRMCAPI100_executeGenericCommand(session, "Mover", "Pass.100ms", 1.0, &status);
+    EXPECT_EQ(status.code, -250941);
 }
 
 TEST_F(LiveTest, ManyMayReadAndWriteAtOnce) {
