@@ -125,6 +125,9 @@ def test_the_slots_of_the_chassis_are_found_one_by_one(shipped):
             found[slot] = module["module"]
     assert found == {module["slot"]: module["name"] for module in chassis["modules"]}
     assert walker.read("Dev.Modules") == list(found.values())
+    assert walker.do("GetChassisIpOrHostname") == {
+        "chassis_ip": chassis["values"]["Dev.TCPIP.EthernetIP"],
+        "chassis_hostname": chassis["values"]["Dev.TCPIP.Hostname"]}
     walker.do("closeSession")
 
 
