@@ -15,10 +15,12 @@ namespace {
 
 constexpr int clients = 6;
 constexpr int operations = 250;
+constexpr size_t operationKinds = 9;
 constexpr int32_t faultCode = -77;
 constexpr int32_t faultWarning = 77;
 constexpr uint32_t areaBytes = 16;
 const std::array<const char*, 4> modules{"Mod1", "Mod2", "Mod4", "Mod5"};
+const std::array<const char*, 3> selfTests{"DMM.SelfTest", "PSU.SelfTest", "DIG.SelfTest"};
 
 const std::array<const char*, 7> faultPlans{
     R"({"faults": [{"probability": 0.05, "status": {"code": -77}}]})",
@@ -34,6 +36,8 @@ const std::array<const char*, 7> faultPlans{
 struct Bench {
     // Sessions that any client may use, abort and close; 0 for none.
     std::array<std::atomic<Handle>, 8> sessions{};
+    // How often each kind of operation on a shared session succeeded.
+    std::array<std::atomic<int>, operationKinds> successes{};
     // How many have each module for themselves.
     std::array<std::atomic<int>, 4> owners{};
 };
@@ -107,13 +111,15 @@ class Client {
             expectSound(status);
         } else if (const Handle session = place.exchange(0)) {
             close(session);
+            openShared();
         }
     }
 
     void useShared() {
         const Handle session = anyShared();
         Status status;
-        switch (below(9)) {
+        const size_t operation = below(operationKinds);
+        switch (operation) {
             case 0:
                 readText(session);
                 break;
@@ -124,10 +130,12 @@ class Client {
                 nQITRMCAPI100_setGenericPropertyDouble(session, "Mod2/ch0", "PSU.Voltage",
                                                        static_cast<double>(below(30)), &status);
                 break;
-            case 3:
-                nQITRMCAPI100_executeGenericCommand(session, anyModule(), "DMM.SelfTest", 1.0,
-                                                    &status);
+            case 3: {
+                const size_t module = below(3);
+                nQITRMCAPI100_executeGenericCommand(session, modules[module], selfTests[module],
+                                                    1.0, &status);
                 break;
+            }
             case 4:
                 nQITRMCAPI100_connectToDevices(session, anyModule(), 1.0, &status);
                 break;
@@ -138,13 +146,20 @@ class Client {
                 readAttribute(session);
                 break;
             case 7:
-                nQITRMCAPI100_renameDevice(session, "Mod5", below(2) == 0 ? "Switch" : "Mod5",
-                                           &status);
+                rename(session, status);
                 break;
             default:
                 readArea(session);
         }
         expectSound(status);
+        bench.successes[operation] += status.code == 0 ? 1 : 0;
+    }
+
+    // To and fro, whatever the name is now.
+    void rename(Handle session, Status& status) {
+        const bool there = below(2) == 0;
+        nQITRMCAPI100_renameDevice(session, there ? "Mod5" : "Switch", there ? "Switch" : "Mod5",
+                                   &status);
     }
 
     static void readText(Handle session) {
@@ -283,7 +298,14 @@ TEST(MixedClientsTest, LeaveNothingBehindAndNeverMeetWhereOneIsAlone) {
         nQITRMCAPI100_closeSession(session, &status);
     }
     expectNothingOutstanding();
-    const Session all("$DefaultDevices,Mod1,Mod2,Mod4,Bench");
+    // Those that leave their status here: writing, commands, connecting, resetting, renaming.
+    for (const size_t operation : {2, 3, 4, 5, 7}) {
+        EXPECT_GT(bench.successes[operation], 0) << "operation " << operation;
+    }
+    Status renaming;
+    const Session any;
+    nQITRMCAPI100_renameDevice(any, "Switch", "Mod5", &renaming);
+    const Session all("Bench,Mod1,Mod2,Mod4,Mod5");
     EXPECT_EQ(get(getDouble, all, "Mod1", "DMM.Range").code, 0);
     EXPECT_EQ(testing::internal::GetCapturedStderr(), "");
 }
