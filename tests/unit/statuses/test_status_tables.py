@@ -42,7 +42,7 @@ request     requête         anfrage         リクエスト   요청       请�
 resource    ressource       ressource       リソース     리소스     资源
 service     service         dienst          サービス     서비스     服务
 session     session         sitzung         セッション   세션       会话
-timeout     d'attente       zeitgrenze      タイムアウト 타임아웃   超时
+timeout     d'attente       zeitlimit       タイムアウト 타임아웃   超时
 """
 
 
