@@ -22,8 +22,8 @@ RESERVED = "The device is reserved by another session. Repeat the request until 
     "sessions."
 NOT_CHASSIS = "The device is not a chassis. Name a device whose property Dev.ProductCategory is 1."
 VALUE_TYPE = "The value does not have the data type of the property. Give a value of the requested " \
-    "data type and within its range: an integer without a decimal point, and an array even for a " \
-    "single element of an array property."
+    "data type and within its range: an integer without a decimal point, an array even for a single " \
+    "element of an array property, and for several resources an array with one value for each."
 RESOURCE = "The name of a resource is unknown or malformed, or its device is missing or does not " \
     "answer. Use a name from the property Sys.Devices, Dev.PhysChans or Dev.NVMEM.Areas. A range " \
     "is written as Dev1/ch0:3 and has at most 1024 names. If the name is right, check that the " \
