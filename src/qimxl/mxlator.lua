@@ -118,8 +118,11 @@ end
 -- interpreter would tell its address.
 local function textOf(value)
     local kind = type(value)
-    if kind == "string" or kind == "number" then
-        return tostring(value)
+    if kind == "string" then
+        return value
+    elseif kind == "number" then
+        -- The interpreter writes the decimal separator of the locale.
+        return (tostring(value):gsub(",", "."))
     end
     return cjson.encode(value)
 end

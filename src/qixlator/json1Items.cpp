@@ -134,11 +134,13 @@ void formatDynamicReportItems(const char* array, const TypedItemFormat* formats,
     while (position != nullptr && status->code >= 0) {
         jsonz_value read;
         const char* end = jsonz_readValue(position, &read);
-        if (read.type != jsonz_typeObject) {
-            layout.fail("json1 dynamic object invalid. each array item must be an object", nullptr);
-            return;
+        // An item with a broken value is still looked into, to name the value.
+        if (*position == '{') {
+            layout.item(position, formats);
         }
-        layout.item(position, formats);
+        if (read.type != jsonz_typeObject && status->code >= 0) {
+            layout.fail("json1 dynamic object invalid. each array item must be an object", nullptr);
+        }
         position = jsonz_nextElement(end);
     }
     output->append(text.c_str(), text.length(), status);

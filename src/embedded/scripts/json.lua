@@ -90,12 +90,17 @@ local function decodeString(text, position)
     end
 end
 
+-- The interpreter reads and writes the decimal separator of the locale.
+local function toNumber(text)
+    return tonumber(text) or tonumber((text:gsub("%.", ",")))
+end
+
 local function decodeNumber(text, position)
     local whole = text:match("^-?[1-9]%d*", position) or text:match("^-?0", position)
         or fail(position, "value expected")
     local number = whole .. (text:match("^%.%d+", position + #whole) or "")
     number = number .. (text:match("^[eE][+-]?%d+", position + #number) or "")
-    return tonumber(number), position + #number
+    return toNumber(number), position + #number
 end
 
 local function decodeArray(text, position)
@@ -195,7 +200,7 @@ local function encodeNumber(number)
     if number ~= number or number == math.huge or number == -math.huge then
         error("json: a number that is not finite has no text", 0)
     end
-    return string.format("%.14g", number)
+    return (string.format("%.14g", number):gsub(",", "."))
 end
 
 local function isArray(value)

@@ -69,6 +69,18 @@ TEST(JsonzUnescape, StopsAtALoneSurrogate) {
     expectFaultAfter("ab\\ude00c", "ab");
 }
 
+TEST(JsonzUnescape, ALowSurrogateBeginsNoPair) {
+    expectFaultAfter("ab\\ude00\\ude00", "ab");
+    expectFaultAfter("ab\\udc00\\udc00", "ab");
+    expectFaultAfter("ab\\udfff\\udc01c", "ab");
+}
+
+TEST(JsonzUnescape, AHighSurrogateBeforeACharacterBeyondTheSurrogatesIsAlone) {
+    expectFaultAfter("ab\\ud800\\ue000", "ab");
+    expectFaultAfter("ab\\ud800\\uffff", "ab");
+    expectFaultAfter("ab\\udbff\\udbff", "ab");
+}
+
 TEST(JsonzUnescape, StopsAtATruncatedOrUnknownEscape) {
     expectFaultAfter("a\\", "a");
     expectFaultAfter("a\\x", "a");

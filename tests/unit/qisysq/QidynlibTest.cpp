@@ -46,6 +46,23 @@ TEST(QidynlibTest, AMissingSymbolIsReportedWithTheLoadersWords) {
     dlclose(handle);
 }
 
+TEST(QidynlibTest, TheSymbolsOfALibraryServeTheWholeProcess) {
+    ASSERT_EQ(nullptr, dlsym(RTLD_DEFAULT, "another_function"));
+    qierr::Status status;
+    // A library of its own, since finding the symbol keeps it loaded.
+    void* handle = qidynlib_load(SHARED_SYMBOLS, &status);
+    ASSERT_NE(nullptr, handle);
+    EXPECT_NE(nullptr, dlsym(RTLD_DEFAULT, "another_function"));
+    dlclose(handle);
+}
+
+TEST(QidynlibTest, AFunctionThatNobodyHasIsMissedAtOnce) {
+    qierr::Status status;
+    EXPECT_EQ(nullptr, qidynlib_load(RELOCATIONS_UNRESOLVED, &status));
+    EXPECT_EQ(-52005, status.code);
+    EXPECT_TRUE(contains(status, "function_of_no_library")) << status.json;
+}
+
 TEST(QidynlibTest, NothingIsDoneWhenTheStatusIsNegative) {
     qierr::Status status;
     status.code = -1;

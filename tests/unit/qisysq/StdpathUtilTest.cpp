@@ -15,6 +15,21 @@ bool contains(const qierr::Status& status, const std::string& part) {
     return std::string(status.json).find(part) != std::string::npos;
 }
 
+// While it lives, the C library has this text for every error.
+class ErrnoText {
+  public:
+    explicit ErrnoText(const char* text) {
+        replaced = true;
+        replacement = text;
+    }
+    ErrnoText(const ErrnoText&) = delete;
+    ErrnoText& operator=(const ErrnoText&) = delete;
+    ~ErrnoText() { replaced = false; }
+
+    static inline bool replaced = false;
+    static inline const char* replacement = nullptr;
+};
+
 class ReadFileToBufferTest : public testing::Test {
   protected:
     void read(const std::string& path) {
@@ -55,6 +70,20 @@ TEST_F(ReadFileToBufferTest, AMissingFileIsReportedWithTheErrno) {
         << status.json;
 }
 
+TEST_F(ReadFileToBufferTest, AnErrnoWithoutATextIsReportedWithoutOne) {
+    for (const char* text : {"", static_cast<const char*>(nullptr)}) {
+        qierr::Status failure;
+        {
+            const ErrnoText replaced(text);
+            qisysq::readFileToBuffer(root.locate("/missing").c_str(), &buffer, &failure);
+        }
+        EXPECT_EQ(-52006, failure.code);
+        EXPECT_TRUE(contains(failure, "\"internal_error\":{\"api\":\"errno\",\"code\":" +
+                                          std::to_string(ENOENT) + "},\"qisysq_debug\":{"))
+            << failure.json;
+    }
+}
+
 TEST_F(ReadFileToBufferTest, AFileThatCannotBeReadToItsEndIsReported) {
     root.makeDirectory("/folder");
     read("/folder");
@@ -85,3 +114,12 @@ TEST_F(ReadFileToBufferTest, NothingIsDoneWhenTheStatusIsNegative) {
 }
 
 }  // namespace
+
+extern "C" {
+char* __real_strerror_r(int error, char* buffer, std::size_t size);
+
+char* __wrap_strerror_r(int error, char* buffer, std::size_t size) {
+    return ErrnoText::replaced ? const_cast<char*>(ErrnoText::replacement)
+                               : __real_strerror_r(error, buffer, size);
+}
+}

@@ -1,11 +1,16 @@
+#include <dirent.h>
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
 #include <cerrno>
+#include <cstddef>
 #include <cstring>
 #include <filesystem>
 #include <string>
+#include <utility>
+#include <vector>
 
+#include "qixlator/DirectoryWalker.h"
 #include "qixlator/qvErrorsParser.h"
 #include "support/FaultyAllocator.h"
 #include "support/TestRoot.h"
@@ -22,6 +27,34 @@ std::string block(const std::string& code, const std::string& text) {
     return "<qierror code=\"" + code + "\">\n" + text + "</qierror>\n";
 }
 
+// The same directory under a path of this length.
+std::string lengthened(std::string path, std::size_t length) {
+    while (path.size() + 1 < length) {
+        path += "/.";
+    }
+    return path.append(length - path.size(), '/');
+}
+
+// While it lives, a directory seems to hold one entry, whose name is longer than a file system lets
+// a name be.
+class LongName {
+  public:
+    explicit LongName(std::size_t length) {
+        block.resize(offsetof(dirent, d_name) + length + 1);
+        std::memset(block.data() + offsetof(dirent, d_name), 'n', length);
+        pending = reinterpret_cast<dirent*>(block.data());
+    }
+    LongName(const LongName&) = delete;
+    LongName& operator=(const LongName&) = delete;
+    ~LongName() { pending = nullptr; }
+
+    static dirent* take() { return std::exchange(pending, nullptr); }
+
+  private:
+    static inline dirent* pending = nullptr;
+    std::vector<char> block;
+};
+
 class ExplanationFilesTest : public testing::Test {
   protected:
     // Searches one file of this content.
@@ -35,6 +68,13 @@ class ExplanationFilesTest : public testing::Test {
     std::string inDirectory(const std::string& directory, std::int32_t code = -1) {
         qixlator::findErrorDescriptionFromDir(root.locate(directory).c_str(), code, &output,
                                               &status);
+        return text();
+    }
+
+    // Searches the directory /dir under a path of this length.
+    std::string inLongDirectory(std::size_t length) {
+        qixlator::findErrorDescriptionFromDir(lengthened(root.locate("/dir"), length).c_str(), -1,
+                                              &output, &status);
         return text();
     }
 
@@ -157,6 +197,15 @@ TEST_F(ExplanationFilesTest, ACodeThatIsNoNumberIsAFailure) {
     EXPECT_TRUE(
         reported("\"qixlator_debug\":{\"debug\":"
                  "\"Could not successfully read the status data!\",\"sscanf\":0}"))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, ATagLineThatEndsBeforeItsCodeIsReportedAsTheEndOfTheText) {
+    EXPECT_EQ("", inFile(document("<qierror code=\"\nText.\n</qierror>\n"), 0));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(
+        reported("\"qixlator_debug\":{\"debug\":"
+                 "\"Could not successfully read the status data!\",\"sscanf\":-1}"))
         << status.json;
 }
 
@@ -294,6 +343,46 @@ TEST_F(ExplanationFilesTest, AnEntryThatCannotBeLookedAtStopsTheSearch) {
         << status.json;
 }
 
+TEST_F(ExplanationFilesTest, AnEntryWhosePathIsTooLongStopsTheSearch) {
+    root.write("/dir/explain.txt", document(block("-1", "Text.\n")));
+    EXPECT_EQ("", inLongDirectory(4096 - 1 - 11));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(
+        reported("\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENAMETOOLONG) +
+                 ",\"string\":\"" + std::strerror(ENAMETOOLONG) +
+                 "\"},\"qixlator_debug\":{\"qixlator\":\"get file info failed\","
+                 "\"path\":\""))
+        << status.json;
+}
+
+TEST_F(ExplanationFilesTest, AnEntryWhosePathJustFitsIsRead) {
+    root.write("/dir/explain.txt", document(block("-1", "Text.\n")));
+    EXPECT_EQ("Text.", inLongDirectory(4096 - 1 - 12));
+    EXPECT_EQ(0, status.code);
+}
+
+// The operating system refuses such a path too, but only after it has been written.
+TEST_F(ExplanationFilesTest, NothingOfAPathThatIsTooLongIsWritten) {
+    root.makeDirectory("/dir");
+    qixlator::DirectoryWalker walker;
+    ASSERT_TRUE(walker.open(lengthened(root.locate("/dir"), 4095).c_str()));
+    ASSERT_TRUE(walker.hasEntry());
+    qixlator::FileEntry entry = {};
+    EXPECT_EQ(ENAMETOOLONG, walker.describe(&entry));
+    EXPECT_STREQ("", entry.path);
+}
+
+TEST_F(ExplanationFilesTest, AnEntryWhoseNameIsTooLongStopsTheSearch) {
+    root.write("/dir/a.txt", document(block("-1", "Text.\n")));
+    const LongName longName(256);
+    EXPECT_EQ("", inDirectory("/dir"));
+    EXPECT_EQ(-52006, status.code);
+    EXPECT_TRUE(reported(
+        "\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENAMETOOLONG) + ","))
+        << status.json;
+    EXPECT_TRUE(reported("\"qixlator\":\"get file info failed\""));
+}
+
 TEST_F(ExplanationFilesTest, WantOfMemoryForTheWalkIsReported) {
     root.makeDirectory("/dir");
     for (int allocation = 0; allocation < 2; ++allocation) {
@@ -352,3 +441,19 @@ TEST_F(ExplanationFilesTest, AnUnknownLanguageIsAFailure) {
 }
 
 }  // namespace
+
+// One of the two is what the compiler makes of readdir, depending on the size of offsets in files.
+extern "C" {
+dirent* __real_readdir(DIR* directory);
+dirent64* __real_readdir64(DIR* directory);
+
+dirent* __wrap_readdir(DIR* directory) {
+    dirent* const entry = LongName::take();
+    return entry != nullptr ? entry : __real_readdir(directory);
+}
+
+dirent64* __wrap_readdir64(DIR* directory) {
+    auto* const entry = reinterpret_cast<dirent64*>(LongName::take());
+    return entry != nullptr ? entry : __real_readdir64(directory);
+}
+}

@@ -97,6 +97,12 @@ TEST_F(Json1Test, AnElaborationFollowsDirectlyInTheRawForm) {
         rawItems("[{\"key\":\"K\",\"value\":\"V\"},{\"type\":\"elaboration\",\"value\":\"E\"}]"));
 }
 
+TEST_F(Json1Test, TheElementsOfARawElaborationHaveNoSeparator) {
+    EXPECT_EQ("Static one\n\nK: Vcd",
+              rawItems("[{\"key\":\"K\",\"value\":\"V\"},"
+                       "{\"type\":\"elaboration\",\"value\":[\"c\",\"d\"]}]"));
+}
+
 TEST_F(Json1Test, TheFormattedFormMarksLabelsAndElaborations) {
     EXPECT_EQ("Static one\n\n<B>K: </B>V\n<B>E</B>",
               formattedItems("[{\"key\":\"K\",\"value\":\"V\"},"
@@ -196,6 +202,15 @@ TEST_F(Json1Test, NestedErrorsAreIndentedByThreeBlanksALevelOnEveryLine) {
             "\"nested_error\":{\"code\":-1,\"translator\":\"test\"}}}"));
 }
 
+TEST_F(Json1Test, CarriageReturnsAreTrimmedOffBothEndsOfANestedText) {
+    xlator.descriptions[-2] = "\r\n\rStatic two\r\nmore\r\n\r";
+    EXPECT_EQ(
+        "Static one\n\n   Static two\r\n   more\n\n   Static one",
+        raw(-1,
+            "{\"translator\":\"test\",\"nested_error\":[{\"code\":-2,\"translator\":\"test\"},"
+            "{\"code\":-1,\"translator\":\"test\"}]}"));
+}
+
 TEST_F(Json1Test, AnArrayOfNestedErrorsIsTakenInOrder) {
     EXPECT_EQ("Static one\n\n   Static two\n\n      Static one\n\n   Static one",
               raw(-1,
@@ -265,6 +280,29 @@ TEST_F(Json1Test, AValueThatIsNoStringIsAFailure) {
         "\"qixlator_debug\":{\"formatDynamicReportItems\":\"json1 dynamic object invalid. value "
         "can only be string\",\"value type\":3}"))
         << failure.json;
+}
+
+TEST_F(Json1Test, AValueThatCannotBeParsedIsAFailure) {
+    EXPECT_EQ("", rawItems("[{\"key\":\"J\",\"value\":\"U\"},{\"key\":\"K\",\"value\":x}]"));
+    EXPECT_EQ(-52005, failure.code);
+    EXPECT_TRUE(reported("\"error_constant\":\"qiapalerr_invalidParameter\""));
+    EXPECT_TRUE(
+        reported("\"qixlator_debug\":{\"formatDynamicReportItems\":\"json1 dynamic object invalid. "
+                 "something's wrong with value item\",\"json1DynamicObjectBegin\":"
+                 "\"[{\\\"key\\\":\\\"J\\\",\\\"value\\\":\\\"U\\\"},"
+                 "{\\\"key\\\":\\\"K\\\",\\\"value\\\":x}],\\\"debug\\\":[]}\","
+                 "\"value\":\"x}],\\\"debug\\\":[]}\"}"))
+        << failure.json;
+}
+
+TEST_F(Json1Test, AnItemThatIsBrokenElsewhereIsNoObject) {
+    for (const char* item : {"{\"key\":\"K\",\"value\":\"V\",5}", "{\"key\":x,\"value\":\"V\"}",
+                             "{\"key\" \"K\"}", "{5}", "x"}) {
+        failure.code = 0;
+        EXPECT_EQ("", rawItems(std::string("[") + item + "]")) << item;
+        EXPECT_EQ(-52005, failure.code) << item;
+        EXPECT_TRUE(reported("each array item must be an object")) << failure.json;
+    }
 }
 
 TEST_F(Json1Test, AnElementThatIsNoStringIsAFailure) {

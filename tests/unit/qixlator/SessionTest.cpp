@@ -371,6 +371,17 @@ TEST_F(DefaultXlatorTest, ACodeWithoutTextIsReported) {
         << status.json;
 }
 
+TEST_F(DefaultXlatorTest, TheEnvironmentIsFourBitsOfTheAttributes) {
+    explain("/English", "-2", "Other text.");
+    for (const auto& [attributes, ade] :
+         {std::pair(0xF00u, "15"), std::pair(0xFFFFF2FFu, "2"), std::pair(0x1000u, "0")}) {
+        qierr::Status failure;
+        EXPECT_EQ("(null)", describeIn(attributes, &failure));
+        EXPECT_TRUE(reported(failure, std::string("\"lang\":0,\"ade\":") + ade + "}"))
+            << failure.json;
+    }
+}
+
 TEST_F(DefaultXlatorTest, MissingDirectoriesAreReportedForEnglish) {
     EXPECT_EQ("(null)", describeIn(2, &status));
     EXPECT_EQ(-52006, status.code);

@@ -47,6 +47,23 @@ TEST_P(LuaXlatorTest, TheScriptGetsCodeLanguageAndEnvironment) {
     EXPECT_EQ(0, status.code);
 }
 
+TEST_P(LuaXlatorTest, LanguageAndEnvironmentAreEightAndFourBitsOfTheAttributes) {
+    host.write("chunk",
+               "return { getStaticDesc = function(code, lang, ade)\n"
+               "return lang .. ' ' .. ade end }");
+    XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
+    ASSERT_NE(nullptr, xlator);
+    const auto seen = [&](std::uint32_t attributes) {
+        return ScriptHost::taken(
+            xlator->getStaticDesc(xlator, -1, attributes, qixlator_realloc, nullptr, &status));
+    };
+    EXPECT_EQ("0 15", seen(0xF00));
+    EXPECT_EQ("255 0", seen(0xFF));
+    EXPECT_EQ("3 2", seen(0xFFFFF203));
+    EXPECT_EQ("0 0", seen(0xFFFFF000));
+    xlator->destroy(xlator);
+}
+
 TEST_P(LuaXlatorTest, TheStructureSizeIsSixteenWhateverThePlatform) {
     writeDynamic("");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);

@@ -128,6 +128,24 @@ TEST_F(StdintTest, ComparesInTheTypesOwnOrder) {
     EXPECT_EQ("false", evaluate("u64(2) == i64(2)"));
 }
 
+// The interpreter compares values of different types without the help of either.
+TEST_F(StdintTest, PlainNumbersAreNotCompared) {
+    EXPECT_EQ("error: test:1: attempt to compare userdata with number", evaluate("i64(7) < 8"));
+    EXPECT_EQ("error: test:1: attempt to compare number with userdata", evaluate("8 < i64(7)"));
+    EXPECT_EQ("error: test:1: attempt to compare number with userdata", evaluate("i64(7) >= 6"));
+    EXPECT_EQ("error: test:1: attempt to compare number with userdata", evaluate("6 <= u64(7)"));
+    EXPECT_EQ("false", evaluate("i64(7) == 7"));
+    EXPECT_EQ("true", evaluate("7 ~= u64(7)"));
+}
+
+// The operators themselves take plain numbers, as arithmetic does.
+TEST_F(StdintTest, TheComparisonsOfTheMetatableTakePlainNumbers) {
+    EXPECT_EQ("true", evaluate("getmetatable(i64(0)).__lt(i64(-7), 6.9)"));
+    EXPECT_EQ("false", evaluate("getmetatable(i64(0)).__lt(6.9, i64(6))"));
+    EXPECT_EQ("true", evaluate("getmetatable(u64(0)).__eq(7.9, u64(7))"));
+    EXPECT_EQ("false", evaluate("getmetatable(i64(0)).__eq(i64(-7), 7)"));
+}
+
 TEST_F(StdintTest, TheTypesDoNotMix) {
     EXPECT_EQ("error: test:1: attempt to compare two userdata values", evaluate("u64(1) < i64(2)"));
     EXPECT_EQ("error: test:1: bad argument #2 to '?' (i64 expected, got userdata)",

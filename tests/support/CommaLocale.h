@@ -1,0 +1,36 @@
+#pragma once
+
+#include <gtest/gtest.h>
+
+#include <clocale>
+#include <cstdlib>
+#include <filesystem>
+#include <string>
+
+// Gives the process a locale with a decimal comma, made from the sources of the package `locales`
+// in a temporary folder, for as long as the object lives.
+class CommaLocale {
+  public:
+    CommaLocale() {
+        folder = (std::filesystem::temp_directory_path() / "qitrmc-locale-XXXXXX").string();
+        EXPECT_NE(nullptr, mkdtemp(folder.data()));
+        const std::string command =
+            "localedef --quiet -c -i de_DE -f UTF-8 '" + folder + "/de_DE.UTF-8'";
+        EXPECT_EQ(0, std::system(command.c_str()));
+        setenv("LOCPATH", folder.c_str(), 1);
+        setenv("LC_ALL", "de_DE.UTF-8", 1);
+        EXPECT_NE(nullptr, std::setlocale(LC_ALL, ""));
+        EXPECT_STREQ(",", std::localeconv()->decimal_point);
+    }
+    CommaLocale(const CommaLocale&) = delete;
+    CommaLocale& operator=(const CommaLocale&) = delete;
+    ~CommaLocale() {
+        std::setlocale(LC_ALL, "C");
+        unsetenv("LC_ALL");
+        unsetenv("LOCPATH");
+        std::filesystem::remove_all(folder);
+    }
+
+  private:
+    std::string folder;
+};

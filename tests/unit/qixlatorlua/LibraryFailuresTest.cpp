@@ -1,0 +1,87 @@
+#include <gtest/gtest.h>
+
+#include <lua.hpp>
+#include <string>
+
+#include "ScriptHost.h"
+
+namespace {
+
+using qixlatorlua::LuaRuntime;
+
+// What opening the library of folders does besides.
+int (*openingFolders)(lua_State* L) = nullptr;
+// What adding the embedded scripts answers instead of adding them; 0 for nothing.
+int preloadResult = 0;
+
+// No translator is made, and the status tells why.
+void expectNoTranslator(LuaRuntime runtime, const std::string& code, const std::string& message,
+                        const std::string& debug) {
+    const ScriptHost host(runtime);
+    qierr::Status status;
+    EXPECT_EQ(nullptr, host.create(host.registration("chunk"), &status));
+    EXPECT_EQ(-52003, status.code);
+    EXPECT_TRUE(
+        reported(status, "\"error_constant\":\"qiapalerr_softwareFaultAPALInternalUseOnly\""))
+        << status.json;
+    EXPECT_TRUE(reported(status, "\"internal_error\":{\"api\":\"lua\",\"code\":" + code +
+                                     ",\"string\":\"" + message + "\"},\"qixlatorlua_debug\":{" +
+                                     debug + "}}"))
+        << status.json;
+}
+
+class LibraryFailuresTest : public testing::TestWithParam<LuaRuntime> {
+  protected:
+    ~LibraryFailuresTest() override { openingFolders = nullptr; }
+};
+
+INSTANTIATE_TEST_SUITE_P(Runtimes, LibraryFailuresTest,
+                         testing::Values(LuaRuntime::plain, LuaRuntime::fast),
+                         [](const testing::TestParamInfo<LuaRuntime>& runtime) {
+                             return runtime.param == LuaRuntime::plain ? "Plain" : "Fast";
+                         });
+
+TEST_P(LibraryFailuresTest, ALibraryThatDoesNotOpenIsNamed) {
+    openingFolders = [](lua_State* L) {
+        lua_pushliteral(L, "no folders today");
+        return lua_error(L);
+    };
+    expectNoTranslator(GetParam(), "2", "no folders today",
+                       "\"debug\":\"failed to load lua lib\",\"lib\":\"lfs\"");
+}
+
+TEST_P(LibraryFailuresTest, AStateWithoutATableForPreloadsIsReported) {
+    openingFolders = [](lua_State* L) {
+        lua_pushnil(L);
+        lua_setglobal(L, "package");
+        return 0;
+    };
+    expectNoTranslator(GetParam(), "2", "attempt to index a nil value",
+                       "\"debug\":\"failed to add embedded modules to preload table\"");
+}
+
+// The other runtime makes the bytecode of these scripts once in the process.
+TEST(EmbeddedScriptFailuresTest, AnEmbeddedScriptThatCannotBeAddedIsReported) {
+    preloadResult = 1;
+    expectNoTranslator(LuaRuntime::plain, "0", "",
+                       "\"debug\":\"failed to add embedded modules to preload table\"");
+    preloadResult = 0;
+}
+
+}  // namespace
+
+extern "C" {
+int __real_luaopen_lfs(lua_State* L);
+int __real__Z25addEmbeddedFilesToPreloadP9lua_State(lua_State* L);
+
+int __wrap_luaopen_lfs(lua_State* L) {
+    if (openingFolders != nullptr) {
+        openingFolders(L);
+    }
+    return __real_luaopen_lfs(L);
+}
+
+int __wrap__Z25addEmbeddedFilesToPreloadP9lua_State(lua_State* L) {
+    return preloadResult != 0 ? preloadResult : __real__Z25addEmbeddedFilesToPreloadP9lua_State(L);
+}
+}
