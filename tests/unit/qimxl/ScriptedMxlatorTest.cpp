@@ -160,7 +160,7 @@ TEST_F(ScriptedMxlatorTest, DriverFilesAreSearchedOnlyWithBothOfTheirSettings) {
          {"{" + shared + "," + directory + "}", "{" + shared + ",\"driverName\":\"d\"}",
           "{" + shared + "}"}) {
         prepare("", settings);
-        EXPECT_EQ("Shared.", describe()) << settings;
+        ASSERT_EQ("Shared.", describe()) << settings;
         xlator->destroy(std::exchange(xlator, nullptr));
     }
     prepare("", "{" + shared + "," + directory + ",\"driverName\":\"d\"}");

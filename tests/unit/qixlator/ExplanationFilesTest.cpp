@@ -361,15 +361,24 @@ TEST_F(ExplanationFilesTest, AnEntryWhosePathJustFitsIsRead) {
     EXPECT_EQ(0, status.code);
 }
 
-// The operating system refuses such a path too, but only after it has been written.
+// The operating system refuses such paths and names too, but only after they have been written.
 TEST_F(ExplanationFilesTest, NothingOfAPathThatIsTooLongIsWritten) {
     root.makeDirectory("/dir");
     qixlator::DirectoryWalker walker;
     ASSERT_TRUE(walker.open(lengthened(root.locate("/dir"), 4095).c_str()));
-    ASSERT_TRUE(walker.hasEntry());
     qixlator::FileEntry entry = {};
     EXPECT_EQ(ENAMETOOLONG, walker.describe(&entry));
     EXPECT_STREQ("", entry.path);
+}
+
+TEST_F(ExplanationFilesTest, NothingOfANameThatIsTooLongIsWritten) {
+    root.makeDirectory("/dir");
+    const LongName longName(256);
+    qixlator::DirectoryWalker walker;
+    ASSERT_TRUE(walker.open(root.locate("/dir").c_str()));
+    qixlator::FileEntry entry = {};
+    EXPECT_EQ(ENAMETOOLONG, walker.describe(&entry));
+    EXPECT_STREQ("", entry.name);
 }
 
 TEST_F(ExplanationFilesTest, AnEntryWhoseNameIsTooLongStopsTheSearch) {

@@ -1,3 +1,5 @@
+#include <sys/stat.h>
+
 #include "StateFolder.h"
 
 using namespace drivertest;
@@ -64,6 +66,30 @@ TEST_F(StateTest, CommittedBytesLast) {
         EXPECT_EQ(readArea(session, "Größe/more", 2), (Bytes{0, 0}));
         EXPECT_EQ(get(getBool, session, "Größe/user", "NVMEMArea.PendingChanges"), uint8_t{0});
     });
+}
+
+mode_t modeOf(const std::string& path) {
+    struct stat facts = {};
+    EXPECT_EQ(stat(path.c_str(), &facts), 0) << path;
+    return facts.st_mode & 07777;
+}
+
+TEST_F(StateTest, TheMaskOfTheProcessDecidesWhoMayReadAndWrite) {
+    for (const mode_t mask : {0000, 0027}) {
+        const std::string parent = state.file("parent" + std::to_string(mask));
+        const std::string folder = parent + "/folder";
+        EXPECT_EQ(state.run([&] {
+            umask(mask);
+            setenv("QITRMC_SIM_STATE", folder.c_str(), 1);
+            Session session("Größe");
+            EXPECT_EQ(execute(session, "Name").code, 0);
+        }),
+                  "");
+        EXPECT_EQ(modeOf(parent), 0777 & ~mask);
+        EXPECT_EQ(modeOf(folder), 0777 & ~mask);
+        EXPECT_EQ(modeOf(folder + "/lock"), 0666 & ~mask);
+        EXPECT_EQ(modeOf(folder + "/change-1"), 0666 & ~mask);
+    }
 }
 
 TEST_F(StateTest, BytesThatWereNotCommittedAreLost) {

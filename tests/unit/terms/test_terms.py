@@ -16,21 +16,6 @@ FIXED_TEXTS = {
     "kUsageTypeName": "Name",
     "kUsageTypeReservedBySessions": "Reserved by Sessions",
 }
-RAISED_BY_THE_SERVICE = (
-    "kUsageTypeDetails",
-    "kUsageTypeOffset",
-    "kUsageTypeInvalidMember",
-    "kUsageTypeMethod",
-    "kUsageTypeParameter",
-    "kUsageTypeJsonDocPointer",
-    "kUsageTypeJsonSchemaKeyword",
-    "kUsageTypeJsonSchemaPointer",
-    "kUsageTypeReservedBySessions",
-    "kUsageTypeSessionId",
-    "kUsageTypeRequestedValue",
-    "kUsageTypeDevices",
-    "kUsageTypeRequestedDataType",
-)
 ATTRIBUTE_IDS = (
     "kUsageTypeAttributeId",
     "kUsageTypeAttributeIdentifier",
@@ -99,9 +84,17 @@ def test_english_labels_are_in_title_case():
                        for word in words), row["key"]
 
 
-@pytest.mark.parametrize("key", RAISED_BY_THE_SERVICE + ATTRIBUTE_IDS)
-def test_each_tag_that_the_service_uses_has_a_term(key):
+@pytest.mark.parametrize("key", ATTRIBUTE_IDS)
+def test_each_attribute_id_has_a_term(key):
     assert TERMS_BY_KEY[key]["eng"]
+
+
+def test_each_tag_in_the_sources_of_the_service_has_an_english_term():
+    sources = [path for path in (TERMS.parents[1] / "src").rglob("*") if path.suffix in (".cpp", ".h")]
+    tags = {tag for path in sources
+            for tag in re.findall(r'"(k(?:UsageType|AuxTerm)\w*)"', path.read_text(encoding="utf-8"))}
+    assert {"kUsageTypeDetails", "kUsageTypeSessionId"} <= tags
+    assert [tag for tag in sorted(tags) if not TERMS_BY_KEY.get(tag, {}).get("eng")] == []
 
 
 def test_each_tag_and_phrase_of_the_simulated_driver_has_a_term():

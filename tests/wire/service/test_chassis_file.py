@@ -1,6 +1,9 @@
 """What the host says of a chassis file that the simulated driver cannot load."""
 
+import os
 import subprocess
+
+import pytest
 
 from hostlib import BUILD_DIR
 
@@ -35,3 +38,19 @@ def test_the_check_takes_no_session_number_from_the_clients(own_host):
         b'{"jsonrpc":"2.0","id":1,"result":{"session_id":"_session1"}}')
     own_host.post(b'{"jsonrpc":"2.0","id":1,"method":"closeSession","params":'
                   b'{"session_id":"_session1"}}')
+
+
+@pytest.mark.parametrize("variable, value, right", [
+    ("QITRMC_SIM_SEED", "many", "a whole number from 0 to 18446744073709551615"),
+    ("QITRMC_SIM_SEED", "-1", "a whole number from 0 to 18446744073709551615"),
+    ("QITRMC_SIM_TIME_SCALE", "fast", "a number from 0.001 to 1000000, or the word calls"),
+    ("QITRMC_SIM_TIME_SCALE", "0,5", "a number from 0.001 to 1000000, or the word calls"),
+])
+def test_a_variable_that_the_driver_refuses_ends_the_start_with_1(variable, value, right):
+    result = subprocess.run([BUILD_DIR / "bin" / "qitrmc-host", "--listen", "127.0.0.1:0"],
+                            capture_output=True, text=True, timeout=60,
+                            env={**os.environ, variable: value})
+    driver, host = result.stderr.splitlines()
+    assert (result.returncode, result.stdout) == (1, "")
+    assert driver == f'qitrmcapi: {variable}: is "{value}"; must be {right}'
+    assert host.startswith("qitrmc-host: The simulated chassis does not start. ")
