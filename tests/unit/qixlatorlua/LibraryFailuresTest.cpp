@@ -43,10 +43,10 @@ INSTANTIATE_TEST_SUITE_P(Runtimes, LibraryFailuresTest,
 
 TEST_P(LibraryFailuresTest, ALibraryThatDoesNotOpenIsNamed) {
     openingFolders = [](lua_State* L) {
-        lua_pushliteral(L, "no folders today");
+        lua_pushliteral(L, "folders are not there");
         return lua_error(L);
     };
-    expectNoTranslator(GetParam(), "2", "no folders today",
+    expectNoTranslator(GetParam(), "2", "folders are not there",
                        "\"debug\":\"failed to load lua lib\",\"lib\":\"lfs\"");
 }
 
