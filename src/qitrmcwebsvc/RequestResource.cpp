@@ -90,6 +90,9 @@ RequestResource::RequestResource(const JsonValue& params, nQITRMCAPI100_Session 
         applyDefault(defaultKind);
 }
 
+RequestResource::RequestResource(const JsonValue& params, const SessionContext& session)
+    : RequestResource(params, session.driverSession, session.defaultResourceKind) {}
+
 std::string RequestResource::joinedNames() const {
     return compressNames(resourceNames, NameKind::Path);
 }

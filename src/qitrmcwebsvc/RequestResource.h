@@ -7,6 +7,7 @@
 
 #include "qitrmcwebsvc/Json.h"
 #include "qitrmcwebsvc/ResourceKind.h"
+#include "qitrmcwebsvc/SessionContext.h"
 
 namespace nQITRMCWEBSVC100 {
 
@@ -23,6 +24,9 @@ class RequestResource {
     // default resources of `defaultKind`.
     RequestResource(const JsonValue& params, nQITRMCAPI100_Session driverSession,
                     ResourceKind defaultKind);
+
+    // As above, with the default kind of the session.
+    RequestResource(const JsonValue& params, const SessionContext& session);
 
     virtual ~RequestResource() = default;
 

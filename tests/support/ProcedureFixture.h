@@ -11,7 +11,7 @@
 
 using Texts = std::vector<std::string>;
 
-// The 26 procedures with their schemas and a session manager, over a recording driver that knows a
+// All procedures with their schemas and a session manager, over a recording driver that knows a
 // small chassis: devices Mod1, Mod2, Mod3 and Bench; channels Mod1/ch0 to Mod1/ch2, Mod2/ch0; the
 // area Mod1/user. Every session that the driver opens has the handle 7; properties that the driver
 // defines open as 21, others as 22, and commands as 31.
@@ -20,7 +20,7 @@ class ProcedureFixture : public DriverTest {
     void SetUp() override;
     void TearDown() override;
 
-    // Opens the session "_session7" anew, on the resources that these members of params name, and
+    // Opens the session "_session7" again, on the resources that these members of params name, and
     // forgets the calls.
     void openSession(const std::string& members = "");
 

@@ -1,13 +1,14 @@
-#include "qitrmcwebsvc/procedure/AbortSession.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void AbortSession::run(const JsonValue&, const std::shared_ptr<SessionContext>& session,
-                       SingleResponse& response) {
+// Ends whatever calls of a session are waiting in the driver. The session stays open and must still
+// be closed. Result: an empty object.
+void AbortSession::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     callDriver(nQITRMCAPI100_abortSession, session->driverSession);
     response.setEmptyResult();
 }

@@ -1,8 +1,9 @@
-#include "qitrmcwebsvc/procedure/CloseSession.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void CloseSession::run(const JsonValue& params, SingleResponse& response) {
+// Ends a session. Result: an empty object.
+void CloseSession::run(const JsonValue& params, SingleResponse& response) const {
     sessionManager->closeSession(sessionIdOf(params));
     response.setEmptyResult();
 }

@@ -1,15 +1,15 @@
-#include "qitrmcwebsvc/procedure/CommitNvmemAreas.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void CommitNvmemAreas::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                           SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Makes the pending writes of areas, or of all areas of devices, last. Result: an empty object.
+void CommitNvmemAreas::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     callDriver(nQITRMCAPI100_commitNvmemGeneric, session->driverSession,
                resource.joinedNames().c_str());
     response.setEmptyResult();

@@ -1,9 +1,8 @@
-#include "qitrmcwebsvc/procedure/ConnectToDevices.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -12,8 +11,10 @@ constexpr double driverChoosesTimeout = -1.0;
 
 }  // namespace
 
-void ConnectToDevices::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                           SingleResponse& response) {
+// Connects devices of the session, for as long as the driver cares to wait. Result: an empty
+// object.
+void ConnectToDevices::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);
     callDriver(nQITRMCAPI100_connectToDevices, session->driverSession,
                resource.joinedNames().c_str(), driverChoosesTimeout);

@@ -1,15 +1,14 @@
-#include "qitrmcwebsvc/procedure/DisconnectFromDevices.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void DisconnectFromDevices::run(const JsonValue& params,
-                                const std::shared_ptr<SessionContext>& session,
-                                SingleResponse& response) {
+// Disconnects devices of the session. Result: an empty object.
+void DisconnectFromDevices::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);
     callDriver(nQITRMCAPI100_disconnectFromDevices, session->driverSession,
                resource.joinedNames().c_str());

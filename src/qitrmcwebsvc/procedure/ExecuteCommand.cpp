@@ -1,9 +1,8 @@
-#include "qitrmcwebsvc/procedure/ExecuteCommand.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -12,9 +11,10 @@ constexpr double defaultTimeout = 10.0;
 
 }  // namespace
 
-void ExecuteCommand::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                         SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Runs a command on resources. Result: an empty object.
+void ExecuteCommand::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     const std::string command = textParam(params, "command");
     const double timeout = doubleParam(params, "timeout", defaultTimeout);
     callDriver(nQITRMCAPI100_executeGenericCommand, session->driverSession,

@@ -1,11 +1,10 @@
-#include "qitrmcwebsvc/procedure/GetChassisIpOrHostname.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/DriverOwners.h"
 #include "qitrmcwebsvc/callDriver.h"
 #include "qitrmcwebsvc/procedure/chassis.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -18,10 +17,11 @@ constexpr std::pair<const char*, const char*> identityProperties[] = {
 
 }  // namespace
 
-void GetChassisIpOrHostname::run(const JsonValue& params,
-                                 const std::shared_ptr<SessionContext>& session,
-                                 SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Tells the network address and name of a chassis. Throws BasicError -250812 for a device that is
+// no chassis. Result: chassis_ip, chassis_hostname.
+void GetChassisIpOrHostname::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     requireChassis(resource, session);
     // The driver has to find the default chassis by itself.
     const auto device = params.FindMember("device");

@@ -1,5 +1,3 @@
-#include "qitrmcwebsvc/procedure/GetCommandInformation.h"
-
 #include <qitrmcapi.h>
 
 #include <utility>
@@ -8,6 +6,7 @@
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -20,10 +19,10 @@ constexpr std::pair<const char*, const char*> CommandInfoKeys[] = {
 
 }  // namespace
 
-void GetCommandInformation::run(const JsonValue& params,
-                                const std::shared_ptr<SessionContext>& session,
-                                SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Tells what a command is. Result: description, document.
+void GetCommandInformation::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     const std::string command = textParam(params, "command");
     DriverCommand handle;
     callDriver(nQITRMCAPI100_openGenericCommand, session->driverSession,

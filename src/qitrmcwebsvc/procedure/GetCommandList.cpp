@@ -1,5 +1,3 @@
-#include "qitrmcwebsvc/procedure/GetCommandList.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/DriverOwners.h"
@@ -7,6 +5,7 @@
 #include "qitrmcwebsvc/callDriver.h"
 #include "qitrmcwebsvc/invalidParams.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -21,9 +20,10 @@ const char* listPropertyOf(ResourceKind kind) {
 
 }  // namespace
 
-void GetCommandList::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                         SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Lists the commands of a device or physical channel in the driver's order. Result: commands.
+void GetCommandList::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     const char* property = listPropertyOf(resource.kind());
     DriverStringArray names;
     callDriver(nQITRMCAPI100_getGenericPropertyStringArray, session->driverSession,

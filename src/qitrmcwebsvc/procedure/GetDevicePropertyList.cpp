@@ -1,11 +1,10 @@
-#include "qitrmcwebsvc/procedure/GetDevicePropertyList.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/DriverOwners.h"
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/invalidParams.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 #include "qitrmcwebsvc/propertyNames.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -46,10 +45,12 @@ void addDynamicNames(JsonValue& result, nQITRMCAPI100_Session session,
 
 }  // namespace
 
-void GetDevicePropertyList::run(const JsonValue& params,
-                                const std::shared_ptr<SessionContext>& session,
-                                SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Lists the properties of a kind of resource, sorted, and those that one resource defines for
+// itself, in the driver's order. The latter are left out for NVMEM areas, which define none, and
+// when the driver cannot list them. Result: static_properties, dynamic_properties.
+void GetDevicePropertyList::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     const Lists lists = listsOf(resource.kind());
 
     JsonPool& pool = *response.getAllocator();

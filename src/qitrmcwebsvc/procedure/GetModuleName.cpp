@@ -1,15 +1,16 @@
-#include "qitrmcwebsvc/procedure/GetModuleName.h"
-
 #include <algorithm>
 
 #include "qitrmcwebsvc/procedure/chassis.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void GetModuleName::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                        SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Finds the module in a slot of a chassis. Throws BasicError -250812 for a device that is no
+// chassis. Result: module, if there is one, and present.
+void GetModuleName::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     requireChassis(resource, session);
     const std::vector<std::string> modules = modulesOf(resource, session);
     const std::uint32_t slot = uintParam(params, "slot_number");

@@ -1,5 +1,3 @@
-#include "qitrmcwebsvc/procedure/GetNvmemBytes.h"
-
 #include <qitrmcapi.h>
 
 #include <cstdlib>
@@ -8,6 +6,7 @@
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -30,9 +29,11 @@ Buffer zeroedBuffer(std::uint32_t size) {
 
 }  // namespace
 
-void GetNvmemBytes::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                        SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Reads bytes of an NVMEM area. Result: data, and next_address, which is the address plus 1
+// whatever the count of bytes.
+void GetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     const std::uint32_t address = uintParam(params, "address");
     const std::uint32_t size = uintParam(params, "size");
     const Buffer buffer = zeroedBuffer(size);

@@ -1,16 +1,16 @@
-#include "qitrmcwebsvc/procedure/GetProperty.h"
-
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/SessionProperty.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 #include "qitrmcwebsvc/procedure/propertyValues.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void GetProperty::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                      SingleResponse& response) {
+// Reads a property. Result: data_type, value.
+void GetProperty::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string name = textParam(params, "property");
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    const RequestResource resource(params, *session);
     const SessionProperty property(session, name, resource);
     const PropertyValueType* type = propertyValueType(property.dataType());
     if (type == nullptr)

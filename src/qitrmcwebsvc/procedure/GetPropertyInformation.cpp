@@ -1,10 +1,9 @@
-#include "qitrmcwebsvc/procedure/GetPropertyInformation.h"
-
 #include <algorithm>
 #include <utility>
 
 #include "qitrmcwebsvc/SessionProperty.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -39,11 +38,13 @@ JsonValue enumValue(const SessionProperty& property, JsonPool& pool) {
 
 }  // namespace
 
-void GetPropertyInformation::run(const JsonValue& params,
-                                 const std::shared_ptr<SessionContext>& session,
-                                 SingleResponse& response) {
+// Tells what a property is. Result: description, document, max_value, min_value and unit where they
+// are not empty; data_type, access, driver_defined, pending_changes; for an enumerated property
+// enum.
+void GetPropertyInformation::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string name = textParam(params, "property");
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    const RequestResource resource(params, *session);
     const SessionProperty property(session, name, resource);
 
     JsonPool& pool = *response.getAllocator();

@@ -1,12 +1,12 @@
-#include "qitrmcwebsvc/procedure/GetSessionPropertyList.h"
-
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 #include "qitrmcwebsvc/propertyNames.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void GetSessionPropertyList::run(const JsonValue&, const std::shared_ptr<SessionContext>& session,
-                                 SingleResponse& response) {
+// Lists the properties of the session and then of the system, each half sorted. Result: properties.
+void GetSessionPropertyList::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     JsonPool& pool = *response.getAllocator();
     JsonValue properties(rapidjson::kArrayType);
     for (const PropertyCategory category : {PropertyCategory::Session, PropertyCategory::System})

@@ -1,10 +1,10 @@
-#include "qitrmcwebsvc/procedure/InitializeSession.h"
-
 #include "qitrmcwebsvc/RequestResource.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void InitializeSession::run(const JsonValue& params, SingleResponse& response) {
+// Opens a session, with or without resources and their reservation. Result: session_id.
+void InitializeSession::run(const JsonValue& params, SingleResponse& response) const {
     const ReservationParams reservation = reservationParams(params);
     const bool forceReserve = boolParam(params, "force_reserve", false);
     const RequestResource resource(params);

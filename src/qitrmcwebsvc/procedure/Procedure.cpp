@@ -13,8 +13,8 @@ void Procedure::execute(const SingleRequest& request, SingleResponse& response) 
     run(request.getParams(), response);
 }
 
-void SessionProcedure::run(const JsonValue& params, SingleResponse& response) {
-    run(params, sessionManager->getSessionContext(sessionIdOf(params)), response);
+std::shared_ptr<SessionContext> Procedure::sessionOf(const JsonValue& params) const {
+    return sessionManager->getSessionContext(sessionIdOf(params));
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -19,25 +19,16 @@ class Procedure : public IProcedure {
     void execute(const SingleRequest& request, SingleResponse& response) final;
 
   protected:
-    // Does the work with params that conform to the schema, and sets the result last.
-    virtual void run(const JsonValue& params, SingleResponse& response) = 0;
+    // The session that `params` names, to be held to the end of the request; its driver session may
+    // be closed meanwhile. Throws BasicError unknownSession.
+    std::shared_ptr<SessionContext> sessionOf(const JsonValue& params) const;
 
     const std::shared_ptr<ISessionManager> sessionManager;
     const std::shared_ptr<ISchemaValidator> schemaValidator;
-};
-
-// The frame of the procedures that act on an open session.
-class SessionProcedure : public Procedure {
-  public:
-    using Procedure::Procedure;
-
-  protected:
-    // `session` is held to the end of the request; its driver session may be closed meanwhile.
-    virtual void run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                     SingleResponse& response) = 0;
 
   private:
-    void run(const JsonValue& params, SingleResponse& response) final;
+    // Does the work with params that conform to the schema, and sets the result last.
+    virtual void run(const JsonValue& params, SingleResponse& response) const = 0;
 };
 
 }  // namespace nQITRMCWEBSVC100

@@ -1,10 +1,9 @@
-#include "qitrmcwebsvc/procedure/ReadRegister.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -37,8 +36,10 @@ std::uint64_t readRegister(std::uint32_t size, nQITRMCAPI100_Session session, co
 
 }  // namespace
 
-void ReadRegister::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                       SingleResponse& response) {
+// Reads one register of a device. Result: next_address, which is the address plus 1 whatever the
+// size, and data.
+void ReadRegister::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);
     const std::uint32_t address = uintParam(params, "address");
     const std::uint32_t size = registerSizeParam(params);

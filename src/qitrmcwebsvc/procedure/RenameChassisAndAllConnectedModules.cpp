@@ -1,10 +1,9 @@
-#include "qitrmcwebsvc/procedure/RenameChassisAndAllConnectedModules.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/callDriver.h"
 #include "qitrmcwebsvc/procedure/chassis.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -15,9 +14,14 @@ void rename(const SessionContext& session, const std::string& oldName, const std
 
 }  // namespace
 
+// Renames the modules of a chassis after its new name and their slots, and the chassis last.
+//
+// Nothing is undone on failure: the modules before it keep their new names, those after it and the
+// chassis their old ones. Throws BasicError -250812 for a device that is no chassis. Result:
+// new_module_names, new_chassis_name.
 void RenameChassisAndAllConnectedModules::run(const JsonValue& params,
-                                              const std::shared_ptr<SessionContext>& session,
-                                              SingleResponse& response) {
+                                              SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string oldChassisName = textParam(params, "old_chassis_name");
     // The driver reads a text up to its first NUL, so that is where a new name ends.
     const std::string newChassisName = textParam(params, "new_chassis_name").c_str();

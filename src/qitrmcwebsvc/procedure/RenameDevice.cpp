@@ -1,13 +1,13 @@
-#include "qitrmcwebsvc/procedure/RenameDevice.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void RenameDevice::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                       SingleResponse& response) {
+// Renames one device, under whatever name the driver knows it. Result: an empty object.
+void RenameDevice::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string device = textParam(params, "device");
     const std::string newName = textParam(params, "new_device_name");
     callDriver(nQITRMCAPI100_renameDevice, session->driverSession, device.c_str(), newName.c_str());

@@ -1,14 +1,14 @@
-#include "qitrmcwebsvc/procedure/ResetDevices.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
-void ResetDevices::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                       SingleResponse& response) {
+// Puts devices into their state after power-on. Result: an empty object.
+void ResetDevices::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);
     callDriver(nQITRMCAPI100_resetDevices, session->driverSession, resource.joinedNames().c_str());
     response.setEmptyResult();

@@ -1,11 +1,10 @@
-#include "qitrmcwebsvc/procedure/SetNvmemBytes.h"
-
 #include <qitrmcapi.h>
 
 #include <vector>
 
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -20,9 +19,11 @@ std::vector<std::uint8_t> bytesOf(const JsonValue& data) {
 
 }  // namespace
 
-void SetNvmemBytes::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                        SingleResponse& response) {
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+// Writes bytes to an NVMEM area; they last only after a commit. Result: next_address, which is the
+// address plus 1 whatever the count of bytes.
+void SetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
+    const RequestResource resource(params, *session);
     const std::uint32_t address = uintParam(params, "address");
     const std::vector<std::uint8_t> bytes = bytesOf(params["data"]);
     const std::string serialNumber = textParam(params, "serial_number", "");

@@ -1,10 +1,9 @@
-#include "qitrmcwebsvc/procedure/SetProperty.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/SessionProperty.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 #include "qitrmcwebsvc/procedure/propertyValues.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -33,10 +32,13 @@ void checkRequestedType(const JsonValue& value, const SessionProperty& property)
 
 }  // namespace
 
-void SetProperty::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                      SingleResponse& response) {
+// Writes a property, which takes effect with a commit. An array of one element may stand for a
+// scalar. Throws BasicError -250819 for a value that is not of the property's type. Result:
+// data_type.
+void SetProperty::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string name = textParam(params, "property");
-    const RequestResource resource(params, session->driverSession, session->defaultResourceKind);
+    const RequestResource resource(params, *session);
     SessionProperty property(session, name, resource);
     const JsonValue& value = scalarUnwrap(params["value"], property);
     checkRequestedType(value, property);

@@ -1,10 +1,9 @@
-#include "qitrmcwebsvc/procedure/WriteRegister.h"
-
 #include <qitrmcapi.h>
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/procedure/procedures.h"
 
 namespace nQITRMCWEBSVC100 {
 
@@ -36,8 +35,10 @@ void writeRegister(std::uint32_t size, nQITRMCAPI100_Session session, const char
 
 }  // namespace
 
-void WriteRegister::run(const JsonValue& params, const std::shared_ptr<SessionContext>& session,
-                        SingleResponse& response) {
+// Writes one register of a device. Throws BasicError -250860 for data with bits above the
+// register's size. Result: next_address, which is the address plus 1 whatever the size.
+void WriteRegister::run(const JsonValue& params, SingleResponse& response) const {
+    const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);
     const std::uint32_t address = uintParam(params, "address");
     const std::uint32_t size = registerSizeParam(params);
