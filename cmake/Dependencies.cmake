@@ -1,5 +1,6 @@
 # The third-party packages, each behind one target. All of them are installed system packages.
 
+find_package(Python3 REQUIRED COMPONENTS Interpreter)
 find_package(Threads REQUIRED)
 find_package(PkgConfig REQUIRED)
 find_package(Boost 1.74 REQUIRED)

@@ -34,9 +34,13 @@ if(QITRMC_SANITIZE)
   add_link_options("-fsanitize=${QITRMC_SANITIZE}")
 endif()
 
+# Generated headers, included as those of src/ are.
+set(QITRMC_GENERATED "${PROJECT_BINARY_DIR}/generated")
+file(MAKE_DIRECTORY "${QITRMC_GENERATED}/qierr")
+
 # qitrmc_library(NAME sources...): one folder of the plug-in as a static library whose headers are
 # included as <folder>/<header>.
 function(qitrmc_library name)
   add_library(${name} STATIC ${ARGN})
-  target_include_directories(${name} PUBLIC "${PROJECT_SOURCE_DIR}/src")
+  target_include_directories(${name} PUBLIC "${PROJECT_SOURCE_DIR}/src" "${QITRMC_GENERATED}")
 endfunction()

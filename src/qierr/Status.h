@@ -5,19 +5,12 @@
 #include <cstdint>
 
 #include "qierr/SourcePosition.h"
+#include "qierr/codes.h"
 
 // Operations on the failure record. None throws; a record is used by one thread at a time.
 //
 // Precedence: an error stands against every later code; a warning gives way to an error only; a
 // success gives way to anything but another success.
-
-// Codes of the platform layers, each with the symbolic name that its failures carry.
-constexpr std::int32_t qiapalerr_memoryFull = -52000;
-constexpr std::int32_t qiapalerr_softwareFaultAPALInternalUseOnly = -52003;
-constexpr std::int32_t qiapalerr_invalidParameter = -52005;
-constexpr std::int32_t qiapalerr_resourceNotFound = -52006;
-constexpr std::int32_t qiapalerr_osFault = -52008;
-constexpr std::int32_t qiapalerr_unsupportedFormat = -52029;
 
 // Sets the code if precedence allows it; an existing text is then reset to "{}". Returns non-zero
 // if the code was replaced.

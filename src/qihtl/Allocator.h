@@ -12,7 +12,7 @@
 // fault test can link a definition that fails on purpose.
 void* qihtl_realloc(void* pointer, std::size_t size);
 
-// Reports that memory ran out: code -52000 at the position of this header.
+// Reports that memory ran out: code qiapalerr_memoryFull at the position of this header.
 inline void qihtl_reportMemoryFull(qierr_Status* status) {
     qierr_Status_setCodeNamed(status, qiapalerr_memoryFull,
                               QIERR_HERE_NAMED("qiapalerr_memoryFull"));

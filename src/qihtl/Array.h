@@ -9,9 +9,9 @@
 
 namespace qihtl {
 
-// An array that reports a failed allocation in a status (-52000) where a standard one would throw.
-// Every operation that takes a status does nothing when that is already negative. Not copied; used
-// by one thread at a time.
+// An array that reports a failed allocation in a status (qiapalerr_memoryFull) where a standard one
+// would throw. Every operation that takes a status does nothing when that is already negative. Not
+// copied; used by one thread at a time.
 template <typename T>
 class Array {
     static_assert(std::is_nothrow_move_constructible_v<T>, "growing moves the elements");

@@ -6,7 +6,8 @@
 
 namespace qihtl {
 
-// A text that reports a failed allocation in a status (-52000) where a standard one would throw.
+// A text that reports a failed allocation in a status (qiapalerr_memoryFull) where a standard one
+// would throw.
 //
 // Every operation that takes a status does nothing when that is already negative, and leaves the
 // text as it was when it fails. The text is followed by a NUL that does not count; it may hold NUL

@@ -16,9 +16,9 @@ class StandardDirectories {
     StandardDirectories(const StandardDirectories&) = delete;
     StandardDirectories& operator=(const StandardDirectories&) = delete;
 
-    // Replaces the text of `directory` by the directory of this key. -52008 without details for an
-    // unknown key, -52006 if its relocation failed, and the failure of the constructor, if there
-    // was one, on each call.
+    // Replaces the text of `directory` by the directory of this key. qiapalerr_osFault without
+    // details for an unknown key, qiapalerr_resourceNotFound if its relocation failed, and the
+    // failure of the constructor, if there was one, on each call.
     void get(const char* key, qihtl::String* directory, qierr_Status* status) const;
 
   private:

@@ -20,7 +20,8 @@ void getCommonAppDataDir(qihtl::String* directory, qierr_Status* status);
 void getTempDir(qihtl::String* directory, qierr_Status* status);
 
 // A standard directory by its key, such as "bindir", where the relocation library puts it or at its
-// default. An unknown key gives -52008; a relocation that failed gives -52006.
+// default. An unknown key gives qiapalerr_osFault; a relocation that failed gives
+// qiapalerr_resourceNotFound.
 void getStandardDir(const char* key, qihtl::String* directory, qierr_Status* status);
 
 }  // namespace qisysq

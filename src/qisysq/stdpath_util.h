@@ -13,8 +13,9 @@ qierr_Writer qisysq_addErrno(qierr_Writer writer, std::int32_t error);
 namespace qisysq {
 
 // Reads a whole file. On success the buffer holds exactly its bytes, and a NUL behind them that
-// does not count. A file that cannot be opened gives -52006, one that cannot be read to its end
-// -52008, want of memory -52000. Does nothing when the status is already negative.
+// does not count. A file that cannot be opened gives qiapalerr_resourceNotFound, one that cannot be
+// read to its end qiapalerr_osFault, want of memory qiapalerr_memoryFull. Does nothing when the
+// status is already negative.
 void readFileToBuffer(const char* fileName, qihtl::String* buffer, qierr_Status* status);
 
 }  // namespace qisysq

@@ -9,7 +9,7 @@ BasicError::BasicError(std::int32_t code, const qierr_SourcePosition& position) 
 }
 
 BasicError::BasicError(const qierr_SourcePosition& position) noexcept
-    : BasicError(internalErrorCode, position) {}
+    : BasicError(qierr::codes::internalError, position) {}
 
 BasicError::BasicError(const BasicError& source) noexcept
     : ExceptionBase(source), std::exception(source) {}
@@ -21,7 +21,7 @@ const char* BasicError::what() const noexcept {
 }
 
 InternalError::InternalError(const char* comment, const qierr_SourcePosition& position) noexcept {
-    qierr_Status_setCodeAt(status(), internalErrorCode, position);
+    qierr_Status_setCodeAt(status(), qierr::codes::internalError, position);
     addComment(qierr_orderedData(translatorName, status()), comment);
 }
 
@@ -40,9 +40,9 @@ void captureCurrentException(qierr_Status* status) {
     } catch (qierr::ExceptionBase& error) {
         qierr_Status_take(status, error.status());
     } catch (const std::bad_alloc&) {
-        qierr_Status_setCodeAt(status, outOfMemoryCode, capturePosition);
+        qierr_Status_setCodeAt(status, qierr::codes::outOfMemory, capturePosition);
     } catch (const std::exception& error) {
-        if (qierr_Status_setCodeAt(status, internalErrorCode, capturePosition) != 0) {
+        if (qierr_Status_setCodeAt(status, qierr::codes::internalError, capturePosition) != 0) {
             qierr_Writer_addString(qierr_Status_writerAtEnd(status), "std_exception_what",
                                    error.what());
         }

@@ -11,9 +11,6 @@ namespace nQITRMCSHAREDCMN100 {
 // The translator of every detail that the service adds to a status.
 constexpr const char* translatorName = "mxlator_qitrmc";
 
-constexpr std::int32_t internalErrorCode = -250800;
-constexpr std::int32_t outOfMemoryCode = -250801;
-
 // A fault of a request. `what` is null when no detail was added.
 class BasicError : virtual public qierr::ExceptionBase, virtual public std::exception {
   public:
@@ -42,8 +39,8 @@ class InternalError : virtual public qierr::ExceptionBase, virtual public std::e
 inline constexpr qierr_SourcePosition capturePosition = QITRMC_HERE;
 
 // Turns the exception in flight into a status, from inside a handler: a status that it carries is
-// taken over; an allocation failure becomes -250801 and any other std::exception -250800 with its
-// text. Any other kind of exception passes through.
+// taken over; an allocation failure becomes outOfMemory and any other std::exception internalError
+// with its text. Any other kind of exception passes through.
 void captureCurrentException(qierr_Status* status);
 
 // A status around driver calls: filled by the call, it throws qierr::Exception from its destructor

@@ -12,12 +12,10 @@ namespace nQITRMCSHAREDCMN100 {
 
 namespace {
 
-constexpr std::int32_t invalidNameCode = -250828;
-constexpr std::int32_t invalidUtf8Code = -250832;
 constexpr std::uint32_t largestRange = 1024;
 
 [[noreturn]] void refuse(const std::string& name, const qierr_SourcePosition& position) {
-    BasicError error(invalidNameCode, position);
+    BasicError error(qierr::codes::invalidResourceName, position);
     addUsageString(error.details(), "kUsageTypeRequestedValue", checkUtf8(name).c_str());
     throw error;
 }
@@ -171,7 +169,7 @@ const std::string& checkUtf8(const std::string& name) {
     while (bytes.Tell() < name.size()) {
         unsigned codePoint;
         if (!rapidjson::UTF8<>::Decode(bytes, &codePoint)) {
-            throw BasicError(invalidUtf8Code, QITRMC_HERE);
+            throw BasicError(qierr::codes::invalidUtf8, QITRMC_HERE);
         }
     }
     return name;

@@ -8,8 +8,9 @@
 // Comma-separated lists of resource names, with ranges at the end of a name: "Mod1/ch0:2,Mod2/ch7"
 // stands for Mod1/ch0, Mod1/ch1, Mod1/ch2 and Mod2/ch7.
 //
-// A name that breaks the rules raises BasicError with code -250828 and the name as a detail; if the
-// name is not valid UTF-8, it is the BasicError of checkUtf8 instead. Any thread may call these.
+// A name that breaks the rules raises BasicError with code invalidResourceName and the name as a
+// detail; if the name is not valid UTF-8, it is the BasicError of checkUtf8 instead. Any thread may
+// call these.
 namespace nQITRMCSHAREDCMN100 {
 
 enum class NameKind : std::int32_t {
@@ -44,7 +45,7 @@ void appendExpanded(std::vector<std::string>& list, const std::string& names, Na
 // is a range itself and continues a run adds one to it only.
 std::string compressNames(const std::vector<std::string>& names, NameKind kind);
 
-// Returns `name`; raises BasicError with code -250832 and no details if it is not valid UTF-8.
+// Returns `name`; raises BasicError with code invalidUtf8 and no details if it is not valid UTF-8.
 const std::string& checkUtf8(const std::string& name);
 
 }  // namespace nQITRMCSHAREDCMN100

@@ -9,8 +9,8 @@ class ISchemaValidator {
   public:
     virtual ~ISchemaValidator() = default;
 
-    // Returns when the request conforms. Otherwise throws BasicError: with invalidRequestCode when
-    // "params" is not an object, and with invalidParamsCode for any other fault. May be called by
+    // Returns when the request conforms. Otherwise throws BasicError: with invalidRequest when
+    // "params" is not an object, and with invalidParams for any other fault. May be called by
     // several threads at once.
     virtual void validate(const SingleRequest& request) = 0;
 };

@@ -15,8 +15,9 @@ namespace nQITRMCWEBSVC100 {
 // access: 1 read only, 3 read and write. reservationTimeout: seconds to wait for a device that
 // another session holds. Any number of threads may call; each call runs alone, the driver's part of
 // it included, so a reservation that waits holds up every other call. Failures are thrown:
-// BasicError -250833 for an unknown id, -250901 when no session with resources can be added;
-// qierr::Exception with the driver's status when the driver refuses; InternalError otherwise.
+// BasicError unknownSession for an unknown id, tooManySessions when no session with resources can
+// be added; qierr::Exception with the driver's status when the driver refuses; InternalError
+// otherwise.
 class ISessionManager {
   public:
     virtual ~ISessionManager() = default;

@@ -3,7 +3,6 @@
 #include <boost/algorithm/string/replace.hpp>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/compactJson.h"
 #include "qitrmcwebsvc/findMember.h"
 #include "qitrmcwebsvcerr/ErrorDescriptions.h"
@@ -100,7 +99,7 @@ void throwInvalidParams(const JsonValue& schema, const SchemaFailure& failure) {
     const std::string details = describeFailure(schema, failure);
     const char* const documentPointer = failure.documentPointer.c_str();
 
-    BasicError error(invalidParamsCode, QITRMC_HERE);
+    BasicError error(qierr::codes::invalidParams, QITRMC_HERE);
     qierr_Writer writer = error.details();
     if (!details.empty()) {
         writer = addUsageString(writer, "kUsageTypeParameter", documentPointer);

@@ -14,7 +14,7 @@ namespace nQITRMCWEBSVC100 {
 // of which names a sentence. Throws InternalError when the schema itself is at fault.
 std::string describeFailure(const JsonValue& schema, const SchemaFailure& failure);
 
-// Throws the BasicError with invalidParamsCode for this failure: with its sentence or, where none
+// Throws the BasicError with invalidParams for this failure: with its sentence or, where none
 // is known, with its raw facts. Throws InternalError as describeFailure.
 [[noreturn]] void throwInvalidParams(const JsonValue& schema, const SchemaFailure& failure);
 

@@ -3,7 +3,6 @@
 #include <exception>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/compactJson.h"
 #include "qitrmcwebsvc/findMember.h"
 #include "qitrmcwebsvc/requestText.h"
@@ -55,7 +54,7 @@ class SkippedError {
   private:
     static JsonValue make(JsonPool& pool) {
         SingleResponse response(&pool);
-        response.setError(*BasicError(skippedCode, QITRMC_HERE).status());
+        response.setError(*BasicError(qierr::codes::skipped, QITRMC_HERE).status());
         return std::move(response.getValue()["error"]);
     }
 
@@ -92,7 +91,7 @@ void RequestHandler::answer(const std::string& body, JsonDocument& responseDocum
         ExclusiveAccess access(accessLock);
         handleBatchRequest(requestDocument, responseDocument, responseDocument.GetAllocator());
     } else {
-        throw BasicError(invalidRequestCode, QITRMC_HERE);
+        throw BasicError(qierr::codes::invalidRequest, QITRMC_HERE);
     }
 }
 
@@ -141,7 +140,7 @@ void RequestHandler::handleBatchRequest(JsonValue& requests, JsonValue& response
 std::shared_ptr<IProcedure> RequestHandler::getProcedure(const std::string& method) const {
     const auto found = procedures.find(method);
     if (found == procedures.end()) {
-        BasicError error(unknownMethodCode, QITRMC_HERE);
+        BasicError error(qierr::codes::unknownMethod, QITRMC_HERE);
         addUsageString(error.details(), "kUsageTypeMethod", method.c_str());
         throw error;
     }

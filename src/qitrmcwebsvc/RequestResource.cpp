@@ -17,8 +17,6 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-constexpr std::int32_t unknownResourceCode = -250828;
-
 // The first member that a request has decides.
 constexpr std::pair<const char*, ResourceKind> resourceMembers[] = {
     {"devices", ResourceKind::Device},
@@ -39,7 +37,7 @@ bool isToken(const std::string& name) {
 }
 
 [[noreturn]] void refuseName(const std::string& name) {
-    BasicError error(unknownResourceCode, QITRMC_HERE);
+    BasicError error(qierr::codes::invalidResourceName, QITRMC_HERE);
     addUsageString(error.details(), "kUsageTypeRequestedValue", name.c_str());
     throw error;
 }

@@ -13,8 +13,8 @@ namespace nQITRMCWEBSVC100 {
 
 // The resources that a request names: their kind and their expanded names, in request order.
 //
-// Relies on a request that passed its schema. Failures are thrown: BasicError -250828 with the name
-// that is unknown to the driver, cannot be parsed or holds a NUL.
+// Relies on a request that passed its schema. Failures are thrown: BasicError invalidResourceName
+// with the name that is unknown to the driver, cannot be parsed or holds a NUL.
 class RequestResource {
   public:
     // Reads the request's members only.

@@ -11,8 +11,8 @@ namespace nQITRMCWEBSVC100 {
 // Whether the one device that the resources name is of this product category, as the driver numbers
 // categories. The session's default devices count as one name.
 //
-// Throws BasicError -32602 unless the resources are exactly one device; qierr::Exception when the
-// driver refuses to tell.
+// Throws BasicError invalidParams unless the resources are exactly one device; qierr::Exception
+// when the driver refuses to tell.
 bool isDeviceOfCategory(const RequestResource& resource,
                         const std::shared_ptr<SessionContext>& session, std::int32_t category);
 

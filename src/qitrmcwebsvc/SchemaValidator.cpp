@@ -2,7 +2,6 @@
 
 #include "embedded/EmbeddedFiles.h"
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/ParameterDiagnosis.h"
 #include "qitrmcwebsvc/SchemaRun.h"
 
@@ -15,7 +14,7 @@ using nQITRMCSHAREDCMN100::InternalError;
 void requireParamsObject(const SingleRequest& request) {
     if (request.getParams().IsObject())
         return;
-    BasicError error(invalidRequestCode, QITRMC_HERE);
+    BasicError error(qierr::codes::invalidRequest, QITRMC_HERE);
     addUsageString(error.details(), "kUsageTypeInvalidMember", "params");
     throw error;
 }

@@ -18,10 +18,6 @@ namespace {
 constexpr std::size_t maxSessionsWithResources = 100;
 constexpr double openTimeout = 60.0;
 
-constexpr std::int32_t deviceReservedCode = -250811;
-constexpr std::int32_t unknownSessionCode = -250833;
-constexpr std::int32_t tooManySessionsCode = -250901;
-
 using OpenSession = void (*)(nQITRMCAPI100_Session*, const char*, double, std::int32_t, const char*,
                              double, qierr_Status*);
 
@@ -112,7 +108,7 @@ std::string SessionManager::createSession(ResourceKind kind, const std::vector<s
     if (forceReserve)
         closeSessionsReserving(devices);
     if (sessions.size() == maxSessionsWithResources)
-        throw BasicError(tooManySessionsCode, QITRMC_HERE);
+        throw BasicError(qierr::codes::tooManySessions, QITRMC_HERE);
     const std::string joinedNames = compressNames(names, NameKind::Path);
     const OpenSession open = openFunction(kind);
     SessionContext context{kind, access, 0};
@@ -131,7 +127,7 @@ std::shared_ptr<SessionContext> SessionManager::getSessionContext(const std::str
     std::lock_guard<std::recursive_mutex> hold(mutex);
     const auto found = sessions.find(sessionId);
     if (found == sessions.end()) {
-        BasicError error(unknownSessionCode, QITRMC_HERE);
+        BasicError error(qierr::codes::unknownSession, QITRMC_HERE);
         addUsageString(error.details(), "kUsageTypeSessionId", sessionId.c_str());
         throw error;
     }
@@ -208,7 +204,7 @@ std::vector<std::string> SessionManager::findSessionsReserving(const DeviceSet& 
 }
 
 void SessionManager::reportReservingSessions(const DeviceSet& devices, qierr_Status* status) {
-    if (status->code != deviceReservedCode)
+    if (status->code != qierr::codes::deviceReserved)
         return;
     const std::vector<std::string> ids = findSessionsReserving(devices);
     if (!ids.empty())

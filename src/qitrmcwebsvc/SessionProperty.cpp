@@ -13,8 +13,6 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-constexpr std::int32_t arrayOnSeveralResourcesCode = -250829;
-
 // Data types: the scalars, and behind them the arrays in the same order.
 constexpr std::int32_t firstScalarType = 1;
 constexpr std::int32_t scalarTypeCount = 7;
@@ -161,7 +159,7 @@ void SessionProperty::spreadOverResources() {
     if (!isOnResources() || resources.size() < 2)
         return;
     if (isArray()) {
-        BasicError error(arrayOnSeveralResourcesCode, QITRMC_HERE);
+        BasicError error(qierr::codes::arrayOnSeveralResources, QITRMC_HERE);
         addUsageString(error.details(), "kUsageTypeDevices", joinedResources.c_str());
         throw error;
     }

@@ -25,9 +25,9 @@ class SessionProperty {
     // A scalar property on several resources has the array of its type, one element for each
     // resource in their order.
     //
-    // Throws BasicError -32602 when the name needs resources and there are none, and -250829 when
-    // an array property is asked of several resources; InternalError for a kind of resources that
-    // does not exist.
+    // Throws BasicError invalidParams when the name needs resources and there are none, and
+    // arrayOnSeveralResources when an array property is asked of several resources; InternalError
+    // for a kind of resources that does not exist.
     SessionProperty(std::shared_ptr<SessionContext> session, std::string name,
                     const RequestResource& resources);
 

@@ -4,7 +4,6 @@
 #include <utility>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/findMember.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -13,14 +12,14 @@ namespace {
 using nQITRMCSHAREDCMN100::BasicError;
 
 [[noreturn]] void throwInvalidMember(const char* name, const qierr_SourcePosition& position) {
-    BasicError error(invalidRequestCode, position);
+    BasicError error(qierr::codes::invalidRequest, position);
     addUsageString(error.details(), "kUsageTypeInvalidMember", name);
     throw error;
 }
 
 void checkEnvelope(const JsonValue& value) {
     if (!value.IsObject() || value.ObjectEmpty())
-        throw BasicError(invalidRequestCode, QITRMC_HERE);
+        throw BasicError(qierr::codes::invalidRequest, QITRMC_HERE);
 
     const JsonValue* const id = findMember(value, "id");
     if (!id || !(id->IsInt() || id->IsString()))

@@ -12,7 +12,7 @@ class SingleRequest {
   public:
     // Checks the envelope and takes `value` over, which becomes null. Its strings and members stay
     // in the pool of their document, which must outlive this object. On failure `value` stays as it
-    // was and a BasicError with invalidRequestCode is thrown.
+    // was and a BasicError with invalidRequest is thrown.
     explicit SingleRequest(JsonValue& value);
     virtual ~SingleRequest() = default;
 

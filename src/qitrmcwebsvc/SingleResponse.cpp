@@ -5,7 +5,6 @@
 #include <string>
 
 #include "qierr/Status.h"
-#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/describeStatus.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -13,9 +12,9 @@ namespace {
 
 // The codes of JSON-RPC itself, which stand bare; every other failure is a server error whose own
 // code and text travel in "data".
-constexpr std::array<std::int32_t, 6> standingCodes = {parseErrorCode,     protocolInternalCode,
-                                                       invalidParamsCode,  unknownMethodCode,
-                                                       invalidRequestCode, serverErrorCode};
+constexpr std::array<std::int32_t, 6> standingCodes = {
+    qierr::codes::parseError,    qierr::codes::rpcInternalError, qierr::codes::invalidParams,
+    qierr::codes::unknownMethod, qierr::codes::invalidRequest,   qierr::codes::serverError};
 
 bool isStandingCode(std::int32_t code) {
     return std::find(standingCodes.begin(), standingCodes.end(), code) != standingCodes.end();
@@ -23,7 +22,7 @@ bool isStandingCode(std::int32_t code) {
 
 std::string describeServerError() {
     qierr::Status status;
-    qierr_Status_setCode(&status, serverErrorCode);
+    qierr_Status_setCode(&status, qierr::codes::serverError);
     return describeStatus(status);
 }
 
@@ -55,7 +54,7 @@ void SingleResponse::setError(const qierr_Status& status) {
         error.AddMember("code", status.code, *allocator);
         error.AddMember("message", JsonValue(text, *allocator), *allocator);
     } else {
-        error.AddMember("code", serverErrorCode, *allocator);
+        error.AddMember("code", qierr::codes::serverError, *allocator);
         error.AddMember("message", JsonValue(describeServerError(), *allocator), *allocator);
         data.AddMember("qitrmc_code", status.code, *allocator);
         data.AddMember("qitrmc_message", JsonValue(text, *allocator), *allocator);

@@ -4,7 +4,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Throws BasicError -32602 with the sentence of this name (getErrorDescription) for the client.
+// Throws BasicError invalidParams with the sentence of this name (getErrorDescription) for the
+// client.
 [[noreturn]] void throwInvalidParams(const char* descriptionName,
                                      const qierr_SourcePosition& position);
 

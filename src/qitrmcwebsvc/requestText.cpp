@@ -4,7 +4,6 @@
 #include <optional>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcwebsvc/JsonRpcCodes.h"
 #include "qitrmcwebsvc/exponentGuard.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -122,7 +121,7 @@ void parseRequestText(const std::string& body, JsonDocument& document) {
         return;
     const auto code =
         handler.numberTooBig() ? rapidjson::kParseErrorNumberTooBig : reader.GetParseErrorCode();
-    BasicError error(parseErrorCode, QITRMC_HERE);
+    BasicError error(qierr::codes::parseError, QITRMC_HERE);
     addUsageUInt32(addUsageString(error.details(), "kUsageTypeDetails", parseErrorText(code)),
                    "kUsageTypeOffset", static_cast<std::uint32_t>(reader.GetErrorOffset()));
     throw error;

@@ -11,6 +11,6 @@ constexpr const char* defaultXlatorName = "qixlator_default";
 
 // Gives the one default translator, or null when the status is negative. It searches the
 // explanation files of the shared directory in the wanted language and then in English, and has no
-// dynamic descriptions. -52006 when there is no text.
+// dynamic descriptions. qiapalerr_resourceNotFound when there is no text.
 XlatorInterface* qixlator_default_create(const char* name, const char* registrationInfo,
                                          qierr_Status* status);

@@ -40,7 +40,8 @@ extern const TypedItemFormat rawItemFormats[];
 extern const TypedItemFormat formattedItemFormats[];
 
 // Appends the items of the JSON array at `array`, all or none. What is no array has no items.
-// -52005 for an item that is no object or a value that is neither a string nor an array of strings.
+// qiapalerr_invalidParameter for an item that is no object or a value that is neither a string nor
+// an array of strings.
 void formatDynamicReportItems(const char* array, const TypedItemFormat* formats,
                               qihtl::String* output, qierr_Status* status);
 

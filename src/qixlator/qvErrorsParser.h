@@ -22,14 +22,15 @@
 // the status is already negative. Nothing is kept between searches, which may run on any thread.
 namespace qixlator {
 
-// Searches one file. A file that does not begin as an explanation file has no descriptions. -52006
-// when it cannot be opened or is faulty; the first block of the code ends the search.
+// Searches one file. A file that does not begin as an explanation file has no descriptions.
+// qiapalerr_resourceNotFound when it cannot be opened or is faulty; the first block of the code
+// ends the search.
 void findErrorDescriptionFromFile(const char* path, std::int32_t code, qihtl::String* output,
                                   qierr_Status* status);
 
 // Searches the regular files of a directory, not those below it, whose extension is exactly "txt"
-// or "err", in the order of the operating system, up to the first description or failure. -52006
-// also when the directory cannot be read.
+// or "err", in the order of the operating system, up to the first description or failure.
+// qiapalerr_resourceNotFound also when the directory cannot be read.
 void findErrorDescriptionFromDir(const char* directory, std::int32_t code, qihtl::String* output,
                                  qierr_Status* status);
 
@@ -40,7 +41,7 @@ void findErrorDescriptionFromErrorsDir(const char* errorsDirectory, std::int32_t
                                        qierr_Status* status);
 
 // The name of a language's directory: English, French, German, Japanese, Korean, ChineseS for 0 to
-// 5. Any other number sets -52005 and gives "".
+// 5. Any other number sets qiapalerr_invalidParameter and gives "".
 const char* convertLangToDir(std::int32_t language, qierr_Status* status);
 
 }  // namespace qixlator

@@ -29,8 +29,9 @@ enum class LuaRuntime {
 //   qixlatorlua_settings  optional: an object for the scripts
 //   qixlatorlua_path      optional: directories to search for scripts, separated by semicolons
 //
-// Null with -52000 when memory runs out for the state, with -52003 when Lua reports an error, and
-// when the status is already negative. The translator is ended by its own destroy.
+// Null with qiapalerr_memoryFull when memory runs out for the state, with
+// qiapalerr_softwareFaultAPALInternalUseOnly when Lua reports an error, and when the status is
+// already negative. The translator is ended by its own destroy.
 XlatorInterface* createLuaXlator(const char* name, const char* registrationInfo, LuaRuntime runtime,
                                  qierr_Status* status);
 

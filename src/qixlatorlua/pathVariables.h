@@ -9,8 +9,8 @@ namespace qixlatorlua {
 void lookupVariable(const char* name, qihtl::String* value, qierr_Status* status);
 
 // Replaces `expanded` by the path with each variable replaced by its value. A variable begins with
-// "$" and ends before a slash; without that slash the path is invalid (-52005), and so is one whose
-// variables hold variables without an end.
+// "$" and ends before a slash; without that slash the path is invalid (qiapalerr_invalidParameter),
+// and so is one whose variables hold variables without an end.
 void expandPath(const char* path, qihtl::String* expanded, qierr_Status* status);
 
 }  // namespace qixlatorlua

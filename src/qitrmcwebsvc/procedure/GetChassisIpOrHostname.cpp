@@ -17,8 +17,8 @@ constexpr std::pair<const char*, const char*> identityProperties[] = {
 
 }  // namespace
 
-// Tells the network address and name of a chassis. Throws BasicError -250812 for a device that is
-// no chassis. Result: chassis_ip, chassis_hostname.
+// Tells the network address and name of a chassis. Throws BasicError notChassis for a device that
+// is no chassis. Result: chassis_ip, chassis_hostname.
 void GetChassisIpOrHostname::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, *session);

@@ -17,7 +17,7 @@ void rename(const SessionContext& session, const std::string& oldName, const std
 // Renames the modules of a chassis after its new name and their slots, and the chassis last.
 //
 // Nothing is undone on failure: the modules before it keep their new names, those after it and the
-// chassis their old ones. Throws BasicError -250812 for a device that is no chassis. Result:
+// chassis their old ones. Throws BasicError notChassis for a device that is no chassis. Result:
 // new_module_names, new_chassis_name.
 void RenameChassisAndAllConnectedModules::run(const JsonValue& params,
                                               SingleResponse& response) const {

@@ -12,8 +12,6 @@ using nQITRMCSHAREDCMN100::BasicError;
 
 namespace {
 
-constexpr std::int32_t wrongDataTypeCode = -250819;
-
 // A scalar may be written as an array of one element.
 const JsonValue& scalarUnwrap(const JsonValue& value, const SessionProperty& property) {
     return property.isScalar() && value.IsArray() && value.Size() == 1 ? value[0] : value;
@@ -24,7 +22,7 @@ void checkRequestedType(const JsonValue& value, const SessionProperty& property)
     const PropertyValueType* type = propertyValueType(property.dataType());
     if (type == nullptr || type->accepts(value))
         return;
-    BasicError error(wrongDataTypeCode, QITRMC_HERE);
+    BasicError error(qierr::codes::wrongValueType, QITRMC_HERE);
     addUsageString(error.details(), "kUsageTypeRequestedDataType",
                    nQITRMCAPI100_translateStaticEnumValueToString("DataType", property.dataType()));
     throw error;
@@ -33,7 +31,7 @@ void checkRequestedType(const JsonValue& value, const SessionProperty& property)
 }  // namespace
 
 // Writes a property, which takes effect with a commit. An array of one element may stand for a
-// scalar. Throws BasicError -250819 for a value that is not of the property's type. Result:
+// scalar. Throws BasicError wrongValueType for a value that is not of the property's type. Result:
 // data_type.
 void SetProperty::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);

@@ -11,8 +11,6 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-constexpr std::int32_t tooWideCode = -250860;
-
 bool fits(std::uint64_t data, std::uint32_t size) {
     return size >= 64 || data >> size == 0;
 }
@@ -35,7 +33,7 @@ void writeRegister(std::uint32_t size, nQITRMCAPI100_Session session, const char
 
 }  // namespace
 
-// Writes one register of a device. Throws BasicError -250860 for data with bits above the
+// Writes one register of a device. Throws BasicError dataTooWide for data with bits above the
 // register's size. Result: next_address, which is the address plus 1 whatever the size.
 void WriteRegister::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
@@ -44,7 +42,7 @@ void WriteRegister::run(const JsonValue& params, SingleResponse& response) const
     const std::uint32_t size = registerSizeParam(params);
     const std::uint64_t data = params["data"].GetUint64();
     if (!fits(data, size))
-        throw BasicError(tooWideCode, QITRMC_HERE);
+        throw BasicError(qierr::codes::dataTooWide, QITRMC_HERE);
     writeRegister(size, session->driverSession, resource.joinedNames().c_str(), address, data);
 
     JsonPool& pool = *response.getAllocator();

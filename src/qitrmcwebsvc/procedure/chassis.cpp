@@ -8,7 +8,6 @@ namespace nQITRMCWEBSVC100 {
 namespace {
 
 constexpr std::int32_t chassisCategory = 1;
-constexpr std::int32_t notAChassisCode = -250812;
 
 }  // namespace
 
@@ -27,7 +26,7 @@ RequestResource ScratchParams::resourceFor(const std::string& device,
 void requireChassis(const RequestResource& resource,
                     const std::shared_ptr<SessionContext>& session) {
     if (!isDeviceOfCategory(resource, session, chassisCategory))
-        throw nQITRMCSHAREDCMN100::BasicError(notAChassisCode, QITRMC_HERE);
+        throw nQITRMCSHAREDCMN100::BasicError(qierr::codes::notChassis, QITRMC_HERE);
 }
 
 std::vector<std::string> modulesOf(const RequestResource& chassis,

@@ -27,7 +27,8 @@ class ScratchParams {
     JsonValue params;
 };
 
-// Throws BasicError -32602 unless the resources are one device, and -250812 unless it is a chassis.
+// Throws BasicError invalidParams unless the resources are one device, and notChassis unless it is
+// a chassis.
 void requireChassis(const RequestResource& resource,
                     const std::shared_ptr<SessionContext>& session);
 

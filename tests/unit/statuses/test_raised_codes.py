@@ -1,6 +1,7 @@
 """No source raises or names a code that has no words."""
 
 import re
+import subprocess
 from pathlib import Path
 
 import pytest
@@ -12,7 +13,6 @@ SUFFIXES = {".c", ".cpp", ".def", ".h", ".lua", ".py"}
 # Numbers of the ranges that the codes are taken from; the limits of 16 bits are no codes.
 CODE = re.compile(r"(?<![\w.])-\s?((?:320|326|327)\d\d|250[89]\d\d|52\d\d\d)(?![\w.]*\d)")
 NO_CODES = {32767, 32768}
-CONSTANT = re.compile(r"\b(qiapalerr_\w+)\s*=\s*(-\d+)")
 
 
 def named_codes(text):
@@ -46,10 +46,23 @@ def test_every_code_in_the_sources_has_its_words(folder):
     assert unexplained == [], "add these codes to share/statuses/catalogue.tsv"
 
 
-def test_platform_constants_have_the_same_numbers_in_the_sources():
-    constants = {row["constant"]: row["code"] for row in CATALOGUE}
-    found = [match for path in source_files(ROOT / "src")
-             for match in CONSTANT.findall(path.read_text(encoding="utf-8"))]
-    assert found
-    for name, code in found:
-        assert constants.get(name) == code
+def test_the_service_writes_codes_by_their_names():
+    written = {str(path.relative_to(ROOT)): sorted(named_codes(path.read_text(encoding="utf-8")))
+               for path in source_files(ROOT / "src") if path.suffix in {".cpp", ".h"}}
+    assert written
+    assert {path: codes for path, codes in written.items() if codes} == {}
+
+
+def test_the_code_that_a_script_raises_has_the_number_of_its_constant():
+    [unsupported] = [row["code"] for row in CATALOGUE
+                     if row["constant"] == "qiapalerr_unsupportedFormat"]
+    script = (ROOT / "src" / "qimxl" / "mxlator.lua").read_text(encoding="utf-8")
+    assert f"local unsupportedFormat = {unsupported}\n" in script
+
+
+def test_the_header_names_every_code_but_those_of_the_simulated_driver(tmp_path):
+    header = tmp_path / "codes.h"
+    subprocess.run([ROOT / "share" / "statuses" / "make_codes.py", header], check=True, timeout=60)
+    declared = re.findall(r"^constexpr std::int32_t (\w+) = (-\d+);$", header.read_text(), re.MULTILINE)
+    expected = [(row["constant"], row["code"]) for row in CATALOGUE] + [("deviceReserved", "-250811")]
+    assert sorted(declared) == sorted(expected)
