@@ -50,7 +50,8 @@ def explanation_files(statuses):
     simulated = [status for status in statuses if status.raiser == SIMULATED_RAISER]
     common = [status for status in statuses if status.raiser in COMMON_RAISERS]
     files = {}
-    for language, folder in LANGUAGES.items():
+    for language in LANGUAGES:
+        folder = language.folder
         files[f"errors/{folder}/qitrmc.txt"] = explanation_text(installed, language)
         files[f"errors/{folder}/qitrmcsim.txt"] = explanation_text(simulated, language)
         files[f"mierrors/qitrmc/{folder}/qitrmc.txt"] = explanation_text(common, language)

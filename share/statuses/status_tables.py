@@ -11,13 +11,15 @@ Every fault is reported as "file:line: what is wrong".
 """
 
 import re
+import sys
 import unicodedata
 from dataclasses import dataclass
 from pathlib import Path
 
-# The word of each language in column names, and its folder in the shared directory.
-LANGUAGES = {"eng": "English", "fra": "French", "deu": "German", "jpn": "Japanese", "kor": "Korean",
-             "chs": "ChineseS"}
+sys.path.insert(0, str(Path(__file__).resolve().parents[1]))
+
+from languages import LANGUAGES, WORDS  # from the folder above
+
 # The raisers of the codes in each table.
 CATALOGUE_RAISERS = ("json-rpc", "service", "platform")
 SIMULATED_RAISER = "simulated-driver"
@@ -36,16 +38,13 @@ CONSTANT = re.compile(r"[a-z][A-Za-z0-9]*(_[a-z][A-Za-z0-9]*)?")
 MARKUP = re.compile(r"[<>&]")
 # The reader cuts longer lines, the line feed included, and looks for tags in the pieces.
 LONGEST_LINE = 1023
-# Languages that put no blank between two sentences.
-UNSPACED = ("jpn", "chs")
-
 
 def text_columns(languages):
     return [f"{language}_{part}" for language in languages for part in ("happened", "remedy")]
 
 
-CATALOGUE_COLUMNS = ["code", "constant", "raiser", *text_columns(LANGUAGES)]
-DRIVER_COLUMNS = ["code", "raiser", *text_columns(list(LANGUAGES)[1:])]
+CATALOGUE_COLUMNS = ["code", "constant", "raiser", *text_columns(WORDS)]
+DRIVER_COLUMNS = ["code", "raiser", *text_columns(WORDS[1:])]
 SIMULATOR_COLUMNS = ["code", "name", "happened", "remedy"]
 
 
@@ -64,8 +63,7 @@ class Status:
     texts: dict
 
     def explanation(self, language):
-        happened, remedy = self.texts[language]
-        return happened + ("" if language in UNSPACED else " ") + remedy
+        return language.gap.join(self.texts[language.word])
 
 
 def read_table(path, columns, faults):
@@ -138,7 +136,7 @@ def texts_of(row, languages):
 
 def service_statuses(path, faults):
     rows = sound_rows(path, CATALOGUE_COLUMNS, CATALOGUE_RAISERS, faults)
-    return [Status(place, code, row["constant"], row["raiser"], texts_of(row, LANGUAGES))
+    return [Status(place, code, row["constant"], row["raiser"], texts_of(row, WORDS))
             for code, (place, row) in rows.items()]
 
 
@@ -159,7 +157,7 @@ def driver_statuses(simulator_path, driver_path, faults):
 def driver_status(place, code, english, other):
     prefix = SIMULATOR_PREFIX if other["raiser"] == SIMULATED_RAISER else ""
     texts = {"eng": (english["happened"], english["remedy"]),
-             **texts_of(other, list(LANGUAGES)[1:])}
+             **texts_of(other, WORDS[1:])}
     return Status(place, code, prefix + english["name"], other["raiser"], texts)
 
 
@@ -170,9 +168,10 @@ def status_faults(status):
     for language in LANGUAGES:
         length = len(status.explanation(language).encode()) + 1
         if length > LONGEST_LINE:
-            yield f"the {language} texts make a line of {length} bytes; {LONGEST_LINE} fit"
-        if language != "eng" and set(status.texts[language]) & set(status.texts["eng"]):
-            yield f"{language} repeats an English text"
+            yield f"the {language.word} texts make a line of {length} bytes; {LONGEST_LINE} fit"
+        texts = status.texts[language.word]
+        if language.word != "eng" and set(texts) & set(status.texts["eng"]):
+            yield f"{language.word} repeats an English text"
 
 
 def read_statuses(catalogue=CATALOGUE, simulator=SIMULATOR, driver=DRIVER):

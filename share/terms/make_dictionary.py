@@ -13,8 +13,11 @@ import sys
 import unicodedata
 from pathlib import Path
 
-LANGUAGES = ("eng", "fra", "deu", "jpn", "kor", "chs")
-HEADER = ("key", *LANGUAGES, "remark")
+sys.path.insert(0, str(Path(__file__).resolve().parents[1]))
+
+from languages import WORDS  # from the folder above
+
+HEADER = ("key", *WORDS, "remark")
 USAGE_KEY = re.compile(r"kUsageType[A-Z][A-Za-z0-9]*")
 AUX_KEY = re.compile(r"kAuxTerm[A-Z][A-Za-z0-9]*")
 TABLES = {
@@ -67,7 +70,7 @@ def same_as_english(remark):
     if not remark.startswith(SAME_AS_ENGLISH):
         return None
     named = remark.removeprefix(SAME_AS_ENGLISH).split(",")
-    return named if all(language in LANGUAGES[1:] for language in named) else None
+    return named if all(language in WORDS[1:] for language in named) else None
 
 
 def english_only_faults(key, translations):
@@ -106,7 +109,7 @@ def row_faults(cells, key_form):
         yield from text_faults(column, text)
     if not english:
         yield "eng is empty"
-    translations = dict(zip(LANGUAGES[1:], others))
+    translations = dict(zip(WORDS[1:], others))
     if remark == ENGLISH_ONLY:
         yield from english_only_faults(key, translations)
     else:
@@ -130,7 +133,7 @@ def merge_tables(directory):
             if key in terms:
                 faults.append(f"{place}: key {key} stands already at {first_places[key]}")
             first_places.setdefault(key, place)
-            terms[key] = dict(zip(LANGUAGES, cells[1:]))
+            terms[key] = dict(zip(WORDS, cells[1:]))
     if faults:
         raise Faults(faults)
     return terms
@@ -186,7 +189,7 @@ def dictionary_text(terms, language):
 
 def main():
     parser = argparse.ArgumentParser(description=__doc__.partition("\n")[0])
-    parser.add_argument("language", choices=LANGUAGES)
+    parser.add_argument("language", choices=WORDS)
     parser.add_argument("output", type=Path, help="Lua file to write")
     parser.add_argument("--tables", type=Path, default=Path(__file__).parent,
                         help="folder of the term tables; default: the folder of this script")

@@ -4,7 +4,6 @@ rules of the files and not from the program that reads them."""
 import re
 
 NUMBER = re.compile(rb"\s*([-+]?)(0[xX][0-9a-fA-F]+|0[0-7]*|[1-9][0-9]*)")
-LANGUAGE_FOLDERS = ("English", "French", "German", "Japanese", "Korean", "ChineseS")
 
 
 class BadFile(Exception):

@@ -1,14 +1,18 @@
 """Reads the tables of the status codes for the tests, and runs their generator."""
 
 import subprocess
+import sys
 from pathlib import Path
 
 ROOT = Path(__file__).resolve().parents[3]
+sys.path.insert(0, str(ROOT / "share"))
+
+from languages import LANGUAGES  # from the folder of the table
+
 STATUSES = ROOT / "share" / "statuses"
 GENERATOR = STATUSES / "make_explanations.py"
-FOLDERS = {"eng": "English", "fra": "French", "deu": "German", "jpn": "Japanese",
-           "kor": "Korean", "chs": "ChineseS"}
-UNSPACED = ("jpn", "chs")
+FOLDERS = {language.word: language.folder for language in LANGUAGES}
+GAPS = {language.word: language.gap for language in LANGUAGES}
 
 
 def rows_of(path):
@@ -40,7 +44,7 @@ TEXTS = gather_texts()
 
 def explanation(code, language):
     """Return the words that a client must find in front of the details."""
-    return ("" if language in UNSPACED else " ").join(TEXTS[code][language])
+    return GAPS[language].join(TEXTS[code][language])
 
 
 def generate(*arguments, generator=GENERATOR):

@@ -97,11 +97,6 @@ def test_the_files_of_a_controller_leave_out_the_simulated_driver(shared, langua
     assert not [code for code in codes if 250950 <= abs(code) <= 250999]
 
 
-def test_the_build_names_every_generated_folder_as_its_output():
-    rules = (ROOT / "share" / "CMakeLists.txt").read_text()
-    assert re.search(r"set\(languages ([\w ]+)\)", rules)[1].split() == list(FOLDERS.values())
-
-
 def test_the_page_of_the_status_codes_is_up_to_date(tmp_path):
     result = generate("--page", tmp_path / "page.md")
     assert result.returncode == 0, result.stderr

@@ -4,7 +4,7 @@ import shutil
 
 import pytest
 
-from status_catalogue import FOLDERS, ROOT, generate
+from status_catalogue import FOLDERS, GAPS, ROOT, generate
 
 CATALOGUE = "share/statuses/catalogue.tsv"
 DRIVER = "share/statuses/driver.tsv"
@@ -17,7 +17,8 @@ class Project:
     def __init__(self, root):
         self.root = root
         for name in (SIMULATOR, CATALOGUE, DRIVER, "share/statuses/make_explanations.py",
-                     "share/statuses/status_tables.py"):
+                     "share/statuses/status_tables.py", "share/languages.py",
+                     "share/languages.tsv"):
             (root / name).parent.mkdir(parents=True, exist_ok=True)
             shutil.copy(ROOT / name, root / name)
 
@@ -111,8 +112,7 @@ def test_translations_of_a_code_that_the_driver_lacks_are_refused(project):
 def test_an_explanation_fits_in_one_line_of_the_reader(project, language):
     cells = dict(zip(project.lines(CATALOGUE)[0].split("\t"),
                      project.lines(CATALOGUE)[1].split("\t")))
-    blank = "" if language in ("jpn", "chs") else " "
-    room = 1022 - len((cells[f"{language}_happened"] + blank).encode())
+    room = 1022 - len((cells[f"{language}_happened"] + GAPS[language]).encode())
     project.change_cell(CATALOGUE, 2, f"{language}_remedy", "x" * (room + 1))
     assert project.refusal() == [
         f"{CATALOGUE}:2: the {language} texts make a line of 1024 bytes; 1023 fit"]

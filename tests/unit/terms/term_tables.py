@@ -1,10 +1,15 @@
 """Reads the term tables for the tests."""
 
+import sys
 from pathlib import Path
 
-TERMS = Path(__file__).resolve().parents[3] / "share" / "terms"
+SHARE = Path(__file__).resolve().parents[3] / "share"
+sys.path.insert(0, str(SHARE))
+
+from languages import WORDS as LANGUAGES  # from the folder of the table
+
+TERMS = SHARE / "terms"
 TABLES = ("usage_general.tsv", "aux_general.tsv", "usage_family.tsv", "aux_family.tsv")
-LANGUAGES = ("eng", "fra", "deu", "jpn", "kor", "chs")
 HEADER = ["key", *LANGUAGES, "remark"]
 
 

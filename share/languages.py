@@ -1,0 +1,33 @@
+"""The languages of all texts, from languages.tsv, the only list of them.
+
+Its rows are in the order in which the program carries the dictionaries. Its columns: the number by
+which the translator knows the language, the word of three letters that names its columns and files,
+its folder in the shared directory, and what separates two sentences.
+"""
+
+from dataclasses import dataclass
+from pathlib import Path
+
+TABLE = Path(__file__).resolve().parent / "languages.tsv"
+
+
+@dataclass(frozen=True)
+class Language:
+    number: int
+    word: str
+    folder: str
+    gap: str  # between two sentences
+
+
+def read_languages(path=TABLE):
+    """Return the languages in the order of their numbers."""
+    _, *rows = path.read_text(encoding="utf-8").removesuffix("\n").split("\n")
+    languages = []
+    for row in rows:
+        number, word, folder, between = row.split("\t")
+        languages.append(Language(int(number), word, folder, {"blank": " ", "nothing": ""}[between]))
+    return sorted(languages, key=lambda language: language.number)
+
+
+LANGUAGES = read_languages()
+WORDS = tuple(language.word for language in LANGUAGES)
