@@ -41,8 +41,8 @@ class SessionProperty {
 
     // getBool, setBool and so on for each type. The driver has no function for some types of system
     // and session properties: InternalError.
-#define QITRMC_PROPERTY_TYPE(number, Type, Value, ...) \
-    Value get##Type() const;                           \
+#define QITRMC_PROPERTY_TYPE(number, Type, Value) \
+    Value get##Type() const;                      \
     void set##Type(const Value& value);
 #include "qitrmcwebsvc/propertyTypes.def"
 
@@ -59,8 +59,18 @@ class SessionProperty {
     void expandTokens();
     void open();
     void spreadOverResources();
-    template <typename Operation>
-    auto choose(const Operation& operation) const;
+
+    template <typename... Values>
+    struct Functions;
+    template <typename... Values>
+    auto choose(const Functions<Values...>& functions) const;
+    template <typename Number>
+    Number readNumber(const Functions<Number*>& functions) const;
+    template <typename Number>
+    std::vector<Number> readNumbers(const Functions<Number**, std::uint32_t*>& functions) const;
+    template <typename Number>
+    void writeNumbers(const Functions<const Number*, std::uint32_t>& functions,
+                      const std::vector<Number>& values) const;
 
     std::shared_ptr<SessionContext> session;
     std::string name;

@@ -1,8 +1,7 @@
-// The typed reads and writes of SessionProperty: which function of the driver serves which scope,
-// and how each type of value crosses to the driver and back.
+// The typed reads and writes of SessionProperty: which function of the driver serves which
+// category, and how each type of value is passed to the driver and back.
 
 #include <algorithm>
-#include <type_traits>
 
 #include "qitrmcwebsvc/SessionProperty.h"
 #include "qitrmcwebsvc/callDriver.h"
@@ -11,150 +10,202 @@ namespace nQITRMCWEBSVC100 {
 
 using namespace nQITRMCSHAREDCMN100;
 
-namespace {
-
-// The driver's functions for one read or write. Values: the parameters that carry the value.
+// The driver's functions for one read or write. Properties of resources are always served, those of
+// the system and of a session only where the driver has a function. Values: the parameters that
+// carry the value.
 template <typename... Values>
-struct Operation {
-    using Scoped = void (*)(nQITRMCAPI100_Session, const char* property, Values..., qierr_Status*);
+struct SessionProperty::Functions {
     using Generic = void (*)(nQITRMCAPI100_Session, const char* resources, const char* property,
                              Values..., qierr_Status*);
+    using Scoped = void (*)(nQITRMCAPI100_Session, const char* property, Values..., qierr_Status*);
 
-    Scoped system;   // null where there is none
-    Scoped session;  // null where there is none
-    bool genericServesSession;
     Generic generic;
+    Scoped system = nullptr;
+    Scoped session = nullptr;
+    bool genericServesSession = false;
 };
 
-// How a value of a type crosses: numbers and truth values as they are, a truth value as one byte.
-template <typename Value>
-struct Crossing {
-    using Element = std::conditional_t<std::is_same_v<Value, bool>, std::uint8_t, Value>;
-    using Read = Operation<Element*>;
-    using Write = Operation<Element>;
-
-    template <typename Call>
-    static Value read(Call call) {
-        Element value = 0;
-        call(&value);
-        return static_cast<Value>(value);
-    }
-    template <typename Call>
-    static void write(Value value, Call call) {
-        call(static_cast<Element>(value));
-    }
-};
-
-template <>
-struct Crossing<std::string> {
-    using Read = Operation<char**>;
-    using Write = Operation<const char*>;
-
-    template <typename Call>
-    static std::string read(Call call) {
-        DriverString value;
-        call(value.out());
-        return value.copy();
-    }
-    template <typename Call>
-    static void write(const std::string& value, Call call) {
-        call(value.c_str());
-    }
-};
-
-template <typename Item>
-struct Crossing<std::vector<Item>> {
-    using Element = typename Crossing<Item>::Element;
-    using Read = Operation<Element**, std::uint32_t*>;
-    using Write = Operation<const Element*, std::uint32_t>;
-
-    template <typename Call>
-    static std::vector<Item> read(Call call) {
-        DriverArray<Element> values;
-        call(values.outArray(), values.outCount());
-        return std::vector<Item>(values.begin(), values.end());
-    }
-    template <typename Call>
-    static void write(const std::vector<Item>& values, Call call) {
-        const auto count = static_cast<std::uint32_t>(values.size());
-        if constexpr (std::is_same_v<Item, bool>) {
-            DriverArray<Element> bytes(count);
-            std::copy(values.begin(), values.end(), bytes.data());
-            call(bytes.data(), count);
-        } else {
-            call(values.data(), count);
-        }
-    }
-};
-
-template <>
-struct Crossing<std::vector<std::string>> {
-    using Read = Operation<char***, std::uint32_t*>;
-    using Write = Operation<const char* const*, std::uint32_t>;
-
-    template <typename Call>
-    static std::vector<std::string> read(Call call) {
-        DriverStringArray values;
-        call(values.outArray(), values.outCount());
-        return std::vector<std::string>(values.begin(), values.end());
-    }
-    template <typename Call>
-    static void write(const std::vector<std::string>& values, Call call) {
-        std::vector<const char*> texts;
-        texts.reserve(values.size());
-        for (const std::string& value : values)
-            texts.push_back(value.c_str());
-        call(texts.data(), static_cast<std::uint32_t>(texts.size()));
-    }
-};
-
-// What the last columns of the type table stand for.
-#define QITRMC_SCOPED_Own(function) function
-#define QITRMC_SCOPED_Generic(function) nullptr
-#define QITRMC_SCOPED_None(function) nullptr
-enum Service { None, Own, Generic };
-
-#define QITRMC_OPERATION(verb, Type, system, session)                             \
-    {                                                                             \
-        QITRMC_SCOPED_##system(nQITRMCAPI100_##verb##SystemProperty##Type),       \
-            QITRMC_SCOPED_##session(nQITRMCAPI100_##verb##SessionProperty##Type), \
-            session == Generic, nQITRMCAPI100_##verb##GenericProperty##Type       \
-    }
-
-#define QITRMC_PROPERTY_TYPE(number, Type, Value, systemRead, sessionRead, systemWrite, \
-                             sessionWrite)                                              \
-    constexpr Crossing<Value>::Read read##Type =                                        \
-        QITRMC_OPERATION(get, Type, systemRead, sessionRead);                           \
-    constexpr Crossing<Value>::Write write##Type =                                      \
-        QITRMC_OPERATION(set, Type, systemWrite, sessionWrite);
-#include "qitrmcwebsvc/propertyTypes.def"
-
-}  // namespace
-
-// The driver's function for the property's category, which wants only the value now.
-template <typename Operation>
-auto SessionProperty::choose(const Operation& operation) const {
+// The function that serves the property's category, which takes only the value now. A category that
+// is not served is refused before anything is borrowed from the driver.
+template <typename... Values>
+auto SessionProperty::choose(const Functions<Values...>& functions) const {
     const bool ofSession = propertyCategory == PropertyCategory::Session;
-    const bool isGeneric = isOnResources() || (ofSession && operation.genericServesSession);
-    const auto scoped = ofSession ? operation.session : operation.system;
+    const bool isGeneric = isOnResources() || (ofSession && functions.genericServesSession);
+    const auto scoped = ofSession ? functions.session : functions.system;
     if (!isGeneric && scoped == nullptr)
         throw InternalError("Unsupported property category.", QITRMC_HERE);
-    return [this, isGeneric, scoped, generic = operation.generic](auto... value) {
+    return [this, isGeneric, scoped, generic = functions.generic](Values... values) {
         if (isGeneric)
             callDriver(generic, session->driverSession, joinedResources.c_str(), name.c_str(),
-                       value...);
+                       values...);
         else
-            callDriver(scoped, session->driverSession, name.c_str(), value...);
+            callDriver(scoped, session->driverSession, name.c_str(), values...);
     };
 }
 
-#define QITRMC_PROPERTY_TYPE(number, Type, Value, ...)      \
-    Value SessionProperty::get##Type() const {              \
-        return Crossing<Value>::read(choose(read##Type));   \
-    }                                                       \
-    void SessionProperty::set##Type(const Value& value) {   \
-        Crossing<Value>::write(value, choose(write##Type)); \
-    }
-#include "qitrmcwebsvc/propertyTypes.def"
+template <typename Number>
+Number SessionProperty::readNumber(const Functions<Number*>& functions) const {
+    Number value = 0;
+    choose(functions)(&value);
+    return value;
+}
+
+template <typename Number>
+std::vector<Number> SessionProperty::readNumbers(
+    const Functions<Number**, std::uint32_t*>& functions) const {
+    const auto read = choose(functions);
+    DriverArray<Number> values;
+    read(values.outArray(), values.outCount());
+    return std::vector<Number>(values.begin(), values.end());
+}
+
+template <typename Number>
+void SessionProperty::writeNumbers(const Functions<const Number*, std::uint32_t>& functions,
+                                   const std::vector<Number>& values) const {
+    choose(functions)(values.data(), static_cast<std::uint32_t>(values.size()));
+}
+
+// The driver's truth values are bytes.
+
+bool SessionProperty::getBool() const {
+    return readNumber<std::uint8_t>(
+               {nQITRMCAPI100_getGenericPropertyBool, nQITRMCAPI100_getSystemPropertyBool}) != 0;
+}
+
+void SessionProperty::setBool(const bool& value) {
+    choose<std::uint8_t>(
+        {nQITRMCAPI100_setGenericPropertyBool, nQITRMCAPI100_setSystemPropertyBool})(value);
+}
+
+std::vector<bool> SessionProperty::getBoolArray() const {
+    const auto bytes = readNumbers<std::uint8_t>({nQITRMCAPI100_getGenericPropertyBoolArray});
+    return std::vector<bool>(bytes.begin(), bytes.end());
+}
+
+void SessionProperty::setBoolArray(const std::vector<bool>& values) {
+    const auto write =
+        choose<const std::uint8_t*, std::uint32_t>({nQITRMCAPI100_setGenericPropertyBoolArray});
+    const auto count = static_cast<std::uint32_t>(values.size());
+    DriverArray<std::uint8_t> bytes(count);
+    std::copy(values.begin(), values.end(), bytes.data());
+    write(bytes.data(), count);
+}
+
+double SessionProperty::getDouble() const {
+    return readNumber<double>({nQITRMCAPI100_getGenericPropertyDouble,
+                               nQITRMCAPI100_getSystemPropertyDouble,
+                               nQITRMCAPI100_getSessionPropertyDouble});
+}
+
+void SessionProperty::setDouble(const double& value) {
+    choose<double>({nQITRMCAPI100_setGenericPropertyDouble, nQITRMCAPI100_setSystemPropertyDouble,
+                    nQITRMCAPI100_setSessionPropertyDouble})(value);
+}
+
+std::vector<double> SessionProperty::getDoubleArray() const {
+    return readNumbers<double>({nQITRMCAPI100_getGenericPropertyDoubleArray});
+}
+
+void SessionProperty::setDoubleArray(const std::vector<double>& values) {
+    writeNumbers<double>({nQITRMCAPI100_setGenericPropertyDoubleArray}, values);
+}
+
+std::int32_t SessionProperty::getInt32() const {
+    return readNumber<std::int32_t>({nQITRMCAPI100_getGenericPropertyInt32});
+}
+
+void SessionProperty::setInt32(const std::int32_t& value) {
+    choose<std::int32_t>({nQITRMCAPI100_setGenericPropertyInt32})(value);
+}
+
+std::vector<std::int32_t> SessionProperty::getInt32Array() const {
+    return readNumbers<std::int32_t>({nQITRMCAPI100_getGenericPropertyInt32Array});
+}
+
+void SessionProperty::setInt32Array(const std::vector<std::int32_t>& values) {
+    writeNumbers<std::int32_t>({nQITRMCAPI100_setGenericPropertyInt32Array}, values);
+}
+
+std::int64_t SessionProperty::getInt64() const {
+    return readNumber<std::int64_t>({nQITRMCAPI100_getGenericPropertyInt64});
+}
+
+void SessionProperty::setInt64(const std::int64_t& value) {
+    choose<std::int64_t>({nQITRMCAPI100_setGenericPropertyInt64})(value);
+}
+
+std::vector<std::int64_t> SessionProperty::getInt64Array() const {
+    return readNumbers<std::int64_t>({nQITRMCAPI100_getGenericPropertyInt64Array});
+}
+
+void SessionProperty::setInt64Array(const std::vector<std::int64_t>& values) {
+    writeNumbers<std::int64_t>({nQITRMCAPI100_setGenericPropertyInt64Array}, values);
+}
+
+std::uint32_t SessionProperty::getUInt32() const {
+    return readNumber<std::uint32_t>({nQITRMCAPI100_getGenericPropertyUInt32});
+}
+
+void SessionProperty::setUInt32(const std::uint32_t& value) {
+    choose<std::uint32_t>({nQITRMCAPI100_setGenericPropertyUInt32})(value);
+}
+
+std::vector<std::uint32_t> SessionProperty::getUInt32Array() const {
+    return readNumbers<std::uint32_t>({nQITRMCAPI100_getGenericPropertyUInt32Array});
+}
+
+void SessionProperty::setUInt32Array(const std::vector<std::uint32_t>& values) {
+    writeNumbers<std::uint32_t>({nQITRMCAPI100_setGenericPropertyUInt32Array}, values);
+}
+
+std::uint64_t SessionProperty::getUInt64() const {
+    return readNumber<std::uint64_t>(
+        {nQITRMCAPI100_getGenericPropertyUInt64, nQITRMCAPI100_getSystemPropertyUInt64});
+}
+
+void SessionProperty::setUInt64(const std::uint64_t& value) {
+    choose<std::uint64_t>({nQITRMCAPI100_setGenericPropertyUInt64})(value);
+}
+
+std::vector<std::uint64_t> SessionProperty::getUInt64Array() const {
+    return readNumbers<std::uint64_t>({nQITRMCAPI100_getGenericPropertyUInt64Array});
+}
+
+void SessionProperty::setUInt64Array(const std::vector<std::uint64_t>& values) {
+    writeNumbers<std::uint64_t>({nQITRMCAPI100_setGenericPropertyUInt64Array}, values);
+}
+
+std::string SessionProperty::getString() const {
+    const auto read = choose<char**>({nQITRMCAPI100_getGenericPropertyString});
+    DriverString value;
+    read(value.out());
+    return value.copy();
+}
+
+// A session's text can be written, by the function for resources, but not read.
+void SessionProperty::setString(const std::string& value) {
+    choose<const char*>({nQITRMCAPI100_setGenericPropertyString, nullptr, nullptr, true})(
+        value.c_str());
+}
+
+std::vector<std::string> SessionProperty::getStringArray() const {
+    const auto read = choose<char***, std::uint32_t*>(
+        {nQITRMCAPI100_getGenericPropertyStringArray, nQITRMCAPI100_getSystemPropertyStringArray,
+         nQITRMCAPI100_getSessionPropertyStringArray});
+    DriverStringArray values;
+    read(values.outArray(), values.outCount());
+    return std::vector<std::string>(values.begin(), values.end());
+}
+
+void SessionProperty::setStringArray(const std::vector<std::string>& values) {
+    const auto write = choose<const char* const*, std::uint32_t>(
+        {nQITRMCAPI100_setGenericPropertyStringArray, nullptr,
+         nQITRMCAPI100_setSessionPropertyStringArray});
+    std::vector<const char*> texts;
+    texts.reserve(values.size());
+    for (const std::string& value : values)
+        texts.push_back(value.c_str());
+    write(texts.data(), static_cast<std::uint32_t>(texts.size()));
+}
 
 }  // namespace nQITRMCWEBSVC100

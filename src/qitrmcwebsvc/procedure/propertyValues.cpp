@@ -72,7 +72,7 @@ void write(SessionProperty& property, const JsonValue& value) {
 }
 
 constexpr PropertyValueType types[] = {
-#define QITRMC_PROPERTY_TYPE(number, Type, Value, ...)                           \
+#define QITRMC_PROPERTY_TYPE(number, Type, Value)                                \
     {number, JsonForm<Value>::accepts, read<Value, &SessionProperty::get##Type>, \
      write<Value, &SessionProperty::set##Type>},
 #include "qitrmcwebsvc/propertyTypes.def"
