@@ -48,7 +48,7 @@ class SkippedError {
         if (error.IsNull())
             error = make(*response.getAllocator());
         JsonValue copy(error, *response.getAllocator());
-        response.setError(copy);
+        response.setError(std::move(copy));
     }
 
   private:

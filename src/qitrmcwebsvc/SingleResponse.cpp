@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <array>
 #include <string>
+#include <utility>
 
 #include "qierr/Status.h"
 #include "qitrmcwebsvc/describeStatus.h"
@@ -37,13 +38,12 @@ SingleResponse::SingleResponse(const JsonValue& id, JsonPool* allocator)
     response.AddMember("id", copiedId, *allocator);
 }
 
-void SingleResponse::setResult(JsonValue& value) {
+void SingleResponse::setResult(JsonValue&& value) {
     response.AddMember("result", value, *allocator);
 }
 
 void SingleResponse::setEmptyResult() {
-    JsonValue empty(rapidjson::kObjectType);
-    setResult(empty);
+    setResult(JsonValue(rapidjson::kObjectType));
 }
 
 void SingleResponse::setError(const qierr_Status& status) {
@@ -60,10 +60,10 @@ void SingleResponse::setError(const qierr_Status& status) {
         data.AddMember("qitrmc_message", JsonValue(text, *allocator), *allocator);
         error.AddMember("data", data, *allocator);
     }
-    setError(error);
+    setError(std::move(error));
 }
 
-void SingleResponse::setError(JsonValue& error) {
+void SingleResponse::setError(JsonValue&& error) {
     response.AddMember("error", error, *allocator);
 }
 

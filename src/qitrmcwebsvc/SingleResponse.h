@@ -22,14 +22,14 @@ class SingleResponse {
     SingleResponse& operator=(const SingleResponse&) = delete;
 
     // Moves a value into "result".
-    void setResult(JsonValue& value);
+    void setResult(JsonValue&& value);
     // Makes "result" an empty object.
     void setEmptyResult();
     // Makes "error" of a status. Throws qierr::Exception when its text cannot be made; nothing is
     // added then.
     void setError(const qierr_Status& status);
     // Moves an error object that another response made into "error".
-    void setError(JsonValue& error);
+    void setError(JsonValue&& error);
 
     // The whole response, to be moved out.
     JsonValue& getValue() { return response; }

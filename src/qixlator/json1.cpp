@@ -92,6 +92,9 @@ class Translation {
 
   private:
     void describe(std::int32_t code, const char* json, std::uint32_t level, std::uint32_t flags);
+    void nameXlator(const char* json, qihtl::String* name);
+    char* staticDesc(std::int32_t code, const qihtl::String& xlator, std::uint32_t flags);
+    char* dynamicDesc(const char* json, const qihtl::String& xlator, std::uint32_t flags);
     void appendSection(const char* json1, const char* member, const char* prefix,
                        const char* suffix, qihtl::String* text);
     void openNested(const char* owner);
@@ -126,26 +129,13 @@ void Translation::run(std::int32_t code, const char* json, std::uint32_t flags) 
 
 void Translation::describe(std::int32_t code, const char* json, std::uint32_t level,
                            std::uint32_t flags) {
-    qihtl::String xlatorName;
-    if (json != nullptr) {
-        appendJsonString(jsonz_findMember(json, "translator"), &xlatorName, status);
-    }
-    if (xlatorName.empty()) {
-        xlatorName.assign(defaultXlatorName, status);
-    }
+    qihtl::String xlator;
+    nameXlator(json, &xlator);
     if (status->code < 0) {
         return;
     }
-    const bool wantsItems = (flags & (includeDynamic | includeDebug)) != 0;
-    const XlatorText description((flags & includeStatic) == 0
-                                     ? nullptr
-                                     : qixlator_getStaticDesc(session, code, xlatorName.c_str(),
-                                                              attributes, qixlator_realloc, nullptr,
-                                                              status));
-    const XlatorText json1(!wantsItems || xlatorName.equals(defaultXlatorName)
-                               ? nullptr
-                               : qixlator_getDynamicDesc(session, json, attributes, "json1",
-                                                         qixlator_realloc, nullptr, status));
+    const XlatorText description(staticDesc(code, xlator, flags));
+    const XlatorText items(dynamicDesc(json, xlator, flags));
     qihtl::String text;
     if (description.get() != nullptr) {
         text.append(sectionFormat.staticPrefix, status);
@@ -153,15 +143,42 @@ void Translation::describe(std::int32_t code, const char* json, std::uint32_t le
         text.append(sectionFormat.staticSuffix, status);
     }
     if ((flags & includeDynamic) != 0) {
-        appendSection(json1.get(), "dynamic", sectionFormat.dynamicPrefix,
+        appendSection(items.get(), "dynamic", sectionFormat.dynamicPrefix,
                       sectionFormat.dynamicSuffix, &text);
     }
     if ((flags & includeDebug) != 0) {
-        appendSection(json1.get(), "debug", sectionFormat.debugPrefix, sectionFormat.debugSuffix,
+        appendSection(items.get(), "debug", sectionFormat.debugPrefix, sectionFormat.debugSuffix,
                       &text);
     }
     (*formatter)(level, &text, status);
     output->append(text.c_str(), text.length(), status);
+}
+
+// The translator that a status names, or the default one.
+void Translation::nameXlator(const char* json, qihtl::String* name) {
+    if (json != nullptr) {
+        appendJsonString(jsonz_findMember(json, "translator"), name, status);
+    }
+    if (name->empty()) {
+        name->assign(defaultXlatorName, status);
+    }
+}
+
+char* Translation::staticDesc(std::int32_t code, const qihtl::String& xlator, std::uint32_t flags) {
+    if ((flags & includeStatic) == 0) {
+        return nullptr;
+    }
+    return qixlator_getStaticDesc(session, code, xlator.c_str(), attributes, qixlator_realloc,
+                                  nullptr, status);
+}
+
+// The default translator has none, which is no failure.
+char* Translation::dynamicDesc(const char* json, const qihtl::String& xlator, std::uint32_t flags) {
+    if ((flags & (includeDynamic | includeDebug)) == 0 || xlator.equals(defaultXlatorName)) {
+        return nullptr;
+    }
+    return qixlator_getDynamicDesc(session, json, attributes, "json1", qixlator_realloc, nullptr,
+                                   status);
 }
 
 void Translation::appendSection(const char* json1, const char* member, const char* prefix,

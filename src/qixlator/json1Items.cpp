@@ -6,16 +6,52 @@
 
 namespace qixlator::json1 {
 
-const SectionFormat sectionFormat = {nullptr, "\n", nullptr, "\n", nullptr, nullptr};
+namespace {
+
+constexpr SectionFormat makeSectionFormat() {
+    SectionFormat format;
+    format.staticSuffix = "\n";
+    format.dynamicSuffix = "\n";
+    return format;
+}
+
+constexpr ItemFormat makeRawFormat() {
+    ItemFormat format;
+    format.itemPrefix = "\n";
+    format.keySuffix = ": ";
+    format.elementSeparator = ", ";
+    return format;
+}
+
+constexpr ItemFormat makeFormattedFormat() {
+    ItemFormat format;
+    format.itemPrefix = "\n";
+    format.keyPrefix = "<B>";
+    format.keySuffix = ": </B>";
+    format.elementSeparator = ", ";
+    return format;
+}
+
+constexpr ItemFormat makeFormattedElaboration() {
+    ItemFormat format;
+    format.itemPrefix = "\n<B>";
+    format.itemSuffix = "</B>";
+    format.elementSeparator = ", ";
+    return format;
+}
+
+}  // namespace
+
+const SectionFormat sectionFormat = makeSectionFormat();
 
 const TypedItemFormat rawItemFormats[] = {
     {"elaboration", {}},
-    {nullptr, {"\n", nullptr, nullptr, ": ", nullptr, nullptr, nullptr, nullptr, ", "}},
+    {nullptr, makeRawFormat()},
 };
 
 const TypedItemFormat formattedItemFormats[] = {
-    {"elaboration", {"\n<B>", "</B>", nullptr, nullptr, nullptr, nullptr, nullptr, nullptr, ", "}},
-    {nullptr, {"\n", nullptr, "<B>", ": </B>", nullptr, nullptr, nullptr, nullptr, ", "}},
+    {"elaboration", makeFormattedElaboration()},
+    {nullptr, makeFormattedFormat()},
 };
 
 namespace {

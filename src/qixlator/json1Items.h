@@ -7,25 +7,25 @@ namespace qixlator::json1 {
 
 // What stands around the sections of one error's text. Null means empty.
 struct SectionFormat {
-    const char* staticPrefix;
-    const char* staticSuffix;
-    const char* dynamicPrefix;
-    const char* dynamicSuffix;
-    const char* debugPrefix;
-    const char* debugSuffix;
+    const char* staticPrefix = nullptr;
+    const char* staticSuffix = nullptr;
+    const char* dynamicPrefix = nullptr;
+    const char* dynamicSuffix = nullptr;
+    const char* debugPrefix = nullptr;
+    const char* debugSuffix = nullptr;
 };
 
 // What stands around the parts of one item. Null means empty.
 struct ItemFormat {
-    const char* itemPrefix;
-    const char* itemSuffix;
-    const char* keyPrefix;
-    const char* keySuffix;
-    const char* valuePrefix;
-    const char* valueSuffix;
-    const char* elementPrefix;
-    const char* elementSuffix;
-    const char* elementSeparator;
+    const char* itemPrefix = nullptr;
+    const char* itemSuffix = nullptr;
+    const char* keyPrefix = nullptr;
+    const char* keySuffix = nullptr;
+    const char* valuePrefix = nullptr;
+    const char* valueSuffix = nullptr;
+    const char* elementPrefix = nullptr;
+    const char* elementSuffix = nullptr;
+    const char* elementSeparator = nullptr;
 };
 
 // The format of the items of one type. A table of these ends with a null type, whose format serves

@@ -35,7 +35,7 @@ void GetChassisIpOrHostname::run(const JsonValue& params, SingleResponse& respon
                    text.out());
         result.AddMember(rapidjson::StringRef(key), textValue(text.copy(), pool), pool);
     }
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

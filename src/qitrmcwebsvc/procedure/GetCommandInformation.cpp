@@ -38,7 +38,7 @@ void GetCommandInformation::run(const JsonValue& params, SingleResponse& respons
                                                      QITRMC_HERE);
         result.AddMember(rapidjson::StringRef(key), textValue(text.get(), pool), pool);
     }
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

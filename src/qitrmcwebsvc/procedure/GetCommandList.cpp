@@ -34,7 +34,7 @@ void GetCommandList::run(const JsonValue& params, SingleResponse& response) cons
     appendTexts(commands, names, pool);
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("commands", commands, pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -60,7 +60,7 @@ void GetDevicePropertyList::run(const JsonValue& params, SingleResponse& respons
     result.AddMember("static_properties", staticNames, pool);
     if (lists.dynamicProperty != nullptr)
         addDynamicNames(result, session->driverSession, resource, lists.dynamicProperty, pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -27,7 +27,7 @@ void GetModuleName::run(const JsonValue& params, SingleResponse& response) const
     if (present)
         result.AddMember("module", textValue(*found, pool), pool);
     result.AddMember("present", present, pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

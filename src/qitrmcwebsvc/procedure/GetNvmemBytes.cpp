@@ -48,7 +48,7 @@ void GetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("data", data, pool);
     result.AddMember("next_address", address + 1, pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

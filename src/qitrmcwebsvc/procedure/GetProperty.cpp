@@ -22,7 +22,7 @@ void GetProperty::run(const JsonValue& params, SingleResponse& response) const {
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("data_type", enumItemValue("DataType", property.dataType(), pool), pool);
     result.AddMember("value", value, pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

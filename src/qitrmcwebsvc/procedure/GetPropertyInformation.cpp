@@ -58,7 +58,7 @@ void GetPropertyInformation::run(const JsonValue& params, SingleResponse& respon
     result.AddMember("pending_changes", property.metaBool("Prop.PendingChanges"), pool);
     if (property.metaBool("Prop.IsEnum"))
         result.AddMember("enum", enumValue(property, pool), pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -14,7 +14,7 @@ void GetSessionPropertyList::run(const JsonValue& params, SingleResponse& respon
 
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("properties", properties, pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

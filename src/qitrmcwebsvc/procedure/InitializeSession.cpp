@@ -17,7 +17,7 @@ void InitializeSession::run(const JsonValue& params, SingleResponse& response) c
     JsonPool& pool = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("session_id", JsonValue(id, pool), pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -50,7 +50,7 @@ void ReadRegister::run(const JsonValue& params, SingleResponse& response) const 
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("next_address", address + 1, pool);
     result.AddMember("data", data, pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

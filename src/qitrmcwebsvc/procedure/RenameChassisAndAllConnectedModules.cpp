@@ -44,7 +44,7 @@ void RenameChassisAndAllConnectedModules::run(const JsonValue& params,
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("new_module_names", newModuleNames, pool);
     result.AddMember("new_chassis_name", textValue(newChassisName, pool), pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -35,7 +35,7 @@ void SetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const
     JsonPool& pool = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("next_address", address + 1, pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -48,7 +48,7 @@ void SetProperty::run(const JsonValue& params, SingleResponse& response) const {
     JsonPool& pool = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
     result.AddMember("data_type", enumItemValue("DataType", property.dataType(), pool), pool);
-    response.setResult(result);
+    response.setResult(std::move(result));
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -1,5 +1,7 @@
 #pragma once
 
+#include <utility>
+
 #include "qitrmcwebsvc/procedure/Procedure.h"
 
 namespace nQITRMCWEBSVC100 {

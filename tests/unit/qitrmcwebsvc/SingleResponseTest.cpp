@@ -4,6 +4,7 @@
 
 #include <optional>
 #include <string>
+#include <utility>
 
 #include "qierr/Exception.h"
 #include "support/PlainDescriptions.h"
@@ -52,7 +53,7 @@ TEST_F(SingleResponseTest, CopiesItsIdDeeply) {
 TEST_F(SingleResponseTest, TakesAResult) {
     SingleResponse response(&pool);
     JsonValue value("done");
-    response.setResult(value);
+    response.setResult(std::move(value));
     EXPECT_TRUE(value.IsNull());
     EXPECT_EQ(textOf(response.getValue()), "{\"jsonrpc\":\"2.0\",\"id\":null,\"result\":\"done\"}");
 }
