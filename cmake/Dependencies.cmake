@@ -4,6 +4,7 @@ find_package(Python3 REQUIRED COMPONENTS Interpreter)
 find_package(Threads REQUIRED)
 find_package(PkgConfig REQUIRED)
 find_package(Boost 1.74 REQUIRED)
+find_package(CLI11 REQUIRED)
 pkg_check_modules(utf8proc REQUIRED IMPORTED_TARGET libutf8proc)
 pkg_check_modules(microhttpd REQUIRED IMPORTED_TARGET libmicrohttpd)
 

@@ -77,6 +77,9 @@ other failure `error.code` is -32000, and the precise code and text stand in `er
 A message begins with the two texts given here, what happened and what can be done about it, in one
 line. Details may follow, such as `Session ID: _session5`. Write programs that look at the code, not
 at the message: its words may change. Messages are in English.
+
+`qitrmc-explain` prints these texts in six languages, for a code, a name or a whole response, and
+searches them with `--search`. `scripts/run` builds it as `build/release/bin/qitrmc-explain`.
 """
 
 PAGE_SECTIONS = {

@@ -4,6 +4,8 @@ import csv
 import json
 import os
 import pathlib
+import re
+import shutil
 import subprocess
 
 import pytest
@@ -17,13 +19,22 @@ ATTRIBUTE_TAGS = {"kUsageTypeAttributeId", "kUsageTypeAttributeIdentifier",
                   "kUsageTypeConflictingProperty", "kUsageTypeUnspecifiedProperty"}
 
 
-def run(*arguments, stdin=""):
-    return subprocess.run([BUILD_DIR / "bin" / "qitrmc-explain", *map(str, arguments)], input=stdin,
-                          capture_output=True, text=True, timeout=60)
+NOT_CHASSIS = ("The device is not a chassis. "
+               "Name a device whose property Dev.ProductCategory is 1.\n")
+NOT_CHASSIS_DEU = ("Das Gerät ist kein Chassis. "
+                   "Geben Sie ein Gerät an, dessen Eigenschaft Dev.ProductCategory den Wert 1 hat.\n")
+OUTPUT_ON = "The output is on. Switch the output off, and try again.\n"
+HINT = "Try qitrmc-explain --help.\n"
 
 
-def explained(*arguments, stdin=""):
-    result = run(*arguments, stdin=stdin)
+def run(*arguments, stdin="", program="qitrmc-explain", folder=None, **environment):
+    return subprocess.run([BUILD_DIR / "bin" / program, *map(str, arguments)], input=stdin,
+                          capture_output=True, encoding="utf-8", timeout=60, cwd=folder,
+                          env=environment)
+
+
+def explained(*arguments, stdin="", **environment):
+    result = run(*arguments, stdin=stdin, **environment)
     assert (result.returncode, result.stderr) == (0, "")
     return result.stdout
 
@@ -110,36 +121,279 @@ def test_debug_items_are_shown_when_asked_for():
     assert "Component: qitrmcsvc\nFile: x.cpp\nLine: 7\n" in text
 
 
+@pytest.mark.parametrize("code", [-250812, 250812])
+def test_a_code_may_lack_its_minus_sign(code):
+    assert explained(code) == NOT_CHASSIS
+
+
+def test_a_code_that_is_positive_is_taken_as_it_is():
+    assert explained(250990) == (
+        "A device was not held by this session, so there was nothing to give up. "
+        "Nothing needs to be done.\n")
+
+
+@pytest.mark.parametrize("name", ["notChassis", "notchassis", "NOTCHASSIS"])
+def test_a_name_may_be_written_in_any_letter_case(name):
+    assert explained(name) == NOT_CHASSIS
+
+
+@pytest.mark.parametrize("name", ["qitrmcsim_outputOn", "QITRMCSIM_OUTPUTON", "outputOn"])
+def test_a_name_of_a_group_may_be_shortened(name):
+    assert explained(name) == OUTPUT_ON
+
+
+def test_a_whole_name_comes_before_a_shortened_one():
+    assert explained("outOfMemory").startswith("The service ran out of memory. ")
+    assert explained("qitrmcsim_outOfMemory").startswith("The driver ran out of memory. ")
+
+
+def test_a_name_may_have_details():
+    status = details(usage("kUsageTypeDevice", "Mod1"))
+    assert explained("notChassis", status) == NOT_CHASSIS + "\nDevice: Mod1\n"
+    assert explained("notChassis", "-", stdin=status) == NOT_CHASSIS + "\nDevice: Mod1\n"
+
+
+SKIPPED = {"jsonrpc": "2.0", "id": 3, "error": {"code": -32001, "message": "Not run."}}
+SERVER_ERROR = {"code": -32000, "message": "The request failed.",
+                "data": {"qitrmc_code": -250812, "qitrmc_message": "The device is not a chassis."}}
+FAILED = {"jsonrpc": "2.0", "id": 2, "error": SERVER_ERROR}
+SUCCEEDED = {"jsonrpc": "2.0", "id": 1, "result": {"code": -250800}}
+
+
+@pytest.mark.parametrize("pasted", [
+    FAILED,
+    SERVER_ERROR,
+    SERVER_ERROR["data"],
+    [SUCCEEDED, FAILED, SKIPPED],
+    [1, [FAILED], SERVER_ERROR],
+    {"id": 2, "error": {"code": -250812, "message": "The device is not a chassis."}},
+    {"code": -250812, "message": "The device is not a chassis.", "data": None},
+])
+def test_the_deepest_code_of_a_pasted_text_is_explained(pasted):
+    for text in (json.dumps(pasted), json.dumps(pasted, indent=2) + "\n"):
+        assert explained(text) == NOT_CHASSIS
+        assert explained("-", stdin=text) == NOT_CHASSIS
+
+
+def test_an_error_without_data_is_explained_by_its_own_code():
+    response = {"jsonrpc": "2.0", "id": None, "error": {"code": -32601, "message": "Method: x"}}
+    assert explained(json.dumps(response)).startswith("The service has no method of this name. ")
+
+
+def test_the_members_of_an_error_object_are_not_taken_for_details():
+    assert explained(json.dumps({**SERVER_ERROR, "nested_error": {"code": -250800}})) == NOT_CHASSIS
+
+
+def test_standard_input_may_hold_a_code_or_a_name():
+    assert explained("-", stdin="-250812\n") == NOT_CHASSIS
+    assert explained("-", stdin=" notChassis\r\n") == NOT_CHASSIS
+
+
+@pytest.mark.parametrize("environment, text", [
+    ({}, NOT_CHASSIS),
+    ({"LANG": "de_DE.UTF-8"}, NOT_CHASSIS_DEU),
+    ({"LANG": "de"}, NOT_CHASSIS_DEU),
+    ({"LANG": "de@euro"}, NOT_CHASSIS_DEU),
+    ({"LANG": "den_CA"}, NOT_CHASSIS),
+    ({"LANG": "it_IT.UTF-8"}, NOT_CHASSIS),
+    ({"LANG": "C.UTF-8"}, NOT_CHASSIS),
+    ({"LANG": "fr_FR", "LC_MESSAGES": "de_DE"}, NOT_CHASSIS_DEU),
+    ({"LANG": "fr_FR", "LC_MESSAGES": "ja_JP", "LC_ALL": "de_DE"}, NOT_CHASSIS_DEU),
+    ({"LANG": "de_DE", "LC_MESSAGES": "", "LC_ALL": ""}, NOT_CHASSIS_DEU),
+    ({"LANG": "de_DE", "LC_ALL": "C"}, NOT_CHASSIS),
+])
+def test_the_environment_sets_the_language(environment, text):
+    assert explained(-250812, **environment) == text
+
+
+@pytest.mark.parametrize("locale, language", zip(
+    ("en_US", "fr_CA", "de_AT", "ja_JP", "ko_KR", "zh_CN"), LANGUAGES))
+def test_every_language_has_its_locale(locale, language):
+    assert explained(-250812, LANG=locale) == explained("--language", language, -250812)
+
+
+def test_an_option_comes_before_the_environment():
+    assert explained("--language", "eng", -250812, LC_ALL="de_DE.UTF-8") == NOT_CHASSIS
+
+
+def test_the_value_of_an_option_may_stand_behind_an_equals_sign():
+    assert explained("--language=deu", -250812) == NOT_CHASSIS_DEU
+
+
+@pytest.mark.parametrize("language", LANGUAGES)
+def test_the_list_shows_every_code_with_its_name_and_first_sentence(language):
+    simulator = {row["code"]: row for row in rows("../simulator/status/statuses.tsv")}
+    expected = []
+    for row in rows("statuses/catalogue.tsv"):
+        expected.append(f"{row['code']:>7}  {row['constant']}: {row[language + '_happened']}")
+    others = {row["code"]: row for row in rows("statuses/driver.tsv")}
+    for code, row in simulator.items():
+        name = row["name"] if others[code]["raiser"] == "driver" else "qitrmcsim_" + row["name"]
+        text = row["happened"] if language == "eng" else others[code][language + "_happened"]
+        expected.append(f"{code:>7}  {name}: {text}")
+    assert explained("--list", "--language", language).splitlines() == expected
+
+
+@pytest.mark.parametrize("word", ["CHASSIS.", "Is Not A Chassis", "productcategory IS 1",
+                                  "NOTCHASSIS"])
+def test_a_search_looks_through_names_and_both_sentences_in_any_letter_case(word):
+    assert explained("--search", word) == "-250812  notChassis: The device is not a chassis.\n"
+
+
+@pytest.mark.parametrize("word, line", [
+    ("GÜLTIGES JSON", " -32700  parseError: Der Inhalt der Anfrage ist kein gültiges JSON.\n"),
+    ("gu\u0308ltiges json", " -32700  parseError: Der Inhalt der Anfrage ist kein gültiges JSON.\n"),
+    ("SCHLIESSEN SIE MIT",
+     "-250901  tooManySessions: Die Grenze von 100 geöffneten Sitzungen ist erreicht.\n"),
+])
+def test_a_search_folds_letters_beyond_ascii(word, line):
+    assert explained("--search", word, "--language", "deu") == line
+
+
+def test_a_word_that_is_no_utf_8_matches_nothing():
+    word = "g\udcfcltig"
+    result = subprocess.run([BUILD_DIR / "bin" / "qitrmc-explain", "--search", word], env={},
+                            capture_output=True, timeout=60)
+    assert (result.returncode, result.stdout) == (1, b"")
+    assert result.stderr == b'qitrmc-explain: No name and no text contains "g\xfcltig".\n'
+
+
+def test_a_search_lists_all_matches_in_the_order_of_the_tables():
+    assert explained("--search=JSON") == (
+        " -32700  parseError: The body of the request is not valid JSON.\n"
+        " -32600  invalidRequest: The request is not a valid JSON-RPC 2.0 request.\n")
+
+
+def test_a_search_without_a_match_is_a_failure_that_says_so():
+    result = run("--search", "zzz")
+    assert (result.returncode, result.stdout, result.stderr) == (
+        1, "", 'qitrmc-explain: No name and no text contains "zzz".\n')
+
+
 @pytest.mark.parametrize("arguments, words", [
-    ((), "Give a code"),
-    ((-1, "{}", "{}"), "Give a code"),
-    ((0,), "no failure"),
-    (("{}",), "no failure"),
-    (("12x",), "not a JSON object"),
-    ((-1, "[]"), "not a JSON object"),
-    ((-1, "{} x"), "not a JSON object"),
-    ((-1, '{"a":'), "not a JSON object"),
-    (("--language", "xyz", -1), 'no language "xyz"'),
-    (("--language",), "--language"),
-    (("--loud", -1), "--loud"),
+    ((), "Give a code, a name or a JSON text."),
+    (("",), "Give a code, a name or a JSON text."),
+    ((-1, "{}", "{}"), "The following argument was not expected: {}"),
+    ((0,), "The code 0 is no failure."),
+    (("2147483648",), "2147483648 is no code: a code has 32 bits."),
+    (("-2147483649",), "-2147483649 is no code: a code has 32 bits."),
+    (("{}",), "There is no code in the text, or it is 0, which is no failure."),
+    (("[]",), "There is no code in the text, or it is 0, which is no failure."),
+    (('{"id":1,"result":{}}',), "There is no code in the text, or it is 0, which is no failure."),
+    (('{"code":4294716484}',), "There is no code in the text, or it is 0, which is no failure."),
+    (('{"code":-250812.0}',), "There is no code in the text, or it is 0, which is no failure."),
+    (('{"code":0,"message":""}',), "There is no code in the text, or it is 0, which is no failure."),
+    (("12x",), '"12x" is no code, no name and no JSON object or array.'),
+    (('{"code":-1} x',), '"{"code":-1} x" is no code, no name and no JSON object or array.'),
+    (('{"code":-1}', "{}"), "Details go with a code or a name, not with a JSON text."),
+    ((-1, "[]"), "The text is not a JSON object. Give the details of a status, {...}."),
+    ((-1, "{} x"), "The text is not a JSON object. Give the details of a status, {...}."),
+    ((-1, '{"a":'), "The text is not a JSON object. Give the details of a status, {...}."),
+    (("--language", "xyz", -1),
+     'There is no language "xyz". Use eng, fra, deu, jpn, kor or chs with --language.'),
+    (("--language",), "--language: 1 required TEXT missing"),
+    (("--loud", -1), "The following argument was not expected: --loud"),
+    (("--list", -1), "--list and --search go with no code, name or JSON text."),
+    (("--search", "x", -1), "--list and --search go with no code, name or JSON text."),
+    (("--list", "--search", "x"), "--list and --search do not go together."),
 ])
 def test_a_wrong_command_line_is_told(arguments, words):
     result = run(*arguments)
     assert (result.returncode, result.stdout) == (2, "")
-    assert words in result.stderr and "--help" in result.stderr
+    assert result.stderr == f"qitrmc-explain: {words}\n{HINT}"
 
 
-def test_a_code_without_words_is_a_failure_that_says_so():
-    result = run(-7)
+NEAR_250834 = """\
+qitrmc-explain: The code -250834 is unknown here. A driver has codes of its own, which its \
+documentation explains.
+The nearest known codes are:
+-250833  unknownSession: No session with this ID is open.
+-250832  invalidUtf8: The name of a resource is not valid UTF-8 text.
+-250829  arrayOnSeveralResources: A property that holds an array cannot be used on several \
+resources at once.
+"""
+
+
+@pytest.mark.parametrize("operand", [-250834, 250834, '{"code":-250834}',
+                                     '{"error":{"code":-32000,"data":{"qitrmc_code":-250834}}}'])
+def test_an_unknown_code_is_told_in_plain_words_with_the_nearest_ones(operand):
+    result = run(operand)
+    assert (result.returncode, result.stdout, result.stderr) == (1, "", NEAR_250834)
+
+
+def test_details_of_an_unknown_code_are_shown_all_the_same():
+    result = run(-250834, details(usage("kUsageTypeDevice", "Mod1")))
+    assert (result.returncode, result.stdout, result.stderr) == (
+        0, "Error description not found\n\nDevice: Mod1\n", NEAR_250834)
+
+
+def test_the_farthest_codes_have_nearest_ones():
+    for code in ("-2147483648", "2147483647"):
+        result = run(code)
+        assert (result.returncode, result.stdout) == (1, "")
+        assert result.stderr.splitlines()[2].startswith("-250989  qitrmcsim_noAnswer: ")
+
+
+@pytest.mark.parametrize("name, likeliest", [
+    ("notChasis", "-250812  notChassis: The device is not a chassis."),
+    ("OutptOn", "-250936  qitrmcsim_outputOn: The output is on."),
+    ("chassis", "-250812  notChassis: The device is not a chassis."),
+])
+def test_an_unknown_name_is_told_in_plain_words_with_similar_ones(name, likeliest):
+    result = run(name)
     assert (result.returncode, result.stdout) == (1, "")
-    assert "-52006" in result.stderr and "explanation files" in result.stderr
+    head, first, *others = result.stderr.splitlines()
+    assert head == f"qitrmc-explain: No status has the name {name}. Perhaps one of these is meant:"
+    assert first == likeliest
+    assert len(others) <= 2
 
 
-def test_a_code_without_words_but_with_details_has_a_stand_in():
-    assert explained(-7, details(usage("kUsageTypeDevice", "Mod1"))) == (
-        "Error description not found\n\nDevice: Mod1\n")
+def test_a_name_like_no_other_leads_to_the_list():
+    result = run("qqqqqqqqqqqq")
+    assert (result.returncode, result.stdout, result.stderr) == (
+        1, "", "qitrmc-explain: No status has the name qqqqqqqqqqqq. --list shows all that are known.\n")
 
 
-def test_help_names_every_option():
-    text = explained("--help")
-    assert all(option in text for option in ("--language", "--formatted", "--debug"))
+@pytest.mark.parametrize("status", ['{"nested_error":3}', '{"translator":"none"}'])
+def test_details_without_words_are_told_without_internal_text(status):
+    result = run(-250812, status)
+    assert (result.returncode, result.stdout) == (1, "")
+    assert re.fullmatch(r"qitrmc-explain: The details cannot be put into words \(code -5200[56]\)\. "
+                        r"Give the code alone to see what it means\.\n", result.stderr)
+
+
+def test_a_controller_without_explanation_files_is_told(tmp_path):
+    def bare(*arguments):
+        result = run(*arguments, program="qitrmc-explain_cwd", folder=tmp_path)
+        assert (result.returncode, result.stdout) == (1, "")
+        return result.stderr
+    assert bare(-250812) == ("qitrmc-explain: The explanation files have no text for -250812 "
+                             "(notChassis). Look whether they are installed.\n")
+    missing = "qitrmc-explain: The explanation files are missing. Look whether they are installed.\n"
+    assert bare("--list") == bare("--search", "chassis") == missing
+
+
+def test_the_list_of_a_controller_leaves_the_simulated_driver_out(tmp_path):
+    installed = BUILD_DIR / "root/usr/local/qinstal/share/errors/English/qitrmc.txt"
+    folder = tmp_path / "usr/local/qinstal/share/errors/English"
+    folder.mkdir(parents=True)
+    shutil.copy(installed, folder)
+    result = run("--list", program="qitrmc-explain_cwd", folder=tmp_path)
+    assert (result.returncode, result.stderr) == (0, "")
+    assert result.stdout.splitlines() == [line for line in explained("--list").splitlines()
+                                          if "qitrmcsim_" not in line]
+
+
+@pytest.mark.parametrize("option", ["-h", "--help"])
+def test_help_names_every_option_and_exit_status(option):
+    text = explained(option)
+    assert text.startswith("Prints what the service's translator says for a status code.\n")
+    assert all(word in text for word in (
+        "STATUS", "DETAILS", "-h,--help", "--version", "--language", "--formatted", "--debug",
+        "--list", "--search", "Exit status: 0 after a text was printed, 1 when ", "and 2 for "))
+
+
+def test_the_version_is_that_of_the_project():
+    project = (ROOT / "CMakeLists.txt").read_text()
+    version = re.search(r"project\(qitrmc VERSION ([0-9.]+)", project)[1]
+    assert explained("--version") == f"qitrmc-explain {version}\n"

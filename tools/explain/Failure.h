@@ -1,0 +1,17 @@
+#pragma once
+
+#include <stdexcept>
+
+namespace explain {
+
+// What was asked for has no words. Exit status 1.
+struct Failure : std::runtime_error {
+    using std::runtime_error::runtime_error;
+};
+
+// The command line is wrong. Exit status 2.
+struct UsageError : std::runtime_error {
+    using std::runtime_error::runtime_error;
+};
+
+}  // namespace explain

@@ -1,0 +1,22 @@
+#pragma once
+
+#include <cstdint>
+#include <string>
+
+#include "explain/Options.h"
+
+namespace explain {
+
+class Translator;
+
+// A status to explain.
+struct Question {
+    std::int32_t code = 0;
+    std::string details;  // a JSON object, or empty
+};
+
+// The status that the operands mean. Throws UsageError, and for an unknown name a Failure that
+// lists similar ones in words of the translator.
+Question readQuestion(const Options& options, Translator& translator);
+
+}  // namespace explain
