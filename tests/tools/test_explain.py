@@ -121,6 +121,13 @@ def test_debug_items_are_shown_when_asked_for():
     assert "Component: qitrmcsvc\nFile: x.cpp\nLine: 7\n" in text
 
 
+def test_the_script_that_serves_the_chassis_builds_the_tool_that_the_readme_names():
+    built = re.findall("^cmake --build --preset release --target (.*)$",
+                       (ROOT / "scripts/run").read_text(), re.MULTILINE)
+    assert any("qitrmc-explain" in targets.split() for targets in built)
+    assert "build/release/bin/qitrmc-explain -" in (ROOT / "README.md").read_text()
+
+
 @pytest.mark.parametrize("code", [-250812, 250812])
 def test_a_code_may_lack_its_minus_sign(code):
     assert explained(code) == NOT_CHASSIS
@@ -180,8 +187,12 @@ def test_an_error_without_data_is_explained_by_its_own_code():
     assert explained(json.dumps(response)).startswith("The service has no method of this name. ")
 
 
-def test_the_members_of_an_error_object_are_not_taken_for_details():
-    assert explained(json.dumps({**SERVER_ERROR, "nested_error": {"code": -250800}})) == NOT_CHASSIS
+@pytest.mark.parametrize("error", [
+    SERVER_ERROR,
+    {"code": -250812, "message": "The device is not a chassis."},
+])
+def test_the_members_of_an_error_object_are_not_taken_for_details(error):
+    assert explained(json.dumps({**error, "nested_error": {"code": -250800}})) == NOT_CHASSIS
 
 
 def test_standard_input_may_hold_a_code_or_a_name():

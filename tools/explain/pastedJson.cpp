@@ -50,9 +50,9 @@ std::optional<Question> questionOfObject(const char* object) {
     const auto code = codeMember(error, "code");
     if (!code)
         return std::nullopt;
-    if (error != object || isErrorObject(object))
+    if (isErrorObject(error))
         return Question{*code, {}};
-    return Question{*code, {object, jsonz_readValue(object, nullptr)}};
+    return Question{*code, {error, jsonz_readValue(error, nullptr)}};
 }
 
 std::optional<Question> questionOfArray(const char* array) {
