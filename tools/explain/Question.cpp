@@ -35,9 +35,13 @@ bool isNumber(const std::string& text) {
            text.find_first_not_of("0123456789", digits) == std::string::npos;
 }
 
+// More than any status has.
+constexpr std::size_t longestName = 100;
+
 bool isName(const std::string& text) {
     const auto isWordCharacter = [](unsigned char c) { return c == '_' || std::isalnum(c) != 0; };
-    return !text.empty() && std::isalpha(static_cast<unsigned char>(text.front())) != 0 &&
+    return !text.empty() && text.size() <= longestName &&
+           std::isalpha(static_cast<unsigned char>(text.front())) != 0 &&
            std::all_of(text.begin(), text.end(), isWordCharacter);
 }
 
@@ -65,7 +69,7 @@ std::int32_t codeOfName(const std::string& name, Translator& translator) {
 
 Question questionOfJson(const std::string& json) {
     if (!isContainer(json))
-        throw UsageError("\"" + json + "\" is no code, no name and no JSON object or array.");
+        throw UsageError("The text is no code, no name and no JSON object or array.");
     if (const auto question = findQuestion(json))
         return *question;
     throw UsageError("There is no code in the text, or it is 0, which is no failure.");
