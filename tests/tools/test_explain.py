@@ -217,6 +217,13 @@ def test_the_environment_sets_the_language(environment, text):
     assert explained(-250812, **environment) == text
 
 
+def test_every_language_of_the_texts_can_be_named():
+    words = {row["word"] for row in rows("languages.tsv")}
+    assert words == set(LANGUAGES)
+    for word in words:
+        assert explained("--language", word, -250812)
+
+
 @pytest.mark.parametrize("locale, language", zip(
     ("en_US", "fr_CA", "de_AT", "ja_JP", "ko_KR", "zh_CN"), LANGUAGES))
 def test_every_language_has_its_locale(locale, language):
@@ -231,17 +238,22 @@ def test_the_value_of_an_option_may_stand_behind_an_equals_sign():
     assert explained("--language=deu", -250812) == NOT_CHASSIS_DEU
 
 
+def first_sentence(text, language):
+    return text.partition("。")[0] + "。" if language in ("jpn", "chs") else re.sub(r"(?<=\.) .*", "", text)
+
+
 @pytest.mark.parametrize("language", LANGUAGES)
 def test_the_list_shows_every_code_with_its_name_and_first_sentence(language):
     simulator = {row["code"]: row for row in rows("../simulator/status/statuses.tsv")}
     expected = []
     for row in rows("statuses/catalogue.tsv"):
-        expected.append(f"{row['code']:>7}  {row['constant']}: {row[language + '_happened']}")
+        text = first_sentence(row[language + "_happened"], language)
+        expected.append(f"{row['code']:>7}  {row['constant']}: {text}")
     others = {row["code"]: row for row in rows("statuses/driver.tsv")}
     for code, row in simulator.items():
         name = row["name"] if others[code]["raiser"] == "driver" else "qitrmcsim_" + row["name"]
         text = row["happened"] if language == "eng" else others[code][language + "_happened"]
-        expected.append(f"{code:>7}  {name}: {text}")
+        expected.append(f"{code:>7}  {name}: {first_sentence(text, language)}")
     assert explained("--list", "--language", language).splitlines() == expected
 
 
