@@ -1,10 +1,15 @@
+#!/usr/bin/python3
 """The languages of all texts, from languages.tsv, the only list of them.
 
 Its rows are in the order in which the program carries the dictionaries. Its columns: the number by
 which the translator knows the language, the word of three letters that names its columns and files,
-its folder in the shared directory, and what separates two sentences.
+its folder in the shared directory, the language code of its locales, and what separates two
+sentences.
+
+usage: languages.py OUTPUT    writes C++ initialisers of word and locale, in the order of the numbers
 """
 
+import sys
 from dataclasses import dataclass
 from pathlib import Path
 
@@ -16,6 +21,7 @@ class Language:
     number: int
     word: str
     folder: str
+    locale: str
     gap: str  # between two sentences
 
 
@@ -24,10 +30,20 @@ def read_languages(path=TABLE):
     _, *rows = path.read_text(encoding="utf-8").removesuffix("\n").split("\n")
     languages = []
     for row in rows:
-        number, word, folder, between = row.split("\t")
-        languages.append(Language(int(number), word, folder, {"blank": " ", "nothing": ""}[between]))
+        number, word, folder, locale, between = row.split("\t")
+        gap = {"blank": " ", "nothing": ""}[between]
+        languages.append(Language(int(number), word, folder, locale, gap))
     return sorted(languages, key=lambda language: language.number)
 
 
 LANGUAGES = read_languages()
 WORDS = tuple(language.word for language in LANGUAGES)
+
+
+def main():
+    rows = [f'{{"{language.word}", "{language.locale}"}},\n' for language in LANGUAGES]
+    Path(sys.argv[1]).write_text("".join(rows), encoding="ascii")
+
+
+if __name__ == "__main__":
+    main()

@@ -1,12 +1,15 @@
 #!/usr/bin/python3
-"""Write the C++ header of the status codes that the service names.
+"""Write the status codes and their names as C++.
 
-usage: make_codes.py HEADER
+usage: make_codes.py (--header | --rows) OUTPUT
 
-The codes of the platform keep the names that their failures carry. The others are in the namespace
-qierr::codes. Those of the simulated driver are left out: only the simulator names them.
+  --header  the constants that the service names. The codes of the platform keep the names that their
+            failures carry; the others are in the namespace qierr::codes. The codes of the simulated
+            driver are left out: only the simulator names them.
+  --rows    initialisers of code and name, of every code
 """
 
+import argparse
 import sys
 from pathlib import Path
 
@@ -34,12 +37,22 @@ def header(statuses):
             + "".join(map(declaration, others)) + "\n}  // namespace qierr::codes\n")
 
 
+def rows(statuses):
+    return "".join(f'{{{status.code}, "{status.constant}"}},\n' for status in statuses)
+
+
 def main():
+    parser = argparse.ArgumentParser(description=__doc__.partition("\n")[0])
+    form = parser.add_mutually_exclusive_group(required=True)
+    form.add_argument("--header", dest="write", action="store_const", const=header)
+    form.add_argument("--rows", dest="write", action="store_const", const=rows)
+    parser.add_argument("output", type=Path)
+    arguments = parser.parse_args()
     try:
-        statuses = read_statuses()
+        text = arguments.write(read_statuses())
     except Faults as faults:
         sys.exit("\n".join(faults.args[0]))
-    Path(sys.argv[1]).write_text(header(statuses), encoding="utf-8")
+    arguments.output.write_text(text, encoding="utf-8")
 
 
 if __name__ == "__main__":

@@ -1,6 +1,7 @@
 #include "explain/Language.h"
 
 #include <cstdlib>
+#include <iterator>
 
 #include "explain/Failure.h"
 
@@ -14,7 +15,7 @@ struct Language {
 
 // In the order of the translator's numbers.
 constexpr Language languages[] = {
-    {"eng", "en"}, {"fra", "fr"}, {"deu", "de"}, {"jpn", "ja"}, {"kor", "ko"}, {"chs", "zh"},
+#include "LanguageRows.inc"
 };
 constexpr std::uint32_t english = 0;
 
@@ -32,6 +33,14 @@ std::uint32_t languageOfLocale(const std::string& locale) {
 
 }  // namespace
 
+std::string languageWords() {
+    const std::size_t last = std::size(languages) - 1;
+    std::string words = languages[0].word;
+    for (std::size_t i = 1; i <= last; ++i)
+        words += (i == last ? " or " : ", ") + std::string(languages[i].word);
+    return words;
+}
+
 std::uint32_t languageOfWord(const std::string& word) {
     std::uint32_t number = 0;
     for (const Language& language : languages) {
@@ -39,8 +48,8 @@ std::uint32_t languageOfWord(const std::string& word) {
             return number;
         ++number;
     }
-    throw UsageError("There is no language \"" + word +
-                     "\". Use eng, fra, deu, jpn, kor or chs with --language.");
+    throw UsageError("There is no language \"" + word + "\". Use " + languageWords() +
+                     " with --language.");
 }
 
 std::uint32_t languageOfEnvironment() {

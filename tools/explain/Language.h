@@ -5,6 +5,9 @@
 
 namespace explain {
 
+// The words of all languages, as an enumeration in English.
+std::string languageWords();
+
 // The number of a language given by its word, such as "deu". Throws UsageError for any other word.
 std::uint32_t languageOfWord(const std::string& word);
 

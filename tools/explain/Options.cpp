@@ -3,6 +3,7 @@
 #include <CLI/CLI.hpp>
 
 #include "explain/Failure.h"
+#include "explain/Language.h"
 
 namespace explain {
 namespace {
@@ -42,8 +43,7 @@ void addOptions(CLI::App& app, Options& options) {
                    "the JSON text of the details that belong to a code or name; \"-\" reads\n"
                    "it from standard input")
         ->option_text(" ");
-    app.add_option("--language", options.language, "eng, fra, deu, jpn, kor or chs")
-        ->option_text("LANG");
+    app.add_option("--language", options.language, languageWords())->option_text("LANG");
     app.add_flag("--formatted", options.formatted, "mark labels with <B> and </B>");
     app.add_flag("--debug", options.debug, "show the items for maintainers too");
     app.add_flag("--list", options.list, "list all codes with name and first sentence");
