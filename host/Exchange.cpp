@@ -2,6 +2,7 @@
 
 #include <cstdlib>
 #include <new>
+#include <utility>
 
 #include "host/EntryName.h"
 
@@ -27,13 +28,25 @@ Exchange::~Exchange() {
         gate.leave();
 }
 
+void Exchange::admit(Verdict verdict) {
+    responseHeaders = std::move(verdict.headers);
+    if (!verdict.refusal.empty())
+        return answer(403, verdict.refusal);
+    if (!verdict.isPreflight)
+        return;
+    answer(204, "");
+    request.type.clear();
+}
+
 void Exchange::begin(const char* transport, const char* method, std::string_view path,
                      const char* declaredLength) {
+    if (answered)
+        return;
     if (!admitted)
-        return refuse(503, "The server is stopping.\n");
+        return answer(503, "The server is stopping.\n");
     std::optional<std::vector<uint32_t>> name = entryNameOfPath(path);
     if (!name)
-        return refuse(404, "There is nothing here. The service is at /qitrmc/Call.\n");
+        return answer(404, "There is nothing here. The service is at /qitrmc/Call.\n");
     if (declaredLength != nullptr && std::strtoull(declaredLength, nullptr, 10) > maxBody)
         return refuseBody();
     entryName = std::move(*name);
@@ -42,9 +55,9 @@ void Exchange::begin(const char* transport, const char* method, std::string_view
 }
 
 bool Exchange::take(const char* data, std::size_t size) {
-    if (!refused && size > maxBody - request.body.size())
+    if (!answered && size > maxBody - request.body.size())
         refuseBody();
-    if (refused) {
+    if (answered) {
         discarded += size;
         return discarded <= kMostDiscarded;
     }
@@ -57,27 +70,27 @@ bool Exchange::take(const char* data, std::size_t size) {
 }
 
 void Exchange::run(const Plugin& plugin) {
-    if (refused)
+    if (answered)
         return;
     Entry entry(entryName);
     if (!plugin.run(entry, request) || !isSendable(request))
         fail();
 }
 
-void Exchange::refuse(int code, std::string_view text) {
-    refused = true;
+void Exchange::answer(int code, std::string_view text) {
+    answered = true;
     request = ws_Request();
     request.code = code;
     request.output = text;
 }
 
 void Exchange::refuseBody() {
-    refuse(413, "The request body is too large: at most " + std::to_string(maxBody) +
+    answer(413, "The request body is too large: at most " + std::to_string(maxBody) +
                     " bytes are taken.\n");
 }
 
 void Exchange::fail() {
-    refuse(500, "The service failed on this request.\n");
+    answer(500, "The service failed on this request.\n");
 }
 
 }  // namespace host

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "host/Gate.h"
+#include "host/OriginPolicy.h"
 #include "host/Plugin.h"
 #include "host/Request.h"
 
@@ -15,8 +16,8 @@ namespace host {
 // One request on its way through the host: its head, its body piece by piece, the work of the
 // plug-in, the response. Used by one thread at a time. Any function may throw std::bad_alloc.
 //
-// A request that the host refuses still has its body read, and thrown away: a client that is cut
-// off while it writes would often never see the response.
+// A request that the host answers by itself still has its body read, and thrown away: a client that
+// is cut off while it writes would often never see the response.
 class Exchange {
   public:
     // maxBody: the most bytes of body that are kept.
@@ -24,6 +25,9 @@ class Exchange {
     ~Exchange();
     Exchange(const Exchange&) = delete;
     Exchange& operator=(const Exchange&) = delete;
+
+    // Takes in what the policy says, before the head.
+    void admit(Verdict verdict);
 
     // Takes in the head. declaredLength: the value of the header "Content-Length", null without it.
     void begin(const char* transport, const char* method, std::string_view path,
@@ -33,17 +37,20 @@ class Exchange {
     // that the connection is to be dropped.
     bool take(const char* data, std::size_t size);
 
-    // Has the plug-in serve the request, unless the host has refused it.
+    // Has the plug-in serve the request, unless the host has answered it.
     void run(const Plugin& plugin);
 
     // Whether the host has its response already, without the plug-in.
-    bool isRefused() const { return refused; }
+    bool isAnswered() const { return answered; }
 
-    // The response; complete after run(), or once the request is refused.
+    // The response; complete after run(), or once the request is answered.
     const ws_Request& response() const { return request; }
 
+    // What the response has besides that.
+    const std::vector<Header>& headers() const { return responseHeaders; }
+
   private:
-    void refuse(int code, std::string_view text);
+    void answer(int code, std::string_view text);
     void refuseBody();
     void fail();
 
@@ -52,8 +59,9 @@ class Exchange {
     const uint32_t maxBody;
     ws_Request request;
     std::vector<uint32_t> entryName;
+    std::vector<Header> responseHeaders;
     std::size_t discarded = 0;
-    bool refused = false;
+    bool answered = false;
 };
 
 }  // namespace host

@@ -1,13 +1,29 @@
 #include "host/Options.h"
 
+#include <CLI/CLI.hpp>
+#include <algorithm>
 #include <charconv>
 #include <limits>
+#include <memory>
 
 #include "host/Failure.h"
+#include "host/Origin.h"
 
 namespace host {
 
 namespace {
+
+constexpr const char* kIntroduction = R"(Usage: qitrmc-host [OPTION]...
+
+Serves the web service plug-in of an instrument chassis over HTTP, for development and tests.
+The service answers POST requests at /qitrmc/Call.
+)";
+
+constexpr const char* kNotes =
+    R"(SIGTERM and SIGINT end the host after the requests in flight; a second signal ends it at once.
+Exit status: 0 after a normal end, 1 when it cannot serve, 2 for a wrong command line.)";
+
+constexpr const char* kVersionText = "qitrmc-host " QITRMC_VERSION "\n";
 
 uint32_t parseNumber(const std::string& option, const std::string& text, uint32_t least,
                      uint32_t most) {
@@ -87,33 +103,139 @@ void setPath(Options& options, const std::string& option, const std::string& tex
     options.*path = text;
 }
 
+void addHostName(Options& options, const std::string& option, const std::string& text) {
+    const bool bracketed = text.size() > 2 && text.front() == '[' && text.back() == ']';
+    const std::string name =
+        canonicalHost(bracketed ? text.substr(1, text.size() - 2) : text).value_or("");
+    if (name.empty()) {
+        throw UsageError(option +
+                         " takes a name or address without a port, such as lab-pc.example, not \"" +
+                         text + "\".");
+    }
+    options.hostNames.push_back(name);
+}
+
+void addOrigin(Options& options, const std::string& option, const std::string& text) {
+    if (!parseOrigin(text)) {
+        throw UsageError(option +
+                         " takes SCHEME://HOST[:PORT], such as http://localhost:3000, not \"" +
+                         text + "\".");
+    }
+    options.allowedOrigins.push_back(text);
+}
+
 struct OptionWithValue {
     const char* name;
+    const char* value;
+    const char* description;
     void (*set)(Options& options, const std::string& option, const std::string& text);
 };
 
 constexpr OptionWithValue kOptionsWithValue[] = {
-    {"--listen", setListen},
-    {"--plugin", setPath<&Options::plugin>},
-    {"--chassis", setPath<&Options::chassis>},
-    {"--state", setPath<&Options::state>},
-    {"--faults", setPath<&Options::faults>},
-    {"--trace", setPath<&Options::trace>},
-    {"--seed", setSeed},
-    {"--time-scale", setTimeScale},
-    {"--threads", setThreads},
-    {"--max-body", setMaxBody},
-    {"--timeout", setTimeout},
-    {"--tls-cert", setPath<&Options::tlsCertificate>},
-    {"--tls-key", setPath<&Options::tlsKey>},
+    {"--listen", "ADDR:PORT",
+     "where to listen (127.0.0.1:8080); port 0 takes a free one,\n"
+     "an IPv6 address stands in brackets",
+     setListen},
+    {"--plugin", "PATH",
+     "the plug-in (libqitrmcsvc.so in ../lib beside the program's\n"
+     "folder, or in it)",
+     setPath<&Options::plugin>},
+    {"--chassis", "FILE",
+     "the chassis that the simulated driver shows\n"
+     "(QITRMC_SIM_CHASSIS)",
+     setPath<&Options::chassis>},
+    {"--state", "DIR", "where the simulated driver keeps its state\n(QITRMC_SIM_STATE)",
+     setPath<&Options::state>},
+    {"--faults", "FILE",
+     "what the simulated driver does wrong on purpose\n"
+     "(QITRMC_SIM_FAULTS); the file may change, come and go while\n"
+     "the host runs",
+     setPath<&Options::faults>},
+    {"--trace", "FILE",
+     "where the simulated driver notes each call of it, \"-\" for\n"
+     "standard error (QITRMC_SIM_TRACE)",
+     setPath<&Options::trace>},
+    {"--seed", "N",
+     "where the random numbers of the simulated chassis come\n"
+     "from: the same seed gives the same numbers (QITRMC_SIM_SEED;\n"
+     "0 to 18446744073709551615)",
+     setSeed},
+    {"--time-scale", "X",
+     "simulated seconds in one real second\n"
+     "(QITRMC_SIM_TIME_SCALE; 0.001 to 1000000), or \"calls\": time\n"
+     "goes by the calls of the driver alone",
+     setTimeScale},
+    {"--threads", "N",
+     "most connections at once, each with a thread of its own\n"
+     "(512; 1 to 900)",
+     setThreads},
+    {"--max-body", "BYTES",
+     "largest request body; a larger one is answered with 413\n"
+     "(16777216)",
+     setMaxBody},
+    {"--timeout", "SECONDS",
+     "how long a client may stay idle, and how long it may take to\n"
+     "send the head of a request, to send its body and to fetch\n"
+     "the response (30)",
+     setTimeout},
+    {"--host-name", "NAME",
+     "a name under which clients reach this machine; requests\n"
+     "whose Host is neither that, nor localhost or another\n"
+     "loopback address, nor the address they came to, are\n"
+     "answered with 403 (may be repeated)",
+     addHostName},
+    {"--allow-origin", "ORIGIN",
+     "lets web pages of this origin send requests, such as\n"
+     "http://localhost:3000; those of others are answered with 403\n"
+     "(may be repeated)",
+     addOrigin},
+    {"--tls-cert", "FILE", "serve HTTPS with this certificate chain in PEM form...",
+     setPath<&Options::tlsCertificate>},
+    {"--tls-key", "FILE", "...and this private key", setPath<&Options::tlsKey>},
 };
 
-const OptionWithValue& findOption(const std::string& name) {
+void describeOptionsWithValue(CLI::App& app, Options& options) {
     for (const OptionWithValue& option : kOptionsWithValue) {
-        if (name == option.name)
-            return option;
+        const auto take = [&options, &option](const CLI::results_t& values) {
+            for (const std::string& value : values)
+                option.set(options, option.name, value);
+            return true;
+        };
+        app.add_option(option.name, take, option.description)
+            ->type_name(option.value)
+            ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
     }
-    throw UsageError("Unknown argument \"" + name + "\". Try --help.");
+}
+
+void describeFlags(CLI::App& app, Options& options) {
+    app.add_flag("--pass-transport", options.passTransport,
+                 "shows the plug-in that a request came over HTTPS, which it\n"
+                 "refuses; it sees plain HTTP without this option");
+    app.set_help_flag();
+    app.add_flag_callback(
+           "-h,--help", [] { throw CLI::CallForHelp(); }, "show this text")
+        ->trigger_on_parse();
+    app.add_flag_callback(
+           "--version", [] { throw CLI::CallForVersion(); }, "show the version")
+        ->trigger_on_parse();
+}
+
+struct HelpLayout : CLI::Formatter {
+    HelpLayout() { column_width(24); }
+    std::string make_usage(const CLI::App*, std::string) const override { return kIntroduction; }
+};
+
+// The parser takes the argument behind "--name=" for the value; it is the empty text.
+std::vector<std::string> withEmptyValues(const std::vector<std::string>& arguments) {
+    std::vector<std::string> separated;
+    for (const std::string& argument : arguments) {
+        const bool isEmptyValue = argument.rfind("--", 0) == 0 && !argument.empty() &&
+                                  argument.find('=') == argument.size() - 1;
+        separated.push_back(isEmptyValue ? argument.substr(0, argument.size() - 1) : argument);
+        if (isEmptyValue)
+            separated.emplace_back();
+    }
+    return separated;
 }
 
 void requireBothTlsFiles(const Options& options) {
@@ -125,21 +247,23 @@ void requireBothTlsFiles(const Options& options) {
 
 Options parseOptions(const std::vector<std::string>& arguments) {
     Options options;
-    for (auto argument = arguments.begin(); argument != arguments.end(); ++argument) {
-        if (*argument == "--help" || *argument == "--version") {
-            options.action = *argument == "--help" ? Action::ShowHelp : Action::ShowVersion;
-            return options;
-        }
-        const std::size_t equals = argument->find('=');
-        const std::string name = argument->substr(0, equals);
-        const OptionWithValue& option = findOption(name);
-        if (equals != std::string::npos) {
-            option.set(options, name, argument->substr(equals + 1));
-            continue;
-        }
-        if (++argument == arguments.end())
-            throw UsageError(name + " needs a value. Try --help.");
-        option.set(options, name, *argument);
+    CLI::App app;
+    app.formatter(std::make_shared<HelpLayout>());
+    app.footer(kNotes);
+    describeOptionsWithValue(app, options);
+    describeFlags(app, options);
+    std::vector<std::string> backwards = withEmptyValues(arguments);
+    std::reverse(backwards.begin(), backwards.end());
+    try {
+        app.parse(std::move(backwards));
+    } catch (const CLI::CallForHelp&) {
+        options.notice = app.help();
+    } catch (const CLI::CallForVersion&) {
+        options.notice = kVersionText;
+    } catch (const CLI::ExtrasError&) {
+        throw UsageError("Unknown argument \"" + app.remaining().front() + "\". Try --help.");
+    } catch (const CLI::ParseError& error) {
+        throw UsageError(error.what() + std::string(". Try --help."));
     }
     requireBothTlsFiles(options);
     return options;

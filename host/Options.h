@@ -6,11 +6,9 @@
 
 namespace host {
 
-enum class Action { Serve, ShowHelp, ShowVersion };
-
 // What the command line asks for.
 struct Options {
-    Action action = Action::Serve;
+    std::string notice;                   // --help, --version: what to print instead of serving
     std::string address = "127.0.0.1";    // a name or number, IPv6 without its brackets
     std::string port = "8080";            // decimal; "0" takes a free one
     std::string plugin;                   // path; empty: look beside the program
@@ -23,8 +21,11 @@ struct Options {
     uint32_t threads = 512;               // 1 to kMostThreads
     uint32_t maxBody = 16 * 1024 * 1024;  // bytes, 1 and more
     uint32_t timeout = 30;                // seconds, 1 to kLongestTimeout
-    std::string tlsCertificate;           // path; both or neither of the two
+    std::vector<std::string> hostNames;   // names of this machine besides its addresses
+    std::vector<std::string> allowedOrigins;  // origins of web pages that may send requests
+    std::string tlsCertificate;               // path; both or neither of the two
     std::string tlsKey;
+    bool passTransport = false;  // the plug-in sees "https" behind TLS
 };
 
 // Every connection takes a thread and a file descriptor, of which a process has 1024.
@@ -35,8 +36,8 @@ constexpr double kSmallestTimeScale = 0.001;
 constexpr double kLargestTimeScale = 1000000.0;
 
 // Reads the arguments of the program, its own name not among them. Options are written as
-// "--name value" or "--name=value"; the last one of a name holds. --help and --version end the
-// reading. Throws UsageError.
+// "--name value" or "--name=value"; the last one of a name holds, except for those that may be
+// repeated. --help and --version end the reading. Throws UsageError.
 Options parseOptions(const std::vector<std::string>& arguments);
 
 }  // namespace host

@@ -29,8 +29,28 @@ const char* headerOf(MHD_Connection* connection, const char* name) {
     return MHD_lookup_connection_value(connection, MHD_HEADER_KIND, name);
 }
 
+MHD_Result takeHeader(void* source, MHD_ValueKind, const char* name, const char* value) {
+    static_cast<Source*>(source)->takeHeader(name, value == nullptr ? "" : value);
+    return MHD_YES;
+}
+
+// The address of this machine that the client has connected to; empty when it is unknown.
+std::string localAddressOf(MHD_Connection* connection) {
+    const auto* info = MHD_get_connection_info(connection, MHD_CONNECTION_INFO_CONNECTION_FD);
+    return localAddress(info->connect_fd);
+}
+
+Source sourceOf(MHD_Connection* connection, const char* method) {
+    Source source;
+    source.method = method;
+    source.localAddress = localAddressOf(connection);
+    MHD_get_connection_values(connection, MHD_HEADER_KIND, takeHeader, &source);
+    return source;
+}
+
 // The body is sent from where it lies: the exchange outlives the response.
-MHD_Result send(MHD_Connection* connection, const ws_Request& answer, bool isLast) {
+MHD_Result send(MHD_Connection* connection, const Exchange& exchange, bool isLast) {
+    const ws_Request& answer = exchange.response();
     const std::unique_ptr<MHD_Response, decltype(&MHD_destroy_response)> response(
         MHD_create_response_from_buffer(
             answer.output.size(), const_cast<char*>(answer.output.data()), MHD_RESPMEM_PERSISTENT),
@@ -44,6 +64,10 @@ MHD_Result send(MHD_Connection* connection, const ws_Request& answer, bool isLas
         return MHD_NO;
     if (isLast && !addHeader(MHD_HTTP_HEADER_CONNECTION, "close"))
         return MHD_NO;
+    for (const Header& header : exchange.headers()) {
+        if (!addHeader(header.name, header.value.c_str()))
+            return MHD_NO;
+    }
     return MHD_queue_response(connection, static_cast<unsigned>(answer.code), response.get());
 }
 
@@ -99,11 +123,12 @@ struct Server::Callbacks {
         client->waitForClient();
         auto* exchange = new Exchange(server.gate, server.settings.maxBody);
         *state = exchange;
-        exchange->begin(server.settings.tls ? "https" : "http", method, path,
-                        headerOf(connection, MHD_HTTP_HEADER_CONTENT_LENGTH));
+        exchange->admit(server.policy.judge(sourceOf(connection, method)));
+        exchange->begin(server.settings.tls && server.settings.passTransport ? "https" : "http",
+                        method, path, headerOf(connection, MHD_HTTP_HEADER_CONTENT_LENGTH));
         // A client that asks before it sends a body can be spared sending it.
         const bool asksFirst = headerOf(connection, MHD_HTTP_HEADER_EXPECT) != nullptr;
-        return exchange->isRefused() && asksFirst ? end(server, connection, *exchange) : MHD_YES;
+        return exchange->isAnswered() && asksFirst ? end(server, connection, *exchange) : MHD_YES;
     }
 
     static MHD_Result end(Server& server, MHD_Connection* connection, Exchange& exchange) {
@@ -111,7 +136,7 @@ struct Server::Callbacks {
         client->workForClient();
         exchange.run(server.plugin);
         client->waitForClient();
-        return send(connection, exchange.response(), server.gate.isClosed());
+        return send(connection, exchange, server.gate.isClosed());
     }
 
     static void onEnd(void*, MHD_Connection* connection, void** state, MHD_RequestTerminationCode) {
@@ -122,10 +147,12 @@ struct Server::Callbacks {
     }
 };
 
-Server::Server(const Plugin& plugin, ListenSocket& socket, ServerSettings wanted)
+Server::Server(const Plugin& plugin, ListenSocket& socket, ServerSettings wanted,
+               const OriginPolicy& policy)
     : plugin(plugin),
       socket(socket),
       settings(std::move(wanted)),
+      policy(policy),
       connections(settings.threads, settings.timeout),
       daemon(startDaemon(), MHD_stop_daemon) {
     if (!daemon) {

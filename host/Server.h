@@ -9,6 +9,7 @@
 #include "host/Connections.h"
 #include "host/Gate.h"
 #include "host/ListenSocket.h"
+#include "host/OriginPolicy.h"
 #include "host/Plugin.h"
 
 struct MHD_Daemon;
@@ -22,14 +23,17 @@ struct ServerSettings {
     bool tls = false;      // HTTPS with these two, both PEM text
     std::string tlsCertificate;
     std::string tlsKey;
+    bool passTransport = false;  // the plug-in sees "https" behind TLS, else always "http"
 };
 
 // The HTTP server. Each connection has a thread, which also runs the plug-in, so no client waits
 // for another one's request.
 class Server {
   public:
-    // Starts to serve. The plug-in and the socket must outlive the server. Throws Failure.
-    Server(const Plugin& plugin, ListenSocket& socket, ServerSettings settings);
+    // Starts to serve. The plug-in, the socket and the policy must outlive the server. Throws
+    // Failure.
+    Server(const Plugin& plugin, ListenSocket& socket, ServerSettings settings,
+           const OriginPolicy& policy);
 
     // Cuts the connections that are left. Returns when no request is in the plug-in any more.
     ~Server();
@@ -54,6 +58,7 @@ class Server {
     const Plugin& plugin;
     ListenSocket& socket;
     const ServerSettings settings;
+    const OriginPolicy& policy;
     Connections connections;
     Gate gate;
     std::unique_ptr<MHD_Daemon, void (*)(MHD_Daemon*)> daemon;

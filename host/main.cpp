@@ -6,15 +6,18 @@
 #include <cstring>
 #include <exception>
 #include <memory>
+#include <optional>
 #include <string>
+#include <vector>
 
 #include "host/Failure.h"
 #include "host/ListenSocket.h"
 #include "host/Options.h"
+#include "host/Origin.h"
+#include "host/OriginPolicy.h"
 #include "host/Plugin.h"
 #include "host/Server.h"
 #include "host/SimulatedDriver.h"
-#include "host/Usage.h"
 
 namespace {
 
@@ -62,11 +65,19 @@ host::ServerSettings settingsOf(const Options& options) {
     settings.maxBody = options.maxBody;
     settings.timeout = options.timeout;
     settings.tls = !options.tlsKey.empty();
+    settings.passTransport = options.passTransport;
     if (settings.tls) {
         settings.tlsCertificate = readFile(options.tlsCertificate, "certificate", "--tls-cert");
         settings.tlsKey = readFile(options.tlsKey, "private key", "--tls-key");
     }
     return settings;
+}
+
+host::OriginPolicy policyOf(const Options& options) {
+    std::vector<std::string> names = options.hostNames;
+    if (const std::optional<std::string> name = host::canonicalHost(options.address))
+        names.push_back(*name);
+    return {options.tlsKey.empty() ? "http" : "https", names, options.allowedOrigins};
 }
 
 sigset_t endSignals() {
@@ -104,8 +115,9 @@ void finishRequests(host::Server& server) {
 }
 
 void serve(const host::Plugin& plugin, host::ListenSocket& socket,
-           const host::ServerSettings& settings, const std::string& chassis) {
-    host::Server server(plugin, socket, settings);
+           const host::ServerSettings& settings, const host::OriginPolicy& policy,
+           const std::string& chassis) {
+    host::Server server(plugin, socket, settings, policy);
     std::printf("Listening on %s://%s/qitrmc/Call\n%s", settings.tls ? "https" : "http",
                 socket.authority().c_str(), chassis.c_str());
     std::fflush(stdout);
@@ -130,7 +142,7 @@ void runHost(const Options& options) {
     const std::string chassis = host::startSimulatedDriver();
     plugin.initialize();
     try {
-        serve(plugin, socket, settings, chassis);
+        serve(plugin, socket, settings, policyOf(options), chassis);
     } catch (...) {
         plugin.finalize();
         throw;
@@ -140,12 +152,10 @@ void runHost(const Options& options) {
 }
 
 void perform(const Options& options) {
-    if (options.action == host::Action::ShowHelp)
-        std::fputs(host::kHelpText, stdout);
-    else if (options.action == host::Action::ShowVersion)
-        std::fputs(host::kVersionText, stdout);
-    else
+    if (options.notice.empty())
         runHost(options);
+    else
+        std::fputs(options.notice.c_str(), stdout);
 }
 
 }  // namespace

@@ -25,7 +25,7 @@ TEST(Exchange, KeepsABodyUpToTheLimit) {
     exchange.begin("http", "POST", "/qitrmc/Call", "10");
     EXPECT_TRUE(exchange.take("01234", 5));
     EXPECT_TRUE(exchange.take("56789", 5));
-    EXPECT_FALSE(exchange.isRefused());
+    EXPECT_FALSE(exchange.isAnswered());
     EXPECT_EQ(exchange.response().body, "0123456789");
 }
 
@@ -34,7 +34,7 @@ TEST(Exchange, RefusesADeclaredLengthAboveTheLimit) {
     for (const char* length : {"11", "4294967306", "99999999999999999999999999"}) {
         Exchange exchange(gate, kMaxBody);
         exchange.begin("http", "POST", "/qitrmc/Call", length);
-        EXPECT_TRUE(exchange.isRefused()) << length;
+        EXPECT_TRUE(exchange.isAnswered()) << length;
         EXPECT_EQ(exchange.response().code, 413);
         EXPECT_EQ(exchange.response().output,
                   "The request body is too large: at most 10 bytes are taken.\n");
@@ -65,11 +65,47 @@ TEST(Exchange, RefusesPathsOutsideTheService) {
     Gate gate;
     Exchange exchange(gate, kMaxBody);
     exchange.begin("http", "POST", "/elsewhere", nullptr);
-    EXPECT_TRUE(exchange.isRefused());
+    EXPECT_TRUE(exchange.isAnswered());
     EXPECT_EQ(exchange.response().code, 404);
     EXPECT_EQ(exchange.response().type, "text/plain");
     EXPECT_EQ(exchange.response().output,
               "There is nothing here. The service is at /qitrmc/Call.\n");
+}
+
+TEST(Exchange, RefusesWhatThePolicyRefusesWhereverItGoes) {
+    Gate gate;
+    for (const char* path : {"/qitrmc/Call", "/elsewhere"}) {
+        Exchange exchange(gate, kMaxBody);
+        exchange.admit({"Not here.\n", false, {}});
+        exchange.begin("http", "POST", path, "11");
+        EXPECT_TRUE(exchange.isAnswered());
+        EXPECT_EQ(exchange.response().code, 403);
+        EXPECT_EQ(exchange.response().type, "text/plain");
+        EXPECT_EQ(exchange.response().output, "Not here.\n");
+    }
+}
+
+TEST(Exchange, AnswersAPreflightWithNothingButHeaders) {
+    Gate gate;
+    Exchange exchange(gate, kMaxBody);
+    exchange.admit({"", true, {{"Vary", "Origin"}}});
+    exchange.begin("http", "OPTIONS", "/qitrmc/Call", nullptr);
+    EXPECT_TRUE(exchange.isAnswered());
+    EXPECT_EQ(exchange.response().code, 204);
+    EXPECT_EQ(exchange.response().type, "");
+    EXPECT_EQ(exchange.response().output, "");
+    ASSERT_EQ(exchange.headers().size(), 1u);
+    EXPECT_STREQ(exchange.headers()[0].name, "Vary");
+}
+
+TEST(Exchange, KeepsTheHeadersOfThePolicyWhenItRefusesTheRequestLater) {
+    Gate gate;
+    Exchange exchange(gate, kMaxBody);
+    exchange.admit({"", false, {{"Vary", "Origin"}}});
+    exchange.begin("http", "POST", "/elsewhere", nullptr);
+    EXPECT_EQ(exchange.response().code, 404);
+    ASSERT_EQ(exchange.headers().size(), 1u);
+    EXPECT_EQ(exchange.headers()[0].value, "Origin");
 }
 
 TEST(Exchange, RefusesEveryRequestOnceTheGateIsClosed) {
@@ -77,7 +113,7 @@ TEST(Exchange, RefusesEveryRequestOnceTheGateIsClosed) {
     gate.close();
     Exchange exchange(gate, kMaxBody);
     exchange.begin("http", "POST", "/qitrmc/Call", nullptr);
-    EXPECT_TRUE(exchange.isRefused());
+    EXPECT_TRUE(exchange.isAnswered());
     EXPECT_EQ(exchange.response().code, 503);
     EXPECT_EQ(exchange.response().output, "The server is stopping.\n");
 }

@@ -3,15 +3,15 @@
 #include <gmock/gmock.h>
 
 #include "host/Failure.h"
-#include "host/Usage.h"
 
 namespace {
 
-using host::Action;
 using host::Options;
 using host::parseOptions;
 using host::UsageError;
+using testing::ElementsAre;
 using testing::HasSubstr;
+using testing::StartsWith;
 
 std::string usageErrorOf(const std::vector<std::string>& arguments) {
     try {
@@ -24,7 +24,7 @@ std::string usageErrorOf(const std::vector<std::string>& arguments) {
 
 TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
     const Options options = parseOptions({});
-    EXPECT_EQ(options.action, Action::Serve);
+    EXPECT_EQ(options.notice, "");
     EXPECT_EQ(options.address, "127.0.0.1");
     EXPECT_EQ(options.port, "8080");
     EXPECT_EQ(options.plugin, "");
@@ -37,17 +37,21 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
     EXPECT_EQ(options.threads, 512u);
     EXPECT_EQ(options.maxBody, 16777216u);
     EXPECT_EQ(options.timeout, 30u);
+    EXPECT_THAT(options.hostNames, ElementsAre());
+    EXPECT_THAT(options.allowedOrigins, ElementsAre());
     EXPECT_EQ(options.tlsCertificate, "");
     EXPECT_EQ(options.tlsKey, "");
+    EXPECT_FALSE(options.passTransport);
 }
 
 TEST(Options, EachOptionSetsItsOwnField) {
-    const Options options =
-        parseOptions({"--listen",     "0.0.0.0:81", "--plugin",  "p.so",   "--chassis",  "c.json",
-                      "--state",      "s",          "--faults",  "f.json", "--seed",     "7",
-                      "--time-scale", "8",          "--trace",   "t",      "--threads",  "3",
-                      "--max-body",   "4",          "--timeout", "5",      "--tls-cert", "cert.pem",
-                      "--tls-key",    "key.pem"});
+    const Options options = parseOptions(
+        {"--listen",        "0.0.0.0:81", "--plugin",    "p.so",   "--chassis",      "c.json",
+         "--state",         "s",          "--faults",    "f.json", "--seed",         "7",
+         "--time-scale",    "8",          "--trace",     "t",      "--threads",      "3",
+         "--max-body",      "4",          "--timeout",   "5",      "--tls-cert",     "cert.pem",
+         "--tls-key",       "key.pem",    "--host-name", "lab",    "--allow-origin", "http://a:1",
+         "--pass-transport"});
     EXPECT_EQ(options.address, "0.0.0.0");
     EXPECT_EQ(options.port, "81");
     EXPECT_EQ(options.plugin, "p.so");
@@ -60,8 +64,11 @@ TEST(Options, EachOptionSetsItsOwnField) {
     EXPECT_EQ(options.threads, 3u);
     EXPECT_EQ(options.maxBody, 4u);
     EXPECT_EQ(options.timeout, 5u);
+    EXPECT_THAT(options.hostNames, ElementsAre("lab"));
+    EXPECT_THAT(options.allowedOrigins, ElementsAre("http://a:1"));
     EXPECT_EQ(options.tlsCertificate, "cert.pem");
     EXPECT_EQ(options.tlsKey, "key.pem");
+    EXPECT_TRUE(options.passTransport);
 }
 
 TEST(Options, AValueMayFollowAnEqualsSign) {
@@ -78,9 +85,42 @@ TEST(Options, AnIpv6AddressLosesItsBrackets) {
     EXPECT_EQ(options.port, "0");
 }
 
+TEST(Options, HostNamesAndOriginsAddUp) {
+    const Options options =
+        parseOptions({"--host-name", "Lab-PC.example", "--host-name=[FE80::1]", "--host-name",
+                      "192.0.2.7", "--allow-origin=https://a", "--allow-origin", "app://b"});
+    EXPECT_THAT(options.hostNames, ElementsAre("lab-pc.example", "fe80::1", "192.0.2.7"));
+    EXPECT_THAT(options.allowedOrigins, ElementsAre("https://a", "app://b"));
+}
+
+TEST(Options, AHostNameWithAPortIsRefused) {
+    for (const char* text : {"", "lab:80", "http://lab", "[::1", "[]", "lab pc", "*"}) {
+        EXPECT_EQ(usageErrorOf({"--host-name", text}),
+                  std::string("--host-name takes a name or address without a port, such as "
+                              "lab-pc.example, not \"") +
+                      text + "\".");
+    }
+}
+
+TEST(Options, WhatNoPageIsOfIsNoOriginToAllow) {
+    for (const char* text : {"", "null", "*", "localhost:3000", "http://a/", "http://a/page",
+                             "http://", "://a", "http://user@a", "http://a:65536"}) {
+        EXPECT_EQ(usageErrorOf({"--allow-origin", text}),
+                  std::string("--allow-origin takes SCHEME://HOST[:PORT], such as "
+                              "http://localhost:3000, not \"") +
+                      text + "\".");
+    }
+}
+
 TEST(Options, HelpAndVersionWinOverWhatFollows) {
-    EXPECT_EQ(parseOptions({"--help", "--nonsense"}).action, Action::ShowHelp);
-    EXPECT_EQ(parseOptions({"--version", "--nonsense"}).action, Action::ShowVersion);
+    for (const char* option : {"--help", "-h"}) {
+        for (const char* next : {"--nonsense", "--threads", "--threads=0"}) {
+            EXPECT_THAT(parseOptions({option, next}).notice, StartsWith("Usage: qitrmc-host "))
+                << option << " " << next;
+        }
+    }
+    EXPECT_THAT(parseOptions({"--version", "--nonsense"}).notice, StartsWith("qitrmc-host "));
+    EXPECT_THAT(parseOptions({"--version", "--threads"}).notice, StartsWith("qitrmc-host "));
 }
 
 TEST(Options, WhatIsNotAnAddressAndAPortIsRefused) {
@@ -146,14 +186,26 @@ TEST(Options, AnEmptyPathIsRefused) {
                   std::string(option) + " takes a path, not an empty text.");
 }
 
+TEST(Options, AnEmptyTextBehindAnEqualsSignIsTheValueAndNotTheNextArgument) {
+    EXPECT_EQ(usageErrorOf({"--plugin=", "--state", "s"}),
+              "--plugin takes a path, not an empty text.");
+    EXPECT_EQ(usageErrorOf({"--threads=", "3"}),
+              "--threads takes a number from 1 to 900, not \"\".");
+}
+
+TEST(Options, AValueMayLookLikeAnOption) {
+    EXPECT_EQ(parseOptions({"--plugin", "--state"}).plugin, "--state");
+    EXPECT_EQ(parseOptions({"--trace", "-"}).trace, "-");
+}
+
 TEST(Options, AMissingValueIsRefused) {
-    EXPECT_EQ(usageErrorOf({"--plugin"}), "--plugin needs a value. Try --help.");
+    EXPECT_EQ(usageErrorOf({"--plugin"}), "--plugin: 1 required PATH missing. Try --help.");
 }
 
 TEST(Options, UnknownArgumentsAreRefused) {
     EXPECT_EQ(usageErrorOf({"--port", "80"}), "Unknown argument \"--port\". Try --help.");
     EXPECT_EQ(usageErrorOf({"plugin.so"}), "Unknown argument \"plugin.so\". Try --help.");
-    EXPECT_EQ(usageErrorOf({"--help=yes"}), "Unknown argument \"--help\". Try --help.");
+    EXPECT_EQ(usageErrorOf({"-x"}), "Unknown argument \"-x\". Try --help.");
     EXPECT_EQ(usageErrorOf({""}), "Unknown argument \"\". Try --help.");
 }
 
@@ -163,12 +215,17 @@ TEST(Options, ACertificateWithoutAKeyIsRefused) {
     EXPECT_EQ(usageErrorOf({"--tls-key", "key.pem"}), expected);
 }
 
-TEST(Options, TheHelpNamesEveryOption) {
-    for (const char* option : {"--listen", "--plugin", "--chassis", "--state", "--faults",
-                               "--trace", "--seed", "--time-scale", "--threads", "--max-body",
-                               "--timeout", "--tls-cert", "--tls-key", "--help", "--version"}) {
-        EXPECT_THAT(host::kHelpText, HasSubstr(std::string("  ") + option + " "));
-    }
+TEST(Options, TheHelpNamesEveryOptionAndFitsATerminal) {
+    const std::string help = parseOptions({"--help"}).notice;
+    for (const char* option :
+         {"  --listen ADDR:PORT ", "  --plugin PATH ", "  --chassis FILE ", "  --state DIR ",
+          "  --faults FILE ", "  --trace FILE ", "  --seed N ", "  --time-scale X ",
+          "  --threads N ", "  --max-body BYTES ", "  --timeout SECONDS ", "  --host-name NAME ",
+          "  --allow-origin ORIGIN ", "  --tls-cert FILE ", "  --tls-key FILE ",
+          "  --pass-transport ", "  -h,--help ", "  --version "})
+        EXPECT_THAT(help, HasSubstr(option));
+    for (std::size_t line = 0; line < help.size(); line = help.find('\n', line) + 1)
+        EXPECT_LE(help.find('\n', line) - line, 100u) << help.substr(line, 100);
 }
 
 }  // namespace

@@ -23,8 +23,8 @@ def read_response(client):
 
 
 def raw_post(entry, body):
-    return (f"POST /qitrmc/{entry} HTTP/1.1\r\nHost: a\r\nContent-Length: {len(body)}\r\n\r\n"
-            .encode() + body)
+    return (f"POST /qitrmc/{entry} HTTP/1.1\r\nHost: localhost\r\n"
+            f"Content-Length: {len(body)}\r\n\r\n".encode() + body)
 
 
 def seconds_until_closed(client):
@@ -61,7 +61,7 @@ def test_a_connection_serves_many_requests(host):
 
 def test_a_client_may_ask_for_the_connection_to_end(host):
     with host.raw_socket() as client:
-        client.sendall(b"POST /qitrmc/Echo HTTP/1.1\r\nHost: a\r\nConnection: close\r\n"
+        client.sendall(b"POST /qitrmc/Echo HTTP/1.1\r\nHost: localhost\r\nConnection: close\r\n"
                        b"Content-Length: 1\r\n\r\nx")
         received = b""
         while piece := client.recv(1000):
@@ -130,7 +130,7 @@ def test_a_rush_of_clients_waits_for_places(start_host):
 @pytest.mark.parametrize("start", [
     b"",
     b"POST /qitrmc/Echo HTTP/1.1\r\n",
-    b"POST /qitrmc/Echo HTTP/1.1\r\nHost: a\r\nContent-Length: 10\r\n\r\nabc",
+    b"POST /qitrmc/Echo HTTP/1.1\r\nHost: localhost\r\nContent-Length: 10\r\n\r\nabc",
     raw_post("Nothing", b"")[:30],
 ], ids=["nothing", "request line", "half a body", "half a head"])
 def test_a_silent_client_loses_its_connection(start_host, start):
@@ -287,12 +287,16 @@ def test_clients_that_vanish_do_no_harm(host):
     assert host.stop() == 0
 
 
-def test_https_is_reported_to_the_plugin(start_host, certificate):
-    host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1])
+@pytest.mark.parametrize("options, transport", [
+    ((), b"http"), (("--pass-transport",), b"https"),
+], ids=["as it is behind a proxy", "as it is"])
+def test_the_plugin_sees_plain_http_behind_https_unless_told(start_host, certificate, options,
+                                                             transport):
+    host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1], *options)
     assert host.first_line.startswith("Listening on https://127.0.0.1:")
     status, _, body = host.post(b"x" * 1000)
     assert status == 200
-    assert b"transport https\n" in body
+    assert b"transport " + transport + b"\n" in body
     text = b"x" * 3000000
     assert host.post(text, "Echo")[2] == text
     assert host.stop() == 0

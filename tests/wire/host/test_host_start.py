@@ -64,8 +64,9 @@ def test_without_options_the_variables_of_the_driver_are_left_alone(start_host):
     assert "time scale 10" in lines
 
 
-def test_help_goes_to_standard_output(run_host):
-    result = run_host("--help")
+@pytest.mark.parametrize("option", ["--help", "-h"])
+def test_help_goes_to_standard_output(run_host, option):
+    result = run_host(option)
     assert (result.returncode, result.stderr) == (0, "")
     assert result.stdout.startswith("Usage: qitrmc-host ")
 
@@ -80,13 +81,17 @@ def test_version_is_one_line(run_host):
 
 @pytest.mark.parametrize("arguments, message", [
     (["--nonsense"], 'Unknown argument "--nonsense". Try --help.'),
-    (["--plugin"], "--plugin needs a value. Try --help."),
+    (["--plugin"], "--plugin: 1 required PATH missing. Try --help."),
     (["--listen", "8080"],
      '--listen takes ADDR:PORT, such as 127.0.0.1:8080 or [::1]:8080, not "8080".'),
     (["--timeout", "soon"], '--timeout takes a number from 1 to 86400, not "soon".'),
     (["--seed", "-1"], '--seed takes a number from 0 to 18446744073709551615, not "-1".'),
     (["--time-scale", "fast"],
      '--time-scale takes a number from 0.001 to 1000000 or the word calls, not "fast".'),
+    (["--host-name", "lab:80"], "--host-name takes a name or address without a port, such as "
+     'lab-pc.example, not "lab:80".'),
+    (["--allow-origin", "null"], "--allow-origin takes SCHEME://HOST[:PORT], such as "
+     'http://localhost:3000, not "null".'),
     (["--tls-key", "key.pem"], "--tls-cert and --tls-key are given together or not at all."),
 ])
 def test_a_wrong_command_line_ends_with_status_2(refused_start, arguments, message):

@@ -41,8 +41,8 @@ def test_the_method_is_looked_at_before_the_entry(host):
 @pytest.mark.parametrize("method", ["post", "Post", "POSTS"])
 def test_the_letter_case_of_the_method_matters(host, method):
     with host.raw_socket() as connection:
-        connection.sendall(f"{method} /qitrmc/Call HTTP/1.1\r\nHost: x\r\nConnection: close\r\n"
-                           "Content-Length: 0\r\n\r\n".encode())
+        connection.sendall(f"{method} /qitrmc/Call HTTP/1.1\r\nHost: localhost\r\n"
+                           "Connection: close\r\nContent-Length: 0\r\n\r\n".encode())
         with connection.makefile("rb") as stream:
             answer = stream.read()
     assert answer.startswith(b"HTTP/1.1 404 ") and answer.endswith(b"\r\n\r\n" + NOT_POST), answer
@@ -88,7 +88,7 @@ def test_headers_change_nothing(host, header):
 
 def test_an_absent_body_is_an_empty_body(host):
     with host.raw_socket() as connection:
-        connection.sendall(b"POST /qitrmc/Call HTTP/1.1\r\nHost: x\r\nConnection: close\r\n"
+        connection.sendall(b"POST /qitrmc/Call HTTP/1.1\r\nHost: localhost\r\nConnection: close\r\n"
                            b"Content-Length: 0\r\n\r\n")
         with connection.makefile("rb") as stream:
             answer = stream.read()
@@ -118,14 +118,20 @@ def test_a_long_answer_arrives_whole(client):
 
 
 @pytest.fixture(scope="module")
-def secure_host(tmp_path_factory):
-    """A host that serves HTTPS with a certificate of its own making."""
+def certificate(tmp_path_factory):
+    """The options of a host that serves HTTPS with a certificate of its own making."""
     directory = tmp_path_factory.mktemp("tls")
     key, certificate = directory / "key.pem", directory / "certificate.pem"
     subprocess.run(["openssl", "req", "-x509", "-newkey", "rsa:2048", "-nodes", "-subj",
                     "/CN=localhost", "-days", "2", "-keyout", key, "-out", certificate],
                    check=True, capture_output=True)
-    with Host(options=("--tls-cert", certificate, "--tls-key", key)) as running:
+    return "--tls-cert", certificate, "--tls-key", key
+
+
+@pytest.fixture(scope="module")
+def secure_host(certificate):
+    """A host that shows the plug-in the real transport."""
+    with Host(options=(*certificate, "--pass-transport")) as running:
         yield running
 
 
@@ -134,3 +140,10 @@ def secure_host(tmp_path_factory):
 def test_the_secure_transport_is_refused_before_anything_else(secure_host, method, entry):
     status, _, body = secure_host.request(method, f"/qitrmc/{entry}", REQUEST)
     assert (status, body) == (404, NOT_HTTP)
+
+
+def test_a_host_with_tls_files_serves_and_not_only_refuses(certificate):
+    with Host(options=certificate) as host:
+        assert host.base_url.startswith("https://")
+        status, _, body = host.post(REQUEST)
+        assert (status, blanked(body)) == (200, UNKNOWN_METHOD)
