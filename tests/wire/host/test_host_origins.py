@@ -67,13 +67,16 @@ def test_a_page_of_another_site_is_refused_before_the_plugin(start_host, tmp_pat
 def test_a_page_of_another_site_set_a_voltage():
     with Host() as host, Client(host) as client:
         session = client.open_session({"devices": "Mod2"})
-        write = call("setProperty", {"session_id": session, "resources": "Mod2", "property":
-                                     "Dev.Name", "value": "Stolen"})
+        channel = {"session_id": session, "property": "PSU.Voltage",
+                   "physical_channels": "Mod2/ch0"}
+        read = call("getProperty", channel)
+        before = client.ask(read)
+        write = call("setProperty", {**channel, "value": 5})
         status, _, _ = host.post(write, headers={"Origin": "http://evil.example",
                                                  "Content-Type": "text/plain"})
-        assert status == 403
-        answer = client.ask(call("getProperty", {"session_id": session, "property": "Dev.Name"}))
-        assert b'"Mod2"' in answer
+        assert (status, client.ask(read)) == (403, before)
+        client.ask(write)
+        assert client.ask(read) != before
 
 
 def test_a_page_without_an_origin_of_its_own_is_foreign(host):
