@@ -4,6 +4,7 @@
 
 #include <cstring>
 #include <exception>
+#include <new>
 #include <utility>
 
 #include "host/Exchange.h"
@@ -29,9 +30,21 @@ const char* headerOf(MHD_Connection* connection, const char* name) {
     return MHD_lookup_connection_value(connection, MHD_HEADER_KIND, name);
 }
 
-MHD_Result takeHeader(void* source, MHD_ValueKind, const char* name, const char* value) {
-    static_cast<Source*>(source)->takeHeader(name, value == nullptr ? "" : value);
-    return MHD_YES;
+struct HeaderReader {
+    Source& source;
+    bool ranOutOfMemory = false;
+};
+
+// No exception may pass the HTTP library, which calls this.
+MHD_Result takeHeader(void* context, MHD_ValueKind, const char* name, const char* value) {
+    auto& reader = *static_cast<HeaderReader*>(context);
+    try {
+        reader.source.takeHeader(name, value == nullptr ? "" : value);
+        return MHD_YES;
+    } catch (const std::bad_alloc&) {
+        reader.ranOutOfMemory = true;
+        return MHD_NO;
+    }
 }
 
 // The address of this machine that the client has connected to; empty when it is unknown.
@@ -44,7 +57,10 @@ Source sourceOf(MHD_Connection* connection, const char* method) {
     Source source;
     source.method = method;
     source.localAddress = localAddressOf(connection);
-    MHD_get_connection_values(connection, MHD_HEADER_KIND, takeHeader, &source);
+    HeaderReader reader{source};
+    MHD_get_connection_values(connection, MHD_HEADER_KIND, takeHeader, &reader);
+    if (reader.ranOutOfMemory)
+        throw std::bad_alloc();
     return source;
 }
 
