@@ -27,10 +27,6 @@ def text_of(answer, status=403):
     return body.decode()
 
 
-def own_origin(host):
-    return host.base_url
-
-
 @pytest.mark.parametrize("options", [(), ("--allow-origin", ALLOWED, "--host-name", "lab-pc")])
 def test_a_client_without_an_origin_sees_no_difference(start_host, options):
     host = start_host(*options)
@@ -46,7 +42,7 @@ def test_a_client_without_an_origin_sees_no_difference(start_host, options):
 def test_a_client_without_a_host_is_served_unless_it_names_an_origin(host):
     head = "POST /qitrmc/Echo HTTP/1.0\nContent-Length: 3\n"
     assert raw_answer(host, head, b"abc").startswith(b"HTTP/1.1 200 OK\r\n")
-    assert raw_answer(host, head + f"Origin: {own_origin(host)}\n", b"abc").startswith(
+    assert raw_answer(host, head + f"Origin: {host.base_url}\n", b"abc").startswith(
         b"HTTP/1.1 403 Forbidden\r\n")
 
 
@@ -86,10 +82,10 @@ def test_a_page_without_an_origin_of_its_own_is_foreign(host):
 
 
 def test_the_hosts_own_origin_is_served(host):
-    status, headers, body = host.post(b"abc", "Echo", {"Origin": own_origin(host)})
+    status, headers, body = host.post(b"abc", "Echo", {"Origin": host.base_url})
     assert (status, body) == (200, b"abc")
     assert headers["Access-Control-Allow-Origin"] is None
-    upper = own_origin(host).upper()
+    upper = host.base_url.upper()
     assert host.post(b"abc", "Echo", {"Origin": upper})[0] == 200
 
 
@@ -165,9 +161,9 @@ def test_an_allowed_origin_is_served_and_may_read_every_answer(start_host):
                       "--max-body", "5")
     for origin in (ALLOWED, "http://localhost:3000"):
         for entry, body, expected in (("Echo", b"abc", 200), ("Echo", b"abcdef", 413),
-                                      ("a/b", b"", 404), ("Status", b"", None)):
+                                      ("a/b", b"", 404)):
             status, headers, _ = host.post(body, entry, {"Origin": origin})
-            assert expected in (status, None)
+            assert status == expected
             assert headers.get_all("Access-Control-Allow-Origin") == [origin]
             assert headers.get_all("Vary") == ["Origin"]
     assert host.post(b"", "Echo", {"Origin": "http://app.example"})[0] == 403
@@ -204,7 +200,7 @@ def test_the_preflight_of_another_origin_is_refused(start_host):
 
 def test_options_without_a_preflight_reach_the_plugin(start_host):
     host = start_host("--allow-origin", ALLOWED)
-    for headers in ({}, PREFLIGHT, {"Origin": ALLOWED}, {"Origin": own_origin(host), **PREFLIGHT}):
+    for headers in ({}, PREFLIGHT, {"Origin": ALLOWED}, {"Origin": host.base_url, **PREFLIGHT}):
         status, _, body = host.request("OPTIONS", "/qitrmc/Call", headers=headers)
         assert status == 200
         assert b"method OPTIONS\n" in body
@@ -219,7 +215,7 @@ def test_a_client_that_asks_first_is_spared_sending_a_body_from_another_site(hos
 
 def test_behind_https_the_hosts_own_origin_is_secure(start_host, certificate):
     host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1])
-    assert own_origin(host).startswith("https://")
-    assert host.post(b"abc", "Echo", {"Origin": own_origin(host)})[2] == b"abc"
-    plain = own_origin(host).replace("https:", "http:")
+    assert host.base_url.startswith("https://")
+    assert host.post(b"abc", "Echo", {"Origin": host.base_url})[2] == b"abc"
+    plain = host.base_url.replace("https:", "http:")
     assert host.post(b"abc", "Echo", {"Origin": plain})[0] == 403
