@@ -122,7 +122,7 @@ def test_debug_items_are_shown_when_asked_for():
 
 
 def test_the_script_that_serves_the_chassis_builds_the_tool_that_the_readme_names():
-    built = re.findall("^cmake --build --preset release --target (.*)$",
+    built = re.findall("^ *cmake --build --preset release --target (.*)$",
                        (ROOT / "scripts/run").read_text(), re.MULTILINE)
     assert any("qitrmc-explain" in targets.split() for targets in built)
     assert "build/release/bin/qitrmc-explain -" in (ROOT / "README.md").read_text()
