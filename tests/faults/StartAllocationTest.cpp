@@ -67,6 +67,20 @@ TEST_P(StartAllocationTest, EndsForWantOfMemoryAndCanBeRepeated) {
     RecordProperty("allocations", tried);
 }
 
+TEST_P(StartAllocationTest, IsSwitchedOnBeforeItHasAHandler) {
+    const std::string configuration = "/etc/qinstal/share/qitrmc.ini";
+    qitrmcFinalize();
+    root.write(configuration, "[WebService]\nEnable=0\n");
+    qitrmcInit();
+    ASSERT_EQ(post(open), disabled);
+    root.write(configuration, "[WebService]\nEnable=1\n");
+    // The configuration takes fewer allocations than this, the handler many more.
+    ASSERT_EQ(startWithFault(200), Start::outOfMemory);
+    EXPECT_EQ(outcomesOfPost(open), Outcomes{httpServerError});
+    qitrmcInit();
+    expectSoundService();
+}
+
 TEST_P(StartAllocationTest, LeavesTheRunningHandlerInPlaceWhenThereIsNoMemoryForANewOne) {
     EXPECT_EQ(outcomesOfPost(open), Outcomes{0});
     // The configuration takes fewer allocations than this, the handler many more.

@@ -46,6 +46,7 @@ extern "C" {
 int ReadRequestVariable_C_REST_QI_QVWS_(ws_Request* request, const char* name, char* buffer,
                                         uint32_t* size) {
     const FaultFree spared;
+    request->variableBufferSizes.push_back(*size);
     const auto found = request->variables.find(name);
     return found == request->variables.end() ? fail(size) : fill(found->second, buffer, size);
 }

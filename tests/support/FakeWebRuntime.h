@@ -18,6 +18,7 @@ struct ws_Request {
     bool bodyFailsForGood = false;
 
     std::vector<std::string> done;
+    std::vector<std::uint32_t> variableBufferSizes;
     std::vector<std::uint32_t> bodyBufferSizes;
 };
 

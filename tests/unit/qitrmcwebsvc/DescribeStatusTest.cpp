@@ -1,5 +1,6 @@
 #include "qitrmcwebsvc/describeStatus.h"
 
+#include <gmock/gmock.h>
 #include <gtest/gtest.h>
 
 #include <string>
@@ -8,6 +9,7 @@
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "support/FaultyAllocator.h"
 #include "support/TestRoot.h"
+#include "unit/qixlator/TestXlator.h"
 
 namespace {
 
@@ -57,6 +59,13 @@ TEST_F(DescribeStatusTest, DetailsAndNestedErrorsAreShownAndTheDebugSectionIsNot
                        "\"nested_error\":[{\"code\":-1,\"translator\":\"mxlator_qitrmc\","
                        "\"translator_info\":{\"ordered_data\":[{\"type\":\"usage\",\"usage\":"
                        "\"kUsageTypeLineNumber\",\"value\":7,\"value_type\":\"uint32_t\"}]}}]}"));
+}
+
+TEST_F(DescribeStatusTest, EveryTranslatorGetsEnglishAndTheSecondEnvironment) {
+    TestXlator xlator("watched");
+    xlator.descriptions[-1] = "Watched text.";
+    EXPECT_EQ("Watched text.", describe(-1, "{\"translator\":\"watched\"}"));
+    EXPECT_THAT(xlator.calls, testing::Contains("static -1 512"));
 }
 
 TEST_F(DescribeStatusTest, EachByteThatIsNoUtf8BecomesTheReplacementCharacter) {

@@ -112,6 +112,18 @@ TEST_F(PluginTest, AnswersAnEmptyBodyWithAnError) {
                             "kUsageTypeOffset=0\"}}"));
 }
 
+TEST_F(PluginTest, ReadsALongVariableWithABufferOfTheReportedSize) {
+    initialiseEnabled();
+    const std::vector<std::uint32_t> once = {32, 32};
+    request.variables["REQUEST_METHOD"] = std::string(32, 'x');
+    run();
+    EXPECT_EQ(request.variableBufferSizes, once);
+    request.variableBufferSizes.clear();
+    request.variables["REQUEST_METHOD"] = std::string(33, 'x');
+    run();
+    EXPECT_EQ(request.variableBufferSizes, (std::vector<std::uint32_t>{32, 32, 33}));
+}
+
 TEST_F(PluginTest, ReadsALongBodyWithABufferOfTheReportedSize) {
     initialiseEnabled();
     for (std::size_t length : {255, 256, 257, 5000}) {
@@ -189,6 +201,15 @@ TEST_F(PluginTest, AnswersAnErrorThatCannotBePutIntoWordsWithABareCode) {
     plainDescriptions::failNext(1);
     EXPECT_EQ(run(), Lines{"code 500"});
     EXPECT_EQ(run(), served(refusedRoot));
+}
+
+TEST_F(PluginTest, LetsAnExceptionThatIsNoStdExceptionReachTheServer) {
+    constexpr ws_EntryOperations throwing = {nullptr, nullptr, nullptr,
+                                             [](const ws_Entry*) -> ws_WideString { throw 5; }};
+    initialiseEnabled();
+    entry.operations = &throwing;
+    EXPECT_THROW(qitrmcRun(&entry, &request), int);
+    EXPECT_EQ(request.done, Lines{});
 }
 
 TEST_F(PluginTest, AnswersWithABareCodeWhenItHasNoHandlerAlthoughItIsSwitchedOn) {

@@ -2,8 +2,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <atomic>
+#include <condition_variable>
+#include <future>
 #include <memory>
+#include <mutex>
 #include <stdexcept>
 #include <vector>
 
@@ -12,6 +16,25 @@
 using nQITRMCWEBSVC100::ExclusiveAccess;
 using nQITRMCWEBSVC100::RequestAccessLock;
 using nQITRMCWEBSVC100::SharedAccess;
+
+// How many of the next waits end at once, without a notification, as any wait may. This program is
+// linked with --wrap for std::condition_variable::wait.
+static std::atomic<int> spuriousWakeUps{0};
+
+extern "C" {
+void __real__ZNSt18condition_variable4waitERSt11unique_lockISt5mutexE(
+    std::condition_variable* condition, std::unique_lock<std::mutex>* hold);
+void __wrap__ZNSt18condition_variable4waitERSt11unique_lockISt5mutexE(
+    std::condition_variable* condition, std::unique_lock<std::mutex>* hold);
+}
+
+void __wrap__ZNSt18condition_variable4waitERSt11unique_lockISt5mutexE(
+    std::condition_variable* condition, std::unique_lock<std::mutex>* hold) {
+    if (spuriousWakeUps > 0)
+        --spuriousWakeUps;
+    else
+        __real__ZNSt18condition_variable4waitERSt11unique_lockISt5mutexE(condition, hold);
+}
 
 namespace {
 
@@ -24,8 +47,7 @@ class Caller {
         : thread([this, &lock, mode] {
               mode == Shared ? lock.lockShared() : lock.lockExclusive();
               entered = true;
-              while (!leaving)
-                  ::sched_yield();
+              left.get_future().wait();
               mode == Shared ? lock.unlockShared() : lock.unlockExclusive();
           }) {}
     ~Caller() { leave(); }
@@ -35,15 +57,19 @@ class Caller {
         while (!entered)
             ::sched_yield();
     }
+    // Holding the lock is waiting too.
     bool waitUntilBlocked() const { return thread.waitUntilBlocked(); }
     void leave() {
+        if (!leaving)
+            left.set_value();
         leaving = true;
         thread.join();
     }
 
   private:
     std::atomic<bool> entered{false};
-    std::atomic<bool> leaving{false};
+    bool leaving = false;
+    std::promise<void> left;
     ObservedThread thread;
 };
 
@@ -120,6 +146,41 @@ TEST(RequestAccessLock, KeepsTwoBatchesApartWhenNoSharedHolderLeaves) {
     EXPECT_FALSE(second.isIn());
     first.leave();
     second.waitUntilIn();
+}
+
+TEST(RequestAccessLock, TestsAgainAfterASharedCallerWokeWithoutBeingNotified) {
+    RequestAccessLock lock;
+    Caller batch(lock, Caller::Exclusive);
+    batch.waitUntilIn();
+    spuriousWakeUps = 3;
+    Caller reader(lock, Caller::Shared);
+    ASSERT_TRUE(reader.waitUntilBlocked());
+    EXPECT_EQ(spuriousWakeUps.exchange(0), 0);
+    EXPECT_FALSE(reader.isIn());
+    batch.leave();
+    reader.waitUntilIn();
+}
+
+TEST(RequestAccessLock, WakesOneWaitingBatchAtATime) {
+    RequestAccessLock lock;
+    Caller running(lock, Caller::Exclusive);
+    running.waitUntilIn();
+    std::vector<std::unique_ptr<Caller>> waiting;
+    for (int i = 0; i < 3; ++i) {
+        waiting.push_back(std::make_unique<Caller>(lock, Caller::Exclusive));
+        ASSERT_TRUE(waiting.back()->waitUntilBlocked());
+    }
+    running.leave();
+    for (; !waiting.empty(); waiting.erase(waiting.begin())) {
+        const auto isIn = [](const std::unique_ptr<Caller>& caller) { return caller->isIn(); };
+        while (std::none_of(waiting.begin(), waiting.end(), isIn))
+            ::sched_yield();
+        for (const auto& caller : waiting)
+            ASSERT_TRUE(caller->waitUntilBlocked());
+        ASSERT_EQ(std::count_if(waiting.begin(), waiting.end(), isIn), 1);
+        std::iter_swap(waiting.begin(), std::find_if(waiting.begin(), waiting.end(), isIn));
+        waiting.front()->leave();
+    }
 }
 
 TEST(RequestAccessLock, WakesSharedCallersOnlyWhenNoExclusiveCallerIsLeft) {

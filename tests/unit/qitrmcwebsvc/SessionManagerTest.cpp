@@ -1,11 +1,14 @@
 #include "qitrmcwebsvc/SessionManager.h"
 
+#include <functional>
+#include <future>
 #include <memory>
 #include <new>
 #include <string>
 
 #include "support/DriverTest.h"
 #include "support/Failures.h"
+#include "support/ObservedThread.h"
 
 using namespace nQITRMCWEBSVC100;
 
@@ -265,6 +268,38 @@ TEST_F(SessionManagerTest, ComparesChannelsAndAreasByTheirDevice) {
     manager->createSession(ResourceKind::NvmemArea, {"Mod1"}, 3, "", 0, true);
 }
 
+TEST_F(SessionManagerTest, ComparesNamesOfDevicesWhole) {
+    openOnDevices(1, {"Rack"});
+    holds(1, {"Rack"});
+    openOnDevices(2, {"Rack/Mod1"});
+    holds(2, {"Rack/Mod1"});
+    openOnDevices(3, {"Rack/Mod1"}, 3, true);
+    EXPECT_EQ(failureOf([&] { manager->getSessionContext("_session1"); }), "nothing");
+    EXPECT_EQ(failureOf([&] { manager->getSessionContext("_session2"); }),
+              "BasicError: -250833 kUsageTypeSessionId=_session2");
+}
+
+TEST_F(SessionManagerTest, DisplacesByForceASessionThatReleasedOnlyPartOfWhatItHolds) {
+    openOnDevices(1, {"Mod1", "Mod2"});
+    manager->unreserveDevices("_session1", {"Mod2"});
+    ASSERT_EQ(manager->getSessionContext("_session1")->access, 0);
+    holds(1, {"Mod1"});
+    openOnDevices(2, {"Mod1"}, 3, true);
+    EXPECT_EQ(failureOf([&] { manager->getSessionContext("_session1"); }),
+              "BasicError: -250833 kUsageTypeSessionId=_session1");
+}
+
+TEST_F(SessionManagerTest, KeepsTheKindOfASessionOnChannelsWhenItReservesDevices) {
+    driver.give("initializeSessionWithPhysChans", std::uint64_t{1});
+    manager->createSession(ResourceKind::PhysicalChannel, {"Mod1/ch0"}, 3, "", 0, false);
+    manager->reserveDevices("_session1", {"Mod2"}, 1, "", 0);
+    EXPECT_EQ(manager->getSessionContext("_session1")->defaultResourceKind,
+              ResourceKind::PhysicalChannel);
+    manager->unreserveDevices("_session1", {"Mod2"});
+    EXPECT_EQ(manager->getSessionContext("_session1")->defaultResourceKind,
+              ResourceKind::PhysicalChannel);
+}
+
 TEST_F(SessionManagerTest, ReservesDevicesAndRemembersTheAccess) {
     openBare(1);
     driver.takeCalls();
@@ -332,6 +367,59 @@ TEST_F(SessionManagerTest, KeepsTheOldEntryOfAHandleThatIsIssuedAgain) {
     openOnDevices(1, {"Mod1"}, 1);
     EXPECT_EQ(openBare(1), "_session1");
     EXPECT_EQ(manager->getSessionContext("_session1")->access, 1);
+}
+
+// ---- One operation at a time --------------------------------------------------------------------
+
+class SessionTableTest : public SessionManagerTest {
+  protected:
+    using Work = std::function<void()>;
+
+    void SetUp() override {
+        SessionManagerTest::SetUp();
+        openOnDevices(1, {"Mod1"});
+        openOnDevices(2, {"Mod2"});
+    }
+
+    // Whether a look-up of another session waits while `work` is inside this driver call.
+    bool holdsLookUpsUp(const std::string& driverCall, const Work& work) {
+        std::promise<void> inside, leave;
+        driver.reply(driverCall, {std::uint64_t{3}, 0, {}, [&] {
+                                      inside.set_value();
+                                      leave.get_future().wait();
+                                  }});
+        ObservedThread holder(work);
+        inside.get_future().wait();
+        ObservedThread other([&] { manager->getSessionContext("_session2"); });
+        const bool heldUp = other.waitUntilBlocked();
+        leave.set_value();
+        return heldUp;
+    }
+};
+
+TEST_F(SessionTableTest, ALookUpWaitsForAnOpening) {
+    EXPECT_TRUE(
+        holdsLookUpsUp("initializeSessionWithoutResources", [&] { manager->createSession(); }));
+}
+
+TEST_F(SessionTableTest, ALookUpWaitsForAnOpeningOnResources) {
+    EXPECT_TRUE(holdsLookUpsUp("initializeSessionWithDevices", [&] {
+        manager->createSession(ResourceKind::Device, {"Mod3"}, 3, "", 0, false);
+    }));
+}
+
+TEST_F(SessionTableTest, ALookUpWaitsForAClose) {
+    EXPECT_TRUE(holdsLookUpsUp("closeSession(1)", [&] { manager->closeSession("_session1"); }));
+}
+
+TEST_F(SessionTableTest, ALookUpWaitsForAReservation) {
+    EXPECT_TRUE(holdsLookUpsUp("reserveDevices",
+                               [&] { manager->reserveDevices("_session1", {"Mod3"}, 3, "", 0); }));
+}
+
+TEST_F(SessionTableTest, ALookUpWaitsForARelease) {
+    EXPECT_TRUE(holdsLookUpsUp("unreserveDevices",
+                               [&] { manager->unreserveDevices("_session1", {"Mod1"}); }));
 }
 
 }  // namespace

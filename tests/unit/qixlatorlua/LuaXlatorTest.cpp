@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <lua.hpp>
 #include <string>
 
 #include "ScriptHost.h"
@@ -196,6 +197,25 @@ TEST_P(LuaXlatorTest, ManyFailuresDoNotExhaustTheState) {
     }
     EXPECT_EQ("good", ScriptHost::taken(
                           xlator->getStaticDesc(xlator, 0, 0, qixlator_realloc, nullptr, &status)));
+    xlator->destroy(xlator);
+}
+
+TEST_P(LuaXlatorTest, AFailedCallLeavesTheStackAsItWas) {
+    host.write("chunk",
+               "local function fail() error('oops') end\n"
+               "return { getStaticDesc = fail, getDynamicDesc = fail }");
+    XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
+    ASSERT_NE(nullptr, xlator);
+    lua_State* L = static_cast<qixlatorlua::LuaXlator*>(xlator)->L;
+    const int before = lua_gettop(L);
+    qierr::Status ofStatic;
+    xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &ofStatic);
+    EXPECT_EQ(-52003, ofStatic.code);
+    EXPECT_EQ(before, lua_gettop(L));
+    qierr::Status ofDynamic;
+    xlator->getDynamicDesc(xlator, "{}", 0, "json1", qixlator_realloc, nullptr, &ofDynamic);
+    EXPECT_EQ(-52003, ofDynamic.code);
+    EXPECT_EQ(before, lua_gettop(L));
     xlator->destroy(xlator);
 }
 

@@ -272,6 +272,33 @@ TEST_F(ChassisTest, TheDeviceGoesToTheDriverAsTheClientWroteIt) {
               "getDevicePropertyString(7, \"bench\", \"Dev.TCPIP.Hostname\")");
 }
 
+// A path name loses the zeros in front of its number where the driver takes a list of names.
+class ChassisWithAPathTest : public ChassisTest {
+  protected:
+    void SetUp() override {
+        ChassisTest::SetUp();
+        give("getSystemPropertyStringArray(7, \"Sys.Devices\")", Texts{"Rack/Bench3"});
+        give("getGenericPropertyInt32(7, \"Rack/Bench3\", \"Dev.ProductCategory\")",
+             std::int64_t{1});
+    }
+};
+
+TEST_F(ChassisWithAPathTest, TheDeviceGoesToTheDriverWithTheZerosThatTheClientWrote) {
+    give("getDevicePropertyString(7, \"Rack/Bench03\", \"Dev.TCPIP.EthernetIP\")",
+         std::string("192.0.2.7"));
+    give("getDevicePropertyString(7, \"Rack/Bench03\", \"Dev.TCPIP.Hostname\")",
+         std::string("bench"));
+    EXPECT_EQ(ask("GetChassisIpOrHostname", R"("device":"Rack/Bench03")"),
+              R"({"chassis_ip":"192.0.2.7","chassis_hostname":"bench"})");
+}
+
+TEST_F(ChassisWithAPathTest, TheChassisIsRenamedUnderTheNameThatTheClientWrote) {
+    EXPECT_EQ(ask("renameChassisAndAllConnectedModules",
+                  R"("old_chassis_name":"Rack/Bench03","new_chassis_name":"B")"),
+              R"({"new_module_names":[],"new_chassis_name":"B"})");
+    EXPECT_EQ(renames(), Calls{"renameDevice(7, \"Rack/Bench03\", \"B\")"});
+}
+
 TEST_F(ChassisTest, AnIdentityThatCannotBeReadIsTheFailure) {
     give("getDevicePropertyString", std::string("x"));
     fail("getDevicePropertyString(7, \"Bench\", \"Dev.TCPIP.Hostname\")", -250999);
