@@ -10,9 +10,11 @@ import random
 import sys
 from pathlib import Path
 
-UNIT_TESTS = Path(__file__).resolve().parents[1] / "unit"
+TESTS = Path(__file__).resolve().parents[1]
 CHASSIS = Path(__file__).resolve().parents[2] / "simulator" / "chassis"
-sys.path[:0] = [str(UNIT_TESTS / "embedded"), str(UNIT_TESTS / "qitrmcwebsvc")]
+sys.path[:0] = [str(TESTS / "support"), str(TESTS / "unit" / "embedded"),
+                str(TESTS / "unit" / "qitrmcwebsvc")]
+import methods  # noqa: E402
 from parameter_model import INLINE, METHODS  # noqa: E402
 from test_random_requests import random_params, request_text  # noqa: E402
 
@@ -20,9 +22,16 @@ REQUESTS_PER_METHOD = 12
 ENVELOPE = ["jsonrpc", "id", "method", "params", "2.0", "_session1", "$ConnectedDevices"]
 
 
+def documented(method) -> str:
+    """The request of the method's page, which a fresh service carries out in its first session."""
+    params = methods.request(method.name).params_in("_session1")
+    return request_text(method, list(params.items()))
+
+
 def requests_of(method, source: random.Random) -> list[str]:
     return [
-        request_text(method, random_params(method, source)) for _ in range(REQUESTS_PER_METHOD)
+        documented(method),
+        *(request_text(method, random_params(method, source)) for _ in range(REQUESTS_PER_METHOD)),
     ]
 
 

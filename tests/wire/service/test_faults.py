@@ -1,101 +1,128 @@
 """The service over a driver that misbehaves on demand."""
 
-import itertools
 import json
 import os
 import re
 
 import pytest
 
+import methods
 from hostlib import ROOT, clean_host
 from jsonrpc import Client, batch, call
+from methods import request
 
-HEADER = (ROOT / "include" / "qitrmcapi.h").read_text(encoding="utf-8")
-FUNCTIONS = re.findall(r"nQITRMCAPI100_(\w+)\([^;]*qierr_Status\* status\)",
-                       re.sub(r"/\*.*?\*/", "", HEADER, flags=re.DOTALL))
+HEADER = re.sub(r"/\*.*?\*/", "", (ROOT / "include" / "qitrmcapi.h").read_text(encoding="utf-8"),
+                flags=re.DOTALL)
+PARAMETERS = dict(re.findall(r"nQITRMCAPI100_(\w+)\(([^;]*)qierr_Status\* status\)", HEADER))
 
-NESTED = {"code": -9, "causes": [{"code": -8, "details": [{"header": "kA"}]}]}
-KINDS = {
-    "failure": {"status": {"code": -77777}},
-    "failure_of_its_own": {"status": {"code": -250811}, "moment": "after"},
-    "nested": {"status": {"code": -250988, "causes": [NESTED, NESTED]}},
-    "no_json": {"status": {"code": -250811, "json": "{\"translator\":[\"\\u0001"}},
-    "warning": {"status": {"code": 77777, "json": "]["}},
-    "null": {"output": {"null": True}},
-    "null_with_count": {"output": {"null": True, "count": 4294967295}},
-    "null_items": {"output": {"null_items": True}},
-    "huge_text": {"output": {"text_size": 200000}},
-    "many": {"output": {"count": 500}},
-    "many_null_items": {"output": {"count": 500, "null_items": True}},
-    "none": {"output": {"count": 0}},
+FUNCTIONS = list(PARAMETERS)
+# Functions that no method calls, with the reason.
+UNREACHED = {
+    "getSystemPropertyUInt64": "the one such property, Sys.ConfigChangeCount, is hidden from clients",
 }
 
-DEVICE = {"device": "Mod1"}
-DEVICES = {"devices": "Mod1"}
-TYPED = {"DMM.InputsInUse": [True], "DMM.Readings": [0.5], "DMM.Trims": [1],
-         "DMM.Timestamps": [1], "DMM.Labels": ["a"], "DMM.Histogram": [1], "DMM.Totals": [1],
-         "Dev.Comment": "x", "Dev.Temperature": 1.5, "Dev.ProductNum": 7,
-         "DMM.TriggerCount": 1, "Dev.ProductCategory": 1}
+# A close that fails after the driver has ended the session leaves the service with a dead session,
+# which it goes on to ask what it holds.
+SESSION_ENDED = -250955
+
+NESTED = {"code": -9, "causes": [{"code": -8, "details": [{"header": "kA"}]}]}
 
 
-def requests_of(session):
+class Fault:
+    """members: of the faults file. trace: a pattern of what the trace shows of a call that it
+    struck. strikes: a pattern of the parameters of the functions that it can strike."""
+
+    def __init__(self, members, trace, strikes=""):
+        self.members = members
+        self.trace = trace
+        self.strikes = strikes
+
+
+TEXT, TEXTS, ARRAY = r"char\*\* ", r"char\*\*\* ", r"\*\* array"
+KINDS = {
+    "failure": Fault({"status": {"code": -77777}}, r"-> -77777 "),
+    "failure_of_its_own": Fault({"status": {"code": -250811}, "moment": "after"}, r"-> -250811 "),
+    "nested": Fault({"status": {"code": -250988, "causes": [NESTED, NESTED]}}, r"-> -250988 "),
+    "no_json": Fault({"status": {"code": -250811, "json": "{\"translator\":[\"\\u0001"}},
+                     r'-> -250811 \{"translator":\["\\u0001 '),
+    "warning": Fault({"status": {"code": 77777, "json": "]["}}, r"-> 77777 \]\["),
+    "null": Fault({"output": {"null": True}}, r"-> \d+ \w+=null", rf"{TEXT}|{ARRAY}"),
+    "null_with_count": Fault({"output": {"null": True, "count": 4294967295}}, r"-> \d+ array=null",
+                             ARRAY),
+    "null_items": Fault({"output": {"null_items": True}}, r"-> \d+ array=\[null", TEXTS),
+    "huge_text": Fault({"output": {"text_size": 200000}}, r"-> \d+ .*\(200000 bytes\)",
+                       rf"{TEXT}|{TEXTS}"),
+    "many": Fault({"output": {"count": 500}}, r"-> \d+ array=\[.*,\.\.\.\(500\)\]", ARRAY),
+    "many_null_items": Fault({"output": {"count": 500, "null_items": True}},
+                             r"-> \d+ array=\[null,.*,\.\.\.\(500\)\]", TEXTS),
+    "none": Fault({"output": {"count": 0}}, r"-> \d+ array=(null|\[\]) ", ARRAY),
+}
+CASES = [(function, kind) for function, parameters in PARAMETERS.items()
+         if function not in UNREACHED
+         for kind, fault in KINDS.items() if re.search(fault.strikes, parameters)]
+
+# The built-in chassis, in which Mod1 has a property of each type that can be written.
+VALUES = {"Bool": True, "Double": 0.5, "Int32": -1, "Int64": -1, "String": "a", "UInt32": 1,
+          "UInt64": 1}
+TYPED = {f"Any.{name}": {"type": name, "value": value, "access": "ReadWrite"}
+         for one, item in VALUES.items() for name, value in ((one, item), (f"{one}Array", [item]))}
+CHASSIS = json.loads((ROOT / "simulator" / "chassis" / "bench.json").read_text(encoding="utf-8"))
+CHASSIS["devices"][0]["modules"][0]["properties"] |= TYPED
+# Those of the system and of the session that have functions of their own.
+SCOPED = {"Sys.Devices": ["A"], "Sys.DiscoveryEnabled": True, "Sys.DiscoveryInterval": 10.0,
+          "Session.Timeout": 5.0, "Session.DefaultDevices": ["Mod1"]}
+
+
+def requests():
     """Requests that lead into every function of the driver that the service calls."""
-    yield "initializeSession", None
-    for kind, names in (("devices", "Mod5"), ("physical_channels", "Mod2/ch0"),
-                        ("nvmem_areas", "Mod2/user")):
-        yield "initializeSession", {kind: names}
-        yield "initializeSession", {kind: names, "force_reserve": True}
-    inside = [("getSessionPropertyList", {}), ("getDevicePropertyList", DEVICE),
-              ("getDevicePropertyList", {"nvmem_area": "Mod1/user"}),
-              ("getCommandList", DEVICE), ("getCommandInformation", {**DEVICE, "command": "DMM.Zero"}),
-              ("getCommandInformation", {**DEVICE, "command": "DMM.Trigger"}),
-              ("executeCommand", {**DEVICES, "command": "DMM.Trigger"}),
-              ("getModuleName", {"chassis": "Bench", "slot": 1}),
-              ("getModuleName", {"device": "Bench", "slot": 1}),
-              ("GetChassisIpOrHostname", {"device": "Bench"}), ("GetChassisIpOrHostname", {}),
-              ("renameDevice", {**DEVICE, "new_name": "Mod1"}),
-              ("renameChassisAndAllConnectedModules", {"device": "Bench", "new_name": "Bench"}),
-              ("getNvmemBytes", {"nvmem_area": "Mod1/user", "address": 0, "size": 4}),
-              ("setNvmemBytes", {"nvmem_area": "Mod1/user", "address": 0, "data": [1]}),
-              ("commitNvmemAreas", {"nvmem_areas": "Mod1/user"}), ("commitProperties", DEVICES)]
-    for method in ("connectToDevices", "disconnectFromDevices", "reserveDevices", "resetDevices",
-                   "unreserveDevices"):
-        inside.append((method, DEVICES))
+    for method in methods.NAMES:
+        yield request(method)
+    yield request("initializeSession", without=["devices"])
+    yield request("initializeSession", opened_on={"devices": "Mod1"}, devices="Mod1",
+                  force_reserve=True)
+    yield request("initializeSession", physical_channels="Mod2/ch0")
+    yield request("initializeSession", nvmem_areas="Mod2/user")
     for size in (8, 16, 32, 64):
-        inside.append(("readRegister", {**DEVICE, "address": 256, "size": size}))
-        inside.append(("writeRegister", {**DEVICE, "address": 256, "size": size, "data": 1}))
-    for name, value in TYPED.items():
-        inside.append(("getProperty", {**DEVICES, "property": name}))
-        inside.append(("setProperty", {**DEVICES, "property": name, "value": value}))
-        inside.append(("getPropertyInformation", {**DEVICE, "property": name}))
-    inside.append(("getPropertyInformation", {"physical_channel": "Mod1/ch0",
-                                              "property": "DMM.Coupling"}))
-    for name, value in (("Sys.Devices", ["A"]), ("Session.DefaultDevices", ["Mod1"])):
-        inside.append(("getProperty", {"property": name}))
-        inside.append(("setProperty", {"property": name, "value": value}))
-    inside.append(("getProperty", {"devices": "$DefaultDevices", "property": "Dev.Comment"}))
-    inside.append(("abortSession", {}))
-    for method, params in inside:
-        yield method, {"session_id": session, **params}
+        yield request("readRegister", address=256, size=size)
+        yield request("writeRegister", address=256, size=size, data=1)
+    for name, about in TYPED.items():
+        yield request("getProperty", property=name, devices="Mod1")
+        yield request("setProperty", property=name, devices="Mod1", value=about["value"])
+        yield request("getPropertyInformation", property=name, device="Mod1")
+    yield request("getPropertyInformation", property="DMM.Range", device="Mod1")
+    for name, value in SCOPED.items():
+        yield request("getProperty", property=name, without=["devices"])
+        yield request("setProperty", property=name, without=["physical_channels"], value=value)
+    yield request("getDevicePropertyList", nvmem_area="Mod1/user")
+    yield request("commitNvmemAreas", devices="Mod1")
+    yield request("getModuleName", opened_on={"devices": "Bench"}, without=["device"])
 
 
 class FaultyHost:
-    """A host whose faults are replaced while it runs."""
+    """A host whose faults are replaced while it runs, and whose calls of the driver are traced."""
 
     def __init__(self, host):
         self.host = host
         self.path = host.directory / "faults.json"
+        self.trace = open(host.directory / "trace", encoding="utf-8", errors="replace")
 
     def put(self, description):
         fresh = self.path.with_suffix(".new")
         fresh.write_text(json.dumps(description))
         os.replace(fresh, self.path)
 
+    def calls(self):
+        """The lines of the trace since this was last called, from the name of the function on."""
+        return [line.split(" ", 2)[2] for line in self.trace.read().splitlines()]
+
 
 @pytest.fixture(scope="module")
 def faulty():
-    with clean_host(("--faults", "faults.json")) as running:
-        yield FaultyHost(running)
+    with clean_host(("--faults", "faults.json", "--trace", "trace", "--chassis", "chassis.json"),
+                    {"chassis.json": json.dumps(CHASSIS).encode()}) as running:
+        host = FaultyHost(running)
+        yield host
+        host.trace.close()
 
 
 @pytest.fixture
@@ -113,25 +140,79 @@ def expect_answer(body, id):
     return answer
 
 
-@pytest.mark.parametrize("function", FUNCTIONS)
-def test_every_fault_of_every_function_is_answered(faulty, client, function):
-    session = client.open_session()
-    for kind, members in KINDS.items():
-        if "output" in members and not function.startswith("get"):
-            continue
-        faulty.put({"faults": [{"function": function, **members}]})
-        requests = list(requests_of(session))
-        opened = []
-        for id, (method, params) in zip(itertools.count(1), requests):
-            client.send(call(method, params, str(id)))
-            answer = expect_answer(client.receive_whole(), id)
-            opened.append(answer.get("result", {}).get("session_id"))
-        faulty.put({})
-        for id in filter(None, opened):
-            client.ask(call("closeSession", {"session_id": id}))
-        assert b'"result":{' in client.ask(
-            call("getProperty", {"session_id": session, **DEVICES, "property": "Dev.Comment"})), kind
-    client.ask(call("closeSession", {"session_id": session}))
+def ask(client, method, params):
+    return expect_answer(client.ask_whole(call(method, params)), 1)
+
+
+def expect_result(client, method, params):
+    answer = ask(client, method, params)
+    assert "result" in answer, (method, params, answer)
+    return answer["result"]
+
+
+def devices(client, session):
+    return expect_result(client, "getProperty",
+                         {"session_id": session, "property": "Sys.Devices"})["value"]
+
+
+def restore_names(client, names):
+    """Gives the devices these names back, in their order."""
+    with client.session() as session:
+        for new, old in zip(names, devices(client, session)):
+            if new != old:
+                expect_result(client, "renameDevice",
+                              {"session_id": session, "device": old, "new_device_name": new})
+
+
+NAMES = ["Bench", "Mod1", "Mod2", "Mod4", "Mod5"]
+
+
+def calls_behind(faulty, client, wanted, fault):
+    """The calls of the driver behind a request that meets a fault. What goes before it meets none,
+    and afterwards all is as it was."""
+    session = wanted.prepare(lambda *step: expect_result(client, *step))
+    faulty.put(fault)
+    faulty.calls()
+    answer = ask(client, wanted.method, wanted.params_in(session))
+    calls = faulty.calls()
+    faulty.put({})
+    for opened in filter(None, (session, answer.get("result", {}).get("session_id"))):
+        ask(client, "closeSession", {"session_id": opened})
+    if wanted.method.startswith("rename"):
+        restore_names(client, NAMES)
+    return calls
+
+
+@pytest.fixture(scope="module")
+def leading_to(faulty):
+    """For each function of the driver, the requests that lead to a call of it."""
+    requests_of = {}
+    with Client(faulty.host) as client:
+        for wanted in requests():
+            calls = calls_behind(faulty, client, wanted, {})
+            for function in {line.split("(")[0] for line in calls}:
+                requests_of.setdefault(function, []).append(wanted)
+    return requests_of
+
+
+def test_the_requests_lead_to_every_function_but_those_that_no_method_calls(leading_to):
+    assert [name for name in FUNCTIONS if name not in leading_to] == list(UNREACHED)
+
+
+@pytest.mark.parametrize("function, kind", CASES)
+def test_every_fault_of_every_function_strikes_and_is_answered(faulty, client, leading_to, function,
+                                                               kind):
+    fault = KINDS[kind]
+    calls = [line for wanted in leading_to[function]
+             for line in calls_behind(faulty, client, wanted,
+                                      {"faults": [{"function": function, **fault.members}]})
+             if line.startswith(f"{function}(") and f" -> {SESSION_ENDED} " not in line]
+    struck = [line for line in calls if re.search(fault.trace, line)]
+    assert struck
+    # Arrays without elements have no texts that could be replaced.
+    assert struck == calls or kind in ("null_items", "huge_text", "many_null_items")
+    with client.session() as session:
+        assert devices(client, session) == NAMES
 
 
 def code_of(body):

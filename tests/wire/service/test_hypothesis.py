@@ -6,6 +6,7 @@ import pytest
 from hypothesis import HealthCheck, given, settings
 from hypothesis import strategies as st
 
+import methods
 from jsonrpc import STANDING_CODES, call
 
 SETTINGS = settings(max_examples=200, deadline=None, database=None, derandomize=True,
@@ -18,8 +19,7 @@ SCALARS = st.none() | st.booleans() | NUMBERS | st.text(max_size=20)
 VALUES = st.recursive(SCALARS, lambda inner: st.lists(inner, max_size=5) |
                       st.dictionaries(st.text(max_size=10), inner, max_size=5), max_leaves=20)
 
-METHODS = st.sampled_from(["initializeSession", "closeSession", "abortSession", "getProperty",
-                           "setProperty", "reserveDevices", "readRegister", "setNvmemBytes", "x", ""])
+METHODS = st.sampled_from([*methods.NAMES, "x", ""])
 NAMES = st.sampled_from(["", "Mod1", "mod2", "Mod1,Mod4", "Mod1/ch0:2", "Mod4/ch4:1", "Mod1/user",
                          "Bench", "$DefaultDevices", "Mod1/ch", ":", "/"]) | st.text(max_size=8)
 PARAMS = st.fixed_dictionaries({}, optional={
@@ -148,10 +148,9 @@ def test_a_batch_stops_at_its_first_failure(client, requests):
         assert response["error"]["data"]["qitrmc_code"] == -32001
 
 
-SOUND = [call("initializeSession", '{"devices":"Mod1","access":"ReadOnly","reservation_timeout":0.0}'),
-         call("closeSession", '{"session_id":"_session1"}', '"é"'),
-         call("setProperty", '{"session_id":"_session1","property":"p","value":[1,-2.5e3,null]}'),
-         b"[" + call("abortSession", '{"session_id":"_session1"}') + b"," + call("x") + b"]"]
+SOUND = {name: call(name, methods.request(name).params_in("_session1"), '"é"')
+         for name in methods.NAMES}
+SOUND["batch"] = b"[" + SOUND["abortSession"] + b"," + call("x") + b"]"
 
 MUTATIONS = st.lists(st.tuples(st.floats(0, 1), st.sampled_from(["change", "insert", "delete",
                                                                   "repeat"]),
@@ -172,7 +171,7 @@ def mutate(body, mutations):
     return body
 
 
-@pytest.mark.parametrize("sound", SOUND, ids=["initialize", "close", "set", "batch"])
+@pytest.mark.parametrize("sound", SOUND.values(), ids=SOUND)
 @SETTINGS
 @given(mutations=MUTATIONS)
 def test_a_mutated_request_gets_one_response(client, sound, mutations):
