@@ -111,6 +111,23 @@ TEST(BrokenChassisTest, NamesThatClientsCannotWriteAreRefused) {
                     "...\", which is not a name; a name has at most 64 bytes");
 }
 
+TEST(BrokenChassisTest, ALongTextIsCutBetweenCharactersAndNotInsideOne) {
+    const auto expectShown = [](const std::string& shown, const std::string& rest) {
+        expectFault(
+            "{\"devices\":[{\"name\":\"" + shown + rest + "\",\"category\":1}]}", "/devices/0/name",
+            "is the text \"" + shown + "...\", which is not a name; a name has at most 64 bytes");
+    };
+    const std::string rest(30, 'y');
+    // Characters of two, three and four bytes: across byte 40, and up to it.
+    for (const std::string character : {"\xC3\xA9", "\xE2\x82\xAC", "\xF0\x9F\x98\x80"}) {
+        for (size_t inside = 1; inside < character.size(); ++inside) {
+            expectShown(std::string(40 - inside, 'x'), character + rest);
+        }
+        expectShown(std::string(40 - character.size(), 'x') + character, rest);
+        expectShown(std::string(40, 'x'), character + rest);
+    }
+}
+
 TEST(BrokenChassisTest, NamesThatDifferInLetterCaseAloneAreRefused) {
     expectFault("{\"devices\":[{\"name\":\"A\",\"category\":2},{\"name\":\"a\",\"category\":2}]}",
                 "/devices/1/name",

@@ -2,6 +2,7 @@
 
 import json
 import os
+import select
 import subprocess
 from pathlib import Path
 
@@ -10,25 +11,36 @@ BUILD = Path(os.environ.get("QITRMC_BUILD_DIR", REPOSITORY / "build" / "dev"))
 CHASSIS = REPOSITORY / "simulator" / "chassis"
 
 
+# Far more than a description takes: it only ends a loader that would never end.
+PATIENCE_SECONDS = 30
+
+
 class LoadProbe:
     """Answers whether descriptions load.
 
         with LoadProbe() as probe:
             assert probe.load('{"devices": []}') is None
             assert probe.load("{}") == ("/devices", "is missing; must be an array of devices")
+
+    A loader that does not come to an end is killed, and its description fails the test.
     """
 
-    def __init__(self):
-        self.process = subprocess.Popen([BUILD / "bin" / "simulator_load_probe"],
-                                        stdin=subprocess.PIPE, stdout=subprocess.PIPE)
+    def __init__(self, command=(BUILD / "bin" / "simulator_load_probe",),
+                 patience=PATIENCE_SECONDS):
+        self.patience = patience
+        self.process = subprocess.Popen(command, stdin=subprocess.PIPE, stdout=subprocess.PIPE)
 
     def __enter__(self):
         return self
 
     def __exit__(self, *_):
-        self.process.stdin.close()
-        self.process.stdout.close()
-        assert self.process.wait(60) == 0
+        try:
+            self.process.communicate(timeout=self.patience)
+        except subprocess.TimeoutExpired:
+            self.process.kill()
+            self.process.communicate()
+            raise AssertionError("the loader did not end") from None
+        assert self.process.returncode == 0
 
     def load(self, description):
         """None when a description (bytes, text, or a value to be written as JSON) loads, else the
@@ -39,8 +51,15 @@ class LoadProbe:
             description = description.encode()
         self.process.stdin.write(b"%d\n%b" % (len(description), description))
         self.process.stdin.flush()
-        answer = self.process.stdout.readline().decode(errors="replace").rstrip("\n")
+        answer = self._read_line()
         if answer == "loaded":
             return None
         pointer, words = answer.split("\t", 1)
         return pointer, words
+
+    def _read_line(self):
+        ready, _, _ = select.select([self.process.stdout], [], [], self.patience)
+        if not ready:
+            self.process.kill()
+            raise AssertionError(f"the loader took more than {self.patience} s")
+        return self.process.stdout.readline().decode().rstrip("\n")
