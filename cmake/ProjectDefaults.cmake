@@ -22,6 +22,10 @@ if(QITRMC_CCACHE)
   set(CMAKE_CXX_COMPILER_LAUNCHER "${QITRMC_CCACHE}")
 endif()
 
+# On a 32-bit target readdir and stat fail for a file whose inode number or place in its directory
+# has 64 bits, unless files and times are counted in 64 bits everywhere.
+add_compile_definitions(_FILE_OFFSET_BITS=64 _TIME_BITS=64)
+
 add_compile_options(-Wall -Wextra -Werror)
 # The control program runs from debug-free paths: file names in error reports are relative to the
 # project, the same on every machine that builds it.

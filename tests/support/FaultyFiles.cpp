@@ -7,15 +7,16 @@
 
 extern "C" {
 
-std::FILE* __real_fopen(const char* path, const char* mode);
+// The name of fopen where files are counted in 64 bits.
+std::FILE* __real_fopen64(const char* path, const char* mode);
 DIR* __real_opendir(const char* path);
 
-std::FILE* __wrap_fopen(const char* path, const char* mode) {
+std::FILE* __wrap_fopen64(const char* path, const char* mode) {
     if (FaultyAllocator::nextFails()) {
         errno = ENOMEM;
         return nullptr;
     }
-    return __real_fopen(path, mode);
+    return __real_fopen64(path, mode);
 }
 
 DIR* __wrap_opendir(const char* path) {
