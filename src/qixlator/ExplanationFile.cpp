@@ -34,8 +34,10 @@ bool ExplanationFile::readHeading() {
 }
 
 bool ExplanationFile::readErrorBlock(qihtl::String* output, qierr_Status* status) {
-    int code = 0;
-    const int converted = std::sscanf(line + std::strlen(errorTag), "%i", &code);
+    // Wider than a code, so that a number beyond the codes matches none instead of some on targets
+    // that wrap it.
+    long long code = 0;
+    const int converted = std::sscanf(line + std::strlen(errorTag), "%lli", &code);
     if (converted != 1) {
         qierr_Writer writer = reportFault("Could not successfully read the status data!", status);
         qierr_Writer_addInt(writer, "sscanf", converted);

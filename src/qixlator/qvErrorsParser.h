@@ -14,7 +14,8 @@
 //     </qidocument>
 //
 // This is no XML parser. It looks at the start of each line and nothing else, in any case of
-// letters, and takes the text of a line as it stands. The code is decimal, or hexadecimal with 0x.
+// letters, and takes the text of a line as it stands. The code is decimal, or hexadecimal with 0x;
+// one beyond a signed number of 32 bits, such as 0xFFFC2C40, is no code's.
 // <qicomment> and </qicomment> enclose lines to be skipped.
 //
 // A search replaces `output` by the description, or leaves it empty: an empty output with a status
