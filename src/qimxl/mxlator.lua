@@ -114,12 +114,17 @@ local function attributeTableNames(word, ade)
     return names
 end
 
+-- The last whole number before which every other one is a number of the interpreter too.
+local largestExact = 2 ^ 53
+
 -- A value of JSON as text. One that is neither a string nor a number is its JSON text, since the
 -- interpreter would tell its address.
 local function textOf(value)
     local kind = type(value)
     if kind == "string" then
         return value
+    elseif kind == "number" and value % 1 == 0 and math.abs(value) <= largestExact then
+        return string.format("%.0f", value)
     elseif kind == "number" then
         -- The interpreter writes the decimal separator of the locale.
         return (tostring(value):gsub(",", "."))
@@ -138,11 +143,13 @@ end
 -- The attribute of a number, or nil for what is no number. An unknown one has its number for a name.
 local function attribute(attributes, num)
     local number = tonumber(num)
-    if not number then
+    -- Eight digits whatever the number, also where a conversion out of range would be undefined. The
+    -- interpreter takes "nan" and "inf" for numbers, which have no remainder.
+    local remainder = number and number % 4294967296
+    if not remainder or remainder ~= remainder then
         return nil
     end
-    -- Eight digits whatever the number, also where a conversion out of range would be undefined.
-    local attrid = string.format("%08X", number % 4294967296)
+    local attrid = string.format("%08X", remainder)
     return attributes and attributes.getAttribute(attrid)
         or { shortName = "0x" .. attrid, enums = {} }
 end
