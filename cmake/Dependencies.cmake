@@ -12,8 +12,9 @@ find_path(RAPIDJSON_INCLUDE_DIR rapidjson/document.h REQUIRED)
 add_library(rapidjson INTERFACE)
 target_include_directories(rapidjson SYSTEM INTERFACE "${RAPIDJSON_INCLUDE_DIR}")
 # The library's own choice aligns to 4 bytes on a 32-bit target, where doubles and 64-bit integers
-# need 8.
-target_compile_options(rapidjson INTERFACE "-DRAPIDJSON_ALIGN(x)=(((x)+7u)&~7u)")
+# need 8. The mask is as wide as a size: a narrower one cuts what is beyond it off a size.
+target_compile_options(rapidjson INTERFACE
+                       "-DRAPIDJSON_ALIGN(x)=(((x)+std::size_t(7))&~std::size_t(7))")
 target_compile_definitions(rapidjson INTERFACE RAPIDJSON_HAS_STDSTRING=1)
 
 # The Lua 5.1 interpreter with its JSON and file system modules. The modules do not name the

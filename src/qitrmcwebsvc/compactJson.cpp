@@ -1,22 +1,45 @@
 #include "qitrmcwebsvc/compactJson.h"
 
 #include <cmath>
+#include <limits>
+#include <new>
 
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-class FiniteWriter : public JsonWriter {
+using Length = rapidjson::SizeType;
+
+// The JSON library makes room for six bytes of each byte of a text and two quotes, and reckons that
+// in 32 bits.
+constexpr Length longestText = (std::numeric_limits<Length>::max() - 2) / 6;
+
+// Refuses what the JSON library cannot write.
+class GuardedWriter : public JsonWriter {
   public:
     using JsonWriter::JsonWriter;
 
+    bool String(const char* text, Length length, bool copy) {
+        expectRoomFor(length);
+        return JsonWriter::String(text, length, copy);
+    }
+    bool Key(const char* text, Length length, bool copy) {
+        expectRoomFor(length);
+        return JsonWriter::Key(text, length, copy);
+    }
     bool Double(double value) { return std::isfinite(value) ? JsonWriter::Double(value) : Null(); }
+
+  private:
+    static void expectRoomFor(Length length) {
+        if (length > longestText)
+            throw std::bad_alloc();
+    }
 };
 
 }  // namespace
 
 std::string compactJson(const JsonValue& value) {
     JsonBuffer text;
-    FiniteWriter writer(text);
+    GuardedWriter writer(text);
     value.Accept(writer);
     return std::string(text.GetString(), text.GetSize());
 }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cstdint>
+#include <limits>
 #include <utility>
 
 namespace nQITRMCWEBSVC100 {
@@ -9,6 +10,7 @@ namespace {
 
 constexpr std::uint32_t firstVariableSize = 32;
 constexpr std::uint32_t firstBodySize = 256;
+constexpr std::size_t mostOutput = std::numeric_limits<std::uint32_t>::max();
 
 // `read` takes a buffer and a pointer to its size. A buffer that is filled to its end has no NUL.
 template <typename Read>
@@ -41,6 +43,14 @@ int readPostBody(ws_Request* request, std::string& out) {
     return readText(firstBodySize, out, [&](char* buffer, std::uint32_t* size) {
         return ReadPostData_C_REST_QI_QVWS_(request, buffer, size);
     });
+}
+
+void writeOutput(ws_Request* request, std::string_view text) {
+    do {
+        const auto size = static_cast<std::uint32_t>(std::min(text.size(), mostOutput));
+        WriteOutput_C_REST_QI_QVWS_(request, text.data(), size);
+        text.remove_prefix(size);
+    } while (!text.empty());
 }
 
 }  // namespace nQITRMCWEBSVC100

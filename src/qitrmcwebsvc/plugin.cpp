@@ -44,13 +44,9 @@ bool readSwitch() {
     return IniFile_getInt(file.get(), "WebService", "Enable", &enable) > 0 && enable != 0;
 }
 
-void write(ws_Request* request, const std::string& text) {
-    WriteOutput_C_REST_QI_QVWS_(request, text.data(), static_cast<std::uint32_t>(text.size()));
-}
-
 void refuse(ws_Request* request, int code, const std::string& text) {
     SetHTTPResponseCode_QI_QVWS_(request, code);
-    write(request, text);
+    writeOutput(request, text);
 }
 
 bool variableIs(ws_Request* request, const char* name, const char* required) {
@@ -80,7 +76,7 @@ void serve(ws_Entry* entry, ws_Request* request) {
         return SetHTTPResponseCode_QI_QVWS_(request, httpServerError);
     const std::string response = requestHandler->handleRequest(body);
     SetHTTPResponseMimeType_C_REST_QI_QVWS_(request, "application/json; charset=utf-8");
-    write(request, response);
+    writeOutput(request, response);
 }
 
 }  // namespace

@@ -2,17 +2,26 @@
 
 #include <qitrmcapi.h>
 
+#include <limits>
 #include <new>
 
 namespace nQITRMCWEBSVC100 {
+namespace {
+
+constexpr rapidjson::SizeType largestSize = std::numeric_limits<rapidjson::SizeType>::max();
+
+}  // namespace
 
 JsonValue textValue(std::string_view text, JsonPool& pool) {
+    // The JSON library counts in 32 bits, the NUL behind a text included.
+    if (text.size() >= largestSize)
+        throw std::bad_alloc();
     return JsonValue(text.data(), static_cast<rapidjson::SizeType>(text.size()), pool);
 }
 
 void reserveElements(JsonValue& array, std::size_t count, JsonPool& pool) {
     // The JSON library multiplies without a look at the result.
-    if (count > PTRDIFF_MAX / sizeof(JsonValue))
+    if (count > largestSize || count > PTRDIFF_MAX / sizeof(JsonValue))
         throw std::bad_alloc();
     array.Reserve(static_cast<rapidjson::SizeType>(count), pool);
 }
