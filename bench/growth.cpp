@@ -105,6 +105,10 @@ std::string longExponents(const std::string& session, Count count) {
     return closing(session, R"("x":)" + array("0.1e-2147483647", count));
 }
 
+std::string digitsOfNumber(const std::string& session, Count count) {
+    return closing(session, R"("x":0.)" + repeated("9", count));
+}
+
 // ---- Requests that fail -------------------------------------------------------------------------
 
 std::string charactersOfUnknownName(const std::string& session, Count count) {
@@ -150,6 +154,7 @@ const Case cases[] = {
     CASE(escapesInText, 16384, 1048576, true),
     CASE(charactersInId, 16384, 1048576, true),
     CASE(longExponents, 1024, 65536, true),
+    CASE(digitsOfNumber, 16384, 1048576, true),
     CASE(charactersOfUnknownName, 16384, 1048576, false),
     CASE(escapesOfUnknownName, 16384, 1048576, false),
     CASE(bracketsTooDeep, 16384, 1048576, false),

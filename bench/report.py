@@ -116,6 +116,17 @@ def report_failures(benchmarks):
            f"(goal: at least 8), memory {memory:.1f} (goal: at least 2)")
 
 
+def report_doubles(benchmarks):
+    ratios = []
+    for digits in ("3", "17"):
+        names = [f"doubles/{kind}Of{digits}Digits" for kind in ("nearest", "rough")]
+        if set(names) <= set(benchmarks.rows):
+            nearest, rough = map(benchmarks.time, names)
+            ratios.append(f"{digits} digits {nearest / rough:.2f}")
+    if ratios:
+        yield f"parsing doubles, nearest to one unit off: {', '.join(ratios)}"
+
+
 def report_service(service):
     if not service:
         return
@@ -139,7 +150,8 @@ def main():
     benchmarks, service = map(read, map(pathlib.Path, sys.argv[1:3]))
     measured = Benchmarks(benchmarks)
     ratios = []
-    for report in (report_requests, report_growth, report_sessions, report_failures):
+    for report in (report_requests, report_growth, report_sessions, report_failures,
+                   report_doubles):
         ratios += report(measured)
     ratios += report_service(service)
     print("\nRatios")

@@ -8,6 +8,7 @@ namespace {
 
 // An exponent with more digits than this, leading zeros apart, is lowered.
 constexpr std::size_t safeDigits = 9;
+constexpr std::size_t countableDigits = 200'000'000;
 
 bool isDigit(char c) {
     return c >= '0' && c <= '9';
@@ -69,6 +70,17 @@ std::optional<std::string> withSafeExponents(const char* text) {
         position += digits.end != 0 ? digits.end : 1;
     }
     return safe;
+}
+
+bool holdsUncountableNumber(const std::string& text) {
+    if (text.size() <= countableDigits)
+        return false;
+    std::size_t digits = 0;
+    for (std::size_t position = 0; position < text.size() && digits <= countableDigits;) {
+        digits = isDigit(text[position]) ? digits + 1 : 0;
+        position = text[position] == '"' ? behindString(text, position) : position + 1;
+    }
+    return digits > countableDigits;
 }
 
 }  // namespace nQITRMCWEBSVC100

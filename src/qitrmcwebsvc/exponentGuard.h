@@ -14,4 +14,9 @@ namespace nQITRMCWEBSVC100 {
 // or nothing when the text holds none. Cost is linear.
 std::optional<std::string> withSafeExponents(const char* text);
 
+// Whether a text holds a number of more than 200 million digits in a row, outside its strings: the
+// reader counts digits in 32 bits too, and with some 215 million of them behind a point a positive
+// exponent overflows.
+bool holdsUncountableNumber(const std::string& text);
+
 }  // namespace nQITRMCWEBSVC100

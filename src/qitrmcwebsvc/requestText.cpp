@@ -1,7 +1,11 @@
 #include "qitrmcwebsvc/requestText.h"
 
+#include <charconv>
 #include <cmath>
+#include <limits>
+#include <new>
 #include <optional>
+#include <system_error>
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/exponentGuard.h"
@@ -12,6 +16,18 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
+// The nearest double to the literal at `text`, which `approximation` is close to. The reader's own
+// exact conversion is no choice: a long literal with small digits first makes it read outside its
+// tables, and for some others its result is far off.
+double nearestDouble(const char* text, const char* textEnd, double approximation) {
+    double value = 0.0;
+    const std::errc failure = std::from_chars(text, textEnd, value).ec;
+    if (failure == std::errc())
+        return value;
+    const bool tooBig = std::fabs(approximation) > 1.0;
+    return std::copysign(tooBig ? std::numeric_limits<double>::infinity() : 0.0, approximation);
+}
+
 // Stands between the reader and the document: refuses what the reader lets through although the
 // rest of the service, or a response that quotes the request, could not carry it.
 class GuardedDocument {
@@ -19,12 +35,16 @@ class GuardedDocument {
     using Ch = JsonDocument::Ch;
     using SizeType = rapidjson::SizeType;
 
-    explicit GuardedDocument(JsonDocument& guarded) : document(guarded) {}
+    // `read` is what the reader reads, up to `end`.
+    GuardedDocument(JsonDocument& guarded, const rapidjson::StringStream& read, const char* end)
+        : document(guarded), stream(read), textEnd(end) {}
 
     // The reader's own check misses some literals that are too big, such as 10e308.
     bool numberTooBig() const { return sawInfinity; }
 
-    bool Double(double value) {
+    bool Double(double approximation) {
+        // The reader moves its stream on behind a literal when the literal is accepted.
+        const double value = nearestDouble(stream.src_, textEnd, approximation);
         sawInfinity = std::isinf(value);
         return !sawInfinity && document.Double(value);
     }
@@ -59,6 +79,8 @@ class GuardedDocument {
     bool enter() { return ++depth <= maxNesting; }
 
     JsonDocument& document;
+    const rapidjson::StringStream& stream;
+    const char* const textEnd;
     int depth = 0;
     bool sawInfinity = false;
 };
@@ -109,10 +131,13 @@ const char* parseErrorText(rapidjson::ParseErrorCode code) {
 }  // namespace
 
 void parseRequestText(const std::string& body, JsonDocument& document) {
+    if (holdsUncountableNumber(body))
+        throw std::bad_alloc();
     const std::optional<std::string> guardedBody = withSafeExponents(body.c_str());
-    rapidjson::StringStream stream(guardedBody ? guardedBody->c_str() : body.c_str());
+    const std::string& text = guardedBody ? *guardedBody : body;
+    rapidjson::StringStream stream(text.c_str());
     JsonReader reader;
-    GuardedDocument handler(document);
+    GuardedDocument handler(document, stream, text.c_str() + text.size());
     auto parse = [&](JsonDocument&) {
         return !reader.Parse<rapidjson::kParseDefaultFlags>(stream, handler).IsError();
     };

@@ -4,6 +4,7 @@
 
 #include <string>
 
+using nQITRMCWEBSVC100::holdsUncountableNumber;
 using nQITRMCWEBSVC100::withSafeExponents;
 
 namespace {
@@ -40,6 +41,13 @@ TEST(ExponentGuard, LeavesStringsAloneWithTheirEscapes) {
 
 TEST(ExponentGuard, EndsAtAnUnfinishedString) {
     EXPECT_EQ(guarded("1e-9999999999 \"e-9999999999\\"), "1e-0999999999 \"e-9999999999\\");
+}
+
+TEST(ExponentGuard, CountsDigitsOutsideStringsOnly) {
+    const std::string digits(200000001, '7');
+    EXPECT_TRUE(holdsUncountableNumber("[" + digits));
+    EXPECT_FALSE(holdsUncountableNumber("[\"" + digits + "\"]"));
+    EXPECT_FALSE(holdsUncountableNumber(digits.substr(1) + "." + digits.substr(1)));
 }
 
 }  // namespace

@@ -2,7 +2,13 @@
 
 #include <gtest/gtest.h>
 
+#include <cmath>
+#include <cstdint>
+#include <cstdlib>
+#include <new>
+#include <random>
 #include <string>
+#include <vector>
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/describeStatus.h"
@@ -75,6 +81,76 @@ TEST(RequestText, TakesAnExponentFarBelowZeroAsZero) {
     parseRequestText("[0.0000000001e-2147483639,-1e-99999999999]", document);
     EXPECT_EQ(document[0].GetDouble(), 0.0);
     EXPECT_EQ(document[1].GetDouble(), 0.0);
+}
+
+// ---- Doubles ------------------------------------------------------------------------------------
+
+double doubleOf(const std::string& literal) {
+    JsonDocument document;
+    parseRequestText("[" + literal + " ]", document);
+    EXPECT_TRUE(document[0].IsDouble()) << literal.substr(0, 40);
+    return document[0].GetDouble();
+}
+
+// A number of 17 digits, the first not 0, with its point anywhere or an exponent.
+std::string randomLiteral(std::mt19937_64& random) {
+    std::string digits = std::to_string(10000000000000000 + random() % 90000000000000000);
+    const std::string sign = random() % 2 == 0 ? "-" : "";
+    if (random() % 2 == 0)
+        return sign + digits.insert(1 + random() % 16, ".");
+    const int exponent = static_cast<int>(random() % 632) - 324;
+    return sign + digits.insert(1, ".") + "e" + std::to_string(exponent);
+}
+
+TEST(RequestText, ALiteralOf17DigitsIsNotOneUnitOff) {
+    std::mt19937_64 random(17);
+    std::vector<std::string> literals;
+    std::string body;
+    for (int i = 0; i < 100000; ++i) {
+        literals.push_back(randomLiteral(random));
+        body += (i == 0 ? "[" : ",") + literals.back();
+    }
+    JsonDocument document;
+    parseRequestText(body + "]", document);
+    int wrong = 0;
+    for (rapidjson::SizeType i = 0; i < document.Size(); ++i)
+        wrong += document[i].GetDouble() != std::strtod(literals[i].c_str(), nullptr);
+    EXPECT_EQ(document.Size(), 100000u);
+    EXPECT_EQ(wrong, 0);
+}
+
+TEST(RequestText, ALiteralBetweenTwoDoublesGoesToTheNearerAndFromTheMiddleToTheEvenOne) {
+    EXPECT_EQ(doubleOf("9007199254740993.0"), 9007199254740992.0);
+    EXPECT_EQ(doubleOf("9007199254740993." + std::string(800, '0') + "1"), 9007199254740994.0);
+    EXPECT_EQ(doubleOf("9007199254740995.0"), 9007199254740996.0);
+    EXPECT_EQ(doubleOf("184467440737095516159999.5"), 0x1.388p+77);
+    EXPECT_EQ(doubleOf("5e-324"), 0x1p-1074);
+    EXPECT_EQ(doubleOf("2.4703282292062328e-324"), 0x1p-1074);
+    EXPECT_EQ(doubleOf("2.4703282292062327e-324"), 0.0);
+    EXPECT_EQ(doubleOf("1.7976931348623157e+308"), 0x1.fffffffffffffp+1023);
+}
+
+TEST(RequestText, ALiteralTooSmallForADoubleIsAZeroOfItsSign) {
+    for (const std::string& literal :
+         {std::string("1e-400"), "0." + std::string(400, '0') + "1",
+          "0." + std::string(30, '0') + "1e-320", "0." + std::string(1000000, '0') + "1"}) {
+        EXPECT_EQ(doubleOf(literal), 0.0);
+        EXPECT_FALSE(std::signbit(doubleOf(literal)));
+        EXPECT_TRUE(std::signbit(doubleOf("-" + literal)));
+    }
+    EXPECT_TRUE(std::signbit(doubleOf("-0.0")));
+}
+
+TEST(RequestText, ALiteralOfAMillionDigitsIsReadInOneGo) {
+    EXPECT_EQ(doubleOf("0." + std::string(1000000, '9')), 1.0);
+    EXPECT_EQ(doubleOf("1." + std::string(1000000, '0') + "1"), 1.0);
+    EXPECT_EQ(doubleOf("0." + std::string(1000000, '0') + "25e1000000"), 0.25);
+}
+
+TEST(RequestText, AnUncountableNumberOfDigitsIsNoMemoryInsteadOfACrash) {
+    const std::string body = "[0." + std::string(300000000, '0') + "e2147483650]";
+    JsonDocument document;
+    EXPECT_THROW(parseRequestText(body, document), std::bad_alloc);
 }
 
 TEST(RequestText, RefusesNestingBeyondTheLimit) {
