@@ -12,7 +12,7 @@ using nQITRMCWEBSVC100::writeOutput;
 
 // A runtime that notes where each piece of the response is, without looking at it.
 struct ws_Request {
-    std::vector<std::pair<const char*, std::uint32_t>> pieces;
+    std::vector<std::pair<const void*, std::uint32_t>> pieces;
 };
 
 extern "C" {
@@ -33,7 +33,7 @@ int ReadPostData_C_REST_QI_QVWS_(ws_Request*, char*, uint32_t*) {
 
 namespace {
 
-using Pieces = std::vector<std::pair<const char*, std::uint32_t>>;
+using Pieces = std::vector<std::pair<const void*, std::uint32_t>>;
 
 TEST(HttpOutput, AResponseOf4GiBAndMoreIsNotCut) {
     constexpr std::uint64_t size = (std::uint64_t{1} << 32) + 5;
