@@ -1,6 +1,8 @@
 #include "description/Description.h"
 
 #include <algorithm>
+#include <charconv>
+#include <system_error>
 
 #include "description/Nearest.h"
 #include "description/SyntaxFault.h"
@@ -28,10 +30,23 @@ bool isLongZero(std::string_view number) {
            (digits.size() < number.size() || digits.size() > mostDigitsOfZero);
 }
 
+// And it reads outside its tables for what is about too small for a double.
+bool isOutOfRange(std::string_view number) {
+    constexpr double leastRead = 1e-300;
+    double value = 0;
+    const std::errc failure =
+        std::from_chars(number.data(), number.data() + number.size(), value).ec;
+    return failure == std::errc::result_out_of_range || (value > 0 && value < leastRead);
+}
+
 void refuseOddNumber(std::string_view text, size_t place, std::string_view number) {
     if (hasHugeExponent(number)) {
         throw DescriptionFault{"", "holds a number out of range at " + lineAndColumn(text, place),
                                "exponents have at most 4 digits"};
+    }
+    if (isOutOfRange(number)) {
+        throw DescriptionFault{"", "holds a number out of range at " + lineAndColumn(text, place),
+                               "numbers are 0 or have an amount from 1e-300 to 1.79e308"};
     }
     if (isLongZero(number)) {
         throw DescriptionFault{"", "holds a zero of many signs at " + lineAndColumn(text, place),

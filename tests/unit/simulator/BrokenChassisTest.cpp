@@ -53,6 +53,17 @@ TEST(BrokenChassisTest, AnExponentOutOfRangeIsRefusedBeforeItIsRead) {
                 "exponents have at most 4 digits");
 }
 
+TEST(BrokenChassisTest, ANumberTooSmallForADoubleIsRefusedInsteadOfACrash) {
+    for (const std::string& number :
+         {std::string("0.12345678901234567e-341"), "0." + std::string(400, '0') + "1",
+          std::string("-0.00000000000000000000000000000001e-320"), std::string("9.9e-301")}) {
+        const std::string column = number.front() == '-' ? "14" : "13";
+        expectFault("{\"devices\": " + number + "}", "",
+                    "holds a number out of range at line 1, column " + column +
+                        "; numbers are 0 or have an amount from 1e-300 to 1.79e308");
+    }
+}
+
 TEST(BrokenChassisTest, ABrokenFileOfFaultsIsRefusedLikeABrokenChassis) {
     const ChassisFile file("{\"faults\":[{}]}");
     const Probe probe = openWith("", "QITRMC_SIM_FAULTS='" + file.path + "'");
