@@ -13,11 +13,16 @@ class HandleTable {
   public:
     explicit HandleTable(uint32_t first = 1) : next(first) {}
 
-    uint32_t add(Item item) {
+    // The number that the next item gets.
+    uint32_t upcoming() {
         while (next == 0 || items.count(next) != 0) {
             ++next;
         }
-        const uint32_t handle = next;
+        return next;
+    }
+
+    uint32_t add(Item item) {
+        const uint32_t handle = upcoming();
         items.emplace(handle, std::move(item));
         ++next;
         return handle;

@@ -7,6 +7,7 @@ namespace simulator {
 Session& Sessions::make() {
     Session fresh;
     fresh.properties = firstProperties;
+    lasting.reserveSessionNumber(table.upcoming());
     const nQITRMCAPI100_Session handle = table.add(std::move(fresh));
     Session& made = *table.find(handle);
     made.handle = handle;

@@ -5,6 +5,7 @@
 #include "Api.h"
 #include "model/Chassis.h"
 #include "sessions/HandleTable.h"
+#include "state/LastingState.h"
 
 namespace simulator {
 
@@ -24,10 +25,12 @@ struct Session {
 class Sessions {
   public:
     // firstProperties: what a session has to begin with.
-    Sessions(nQITRMCAPI100_Session firstHandle, const PropertyStore& firstProperties)
-        : table(firstHandle), firstProperties(firstProperties) {}
+    Sessions(nQITRMCAPI100_Session firstHandle, const PropertyStore& firstProperties,
+             LastingState& lasting)
+        : table(firstHandle), firstProperties(firstProperties), lasting(lasting) {}
 
-    // Makes a session under the next free handle.
+    // Makes a session under the next free handle. Refuses with stateNotWritten when a later start
+    // would give out this handle again.
     Session& make();
     // Refuses with unknownSession when the handle is dead or its session is still opening.
     Session& get(nQITRMCAPI100_Session handle);
@@ -46,6 +49,7 @@ class Sessions {
   private:
     HandleTable<Session> table;
     const PropertyStore& firstProperties;
+    LastingState& lasting;
 };
 
 }  // namespace simulator

@@ -41,7 +41,7 @@ Simulator::Simulator(std::unique_ptr<Chassis> loaded, const TimeScale& timeScale
       lasting(*chassis),
       clock(timeScale),
       waits(clock),
-      sessions(chassis->firstSessionHandle, chassis->sessionProperties),
+      sessions(chassis->firstSessionHandle, chassis->sessionProperties, lasting),
       reservations(*chassis, waits),
       faults(*chassis, sessions, waits, clock) {
     // What follows a value that was restored has followed it long ago.

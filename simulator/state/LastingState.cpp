@@ -11,6 +11,9 @@ namespace simulator {
 
 namespace {
 
+constexpr uint32_t sessionBlock = 100;
+constexpr const char* nextSessionItem = "Sys.NextSession";
+
 std::string keyOf(const std::string& resource, const std::string& item) {
     return foldName(resource) + '\n' + item;
 }
@@ -62,6 +65,7 @@ LastingState::LastingState(Chassis& chassis) {
     try {
         folder.emplace(path);
         restore(load(), path, chassis);
+        loadSessionNumber(chassis);
     } catch (const StateFault& fault) {
         refuse(fault);
     }
@@ -113,6 +117,32 @@ void LastingState::keep(const Change& change) {
         folder->write(next, change.text.file(next));
         settle(change.keys);
     }
+}
+
+void LastingState::loadSessionNumber(Chassis& chassis) const {
+    if (!folder->has(sessionsFile)) {
+        return;
+    }
+    for (const StateEntry& entry :
+         readStateFile(folder->filePath(sessionsFile), sessionsFile, folder->read(sessionsFile))) {
+        const auto* number = std::get_if<List<uint32_t>>(&entry.value);
+        if (entry.item == nextSessionItem && number != nullptr && number->size() == 1) {
+            chassis.firstSessionHandle = number->front();
+        }
+    }
+}
+
+void LastingState::reserveSessionNumber(uint32_t number) {
+    // Numbers go round, and these differences with them.
+    const bool isReserved = reservedEnd && *reservedEnd - number - 1 < sessionBlock;
+    if (!folder || isReserved) {
+        return;
+    }
+    const uint32_t end = number + sessionBlock;
+    StateText text;
+    text.add("", nextSessionItem, DataType::uint32, List<uint32_t>{end});
+    folder->write(sessionsFile, text.file(sessionsFile));
+    reservedEnd = end;
 }
 
 }  // namespace simulator

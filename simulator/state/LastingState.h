@@ -54,18 +54,26 @@ class LastingState {
     // in memory. Refuses with stateNotWritten.
     void keep(const Change& change);
 
+    // Makes sure that no later start gives out this number of a session again. Numbers are reserved
+    // in blocks, so that few sessions wait for the disk; a start goes on behind the last block.
+    // Refuses with stateNotWritten.
+    void reserveSessionNumber(uint32_t number);
+
   private:
     using Generation = uint64_t;
     using Entries = std::map<std::string, StateEntry>;
 
     // Reads all files: the latest entry for each key.
     Entries load();
+    void loadSessionNumber(Chassis& chassis) const;
     // Makes room for what settle() notes.
     void prepare(const std::vector<std::string>& keys);
     // Notes that the next generation holds the keys, and removes files that this makes useless.
     void settle(const std::vector<std::string>& keys) noexcept;
 
     std::optional<StateFolder> folder;
+    // The first number behind the block that this start has reserved last.
+    std::optional<uint32_t> reservedEnd;
     // Which file holds the latest value; 0 for none.
     std::map<std::string, Generation> holders;
     // How many latest values a file holds.

@@ -24,11 +24,16 @@ constexpr const char* lockName = "lock";
 // What is being written. Never read: a process that ends meanwhile leaves a part of a file here.
 constexpr const char* unfinishedName = "unfinished";
 constexpr std::string_view prefix = "change-";
+constexpr std::string_view sessionsName = "sessions";
 
 using FileName = std::array<char, 32>;
 
 FileName fileName(uint64_t generation) noexcept {
     FileName name{};
+    if (generation == sessionsFile) {
+        std::copy(sessionsName.begin(), sessionsName.end(), name.data());
+        return name;
+    }
     char* const end = std::copy(prefix.begin(), prefix.end(), name.data());
     std::to_chars(end, name.data() + name.size() - 1, generation);
     return name;
@@ -143,6 +148,11 @@ std::vector<uint64_t> StateFolder::generations() const {
     return found;
 }
 
+bool StateFolder::has(uint64_t generation) const {
+    struct stat facts = {};
+    return fstatat(folder, fileName(generation).data(), &facts, 0) == 0 || errno != ENOENT;
+}
+
 std::string StateFolder::read(uint64_t generation) const {
     const auto refuse = [&] {
         throw StateFault{filePath(generation),
@@ -184,7 +194,9 @@ void StateFolder::write(uint64_t generation, std::string_view content) const {
         unlinkat(folder, unfinishedName, 0);
     } else if (fsync(folder) != 0) {
         reason = errno;
-        remove(generation);
+        if (generation != sessionsFile) {
+            remove(generation);
+        }
     }
     if (reason != 0) {
         refuseWriting(whole, std::strerror(reason));

@@ -25,8 +25,11 @@ class Descriptor {
     int number;
 };
 
+// Stands for the file "sessions", which is replaced as a whole, where a generation is wanted.
+inline constexpr uint64_t sessionsFile = 0;
+
 // The folder in which one process keeps what lasts: a file for each change that still matters,
-// "change-1" and so on. Other files in it are left alone.
+// "change-1" and so on, and the file "sessions". Other files in it are left alone.
 class StateFolder {
   public:
     // Makes the folder if it is missing and locks it for as long as this object and its process
@@ -36,11 +39,12 @@ class StateFolder {
     std::string filePath(uint64_t generation) const;
     // The generations of the files that are there, the oldest first. Throws a StateFault.
     std::vector<uint64_t> generations() const;
+    bool has(uint64_t generation) const;
     // The content of a file. Throws a StateFault.
     std::string read(uint64_t generation) const;
 
     // Makes a file. It is whole and on the disk when this returns. Refuses with stateNotWritten,
-    // and then there is no such file.
+    // and then there is no such file of a change.
     void write(uint64_t generation, std::string_view content) const;
     // Removes a file if that can be done.
     void remove(uint64_t generation) const noexcept;

@@ -206,6 +206,8 @@ TEST_F(StateFaultTest, AFileIsWrittenAsItIsReadHere) {
               "");
     EXPECT_EQ(contentOf(state.file("change-1")),
               fileOf(1, entry("Mod1", "Dev.Comment", 5, 1, text("é"))));
+    EXPECT_EQ(contentOf(state.file("sessions")),
+              fileOf(0, entry("", "Sys.NextSession", 6, 1, number(101, 4))));
 }
 
 TEST_F(StateFaultTest, AFileCutOffAnywhereIsRefused) {
@@ -388,11 +390,11 @@ TEST_F(StateFaultTest, ACommitSucceedsOnceThereIsRoom) {
 }
 
 TEST_F(StateFaultTest, WhatCannotBeWrittenChangesNothing) {
-    std::filesystem::create_directory(state.file("unfinished"));
     const std::string path = state.file("change-1");
     const std::string reason = "Is a directory";
     EXPECT_EQ(state.run([&] {
         Session session("Mod1,Mod2");
+        std::filesystem::create_directory(state.file("unfinished"));
         expectNotWritten(renameDevice(session, "Mod1", "Other"), path, reason);
         EXPECT_EQ(session.systemList("Sys.Devices")[1], "Mod1");
         EXPECT_EQ(get(getUInt32, session, "Other", "Dev.SlotNum").code, -250956);
