@@ -3,6 +3,7 @@
 #include <cstdlib>
 
 #include "EmbeddedTexts.h"
+#include "Members.h"
 #include "description/Description.h"
 #include "description/LiveFile.h"
 #include "description/PartsFile.h"
@@ -72,9 +73,7 @@ void DeviceReader::readModules(const Node& node, Device& owner) {
 }
 
 Device& DeviceReader::read(const Node& node, Place place) {
-    node.expectMembers({"name", "category", "slot", "modules", "channels", "nvmem_areas",
-                        "registers", "values", "properties", "commands", "connect_seconds",
-                        "reachable", "live"});
+    node.expectMembers(members::device);
     Device& device = addDevice(node);
     device.category = node.member("category", "the product category").signedNumber();
     readSlot(node, place, device);
@@ -122,8 +121,7 @@ std::unique_ptr<Chassis> parseChassis(std::string_view text) {
     JsonDocument document;
     parseDescription(text, document);
     const Node root(document);
-    root.expectMembers({"$schema", "first_session_handle", "enums", "driver_properties",
-                        "system_values", "session_values", "devices", "seed"});
+    root.expectMembers(members::chassis);
     root.ifPresent("$schema", [](const Node& schema) { schema.text(); });
     auto chassis = std::make_unique<Chassis>();
     root.ifPresent("first_session_handle", [&](const Node& handle) {

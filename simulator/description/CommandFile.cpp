@@ -1,5 +1,6 @@
 #include "description/CommandFile.h"
 
+#include "Members.h"
 #include "description/Nearest.h"
 #include "description/PropertyFile.h"
 #include "description/StatusFile.h"
@@ -63,7 +64,7 @@ void readEffects(const Node& node, Owner owner, const Resource& resource, Comman
 }
 
 CommandFailure::State readState(const Node& node, const Resource& resource) {
-    node.expectMembers({"property", "is"});
+    node.expectMembers(members::when);
     const Node nameNode = node.member("property", "the name of a property of the resource");
     const std::string name = nameNode.text();
     const Property* property = resource.properties.find(name);
@@ -78,7 +79,7 @@ CommandFailure::State readState(const Node& node, const Resource& resource) {
 
 CommandFailure readFailure(const Node& node, const Resource& resource,
                            const Enumerations& enumerations) {
-    node.expectMembers({"status", "when", "probability", "every"});
+    node.expectMembers(members::failure);
     CommandFailure failure{
         readStatus(node.member("status", "the status that the command gives"), enumerations)};
     node.ifPresent("when", [&](const Node& state) { failure.when = readState(state, resource); });
@@ -97,8 +98,7 @@ CommandFailure readFailure(const Node& node, const Resource& resource,
 
 Command readCommand(const std::string& name, const Node& node, const Resource& resource,
                     const Enumerations& enumerations) {
-    node.expectMembers(
-        {"description", "document", "seconds", "resets", "sets", "adds", "on_device", "fails"});
+    node.expectMembers(members::command);
     Command command;
     command.name = name;
     command.place = keyOf(resource.fullName() + "/" + name);
@@ -108,7 +108,7 @@ Command readCommand(const std::string& name, const Node& node, const Resource& r
     node.ifPresent("resets", [&](const Node& resets) { command.resets = resets.flag(); });
     readEffects(node, Owner::resource, resource, command);
     node.ifPresent("on_device", [&](const Node& effects) {
-        effects.expectMembers({"sets", "adds"});
+        effects.expectMembers(members::onDevice);
         readEffects(effects, Owner::device, resource, command);
     });
     node.ifPresent("fails", [&](const Node& failure) {

@@ -162,10 +162,10 @@ void Node::expect(bool condition, const char* right) const {
     }
 }
 
-void Node::expectMembers(std::initializer_list<std::string_view> allowed) const {
+void Node::expectMembers(const std::string_view* allowed, size_t count) const {
     forEachMember([&](const std::string& name, const Node& member) {
-        if (std::find(allowed.begin(), allowed.end(), name) == allowed.end()) {
-            const std::vector<std::string> known(allowed.begin(), allowed.end());
+        if (std::find(allowed, allowed + count, name) == allowed + count) {
+            const std::vector<std::string> known(allowed, allowed + count);
             member.fail("is not a known member",
                         perhapsMeant(name, known) + "the members here are " + listed(known));
         }

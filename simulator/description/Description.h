@@ -2,7 +2,6 @@
 
 #include <cstdint>
 #include <cstdlib>
-#include <initializer_list>
 #include <new>
 #include <set>
 #include <string>
@@ -66,8 +65,12 @@ class Node {
     explicit Node(const JsonValue& value, std::string pointer = "")
         : value(&value), pointer(std::move(pointer)) {}
 
-    // Makes sure that this is an object with no members but these.
-    void expectMembers(std::initializer_list<std::string_view> allowed) const;
+    // Makes sure that this is an object with no members but these: a list of Members.h, which has
+    // them from the JSON Schemas.
+    template <size_t count>
+    void expectMembers(const std::string_view (&allowed)[count]) const {
+        expectMembers(allowed, count);
+    }
     bool has(const char* member) const;
     // Calls read(Node) for a member if it is there.
     template <typename Read>
@@ -121,6 +124,7 @@ class Node {
     void expect(bool condition, const char* right) const;
 
   private:
+    void expectMembers(const std::string_view* allowed, size_t count) const;
     std::string childPointer(std::string_view name) const;
 
     const JsonValue* value;

@@ -3,6 +3,7 @@
 #include <array>
 #include <utility>
 
+#include "Members.h"
 #include "description/Nearest.h"
 #include "live/Maths.h"
 
@@ -98,8 +99,7 @@ const Resource* FollowsReader::followed() const {
 }
 
 void FollowsReader::read(ReadMotion& into) const {
-    node.expectMembers(
-        {"property", "resource", "optional", "while", "factor", "offset", "time_constant"});
+    node.expectMembers(members::follows);
     Follows follows;
     readNumber(node, "factor", -largestTame, largestTame, follows.factor);
     readNumber(node, "offset", -largestTame, largestTame, follows.offset);
@@ -123,7 +123,7 @@ void FollowsReader::read(ReadMotion& into) const {
 }
 
 Drift readDrift(const Node& node) {
-    node.expectMembers({"amplitude", "period"});
+    node.expectMembers(members::drift);
     Drift drift;
     drift.amplitude = node.member("amplitude", "how far it goes").number(0.0, largestTame);
     drift.period = node.member("period", "a time in seconds").number(shortestPeriod, longestPeriod);
@@ -131,7 +131,7 @@ Drift readDrift(const Node& node) {
 }
 
 Counts readCounts(const Node& node) {
-    node.expectMembers({"per_second"});
+    node.expectMembers(members::counts);
     return {node.member("per_second", "how many are counted in a second")
                 .number(0.0, highestCountRate)};
 }
@@ -166,7 +166,7 @@ Waveform::Shape readShape(const Node& node) {
 }
 
 Waveform readWaveform(const Node& node, const MotionPlace& place) {
-    node.expectMembers({"shape", "frequency", "amplitude", "offset", "samples", "sample_rate"});
+    node.expectMembers(members::waveform);
     Waveform waveform;
     waveform.shape = readShape(node.member("shape", "the name of a shape"));
     readNumber(node, "frequency", 0.0, highestFrequency, waveform.frequency);
@@ -216,7 +216,7 @@ void expectSuitableType(const Node& node, const PropertyDefinition& definition) 
 
 ReadMotion readMotion(const Node& node, const MotionPlace& place,
                       const PropertyDefinition& definition, const Chassis& chassis) {
-    node.expectMembers({"follows", "drift", "noise", "counts", "waveform"});
+    node.expectMembers(members::motion);
     expectCompany(node, definition);
     expectSuitableType(node, definition);
     ReadMotion read;

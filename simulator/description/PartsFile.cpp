@@ -1,5 +1,6 @@
 #include "description/PartsFile.h"
 
+#include "Members.h"
 #include "description/CommandFile.h"
 #include "description/Nearest.h"
 #include "model/NameText.h"
@@ -89,7 +90,7 @@ void readResource(const Node& node, Category category, const Chassis& chassis,
 
 void readPhysChans(const Node& node, const Enumerations& enumerations, Chassis& chassis,
                    Device& device) {
-    node.expectMembers({"prefix", "count", "values", "properties", "commands", "live"});
+    node.expectMembers(members::channels);
     const Node prefixNode = node.member("prefix", "the text in front of the channel's number");
     const std::string prefix = readName(prefixNode, nameFault);
     if (prefix.back() >= '0' && prefix.back() <= '9') {
@@ -105,8 +106,7 @@ void readPhysChans(const Node& node, const Enumerations& enumerations, Chassis& 
 
 void readNvmemArea(const Node& node, const Enumerations& enumerations, Chassis& chassis,
                    Device& device) {
-    node.expectMembers({"name", "size", "bytes", "access", "serial_number_wanted", "password",
-                        "values", "properties"});
+    node.expectMembers(members::nvmemArea);
     const Node nameNode = node.member("name", "the name of the area");
     const std::string name = readName(nameNode, partNameFault);
     if (chassis.findPart(device, name) != nullptr) {

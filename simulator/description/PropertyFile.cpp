@@ -4,6 +4,7 @@
 #include <array>
 #include <utility>
 
+#include "Members.h"
 #include "description/Nearest.h"
 #include "description/ValueFile.h"
 
@@ -176,8 +177,7 @@ Enumerations readEnumerations(const Node& node) {
 
 PropertyDefinition readDefinition(const std::string& name, const Node& node,
                                   const Enumerations& enumerations) {
-    node.expectMembers({"type", "access", "computed", "needs_commit", "lasting", "description",
-                        "document", "unit", "min", "max", "enum", "value"});
+    node.expectMembers(members::property);
     PropertyDefinition definition;
     definition.name = name;
     definition.type = readType(node);
@@ -199,7 +199,7 @@ PropertyDefinition readDefinition(const std::string& name, const Node& node,
 
 void readCatalogue(const Node& node, const Enumerations& enumerations, Origin origin,
                    Catalogue& catalogue) {
-    node.expectMembers({"system", "session", "device", "phys_chan", "nvmem_area"});
+    node.expectMembers(members::driverProperties);
     for (const auto& [member, category] : categories) {
         node.ifPresent(member, [&, category = category](const Node& definitions) {
             definitions.forEachMember([&](const std::string& name, const Node& entry) {

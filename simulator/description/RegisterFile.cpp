@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "Members.h"
 #include "description/Nearest.h"
 #include "description/PartsFile.h"
 #include "model/RegisterValues.h"
@@ -123,7 +124,7 @@ void readShown(const Node& node, const Chassis& chassis, Device& device, Registe
         return;
     }
     node.expect(node.json().IsObject(), "a text, or an object with property and resource");
-    node.expectMembers({"property", "resource"});
+    node.expectMembers(members::shown);
     Resource& owner = readOwner(node, chassis, device);
     readProperty(node.member("property", "the name of the property"), owner, block);
 }
@@ -131,8 +132,14 @@ void readShown(const Node& node, const Chassis& chassis, Device& device, Registe
 }  // namespace
 
 void readRegisterBlock(const Node& node, const Chassis& chassis, Device& device) {
-    node.expectMembers(
-        {"address", "size", "bytes", "access", "width", "on_read", "on_write", "runs", "shows"});
+    node.expectMembers(members::registerBlock);
+    // For those who read the file.
+    node.ifPresent("name", [](const Node& name) {
+        if (name.text().empty()) {
+            name.fail("is empty", "must be what people call the registers");
+        }
+    });
+    node.ifPresent("description", [](const Node& text) { text.text(); });
     RegisterBlock block;
     block.address = node.member("address", "the first address").unsignedNumber(0, UINT32_MAX);
     block.initial = readBytes(node);

@@ -3,6 +3,8 @@
 #include <string>
 #include <vector>
 
+#include "Members.h"
+
 namespace simulator {
 
 namespace {
@@ -43,27 +45,27 @@ void readUsageValue(const Node& value, const std::string& key, Refusal& status) 
 void readUsage(const Node& node, const Enumerations& enumerations, Refusal& status) {
     const std::string key = readKey(node.member("usage", ""));
     if (node.has("item") || node.has("enum")) {
-        node.expectMembers({"usage", "item", "enum"});
+        node.expectMembers(members::usageItem);
         readEnumUsage(node, key, enumerations, status);
     } else {
-        node.expectMembers({"usage", "value"});
+        node.expectMembers(members::usageValue);
         readUsageValue(node.member("value", "a text, a number or an array of texts"), key, status);
     }
 }
 
 void readEntry(const Node& node, const Enumerations& enumerations, Refusal& status) {
-    node.expectMembers({"usage", "value", "item", "enum", "elaboration", "header", "empty"});
+    node.expectMembers(members::entry);
     if (node.has("usage")) {
         readUsage(node, enumerations, status);
     } else if (node.has("elaboration")) {
-        node.expectMembers({"elaboration"});
+        node.expectMembers(members::elaboration);
         status.elaboration(readKey(node.member("elaboration", "")));
     } else if (node.has("header")) {
-        node.expectMembers({"header"});
+        node.expectMembers(members::header);
         status.header(readKey(node.member("header", "")));
     } else {
         const Node flag = node.member("empty", "there, unless usage, elaboration or header is");
-        node.expectMembers({"empty"});
+        node.expectMembers(members::emptyLine);
         flag.expect(flag.flag(), "true");
         status.empty();
     }
@@ -80,7 +82,7 @@ Refusal readNested(const Node& node, const Enumerations& enumerations, int depth
     if (depth > mostCauseDepth) {
         node.fail("is nested too deep", "causes are nested at most 16 deep");
     }
-    node.expectMembers({"code", "constant", "details", "causes"});
+    node.expectMembers(members::nestedStatus);
     const int32_t code = readCode(node);
     std::optional<std::string> constant;
     node.ifPresent("constant", [&](const Node& name) { constant = name.text(); });
@@ -98,11 +100,11 @@ Refusal readNested(const Node& node, const Enumerations& enumerations, int depth
 }  // namespace
 
 Refusal readStatus(const Node& node, const Enumerations& enumerations) {
-    node.expectMembers({"code", "constant", "details", "causes", "json"});
+    node.expectMembers(members::status);
     if (!node.has("json")) {
         return readNested(node, enumerations, 0);
     }
-    node.expectMembers({"code", "json"});
+    node.expectMembers(members::writtenStatus);
     return Refusal(readCode(node), std::nullopt).ownText(node.member("json", "").text());
 }
 

@@ -36,23 +36,32 @@ std::string wordAt(std::string_view rest) {
     return std::string(rest.begin(), end).substr(0, 20);
 }
 
+// What the JSON library says, as a part of a sentence.
+std::string reason(rapidjson::ParseErrorCode code) {
+    std::string words = rapidjson::GetParseError_En(code);
+    if (!words.empty() && words.back() == '.') {
+        words.pop_back();
+    }
+    return words;
+}
+
 Words textWords(const Place& place, rapidjson::ParseErrorCode code) {
     const bool inText = code == rapidjson::kParseErrorStringMissQuotationMark ||
                         code == rapidjson::kParseErrorStringInvalidEncoding ||
                         code == rapidjson::kParseErrorStringEscapeInvalid;
     const char c = place.first();
     if (inText && (c == '\n' || c == '\r')) {
-        return {"A text goes on in the next line.",
+        return {"A text goes on in the next line",
                 "a text must end in its line; \\n stands for a line break"};
     }
     if (inText && c == '\t') {
-        return {"There is a tabulator inside of a text.", "it must be written as \\t"};
+        return {"There is a tabulator inside of a text", "it must be written as \\t"};
     }
     if (code == rapidjson::kParseErrorStringInvalidEncoding) {
-        return {"There are bytes that are not UTF-8.", "the file must be saved as UTF-8"};
+        return {"There are bytes that are not UTF-8", "the file must be saved as UTF-8"};
     }
     if (code == rapidjson::kParseErrorStringEscapeInvalid) {
-        return {rapidjson::GetParseError_En(code), "a backslash in a text must be written as \\\\"};
+        return {reason(code), "a backslash in a text must be written as \\\\"};
     }
     return {};
 }
@@ -61,33 +70,32 @@ Words bracketWords(const Place& place, rapidjson::ParseErrorCode code) {
     const bool isOpen = code == rapidjson::kParseErrorObjectMissCommaOrCurlyBracket ||
                         code == rapidjson::kParseErrorArrayMissCommaOrSquareBracket;
     if (isOpen && place.rest.empty()) {
-        return {"The text ends too early.", "every bracket must be closed"};
+        return {"The text ends too early", "every bracket must be closed"};
     }
     if (isOpen) {
-        return {rapidjson::GetParseError_En(code), "elements must have a comma between them"};
+        return {reason(code), "elements must have a comma between them"};
     }
     if (code == rapidjson::kParseErrorDocumentRootNotSingular) {
-        return {rapidjson::GetParseError_En(code),
-                "there must be nothing behind the last closing bracket"};
+        return {reason(code), "there must be nothing behind the last closing bracket"};
     }
     return {};
 }
 
 Words wordWords(const Place& place, rapidjson::ParseErrorCode code) {
     if (place.first() == '.' || place.first() == '+') {
-        return {"A number begins with a point or a plus.",
+        return {"A number begins with a point or a plus",
                 "numbers must begin with a digit or a minus"};
     }
     if (place.last == '0' && (place.first() == 'x' || isDigit(place.first()))) {
-        return {"A number begins with 0.",
+        return {"A number begins with 0",
                 "numbers must be decimal, without 0x and without zeros in front"};
     }
     if (code == rapidjson::kParseErrorObjectMissName && isLetter(place.first())) {
-        return {"The name " + wordAt(place.rest) + " has no quotes.",
+        return {"The name " + wordAt(place.rest) + " has no quotes",
                 "names must stand in double quotes"};
     }
     if (code == rapidjson::kParseErrorValueInvalid && isLetter(place.first())) {
-        return {"The word " + wordAt(place.rest) + " is no value.",
+        return {"The word " + wordAt(place.rest) + " is no value",
                 "texts must stand in double quotes, and the words are true and false"};
     }
     return {};
@@ -96,13 +104,13 @@ Words wordWords(const Place& place, rapidjson::ParseErrorCode code) {
 Words markWords(const Place& place) {
     const char c = place.first();
     if (place.beginsWith("//") || place.beginsWith("/*") || c == '#') {
-        return {"There is a comment.", "JSON must have no comments"};
+        return {"There is a comment", "JSON must have no comments"};
     }
     if (c == '\'') {
-        return {"There is a single quote.", "texts must stand in double quotes"};
+        return {"There is a single quote", "texts must stand in double quotes"};
     }
     if ((c == '}' || c == ']') && place.last == ',') {
-        return {"There is a comma behind the last element.",
+        return {"There is a comma behind the last element",
                 "commas must stand between elements alone"};
     }
     return {};
@@ -120,7 +128,7 @@ Words wordsAt(const Place& place, rapidjson::ParseErrorCode code, const char* wh
             return words;
         }
     }
-    return {rapidjson::GetParseError_En(code), std::string(what) + " is one JSON object"};
+    return {reason(code), std::string(what) + " is one JSON object"};
 }
 
 }  // namespace

@@ -1,5 +1,9 @@
 #include "faults/FaultPlan.h"
 
+#include <algorithm>
+
+#include "MethodFunctions.h"
+
 namespace simulator {
 
 namespace {
@@ -17,6 +21,12 @@ double drawOf(uint64_t number) {
 }  // namespace
 
 bool Fault::matchesFunction(std::string_view name) const {
+    if (!method.empty()) {
+        return std::any_of(std::begin(methodFunctions), std::end(methodFunctions),
+                           [&](const MethodFunction& known) {
+                               return known.method == method && known.function == name;
+                           });
+    }
     return isBeginning ? name.substr(0, function.size()) == function : name == function;
 }
 

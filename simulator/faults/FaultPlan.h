@@ -29,6 +29,8 @@ class Fault {
     // The name of a function without its prefix, or the beginning of such names.
     std::string function;
     bool isBeginning = true;
+    // A method of the service instead, whose functions are struck; empty for none.
+    std::string method;
     // Null for calls about anything.
     const Resource* resource = nullptr;
     // Of the calls that match: the first that is struck, the distance from one to the next, and how
@@ -38,6 +40,9 @@ class Fault {
     uint64_t count = std::numeric_limits<uint64_t>::max();
     // Of these calls again, the part that is struck, 0 to 1.
     double probability = 1.0;
+    // Seconds since the plan came into force, between which calls are struck.
+    double begin = 0.0;
+    double end = std::numeric_limits<double>::infinity();
 
     // Seconds.
     double delay = 0.0;

@@ -3,7 +3,10 @@
 #include <algorithm>
 
 #include "DriverFunctions.h"
+#include "Members.h"
+#include "MethodFunctions.h"
 #include "description/Description.h"
+#include "description/Nearest.h"
 #include "description/StatusFile.h"
 
 namespace simulator {
@@ -12,6 +15,12 @@ namespace {
 
 constexpr uint32_t mostBytes = 1u << 30;
 constexpr uint32_t mostElements = 1u << 24;
+
+// The name in a text that may have the prefix of all functions in front.
+std::string_view nameOf(std::string_view text) {
+    constexpr std::string_view prefix = "nQITRMCAPI100_";
+    return text.substr(0, prefix.size()) == prefix ? text.substr(prefix.size()) : text;
+}
 
 void readFunction(const Node& node, Fault& fault) {
     std::string name = node.text();
@@ -23,8 +32,32 @@ void readFunction(const Node& node, Fault& fault) {
     if (std::none_of(std::begin(driverFunctions), std::end(driverFunctions),
                      [&](std::string_view known) { return fault.matchesFunction(known); })) {
         node.fail("is not a function of the driver that has a status",
-                  "must be the name of one without nQITRMCAPI100_, or its beginning with a star");
+                  perhapsMeant(nameOf(node.text()),
+                               {std::begin(driverFunctions), std::end(driverFunctions)}) +
+                      "must be the name of one without nQITRMCAPI100_, or its beginning with a "
+                      "star");
     }
+}
+
+void readMethod(const Node& node, Fault& fault) {
+    fault.method = node.text();
+    std::vector<std::string> known;
+    for (const MethodFunction& row : methodFunctions) {
+        if (known.empty() || known.back() != row.method) {
+            known.emplace_back(row.method);
+        }
+    }
+    if (std::find(known.begin(), known.end(), fault.method) == known.end()) {
+        node.fail("is not a method of the service",
+                  perhapsMeant(fault.method, known) + "must be the name of one");
+    }
+}
+
+// When something begins and ends.
+template <typename Timed>
+void readTimes(const Node& node, Timed& timed) {
+    node.ifPresent("after", [&](const Node& time) { timed.begin = time.seconds(); });
+    node.ifPresent("lasts", [&](const Node& time) { timed.end = timed.begin + time.seconds(); });
 }
 
 // By its present name, or else by its name in the description, which it has again in a file that
@@ -44,7 +77,7 @@ const Resource& readResource(const Node& node, const Chassis& chassis) {
 }
 
 void readTurns(const Node& node, Fault& fault) {
-    node.expectMembers({"first", "count", "every"});
+    node.expectMembers(members::calls);
     const auto read = [&](const char* name, uint64_t& number) {
         node.ifPresent(name,
                        [&](const Node& value) { number = value.unsignedNumber(1, UINT32_MAX); });
@@ -68,7 +101,7 @@ bool readIsAfter(const Node& node) {
 }
 
 OutputFault readOutput(const Node& node) {
-    node.expectMembers({"null", "null_items", "text_size", "count"});
+    node.expectMembers(members::output);
     OutputFault output;
     node.ifPresent("null", [&](const Node& flag) { output.isNull = flag.flag(); });
     node.ifPresent("null_items", [&](const Node& flag) { output.hasNullItems = flag.flag(); });
@@ -96,6 +129,9 @@ void expectSense(const Node& node, const Fault& fault) {
     if (!node.has("delay") && !fault.status && !fault.output) {
         node.fail("does nothing", "must have delay, status or output");
     }
+    if (node.has("function") && node.has("method")) {
+        node.member("method", "").fail("stands beside a function", "must be without one");
+    }
     if (node.has("moment") && !fails) {
         node.member("moment", "")
             .fail("belongs to no failure",
@@ -108,15 +144,16 @@ void expectSense(const Node& node, const Fault& fault) {
 }
 
 Fault readFault(const Node& node, const Chassis& chassis) {
-    node.expectMembers(
-        {"function", "resource", "calls", "probability", "delay", "status", "moment", "output"});
+    node.expectMembers(members::fault);
     Fault fault;
     node.ifPresent("function", [&](const Node& name) { readFunction(name, fault); });
+    node.ifPresent("method", [&](const Node& name) { readMethod(name, fault); });
     node.ifPresent("resource",
                    [&](const Node& name) { fault.resource = &readResource(name, chassis); });
     node.ifPresent("calls", [&](const Node& turns) { readTurns(turns, fault); });
     node.ifPresent("probability",
                    [&](const Node& number) { fault.probability = readProbability(number); });
+    readTimes(node, fault);
     node.ifPresent("delay", [&](const Node& time) { fault.delay = time.seconds(); });
     node.ifPresent("status", [&](const Node& status) {
         fault.status = readStatus(status, chassis.enumerations);
@@ -151,13 +188,12 @@ Absence readAbsence(const Node& node, const Device& device) {
 }
 
 DeviceEvent readEvent(const Node& node, const Chassis& chassis) {
-    node.expectMembers({"device", "event", "after", "lasts"});
+    node.expectMembers(members::event);
     const Device& device = readDevice(node.member("device", "the name of a device"), chassis);
     DeviceEvent event{&device,
                       readAbsence(node.member("event", "pulled or connection_lost"), device), 0.0,
                       std::numeric_limits<double>::infinity()};
-    node.ifPresent("after", [&](const Node& time) { event.begin = time.seconds(); });
-    node.ifPresent("lasts", [&](const Node& time) { event.end = event.begin + time.seconds(); });
+    readTimes(node, event);
     return event;
 }
 
@@ -167,8 +203,9 @@ FaultPlan readFaults(std::string_view text, const Chassis& chassis) {
     JsonDocument document;
     parseDescription(text, document, "a description of faults");
     const Node root(document);
-    root.expectMembers({"seed", "faults", "events"});
+    root.expectMembers(members::faults);
     FaultPlan plan;
+    root.ifPresent("$schema", [](const Node& schema) { schema.text(); });
     root.ifPresent("seed",
                    [&](const Node& seed) { plan.seed = seed.unsignedNumber(0, UINT32_MAX); });
     root.ifPresent("faults", [&](const Node& faults) {

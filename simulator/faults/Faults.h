@@ -38,6 +38,9 @@ class Faults : public Agenda {
     // The plan lives on while somebody holds it.
     const std::shared_ptr<FaultPlan>& plan() const { return current; }
 
+    // Whether a time, in seconds since the plan came into force, has come or is over.
+    bool isPast(double seconds) const { return timeOf(seconds) <= clock.now(); }
+
     int64_t next() const override { return due; }
     void catchUp() override;
 

@@ -51,7 +51,8 @@ Strike::Strike(Simulator& simulator, const Call& call)
     Subjects subjects(simulator, call);
     for (size_t place = 0; place < plan->faults.size(); ++place) {
         Fault& candidate = plan->faults[place];
-        if (candidate.matchesFunction(call.function()) &&
+        if (simulator.faults.isPast(candidate.begin) && !simulator.faults.isPast(candidate.end) &&
+            candidate.matchesFunction(call.function()) &&
             (candidate.resource == nullptr || subjects.include(*candidate.resource)) &&
             candidate.takeTurn(plan->seed, place) && fault == nullptr) {
             fault = &candidate;

@@ -4,6 +4,8 @@ import copy
 
 from hypothesis import strategies as st
 
+from described_files import known_members
+
 BOUNDS = {"Int32": (-2**31, 2**31 - 1), "Int64": (-2**63, 2**63 - 1), "UInt32": (0, 2**32 - 1),
           "UInt64": (0, 2**64 - 1)}
 SCALARS = ["Bool", "Double", *BOUNDS, "String"]
@@ -199,14 +201,8 @@ WRONG = [None, True, False, 0, 1, -1, 2, 65, 1.0, 1.5, -0.5, 1e300, 2**31, 2**32
          2**70, "", "x", "A,B", "$x", "x ", "ch1", "x01", "0", "0g", "abc", "a\0", "Bool", "Int32",
          "Rack", "ReadOnly", "é" * 40, [], {}, [1], ["a"], [[]], [True, 1], {"a": 1}, {"": 1},
          {"type": "Bool", "value": True}, {"type": "Bool"}]
-MEMBERS = ["name", "category", "slot", "modules", "values", "properties", "commands", "channels",
-           "nvmem_areas", "registers", "connect_seconds", "reachable", "prefix", "count", "type",
-           "value", "access", "needs_commit", "enum", "min", "max", "unit", "description",
-           "document", "computed", "seconds", "resets", "sets", "adds", "size", "bytes", "address",
-           "serial_number_wanted", "password", "devices", "enums", "$schema", "Dev.Comment",
-           "Dev.Name", "Own.a", "live", "seed", "noise", "drift", "counts", "follows", "waveform", "shape", "property", "resource",
-           "while", "samples", "per_second", "period", "fails", "status", "lasting",
-           "code", "when", "is", "details", "usage", "runs", "shows", "on_read", "width", "json", "colour", ""]
+MEMBERS = sorted(known_members("chassis.schema.json")) + ["Dev.Comment", "Dev.Name", "Own.a",
+                                                          "colour", ""]
 
 
 def places(node, path=()):

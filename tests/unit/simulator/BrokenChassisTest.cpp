@@ -37,13 +37,13 @@ TEST(BrokenChassisTest, AFileWithoutEndIsGivenUp) {
 
 TEST(BrokenChassisTest, AnEmptyFileIsNotJson) {
     expectFault("", "",
-                "is not JSON at line 1, column 1: The document is empty.; "
+                "is not JSON at line 1, column 1: The document is empty; "
                 "a chassis description is one JSON object");
 }
 
 TEST(BrokenChassisTest, TextThatIsNotJsonIsToldWithItsLine) {
     expectFault("{\n  \"devices\": [,]\n}", "",
-                "is not JSON at line 2, column 15: Invalid value.; "
+                "is not JSON at line 2, column 15: Invalid value; "
                 "a chassis description is one JSON object");
 }
 
@@ -91,8 +91,8 @@ TEST(BrokenChassisTest, AMissingMemberIsNamedByItsPlace) {
 TEST(BrokenChassisTest, AMistypedMemberIsNamedWithTheOnesThatExist) {
     expectFault("{\"devises\":[]}", "/devises",
                 "is not a known member; perhaps \"devices\" is meant; the members here are "
-                "$schema, first_session_handle, enums, driver_properties, system_values, "
-                "session_values, devices, seed");
+                "$schema, devices, first_session_handle, enums, driver_properties, seed, "
+                "system_values, session_values");
 }
 
 TEST(BrokenChassisTest, AMemberThatStandsTwiceIsRefused) {

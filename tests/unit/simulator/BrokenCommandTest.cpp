@@ -46,8 +46,8 @@ TEST(BrokenCommandTest, EffectsOnTheDeviceAreThoseOfItsProperties) {
 TEST(BrokenCommandTest, AFailureHasAStatus) {
     expectFailureFault("", "/status", "is missing; must be the status that the command gives");
     expectFailureFault("\"often\":1", "/often",
-                       "is not a known member; the members here are status, when, probability, "
-                       "every");
+                       "is not a known member; the members here are status, when, every, "
+                       "probability");
 }
 
 TEST(BrokenCommandTest, AFailureLooksAtAPropertyOfItsResource) {

@@ -21,7 +21,7 @@ void expectBlockFault(const std::string& members, const std::string& place,
 TEST(BrokenRegisterTest, TheMembersOfABlockAreTold) {
     expectBlockFault("\"size\":4,\"show\":\"I\"", "/show",
                      "is not a known member; perhaps \"shows\" is meant; the members here are "
-                     "address, size, bytes, access, "
+                     "name, description, address, size, bytes, access, "
                      "width, on_read, on_write, runs, shows");
 }
 

@@ -426,6 +426,25 @@ TEST_F(LiveTest, AnEventThatIsOverAtTheEndOfACommandEndsIt) {
     EXPECT_EQ(status.code, -250941);
 }
 
+TEST_F(LiveTest, AFaultStrikesAndCountsTheCallsOfItsTime) {
+    const auto codesWith = [&](const std::string& members) {
+        const FaultsInForce faults(
+            oneFault("\"function\":\"abortSession\",\"status\":{\"code\":-77}," + members));
+        std::vector<int32_t> codes;
+        for (int call = 0; call < 5; ++call) {
+            codes.push_back(session.abort());
+        }
+        return codes;
+    };
+    // A millisecond passes at the beginning of each call.
+    using Codes = std::vector<int32_t>;
+    EXPECT_EQ(codesWith("\"after\":0.003"), (Codes{0, 0, -77, -77, -77}));
+    EXPECT_EQ(codesWith("\"lasts\":0.003"), (Codes{-77, -77, 0, 0, 0}));
+    EXPECT_EQ(codesWith("\"after\":0.003,\"lasts\":0.002"), (Codes{0, 0, -77, -77, 0}));
+    EXPECT_EQ(codesWith("\"after\":0.003,\"lasts\":0.002,\"calls\":{\"first\":2}"),
+              (Codes{0, 0, 0, -77, 0}));
+}
+
 TEST_F(LiveTest, ManyMayReadAndWriteAtOnce) {
     std::vector<std::thread> threads;
     for (int i = 0; i < 4; ++i) {

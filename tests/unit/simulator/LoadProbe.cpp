@@ -1,4 +1,5 @@
-// Reads chassis descriptions from standard input, each as its length in decimal digits, a newline
+// Reads chassis descriptions, or with the argument "faults" descriptions of faults in the built-in
+// chassis, from standard input, each as its length in decimal digits, a newline
 // and so many bytes, and answers each with a line: "loaded", or the place of the fault as a JSON
 // pointer, a tabulator, what is wrong, "; " and what would be right.
 
@@ -6,14 +7,26 @@
 #include <iostream>
 #include <string>
 
+#include "EmbeddedTexts.h"
 #include "description/ChassisFile.h"
 #include "description/Description.h"
+#include "faults/FaultReader.h"
 
 namespace {
 
-std::string answerTo(const std::string& description) {
+void loadChassis(const std::string& description) {
+    simulator::parseChassis(description);
+}
+
+void loadFaults(const std::string& description) {
+    static const auto chassis = simulator::parseChassis(simulator::embedded::bench);
+    simulator::readFaults(description, *chassis);
+}
+
+std::string answerTo(const std::string& description, void (*load)(const std::string&)) {
     try {
-        return simulator::parseChassis(description) != nullptr ? "loaded" : "nothing";
+        load(description);
+        return "loaded";
     } catch (const simulator::DescriptionFault& fault) {
         return simulator::oneLine(fault.pointer) + "\t" +
                simulator::oneLine(fault.wrong + "; " + fault.right);
@@ -22,14 +35,15 @@ std::string answerTo(const std::string& description) {
 
 }  // namespace
 
-int main() {
+int main(int count, char** arguments) {
+    const bool ofFaults = count > 1 && std::string(arguments[1]) == "faults";
     std::size_t length = 0;
     while (std::cin >> length && std::cin.get() == '\n') {
         std::string description(length, '\0');
         if (!std::cin.read(description.data(), static_cast<std::streamsize>(length))) {
             break;
         }
-        std::cout << answerTo(description) << std::endl;
+        std::cout << answerTo(description, ofFaults ? loadFaults : loadChassis) << std::endl;
     }
     return std::cin.eof() ? 0 : 1;
 }

@@ -14,9 +14,19 @@ CHASSIS = REPOSITORY / "simulator" / "chassis"
 # Far more than a description takes: it only ends a loader that would never end.
 PATIENCE_SECONDS = 30
 
+FAULTS = (BUILD / "bin" / "simulator_load_probe", "faults")
+
+
+def expect_sentence(words):
+    """What is wrong and what would be right are two parts of one sentence, without a full stop."""
+    wrong, right = words.split("; ", 1)
+    for part in (wrong, right):
+        assert part == part.strip() and part and part[-1] not in ".;,", words
+
 
 class LoadProbe:
-    """Answers whether descriptions load.
+    """Answers whether descriptions load; with the command FAULTS, whether descriptions of faults in
+    the built-in chassis do.
 
         with LoadProbe() as probe:
             assert probe.load('{"devices": []}') is None
@@ -55,6 +65,7 @@ class LoadProbe:
         if answer == "loaded":
             return None
         pointer, words = answer.split("\t", 1)
+        expect_sentence(words)
         return pointer, words
 
     def _read_line(self):
