@@ -40,9 +40,9 @@ size_t distance(std::string_view left, std::string_view right) {
 
 }  // namespace
 
-std::string perhapsMeant(std::string_view given, const std::vector<std::string>& known) {
+const std::string* nearestName(std::string_view given, const std::vector<std::string>& known) {
     if (given.empty() || given.size() > longest) {
-        return {};
+        return nullptr;
     }
     size_t least = given.size() / 3 + 1;
     const std::string* nearest = nullptr;
@@ -55,6 +55,11 @@ std::string perhapsMeant(std::string_view given, const std::vector<std::string>&
             }
         }
     }
+    return nearest;
+}
+
+std::string perhapsMeant(std::string_view given, const std::vector<std::string>& known) {
+    const std::string* nearest = nearestName(given, known);
     return nearest == nullptr ? std::string() : "perhaps \"" + *nearest + "\" is meant; ";
 }
 

@@ -1,5 +1,6 @@
 #include <algorithm>
 
+#include "description/Nearest.h"
 #include "entries/Attributes.h"
 #include "entries/TypedValues.h"
 #include "sessions/CommandRun.h"
@@ -7,6 +8,19 @@
 using namespace simulator;
 
 namespace {
+
+[[noreturn]] void refuseUnknown(std::string_view command, const Resource& resource) {
+    Refusal refusal(code::unknownCommand);
+    refusal.usage(tag::command, command).usage(tag::resource, resource.fullName());
+    std::vector<std::string> known;
+    for (const Command& other : resource.commands) {
+        known.push_back(other.name);
+    }
+    if (const std::string* nearest = nearestName(command, known)) {
+        refusal.usage(tag::nearestName, *nearest);
+    }
+    throw refusal;
+}
 
 // One task for each resource, however often it is named.
 std::vector<Task> findTasks(const Resolver& resolver, std::string_view resources,
@@ -17,9 +31,7 @@ std::vector<Task> findTasks(const Resolver& resolver, std::string_view resources
     for (Resource* resource : found) {
         Command* known = resource->command(command);
         if (known == nullptr) {
-            throw Refusal(code::unknownCommand)
-                .usage(tag::command, command)
-                .usage(tag::resource, resource->fullName());
+            refuseUnknown(command, *resource);
         }
         const auto isSame = [&](const Task& task) { return task.resource == resource; };
         if (std::none_of(tasks.begin(), tasks.end(), isSame)) {

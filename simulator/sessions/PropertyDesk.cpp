@@ -1,5 +1,6 @@
 #include "sessions/PropertyDesk.h"
 
+#include "description/Nearest.h"
 #include "sessions/ComputedProperties.h"
 #include "status/Refusal.h"
 
@@ -18,18 +19,28 @@ Category categoryOf(Kind kind) {
     }
 }
 
-[[noreturn]] void refuseUnknown(std::string_view name, const Resource* resource) {
+// known: the names that can be read or written instead.
+[[noreturn]] void refuseUnknown(std::string_view name, const Resource* resource,
+                                const std::vector<std::string>& known) {
     Refusal refusal(code::unknownProperty);
     refusal.usage(tag::propertyName, name);
     if (resource != nullptr) {
         refusal.usage(tag::resource, resource->fullName());
     }
+    if (const std::string* nearest = nearestName(name, known)) {
+        refusal.usage(tag::nearestName, *nearest);
+    }
     throw refusal;
 }
 
-Refusal about(const Code& reason, const PropertyDefinition& definition) {
+// resource: null for the system and the session.
+Refusal about(const Code& reason, const PropertyDefinition& definition,
+              const Resource* resource = nullptr) {
     Refusal refusal(reason);
     refusal.usage(tag::propertyName, definition.name);
+    if (resource != nullptr) {
+        refusal.usage(tag::resource, resource->fullName());
+    }
     return refusal;
 }
 
@@ -44,9 +55,18 @@ void expectType(const PropertyDefinition& definition, DataType type, size_t plac
     }
 }
 
-[[noreturn]] void refuseRange(const PropertyDefinition& definition, const Elements& value,
-                              size_t index) {
-    Refusal refusal = about(code::valueOutOfRange, definition);
+// "Off (0)" and the like.
+std::vector<std::string> itemsOf(const Enumeration& enumeration) {
+    std::vector<std::string> items;
+    for (const auto& [name, number] : enumeration.items) {
+        items.push_back(name + " (" + std::to_string(number) + ")");
+    }
+    return items;
+}
+
+[[noreturn]] void refuseRange(const PropertyDefinition& definition, const Resource* resource,
+                              const Elements& value, size_t index) {
+    Refusal refusal = about(code::valueOutOfRange, definition, resource);
     refusal.usage(tag::requestedValue, firstText(elementAt(value, index)));
     if (definition.least) {
         refusal.usage(tag::minimum, firstText(*definition.least));
@@ -71,6 +91,18 @@ void forEachPart(const std::vector<Resource*>& resources, Visit visit) {
 
 }  // namespace
 
+std::vector<std::string> PropertyDesk::knownNames(Category category, const Resource* resource,
+                                                  const PropertyStore& store) const {
+    std::vector<std::string> names = store.names();
+    for (const DefinitionPointer& definition : simulator.chassis->catalogue.definitions(category)) {
+        if (definition->computed &&
+            computedValue(simulator, session, category, resource, definition->name)) {
+            names.push_back(definition->name);
+        }
+    }
+    return names;
+}
+
 PropertyDesk::Place PropertyDesk::find(Category category, Resource* resource, PropertyStore& store,
                                        std::string_view name) {
     if (Property* stored = store.find(name)) {
@@ -79,7 +111,7 @@ PropertyDesk::Place PropertyDesk::find(Category category, Resource* resource, Pr
     auto computed = computedValue(simulator, session, category, resource, name);
     DefinitionPointer definition = simulator.chassis->catalogue.find(category, name);
     if (!computed || definition == nullptr) {
-        refuseUnknown(name, resource);
+        refuseUnknown(name, resource, knownNames(category, resource, store));
     }
     return {category, resource, definition, nullptr, std::move(computed)};
 }
@@ -137,15 +169,16 @@ Elements PropertyDesk::read(std::string_view resources, std::string_view name, D
 void PropertyDesk::expectAcceptable(const Place& place, const Elements& value) const {
     const PropertyDefinition& definition = *place.definition;
     if (definition.access == PropertyAccess::readOnly) {
-        throw about(code::readOnlyProperty, definition);
+        throw about(code::readOnlyProperty, definition, place.resource);
     }
     if (const auto index = definition.firstWithoutItem(value)) {
-        throw about(code::valueNotEnumerated, definition)
+        throw about(code::valueNotEnumerated, definition, place.resource)
             .usageEnum(tag::requestedValue, std::get<List<int32_t>>(value)[*index],
-                       definition.enumeration->id);
+                       definition.enumeration->id)
+            .usage(tag::allowedValues, itemsOf(*definition.enumeration));
     }
     if (const auto index = definition.firstOutOfRange(value)) {
-        refuseRange(definition, value, *index);
+        refuseRange(definition, place.resource, value, *index);
     }
     if (place.resource != nullptr) {
         simulator.reservations.expectWritable(session.handle, *place.resource->device);
@@ -225,13 +258,20 @@ void PropertyDesk::commit(std::string_view resources) {
 }
 
 OpenProperty PropertyDesk::openDriverDefined(std::string_view name) {
-    for (const Category category : {Category::session, Category::system, Category::device,
-                                    Category::physChan, Category::nvmemArea}) {
+    constexpr Category categories[] = {Category::session, Category::system, Category::device,
+                                       Category::physChan, Category::nvmemArea};
+    for (const Category category : categories) {
         if (auto definition = simulator.chassis->catalogue.find(category, name)) {
             return {session.handle, category, std::move(definition), nullptr};
         }
     }
-    refuseUnknown(name, nullptr);
+    std::vector<std::string> known;
+    for (const Category category : categories) {
+        for (const DefinitionPointer& other : simulator.chassis->catalogue.definitions(category)) {
+            known.push_back(other->name);
+        }
+    }
+    refuseUnknown(name, nullptr, known);
 }
 
 OpenProperty PropertyDesk::openGeneric(std::string_view resource, std::string_view name) {

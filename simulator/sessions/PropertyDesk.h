@@ -46,6 +46,9 @@ class PropertyDesk {
         std::optional<Elements> computed;
     };
 
+    // The names of the properties that are there.
+    std::vector<std::string> knownNames(Category category, const Resource* resource,
+                                        const PropertyStore& store) const;
     std::vector<Place> findIn(Category category, std::string_view name);
     std::vector<Place> find(std::string_view resources, std::string_view name);
     Place find(Category category, Resource* resource, PropertyStore& store, std::string_view name);

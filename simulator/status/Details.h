@@ -43,6 +43,7 @@ class Details {
 
 // The keys of the labels in use.
 namespace tag {
+inline constexpr std::string_view allowedValues = "kUsageTypeAllowedValues";
 inline constexpr std::string_view areaSize = "kUsageTypeNvmemAreaSize";
 inline constexpr std::string_view argument = "kUsageTypeArgumentName";
 inline constexpr std::string_view attribute = "kUsageTypeAttributeName";
@@ -56,6 +57,7 @@ inline constexpr std::string_view handle = "kUsageTypeIdentifier";
 inline constexpr std::string_view jsonPointer = "kUsageTypeJsonDocPointer";
 inline constexpr std::string_view maximum = "kUsageTypeMaximumValue";
 inline constexpr std::string_view minimum = "kUsageTypeMinimumValue";
+inline constexpr std::string_view nearestName = "kUsageTypeNearestName";
 inline constexpr std::string_view nvmemAddress = "kUsageTypeNvmemAddress";
 inline constexpr std::string_view propertyName = "kUsageTypePropertyName";
 inline constexpr std::string_view registerAddress = "kUsageTypeRegisterAddress";

@@ -58,6 +58,13 @@ TEST_F(CommandTest, AnUnknownCommandIsRefusedWithItsResource) {
     EXPECT_EQ(get(getUInt64, session, "Mod1", "DMM.TriggerCount"), uint64_t{0});
 }
 
+TEST_F(CommandTest, AMisspeltCommandIsRefusedWithTheNearestName) {
+    EXPECT_EQ(execute(session, "Mod1", "dmm.triger", 1.0).text,
+              detailsOf("unknownCommand", usage("CommandName", "\"dmm.triger\"") + "," +
+                                              usage("ResourceName", "\"Mod1\"") + "," +
+                                              usage("NearestName", "\"DMM.Trigger\"")));
+}
+
 TEST_F(CommandTest, ACommandNeedsAResourceAndATime) {
     EXPECT_EQ(execute(session, "", "DMM.Trigger", 1.0).code, -250959);
     EXPECT_EQ(execute(session, "Mod1", "DMM.Trigger", -1.0).code, -250962);

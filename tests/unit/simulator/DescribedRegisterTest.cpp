@@ -40,8 +40,8 @@ class DescribedRegisterTest : public testing::Test {
 };
 
 std::string aboutProperty(const char* name, const std::string& more = "") {
-    return usage("PropertyName", "\"" + std::string(name) + "\"") + (more.empty() ? "" : ",") +
-           more;
+    return usage("PropertyName", "\"" + std::string(name) + "\"") + "," +
+           usage("ResourceName", "\"Unit\"") + (more.empty() ? "" : ",") + more;
 }
 
 TEST_F(DescribedRegisterTest, BytesAreClearedWhenTheyHaveBeenRead) {
@@ -195,7 +195,8 @@ TEST_F(DescribedRegisterTest, APropertyTakesWhatItsRulesAllow) {
                         aboutProperty("Phase",
                                       "{\"type\":\"usage\",\"usage\":\"kUsageTypeRequestedValue\","
                                       "\"value\":3,\"value_type\":{\"type\":\"enum\","
-                                      "\"id\":4096}}")));
+                                      "\"id\":4096}}," +
+                                          usage("AllowedValues", "[\"Idle (0)\",\"Busy (7)\"]"))));
     EXPECT_EQ(put(164, 7).code, 0);
     const Outcome access = put(136, 0);
     EXPECT_EQ(access.code, -250968);

@@ -127,6 +127,32 @@ TEST_F(PropertyTest, AnUnknownPropertyIsRefusedWithItsResource) {
     EXPECT_EQ(get(getUInt32, session, "Bench", "Dev.SlotNum").code, -250964);
 }
 
+TEST_F(PropertyTest, AMisspeltPropertyIsRefusedWithTheNearestName) {
+    const auto refusal = [](const char* given, const std::string& more) {
+        return detailsOf("unknownProperty",
+                         usage("PropertyName", "\"" + std::string(given) + "\"") + "," + more);
+    };
+    const std::string module = usage("ResourceName", "\"Mod1\"") + ",";
+    EXPECT_EQ(get(getDouble, session, "Mod1", "DMM.Rnage").text,
+              refusal("DMM.Rnage", module + usage("NearestName", "\"DMM.Range\"")));
+    EXPECT_EQ(get(getDouble, session, "Mod1", "dmm.range").text,
+              refusal("dmm.range", module + usage("NearestName", "\"DMM.Range\"")));
+    // Of those that the driver computes too, but not of those that the resource lacks.
+    EXPECT_EQ(get(getUInt32, session, "Mod1", "Dev.SlotNumber").text,
+              refusal("Dev.SlotNumber", module + usage("NearestName", "\"Dev.SlotNum\"")));
+    EXPECT_EQ(get(getUInt32, session, "Mod1", "Far.From.Everything").text,
+              refusal("Far.From.Everything", usage("ResourceName", "\"Mod1\"")));
+    Status status;
+    char** names = nullptr;
+    uint32_t count = 0;
+    nQITRMCAPI100_getSystemPropertyStringArray(session, "Sys.Device", &names, &count, &status);
+    EXPECT_EQ(status.text(), refusal("Sys.Device", usage("NearestName", "\"Sys.Devices\"")));
+    Status opening;
+    nQITRMCAPI100_Property property = 0;
+    nQITRMCAPI100_openDriverDefinedProperty(session, "Dev.Coment", &property, &opening);
+    EXPECT_EQ(opening.text(), refusal("Dev.Coment", usage("NearestName", "\"Dev.Comment\"")));
+}
+
 TEST_F(PropertyTest, ResourcesMustBeNamed) {
     EXPECT_EQ(get(getDouble, session, "", "DMM.Range").code, -250959);
     EXPECT_EQ(get(getDouble, session, "Mod9", "DMM.Range").code, -250956);
@@ -139,7 +165,8 @@ TEST_F(PropertyTest, AReadOnlyPropertyIsNotWritten) {
     const Outcome outcome = set(setUInt64, session, "Mod1", "DMM.TriggerCount", uint64_t{1});
     EXPECT_EQ(outcome.code, -250968);
     EXPECT_EQ(outcome.text,
-              detailsOf("readOnlyProperty", usage("PropertyName", "\"DMM.TriggerCount\"")));
+              detailsOf("readOnlyProperty", usage("PropertyName", "\"DMM.TriggerCount\"") + "," +
+                                                usage("ResourceName", "\"Mod1\"")));
     EXPECT_EQ(set(setUInt32, session, "Mod1", "Dev.SlotNum", 3u).code, -250968);
 }
 
@@ -156,9 +183,13 @@ TEST_F(PropertyTest, AValueThatIsNoItemIsRefusedAsOne) {
     EXPECT_EQ(outcome.code, -250970);
     EXPECT_EQ(outcome.text,
               detailsOf("valueNotEnumerated",
-                        usage("PropertyName", "\"DMM.Function\"") +
+                        usage("PropertyName", "\"DMM.Function\"") + "," +
+                            usage("ResourceName", "\"Mod1\"") +
                             ",{\"type\":\"usage\",\"usage\":\"kUsageTypeRequestedValue\","
-                            "\"value\":3,\"value_type\":{\"type\":\"enum\",\"id\":4096}}"));
+                            "\"value\":3,\"value_type\":{\"type\":\"enum\",\"id\":4096}}," +
+                            usage("AllowedValues",
+                                  "[\"Voltage (0)\",\"Current (1)\",\"Resistance (2)\","
+                                  "\"Temperature (10)\"]")));
     EXPECT_EQ(get(getInt32, session, "Mod1", "DMM.Function"), 10);
 }
 
@@ -167,6 +198,7 @@ TEST_F(PropertyTest, AValueOutOfRangeIsRefusedWithTheLimits) {
     EXPECT_EQ(outcome.code, -250971);
     EXPECT_EQ(outcome.text,
               detailsOf("valueOutOfRange", usage("PropertyName", "\"PSU.Voltage\"") + "," +
+                                               usage("ResourceName", "\"Mod2/ch0\"") + "," +
                                                usage("RequestedValue", "\"30.5\"") + "," +
                                                usage("MinimumValue", "\"0\"") + "," +
                                                usage("MaximumValue", "\"30\"")));

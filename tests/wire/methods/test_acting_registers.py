@@ -83,8 +83,8 @@ def test_a_register_keeps_to_the_limits_of_its_property(session):
     assert write(session, "Mod1", 1040, 32, 2**32 - 1000) == written(1040)
     assert value(session, "DMM.Offset", '"devices":"Mod1"') == answer_of("Int32", -1000)
     assert write(session, "Mod1", 1040, 32, 2**32 - 1001) == failure(
-        -250971, "Property Name: DMM.Offset", "Requested Value: -1001", "Minimum Value: -1000",
-        "Maximum Value: 1000")
+        -250971, "Property Name: DMM.Offset", "Resource Name: Mod1", "Requested Value: -1001",
+        "Minimum Value: -1000", "Maximum Value: 1000")
     assert holds(session, "Mod1", 1040, 32, 2**32 - 1000)
 
 
@@ -97,8 +97,8 @@ def test_voltages_stand_in_registers(session):
         '{"data_type":"Double"}')
     assert holds(session, "Mod2", 1032, 64, bits(3.25))
     assert write(session, "Mod2", 1032, 64, bits(-0.5)) == failure(
-        -250971, "Property Name: PSU.Voltage", "Requested Value: -0.5", "Minimum Value: 0",
-        "Maximum Value: 30")
+        -250971, "Property Name: PSU.Voltage", "Resource Name: Mod2/ch1", "Requested Value: -0.5",
+        "Minimum Value: 0", "Maximum Value: 30")
 
 
 def command(session, name, channel):

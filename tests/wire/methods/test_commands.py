@@ -63,7 +63,7 @@ def test_the_default_resource_needs_commands_to_list(rack, params, answer):
     ("Chan.Set", '"physical_channel":"Unit1/ch0:3"',
      result_response('{"description":"","document":""}')),
     ("unit.set", '"device":"Unit1"', failure(-250975, "Command Name: unit.set",
-                                             "Resource Name: Unit1")),
+                                             "Resource Name: Unit1", "Nearest Name: Unit.Set")),
     ("Unit.Set", '"physical_channel":"Unit1/ch0"', failure(-250975, "Command Name: Unit.Set",
                                                            "Resource Name: Unit1/ch0")),
     ("Unit.Set", "", failure(-250959)),

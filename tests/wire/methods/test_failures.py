@@ -151,7 +151,7 @@ FAILURES = {
 
 # What takes two connections, a hundred sessions or a state folder, and has a test of its own; and
 # -250987, which would take ten seconds and has one with the driver alone.
-PROVOKED_ELSEWHERE = {"initializeSession": {-250901}, "connectToDevices": {-250963, -250987},
+PROVOKED_ELSEWHERE = {"initializeSession": {-250901, -250931}, "connectToDevices": {-250963, -250987},
                       "executeCommand": {-250931, -250963, -250977}, "renameDevice": {-250931},
                       "setProperty": {-250931}, "commitProperties": {-250931},
                       "commitNvmemAreas": {-250931},

@@ -118,9 +118,11 @@ def test_without_resources_only_listed_names_are_known(rack, method, more, name)
         assert session.ask(method, f'"property":"{name}"{more}') == NONE_GIVEN
 
 
-@pytest.mark.parametrize("name", ["No.Such", "any.int32", "dev.name", "Any.Int32 ", ""])
-def test_an_unknown_name_on_a_resource_is_the_driver_s_to_refuse(session, name):
-    details = [f"Property Name: {name}", "Resource Name: Unit1"]
+@pytest.mark.parametrize("name, nearest", [
+    ("No.Such", []), ("any.int32", ["Nearest Name: Any.Int32"]),
+    ("dev.name", ["Nearest Name: Dev.Name"]), ("Any.Int32 ", ["Nearest Name: Any.Int32"]), ("", [])])
+def test_an_unknown_name_on_a_resource_is_the_driver_s_to_refuse(session, name, nearest):
+    details = [f"Property Name: {name}", "Resource Name: Unit1", *nearest]
     assert session.ask("getProperty", f'"property":"{name}","devices":"Unit1"') == failure(
         -250964, *details)
     assert session.ask("setProperty", f'"property":"{name}","devices":"Unit1","value":1') == (
@@ -189,20 +191,21 @@ def test_a_property_that_can_only_be_written_is_not_read(session):
 
 def test_a_property_that_can_only_be_read_is_not_written(session):
     assert session.ask("setProperty", '"property":"Info.Plain","devices":"Unit1","value":1') == (
-        failure(-250968, "Property Name: Info.Plain"))
+        failure(-250968, "Property Name: Info.Plain", "Resource Name: Unit1"))
 
 
 @pytest.mark.parametrize("sent, read", [("0.09", "0.09"), ("-1", "-1"), ("1e301", "1e+301")])
 def test_a_value_beyond_its_limits_is_refused(session, sent, read):
     assert session.ask("setProperty", f'"property":"Info.Limited","devices":"Unit1","value":{sent}'
                        ) == failure(-250971, "Property Name: Info.Limited",
-                                    f"Requested Value: {read}", "Minimum Value: 0.1",
+                                    "Resource Name: Unit1", f"Requested Value: {read}", "Minimum Value: 0.1",
                                     "Maximum Value: 1e+300")
 
 
 def test_a_value_that_is_no_item_of_its_enumeration_is_refused(session):
     assert session.ask("setProperty", '"property":"Info.Mode","devices":"Unit1","value":4') == (
-        failure(-250970, "Property Name: Info.Mode", "Requested Value: 4"))
+        failure(-250970, "Property Name: Info.Mode", "Resource Name: Unit1", "Requested Value: 4",
+                'Allowed Values: Zulu (3), Alpha (-2147483648), ä "b" (2147483647)'))
     assert session.ask("setProperty",
                        '"property":"Info.Mode","devices":"Unit1","value":-2147483648') == (
         result_response('{"data_type":"Int32"}'))

@@ -155,10 +155,11 @@ def test_an_array_on_several_resources_is_not_described(session):
         -250829, "Devices: Unit1,Unit2")
 
 
-@pytest.mark.parametrize("name", ["No.Such", "info.full"])
-def test_what_is_not_there_is_not_described(session, name):
+@pytest.mark.parametrize("name, nearest", [
+    ("No.Such", []), ("info.full", ["Nearest Name: Info.Full"])])
+def test_what_is_not_there_is_not_described(session, name, nearest):
     assert session.ask("getPropertyInformation", f'"property":"{name}","device":"Unit1"') == (
-        failure(-250964, f"Property Name: {name}", "Resource Name: Unit1"))
+        failure(-250964, f"Property Name: {name}", "Resource Name: Unit1", *nearest))
 
 
 class Held:
