@@ -2,6 +2,7 @@
 #include <tuple>
 
 #include "ServiceTest.h"
+#include "qitrmcwebsvc/IProcedureFactory.h"
 #include "support/allocationFaults.h"
 #include "support/cjsonLeak.h"
 #include "support/knownChassis.h"
@@ -109,6 +110,17 @@ const Scenario scenarios[] = {
               R"("old_chassis_name":"Bench","new_chassis_name":"aNewNameForTheChassis")"),
     onSession("GetChassisIpOrHostname", R"("device":"Bench")"),
 };
+
+TEST(RequestAllocation, IsTriedWithEachMethod) {
+    for (const nQITRMCWEBSVC100::Method& method : nQITRMCWEBSVC100::methodTable) {
+        const std::string member = "\"method\":\"" + std::string(method.name) + "\"";
+        EXPECT_TRUE(std::any_of(std::begin(scenarios), std::end(scenarios),
+                                [&](const Scenario& scenario) {
+                                    return scenario.body.find(member) != std::string::npos;
+                                }))
+            << method.name;
+    }
+}
 
 using Parameter = std::tuple<AllocationFault::Extent, Scenario>;
 

@@ -39,11 +39,10 @@ def test_the_page_is_up_to_date(tmp_path):
     assert page.read_bytes() == (DOCS / "methods.md").read_bytes()
 
 
-def test_the_page_has_a_section_for_each_of_the_26_methods():
+def test_the_page_has_a_section_for_each_method():
     methods = list(make_methods.read_methods())
     page = (DOCS / "methods.md").read_text(encoding="utf-8")
     sections = [line.removeprefix("## ") for line in page.splitlines() if line.startswith("## ")]
-    assert len(methods) == 26
     assert sections == ["Errors of every method", *methods]
 
 
