@@ -1,21 +1,22 @@
+// Folder embedded: the JSON schemas and Lua scripts that are compiled into the program.
 #pragma once
 
 #include <cstdint>
 
-// The JSON schemas and Lua scripts that the program carries as constant data, so that it needs no
-// such file on the controller. All of it is read-only: any thread may use it at any time.
+// The files are constant data, so none of them has to be installed on the controller. Any thread
+// may read them at any time.
 
 struct EmbeddedFile {
-    // With its extension and without a folder.
+    // With its extension, without a folder.
     const char* name;
-    // The bytes as they stand in the source file. A NUL follows the last one, so that a file
-    // without a NUL of its own can be read as a C text.
+    // The bytes of the source file, followed by a NUL, so that a file that contains no NUL can be
+    // read as a C string.
     const char* data;
-    // The count of bytes, without that NUL.
+    // The number of bytes, without that NUL.
     std::uint32_t size;
 };
 
-// The files in table order, for a range-based loop.
+// The files in the order of the table, for a range-based loop.
 struct EmbeddedFiles {
     const EmbeddedFile* first;
     const EmbeddedFile* last;
@@ -26,6 +27,6 @@ struct EmbeddedFiles {
 
 EmbeddedFiles embeddedFiles() noexcept;
 
-// The data of the file of exactly this name. Throws std::out_of_range when there is none, which is
-// a defect of the program.
+// The data of the file with exactly this name. Throws std::out_of_range if there is no such file,
+// which is a programming error.
 const char* embeddedText(const char* name);

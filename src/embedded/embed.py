@@ -4,13 +4,13 @@
 import sys
 from pathlib import Path
 
-# Characters that stand for themselves in a C++ string literal. A question mark is left out, since
-# older language levels read two of them as the start of another character.
+# Characters that need no escape in a C++ string literal. The question mark is not among them, since
+# two of them begin a trigraph in older versions of C++.
 PLAIN = frozenset(range(0x20, 0x7F)) - frozenset(b'"\\?')
 
 
 def escaped(line: bytes) -> str:
-    # Always three octal digits, so that a digit after the escape is not taken for a part of it.
+    # Always three octal digits, so that a digit after the escape is not read as part of it.
     return "".join(chr(byte) if byte in PLAIN else f"\\{byte:03o}" for byte in line)
 
 

@@ -4,7 +4,7 @@
 #include <cstring>
 #include <lua.hpp>
 
-// Nothing here owns anything: a Lua error jumps over the frames of these functions.
+// These functions must not own resources: a Lua error is a longjmp that skips destructors.
 
 bool isLuaFile(const EmbeddedFile& file) {
     const char* extension = std::strrchr(file.name, '.');

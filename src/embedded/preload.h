@@ -4,23 +4,23 @@
 
 struct lua_State;
 
-// Offers the embedded Lua scripts to a Lua state as modules, so that `require` finds them without a
-// search path.
+// Registers the embedded Lua scripts as modules of a Lua state, so that `require` finds them
+// without a search path.
 
-// Compiles every Lua file in table order and stores it in package.preload under its name without
-// the extension. A file that cannot be compiled gives one line on standard error and does not
-// hinder the others. Returns 0, or 1 if any file failed. Leaves the stack as it was. Raises a Lua
-// error when memory runs out: call it in a protected call.
+// Compiles every Lua file in the order of the table and stores it in package.preload under its name
+// without the extension. For a file that cannot be compiled it writes one line to standard error
+// and continues. Returns 0, or 1 if any file failed. Leaves the stack unchanged. Raises a Lua error
+// if memory runs out, so it must run in a protected call.
 int addEmbeddedFilesToPreload(lua_State* L);
 
 // The same for a given table of files.
 int addFilesToPreload(lua_State* L, EmbeddedFiles files);
 
-// Whether a file is a Lua script or chunk, by its extension ".lua" or ".luac".
+// Whether the extension of a file is ".lua" (script) or ".luac" (compiled chunk).
 bool isLuaFile(const EmbeddedFile& file);
 
-// Bytes of a file's name before its last dot.
+// The length of a file's name up to its last dot.
 unsigned moduleNameLength(const EmbeddedFile& file);
 
-// The line on standard error for a file that cannot be compiled.
+// Writes the line for a file that cannot be compiled to standard error.
 void reportLoadFailure(const char* fileName, const char* message);

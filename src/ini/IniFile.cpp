@@ -11,7 +11,7 @@
 
 #include "ini/LineReader.h"
 #include "ini/Parser.h"
-#include "ini/names.h"
+#include "ini/nameComparison.h"
 
 namespace {
 
@@ -80,7 +80,7 @@ const std::string* find(const IniFile& file, std::string_view sectionName, std::
     return entry != section->entries.end() ? &entry->value : nullptr;
 }
 
-// Reads blanks, a plus sign or none, and digits to the end but for blanks.
+// Parses an optional plus sign and digits, with optional blanks on both sides.
 bool parseUnsigned(std::string_view text, std::uint32_t& number) {
     text = ini::withoutTrailingBlanks(ini::withoutLeadingBlanks(text));
     if (!text.empty() && text.front() == '+') {

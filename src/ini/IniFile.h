@@ -1,3 +1,4 @@
+// Folder ini: reads configuration files in the ini format.
 #pragma once
 
 #include <cstdint>
@@ -5,7 +6,7 @@
 #include <string>
 #include <vector>
 
-// A reader of ini files. A file object is used by one thread at a time.
+// A file object may be used by one thread at a time.
 
 struct IniEntry {
     std::string key;
@@ -42,23 +43,23 @@ enum IniError : std::int32_t {
 struct IniFile {
     std::vector<IniSection> sections;  // in the order of the file
     std::int32_t firstBadLine = -1;    // the first line that could not be parsed, or -1
-    bool mergeRepeated = true;         // a repeated section or key goes on in the earlier one
+    bool mergeRepeated = true;         // a repeated section or key is merged into the earlier one
     bool ignoreCase = true;            // in the names of sections and keys
     std::uint32_t flags = ini_stripDoubleQuotes;
     std::string path;          // empty before a load
     std::time_t modified = 0;  // modification time of the loaded file
 };
 
-// An empty file object, or null without memory. It goes back through IniFile_destroy.
+// Creates an empty file object, to be freed with IniFile_destroy. Returns null if memory runs out.
 IniFile* IniFile_create() noexcept;
 void IniFile_destroy(IniFile* file) noexcept;
 
-// Reads the file at `path` in place of what `file` held. Returns 0 or an IniError; after an error
-// `file` is as it was. Lines that cannot be parsed are left out and are no error.
+// Replaces the contents of `file` by those of the file at `path`. Returns 0 or an IniError; after
+// an error `file` is unchanged. Lines that cannot be parsed are skipped without an error.
 std::int32_t IniFile_load(IniFile* file, const char* path) noexcept;
 
 // Reads an unsigned decimal integer. Returns 1; 0 if the section or key is missing or the value is
-// empty; or ini_errorNoInteger. `value` is written on 1 only. Null for `file` reads as an empty
-// one.
+// empty; or ini_errorNoInteger. `value` is written only if the result is 1. A null `file` counts as
+// an empty one.
 std::int32_t IniFile_getInt(const IniFile* file, const char* section, const char* key,
                             std::uint32_t* value) noexcept;

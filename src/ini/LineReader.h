@@ -6,16 +6,16 @@
 
 namespace ini {
 
-// Cuts a stream into lines. A line ends at a carriage return, a newline or a NUL; two different
-// ones of these in a row are one end.
+// Splits a stream into lines. A line ends at a carriage return, a newline or a NUL; two different
+// ones of these in a row count as one line end.
 class LineReader {
   public:
     explicit LineReader(std::FILE* stream) : stream(stream) {}
 
-    // Passes the byte order mark of UTF-8. False at a mark of UTF-16 or UTF-32. Call it first.
+    // Skips a UTF-8 byte order mark. Returns false for a UTF-16 or UTF-32 mark. To be called first.
     bool passByteOrderMark();
 
-    // The next line without its end. False at the end of the stream.
+    // Reads the next line, without its line end. Returns false at the end of the stream.
     bool next(std::string& line);
 
   private:

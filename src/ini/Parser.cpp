@@ -2,14 +2,13 @@
 
 #include <algorithm>
 
-#include "ini/names.h"
+#include "ini/nameComparison.h"
 
 namespace ini {
 
 namespace {
 
-// The number in a key's ending " Line<digits>", without leading zeros; empty without such an
-// ending.
+// The number in a key that ends in " Line<digits>", without leading zeros. Empty for any other key.
 std::string_view splitNumber(std::string_view key) {
     static constexpr std::string_view word = " Line";
     const std::size_t lastOther = key.find_last_not_of("0123456789");

@@ -8,14 +8,14 @@
 
 namespace ini {
 
-// Puts lines into a file object, whose settings it follows.
+// Parses lines into a file object, according to the settings of that object.
 class Parser {
   public:
     explicit Parser(IniFile& file) : file(file) {}
 
     void addLine(std::string_view line);
 
-    // Joins the values that are split over the keys "name Line1", "name Line2" and so on.
+    // Joins values that are split over several keys "name Line1", "name Line2" and so on.
     void joinSplitValues();
 
   private:
@@ -37,8 +37,8 @@ class Parser {
     IniFile& file;
     std::int32_t lineNumber = 0;
     std::size_t current = none;
-    // Where the section of a folded name stands, and the entry of a section's number and a folded
-    // key: a file of many names is read in linear time.
+    // Indexes into the file object, so that a file with many names is parsed in linear time:
+    // sections by folded name, entries by section number and folded key.
     std::unordered_map<std::string, std::size_t> sectionIndex;
     std::unordered_map<std::string, std::size_t> entryIndex;
 };

@@ -7,7 +7,7 @@ namespace jsonz {
 namespace {
 
 // The kinds of the open containers, one bit each, so that text of any depth is read without
-// recursion. Depths that no honest text has go to the heap.
+// recursion. Realistic depths fit into a buffer on the stack; deeper ones use the heap.
 class Nesting {
   public:
     Nesting() = default;
@@ -15,7 +15,7 @@ class Nesting {
     Nesting(const Nesting&) = delete;
     Nesting& operator=(const Nesting&) = delete;
 
-    // False if there is no memory for another level.
+    // Returns false if there is no memory for another level.
     bool push(bool isObject) {
         if (levels == room && !grow()) {
             return false;
@@ -34,10 +34,10 @@ class Nesting {
     }
 
     bool empty() const { return levels == 0; }
-    // The innermost container is an object.
+    // Whether the innermost container is an object.
     bool inObject() const { return (bits[(levels - 1) / 8] >> ((levels - 1) % 8) & 1) != 0; }
     bool inAnyObject() const { return objects > 0; }
-    // The innermost container lies in a member of an object, at whatever distance.
+    // Whether the innermost container is inside a member of an object, directly or not.
     bool inMember() const { return objects > (inObject() ? 1u : 0u); }
 
   private:
@@ -67,7 +67,7 @@ class ContainerReader {
   public:
     ContainerReader(const char* position, jsonz_value* value) : p(position), value(value) {}
 
-    // The position behind the container, or null with the fault in the record.
+    // Returns the position after the container, or null with the error in the record.
     const char* read() {
         do {
             if (!readElement() || !finishElements()) {
@@ -85,7 +85,7 @@ class ContainerReader {
         ++p;
     }
 
-    // Passes a scalar, an empty container, or the start of a container down to its first such.
+    // Skips a scalar or an empty container, after opening all containers that begin before it.
     bool readElement() {
         while (*p == '{' || *p == '[') {
             if (!nesting.push(*p == '{')) {
@@ -108,7 +108,7 @@ class ContainerReader {
         return true;
     }
 
-    // Passes the key of a member and its colon; there is nothing to pass in an array.
+    // Skips the key of a member and its colon. Does nothing in an array.
     bool readKey() {
         if (!nesting.inObject()) {
             return true;
@@ -125,7 +125,7 @@ class ContainerReader {
         return true;
     }
 
-    // Closes the containers that end here, or passes the comma and the key before the next element.
+    // Closes the containers that end here, then skips the comma and key before the next element.
     bool finishElements() {
         while (!nesting.empty()) {
             p = skipWhiteSpace(p);
@@ -161,7 +161,7 @@ class ContainerReader {
         return false;
     }
 
-    // Objects drop what they know of a fault in a member.
+    // The error of an object does not tell where in its members the text is invalid.
     bool failWithoutDetails() {
         fail(value, nullptr, jsonz_errorNone);
         return false;

@@ -8,7 +8,7 @@ using jsonz::skipWhiteSpace;
 
 namespace {
 
-// Passes a key and its colon. Returns the position of the member's value, or null.
+// Skips a key and its colon. Returns the position of the member's value, or null.
 const char* readKey(const char* position, jsonz_value* key) {
     const char* p = jsonz::readString(position, key);
     if (p == nullptr) {

@@ -11,7 +11,7 @@ namespace {
 constexpr long lowest = std::numeric_limits<std::int32_t>::min();
 constexpr long highest = std::numeric_limits<std::int32_t>::max();
 
-// The conversions below read the text in place: they stop where the number ends by themselves.
+// The conversion functions below stop at the end of the number, so the text need not be copied.
 
 std::int32_t wholeNumber(const char* text, std::int32_t fallback) {
     char* end = nullptr;

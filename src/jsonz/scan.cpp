@@ -40,8 +40,8 @@ const char* skipDigits(const char* position) {
     return position;
 }
 
-// Passes one escape sequence, from the character behind the backslash on. On a fault *valid turns
-// false and the result is the first character that does not fit.
+// Skips one escape sequence, starting after the backslash. If it is invalid, sets *valid to false
+// and returns the position of the first invalid character.
 const char* skipEscape(const char* position, bool* valid) {
     if (*position != 'u') {
         *valid = *position != '\0' && std::strchr("\"/\\bfnrt", *position) != nullptr;
@@ -99,8 +99,7 @@ const char* readKeyword(const char* position, jsonz_value* value) {
             return position + keyword.length;
         }
     }
-    // The string is the first kind of value that is looked for, so its fault is the one reported
-    // where no value begins.
+    // Where no value begins, the missing double quote is the error that is reported.
     return fail(value, position, jsonz_errorDoubleQuoteExpected);
 }
 

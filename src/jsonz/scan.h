@@ -2,7 +2,7 @@
 
 #include "jsonz/jsonz.h"
 
-// The readers of single tokens, shared by the sources of this folder.
+// Functions that read single tokens and containers, shared by the sources of this folder.
 namespace jsonz {
 
 const char* skipWhiteSpace(const char* position);
@@ -14,15 +14,15 @@ inline bool isDigit(char c) {
 // The value of a hexadecimal digit, or -1.
 int hexDigit(char c);
 
-// Reads a string, number or keyword at `position`, which stands on no white space. Always fills
-// `value`; returns the position behind the token, or null.
+// Reads a string, number or keyword at `position`, which must not be white space. Always fills
+// `value`; returns the position after the token, or null.
 const char* readScalar(const char* position, jsonz_value* value);
 const char* readString(const char* position, jsonz_value* value);
 
 // Fills `value` with a failure; returns null.
 const char* fail(jsonz_value* value, const char* position, jsonz_error error);
 
-// Reads the container whose opening bracket is at `position`. As readScalar.
+// The same for the container whose opening bracket is at `position`.
 const char* readContainer(const char* position, jsonz_value* value);
 
 }  // namespace jsonz

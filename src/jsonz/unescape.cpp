@@ -7,14 +7,14 @@ namespace {
 
 constexpr std::uint32_t fault = 0xFFFFFFFF;
 
-// Decodes a string step by step. A step is one plain byte or one escape sequence.
+// Decodes a string in steps of one plain byte or one escape sequence.
 class Decoder {
   public:
     Decoder(const char* text, std::size_t length) : p(text), end(text + length) {}
 
     bool atEnd() const { return p == end; }
 
-    // Writes the bytes of the next step, at most 4. Returns their number, or 0 after a fault.
+    // Writes the bytes of the next step, at most 4. Returns their number, or 0 for an invalid one.
     std::size_t step(char* bytes) {
         if (*p != '\\') {
             *bytes = *p++;
@@ -40,7 +40,7 @@ class Decoder {
         return 1;
     }
 
-    // The code point that begins at the letter u, of one unit or of a surrogate pair.
+    // Reads the code point that begins at the letter u: one code unit or a surrogate pair.
     std::uint32_t codePoint() {
         const std::uint32_t high = unit();
         if (high == fault || high < 0xD800 || high > 0xDFFF) {
@@ -57,7 +57,7 @@ class Decoder {
         return 0x10000 + ((high - 0xD800) << 10) + (low - 0xDC00);
     }
 
-    // The letter u and four hexadecimal digits.
+    // Reads one code unit: the letter u and four hexadecimal digits.
     std::uint32_t unit() {
         if (end - p < 5) {
             return fault;

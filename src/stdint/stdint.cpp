@@ -6,11 +6,11 @@
 
 #include "stdint/luaopen_stdint.h"
 
-// Nothing here owns anything: a Lua error jumps over the frames of these functions.
+// These functions must not own resources: a Lua error is a longjmp that skips destructors.
 
 namespace {
 
-// What differs between the two types: their names, texts and formats.
+// The differences between the two types: their names, texts and formats.
 struct Signed {
     using Integer = std::int64_t;
     static constexpr const char* name = "i64";
@@ -29,7 +29,7 @@ struct Signed {
     static int print(char* buffer, std::size_t size, Integer value) {
         return std::snprintf(buffer, size, "%lli", static_cast<long long>(value));
     }
-    // The quotient of the lowest value and -1 does not exist; it wraps like every other result.
+    // The quotient of the lowest value and -1 is out of range; it wraps like every other result.
     static bool isWrappingDivisor(Integer divisor) { return divisor == -1; }
 };
 
@@ -54,12 +54,12 @@ struct Unsigned {
     static bool isWrappingDivisor(Integer) { return false; }
 };
 
-// Clamped by hand: the language leaves the conversion of a number out of range undefined.
+// Clamps explicitly: in C++, converting a double that is out of range is undefined behaviour.
 template <typename Type>
 typename Type::Integer fromDouble(double number) {
     using Integer = typename Type::Integer;
     using Limits = std::numeric_limits<Integer>;
-    // Twice the power of two below the maximum: the first double above the range.
+    // Twice the largest power of two in the range: the smallest double above the range.
     const double end = 2.0 * static_cast<double>(Limits::max() / 2 + 1);
     if (number != number) {
         return 0;

@@ -1,13 +1,13 @@
 -- JSON for Lua 5.1: decode and encode texts.
 --
---   json.decode(text [, position])  the value at the position (1 by default), and the position behind
---                                   it with the white space that follows. A null is nil, so an object
---                                   has no member for it and an array a hole.
+--   json.decode(text [, position])  the value at the position (1 by default), and the position after
+--                                   it and the white space that follows. A null becomes nil, so an
+--                                   object has no member for it and an array has a hole.
 --   json.encode(value)              the text of nil, a boolean, a finite number, a string, or a table.
---                                   A table whose keys are 1 to n is an array, the empty one too.
---   json.null                       stands for null where nil cannot be stored.
+--                                   A table whose keys are 1 to n is an array, also an empty table.
+--   json.null                       represents null where nil cannot be stored.
 --
--- Faults are raised as errors with the position. The input is never run as code.
+-- Invalid text raises an error that names the position. The text is never executed as code.
 
 local json = {}
 
@@ -45,7 +45,7 @@ local function utf8(point)
         0x80 + math.floor(point / 0x40) % 0x40, 0x80 + point % 0x40)
 end
 
--- The code point of the escape that begins with "\u" at the position, and the position behind it.
+-- The code point of the escape that begins with "\u" at the position, and the position after it.
 local function decodeCodePoint(text, position)
     local digits = text:match("^\\u(%x%x%x%x)", position)
     if not digits then
@@ -90,7 +90,7 @@ local function decodeString(text, position)
     end
 end
 
--- The interpreter reads and writes the decimal separator of the locale.
+-- The interpreter reads and writes numbers with the decimal separator of the locale.
 local function toNumber(text)
     return tonumber(text) or tonumber((text:gsub("%.", ",")))
 end

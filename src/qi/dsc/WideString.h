@@ -1,3 +1,4 @@
+// Folder qi/dsc: strings of 32-bit characters, and size arithmetic that detects overflow.
 #pragma once
 
 #include <cstddef>
@@ -7,15 +8,15 @@
 
 namespace qi::dsc {
 
-// A string of 32-bit characters with an explicit end, in a block of its own. It may hold NULs.
+// An owned string of 32-bit characters with an explicit end, which may contain NULs.
 //
-// Construction throws std::bad_alloc without memory and exception::OutOfRange for a string whose
-// block would need more than 32 bits of size.
+// Construction throws std::bad_alloc if memory runs out and exception::OutOfRange if the size in
+// bytes does not fit into 32 bits.
 class WideString {
   public:
-    // Copies the characters from `begin` up to `end`; a null `begin` reads as empty.
+    // Copies the characters from `begin` up to `end`; a null `begin` gives an empty string.
     WideString(const std::uint32_t* begin, const std::uint32_t* end);
-    // Widens a NUL-terminated ASCII text; null reads as empty.
+    // Widens a NUL-terminated ASCII text; null gives an empty string.
     explicit WideString(const char* text);
 
     const std::uint32_t* begin() const noexcept { return block.get(); }
@@ -33,7 +34,7 @@ class WideString {
     std::size_t length;
 };
 
-// Compares character by character, each taken through towupper.
+// Compares character by character after towupper.
 bool equalsIgnoringCase(const WideString& a, const WideString& b);
 
 }  // namespace qi::dsc

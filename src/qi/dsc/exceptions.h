@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <exception>
 
-// Exceptions of the size arithmetic and of what rests on it.
+// Exceptions thrown by the size arithmetic and by the types that use it.
 namespace qi::dsc::exception {
 
 class Exception : public std::exception {
@@ -11,7 +11,7 @@ class Exception : public std::exception {
     // `file` is not copied and must outlive the exception.
     Exception(std::int32_t line, const char* file) noexcept : line(line), file(file) {}
     const char* what() const noexcept override { return "unspecified exception"; }
-    // A number for the kind of failure.
+    // Identifies the kind of failure.
     virtual std::uint32_t code() const noexcept { return 0xFFFFFFFF; }
 
     // Where the exception was thrown.

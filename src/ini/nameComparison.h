@@ -21,7 +21,8 @@ inline char lowered(char c) {
     return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
 }
 
-// The form in which names of sections and keys are compared.
+// The form in which names of sections and keys are compared: without leading blanks, and in lower
+// case if case is ignored.
 inline std::string folded(std::string_view name, bool ignoreCase) {
     std::string result(withoutLeadingBlanks(name));
     if (ignoreCase) {
