@@ -1,7 +1,7 @@
 #include "jsonz/jsonz.h"
 #include "qierr/Writer.h"
 
-// The details that a translator puts into words: entries of the array translator_info.ordered_data.
+// The details that a translator formats: entries of the array translator_info.ordered_data.
 
 namespace {
 
@@ -15,7 +15,7 @@ bool isString(const char* position, const char* plain) {
     return value.type == jsonz_typeString && jsonz_equals(value.text, value.length, plain);
 }
 
-// The closing bracket of the container at `position`, if it opens with `bracket`; else null.
+// The closing bracket of the container at `position` if it begins with `bracket`; otherwise null.
 const char* endOf(char bracket, const char* position) {
     return *position == bracket ? jsonz_endOfContainer(position) : nullptr;
 }

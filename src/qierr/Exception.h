@@ -6,17 +6,17 @@
 
 namespace qierr {
 
-// What the three exception classes share: one status record, which the exception owns.
+// Base of the three exception classes: owns one status record.
 //
-// Copying moves the JSON text out of the source, so that a thrown copy of a local object takes its
-// details along.
+// Copying moves the JSON text out of the source, so that throwing a local object keeps its details
+// without allocating memory.
 class ExceptionBase {
   public:
     virtual ~ExceptionBase();
-    // The JSON text, or "" when there is none.
+    // The JSON text, or "" if there is none.
     virtual const char* what() const noexcept;
 
-    // The status, for adding details before the throw and for taking it in a handler.
+    // The status, for adding details before the throw and for reading it in a catch block.
     qierr_Status* status() const noexcept { return &record; }
 
   protected:
@@ -28,10 +28,10 @@ class ExceptionBase {
     mutable qierr_Status record;
 };
 
-// A failure passed on from a status.
+// A failure that was reported in a status.
 class Exception : virtual public ExceptionBase, virtual public std::exception {
   public:
-    // Takes the code and the text out of `source`.
+    // Copies the code of `source` and takes its text.
     explicit Exception(qierr_Status* source) noexcept;
     Exception(const Exception& source) noexcept;
     ~Exception() override;

@@ -2,7 +2,8 @@
 
 #include <cstdint>
 
-// Where a failure arose. Plain constant data; the texts are not copied and must outlive the record.
+// The source position where a failure was detected. The texts are not copied and must outlive the
+// record.
 struct qierr_SourcePosition {
     const char* file;
     std::int32_t line;

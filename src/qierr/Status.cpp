@@ -7,7 +7,7 @@
 
 #include "qierr/Writer.h"
 
-// Other programs fill this record: its layout is fixed on builds of either pointer size.
+// Separately built libraries fill this record, so its layout is fixed for both pointer sizes.
 static_assert(std::is_standard_layout_v<qierr_Status> && std::is_trivial_v<qierr_Status>);
 static_assert(offsetof(qierr_Status, code) == 0);
 static_assert(offsetof(qierr_Status, capacity) == 4);
@@ -41,12 +41,12 @@ std::uint32_t roundedUp(std::uint32_t size) {
     return rounded;
 }
 
-// Copies the text of another record, null meaning "{}".
+// Copies the text of another record; null means "{}".
 bool copyText(qierr_Status* target, const qierr_Status* source) {
     return qierr_Status_setJson(target, source->json) != nullptr;
 }
 
-// Starts a fresh text with error_constant, if it is given, and the position.
+// Writes a new text with the position, preceded by error_constant unless that is null.
 bool writePosition(qierr_Status* status, const qierr_SourcePosition& position,
                    const char* errorConstant) {
     qierr_Writer writer{qierr_Status_setJson(status, nullptr), qierr_Status_growJson, status};

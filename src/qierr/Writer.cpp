@@ -8,7 +8,8 @@ static_assert(sizeof(qierr_Writer) == 3 * sizeof(void*));
 
 namespace {
 
-// More than any buffer can hold; counted in 64 bits, since escaping can lengthen a text sixfold.
+// The limit of a member's size. Sizes are computed in 64 bits, since escaping can make a text six
+// times as long.
 constexpr std::uint64_t largestMember = 0x7FFFFFFD;
 
 bool isBlank(char c) {
@@ -21,7 +22,7 @@ bool isOpening(char c) {
 
 // ---- Escaping -----------------------------------------------------------------------------------
 
-// The letter of a two-character escape, or 0.
+// The letter of a character's two-character escape sequence, or 0 if it has none.
 char escapeLetter(char c) {
     switch (c) {
         case '\b':
@@ -77,7 +78,7 @@ char* writeEscaped(char* at, const char* text) {
 // A member of an object, or an element of an array.
 struct Member {
     const char* key;    // null for an element
-    const char* value;  // JSON as it stands, or the plain text of a string
+    const char* value;  // JSON text, or the unescaped text of a string
     bool isString;
 
     std::uint64_t size() const {
@@ -85,7 +86,7 @@ struct Member {
         return keySize + (isString ? escapedLength(value) + 2 : std::strlen(value));
     }
 
-    // Returns the position behind the last byte written.
+    // Returns the position after the last byte written.
     char* write(char* at) const {
         if (key != nullptr) {
             at = writeString(at, key);
@@ -108,7 +109,7 @@ struct Member {
     }
 };
 
-// Whether something stands beside what is inserted at `pos`: all but an empty container.
+// Whether a member that is inserted at `pos` needs a comma: unless the container is empty.
 bool needsComma(const char* pos) {
     const char* neighbour = pos;
     if (isOpening(*pos)) {
@@ -136,8 +137,9 @@ bool hasRoom(const char* nul, std::uint64_t room) {
     return true;
 }
 
-// Moves the text apart for a member of `size` bytes and writes the comma, if one is needed, beside
-// it. Returns where the member goes, or null if there is no room; a comma is always reckoned with.
+// Moves the rest of the text to make a gap of `size` bytes for a member, and writes a comma beside
+// the gap if one is needed. Returns the start of the gap, or null if there is not enough space;
+// space for a comma is always required.
 char* openGap(char* pos, std::uint64_t size) {
     const bool atStart = isOpening(*pos);
     const bool comma = needsComma(pos);
@@ -159,13 +161,13 @@ char* openGap(char* pos, std::uint64_t size) {
     return tail + 1;
 }
 
-// Inserts and stands `back` bytes before the end of what was inserted.
+// Inserts a member. The returned writer is positioned `back` bytes before the end of the member.
 qierr_Writer insert(qierr_Writer writer, const Member& member, int back) {
     if (writer.pos == nullptr) {
         return writer;
     }
     const std::uint64_t size = member.size();
-    // Outside the outermost bracket nothing can be inserted.
+    // Nothing can be inserted after the outermost container.
     if (size > largestMember || *writer.pos == '\0') {
         writer.pos = nullptr;
     }
@@ -179,7 +181,7 @@ qierr_Writer insert(qierr_Writer writer, const Member& member, int back) {
     return writer;
 }
 
-// Moves past the bracket that ends the open container.
+// Moves past the bracket that closes the current container.
 qierr_Writer pass(qierr_Writer writer, char bracket) {
     if (writer.pos != nullptr) {
         writer.pos = *writer.pos == bracket ? writer.pos + 1 : nullptr;

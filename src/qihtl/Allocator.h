@@ -1,3 +1,4 @@
+// Folder qihtl: strings and arrays that report a failed allocation in a status, without exceptions.
 #pragma once
 
 #include <cstddef>
@@ -5,21 +6,21 @@
 
 #include "qierr/Status.h"
 
-// The one door through which the translation layers, their Lua states included, get heap memory.
+// The only allocation function of the translation layers, Lua states included.
 //
-// realloc with a plain meaning for size 0: the block is freed and null returned. Null when memory
-// runs out; the old block then stands. Any thread. Defined in a source file of its own, so that a
-// fault test can link a definition that fails on purpose.
+// Works like realloc, but size 0 always frees the block and returns null. If memory runs out, it
+// returns null and the old block remains valid. Any thread may call it. It is defined in a source
+// file of its own, so that tests can link a definition that fails on purpose.
 void* qihtl_realloc(void* pointer, std::size_t size);
 
-// Reports that memory ran out: code qiapalerr_memoryFull at the position of this header.
+// Reports that memory ran out: qiapalerr_memoryFull, with the position of this line.
 inline void qihtl_reportMemoryFull(qierr_Status* status) {
     qierr_Status_setCodeNamed(status, qiapalerr_memoryFull,
                               QIERR_HERE_NAMED("qiapalerr_memoryFull"));
 }
 
-// The capacity to grow to when `needed` elements do not fit: half as much again, at least 8, at
-// least `needed`. 0 when that many elements of `elementSize` bytes overflow 32 bits of bytes.
+// The new capacity if `needed` elements do not fit: one and a half times the old one, but at least
+// 8 and at least `needed`. 0 if the size in bytes would exceed 0x7FFFFFFF.
 inline std::uint32_t qihtl_grownCapacity(std::uint32_t capacity, std::uint64_t needed,
                                          std::size_t elementSize) {
     const std::uint64_t limit = 0x7FFFFFFFu / elementSize;

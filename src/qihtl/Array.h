@@ -9,9 +9,9 @@
 
 namespace qihtl {
 
-// An array that reports a failed allocation in a status (qiapalerr_memoryFull) where a standard one
-// would throw. Every operation that takes a status does nothing when that is already negative. Not
-// copied; used by one thread at a time.
+// An array that reports a failed allocation in a status (qiapalerr_memoryFull) instead of throwing.
+// An operation that takes a status does nothing if the status is already negative. An array cannot
+// be copied and may be used by one thread at a time.
 template <typename T>
 class Array {
     static_assert(std::is_nothrow_move_constructible_v<T>, "growing moves the elements");
@@ -34,7 +34,7 @@ class Array {
     T& operator[](std::uint32_t index) noexcept { return elements[index]; }
     const T& operator[](std::uint32_t index) const noexcept { return elements[index]; }
 
-    // Makes room for exactly `wanted` elements unless there is room already.
+    // Allocates room for exactly `wanted` elements unless the capacity suffices.
     void reserve(std::uint32_t wanted, qierr_Status* status) {
         if (status->code < 0 || wanted <= room) {
             return;
@@ -46,7 +46,7 @@ class Array {
         moveTo(wanted, status);
     }
 
-    // Appends an element. On failure the array is as it was and `element` is destroyed.
+    // Appends an element. On failure the array is unchanged and `element` is destroyed.
     void append(T element, qierr_Status* status) {
         if (status->code < 0) {
             return;
@@ -67,11 +67,11 @@ class Array {
         ++used;
     }
 
-    // The last element, and its removal; there must be one.
+    // Return and remove the last element. The array must not be empty.
     T& last() noexcept { return elements[used - 1]; }
     void removeLast() noexcept { elements[--used].~T(); }
 
-    // Destroys the elements from the first to the last; the room stays.
+    // Destroys the elements in order. The capacity does not change.
     void clear() noexcept {
         for (std::uint32_t index = 0; index < used; ++index) {
             elements[index].~T();

@@ -6,7 +6,8 @@ namespace qihtl {
 
 namespace {
 
-// Texts beyond this are refused as too large for memory; it keeps every sum below 32 bits.
+// A longer text is reported as an allocation failure. The limit keeps every sum of two lengths
+// within 32 bits.
 constexpr std::uint32_t maximumLength = 0x7FFFFFFE;
 
 std::uint32_t boundedLength(const char* text) {

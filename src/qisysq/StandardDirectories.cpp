@@ -39,7 +39,7 @@ constexpr Default defaults[] = {
     {"initddir", "/etc/init.d"},
 };
 
-// What the relocation library may fill.
+// The buffer size that is passed to the relocation library.
 constexpr std::uint32_t relocatedSize = 255;
 
 }  // namespace
@@ -61,7 +61,7 @@ void StandardDirectories::addDefaults() {
 }
 
 void StandardDirectories::relocate(const char* relocationLibrary) {
-    // A system without the library, or with one that lacks the function, relocates nothing.
+    // Without the library or its function, all directories keep their defaults.
     qierr::Status loadStatus;
     void* library = qidynlib_load(relocationLibrary, &loadStatus);
     const auto getRelocatedDir = reinterpret_cast<get_relocated_dir_fn>(
@@ -70,7 +70,7 @@ void StandardDirectories::relocate(const char* relocationLibrary) {
         if (getRelocatedDir == nullptr) {
             break;
         }
-        // One byte more than is offered, so that a full buffer still ends.
+        // One byte more than the size passed, so that a completely filled buffer is terminated.
         char buffer[relocatedSize + 1] = "";
         const std::int32_t count = getRelocatedDir(entry.key, buffer, relocatedSize);
         if (count > 0) {

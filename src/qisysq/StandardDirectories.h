@@ -6,19 +6,18 @@
 
 namespace qisysq {
 
-// The standard installation directories, each at its default or where the optional relocation
-// library puts it. Filled by the constructor and constant from then on, so that any number of
-// threads may read it.
+// The standard installation directories: defaults, or the paths given by the optional relocation
+// library. Constant after construction, so any number of threads may read it.
 class StandardDirectories {
   public:
-    // Asks `relocationLibrary`, if it can be loaded, for every key and unloads it again.
+    // Loads `relocationLibrary` if possible, queries it for every key, and unloads it.
     explicit StandardDirectories(const char* relocationLibrary);
     StandardDirectories(const StandardDirectories&) = delete;
     StandardDirectories& operator=(const StandardDirectories&) = delete;
 
-    // Replaces the text of `directory` by the directory of this key. qiapalerr_osFault without
-    // details for an unknown key, qiapalerr_resourceNotFound if its relocation failed, and the
-    // failure of the constructor, if there was one, on each call.
+    // Replaces the text of `directory` by the directory with this key. qiapalerr_osFault without
+    // details for an unknown key; qiapalerr_resourceNotFound if its relocation failed. A failure of
+    // the constructor is reported by every call.
     void get(const char* key, qihtl::String* directory, qierr_Status* status) const;
 
   private:

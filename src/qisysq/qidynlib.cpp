@@ -8,7 +8,7 @@ namespace {
 
 void reportFailure(qierr_Status* status, const qierr_SourcePosition& position, const char* what,
                    const char* subjectKey, const char* subject) {
-    // Reading the loader's text also clears it.
+    // dlerror() also clears the error, so it is called even if the text is not used.
     const char* reason = dlerror();
     if (!qierr_Status_setCodeNamed(status, qiapalerr_invalidParameter, position)) {
         return;

@@ -2,12 +2,12 @@
 
 #include "qierr/Status.h"
 
-// Dynamic loading that reports in a status. Both do nothing and return null when the status is
-// already negative. On failure they set qiapalerr_invalidParameter with the loader's own words and
-// return null.
+// Dynamic loading with failures reported in a status. Both functions return null and do nothing if
+// the status is already negative. On failure they set qiapalerr_invalidParameter with the text of
+// dlerror() as a detail, and return null.
 
-// Opens a library by path or name, with all symbols bound at once and visible to libraries that are
-// loaded later. The caller closes the handle with dlclose.
+// Opens a library by path or name with RTLD_NOW and RTLD_GLOBAL. The caller closes the handle with
+// dlclose.
 void* qidynlib_load(const char* path, qierr_Status* status);
 
 // The address of a symbol of the library.

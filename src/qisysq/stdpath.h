@@ -1,27 +1,29 @@
+// Folder qisysq: directories and files of the target system, and dynamic loading of libraries.
 #pragma once
 
 #include "qihtl/String.h"
 
-// The well-known directories of the target.
+// The standard directories of the target.
 //
-// Each function replaces the text of `directory`, does nothing when the status is already negative,
-// and may run on any thread. Paths that are built in lie below qisysq_installRoot(); a path that
-// the installation or the environment gives is used as it stands.
+// Each function replaces the text of `directory`. It does nothing if the status is already
+// negative, and may be called from any thread. Built-in paths are prefixed with
+// qisysq_installRoot(); a path from a configuration file or the environment is used unchanged.
 namespace qisysq {
 
-// The directory of the data that all programs share: what the installation wrote to share.dir, or
-// the standard one when that file cannot be read. Reads the file on each call.
+// The shared data directory: the content of the installed file share.dir, or the default if that
+// file cannot be read. Reads the file on each call.
 void getSharedDir(qihtl::String* directory, qierr_Status* status);
 
-// The directory of application data that belongs to no user.
+// The directory of application data that is common to all users.
 void getCommonAppDataDir(qihtl::String* directory, qierr_Status* status);
 
-// The directory of temporary files: TMPDIR, an empty one included, or /tmp when that is not set.
+// The directory of temporary files: the value of TMPDIR, even if it is empty, or /tmp if TMPDIR is
+// not set.
 void getTempDir(qihtl::String* directory, qierr_Status* status);
 
-// A standard directory by its key, such as "bindir", where the relocation library puts it or at its
-// default. An unknown key gives qiapalerr_osFault; a relocation that failed gives
-// qiapalerr_resourceNotFound.
+// The standard directory with this key, such as "bindir": as given by the relocation library, or
+// the default. qiapalerr_osFault for an unknown key; qiapalerr_resourceNotFound if the relocation
+// failed.
 void getStandardDir(const char* key, qihtl::String* directory, qierr_Status* status);
 
 }  // namespace qisysq

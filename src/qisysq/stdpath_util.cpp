@@ -6,7 +6,8 @@
 
 namespace {
 
-// Which of the two signatures of strerror_r there is depends on the C library.
+// strerror_r has two signatures, depending on the C library; these overloads accept the result of
+// either.
 [[maybe_unused]] const char* textOf(int result, const char* buffer) {
     return result == 0 ? buffer : nullptr;
 }
@@ -54,7 +55,7 @@ void reportShortRead(const char* fileName, long size, std::size_t got, int error
     qierr_Writer_endObject(writer);
 }
 
-// The size of what cannot tell one, such as a pipe or a folder, counts as -1.
+// The size of a file, or -1 for a file without one, such as a pipe or a directory.
 long sizeOf(std::FILE* file) {
     if (std::fseek(file, 0, SEEK_END) != 0) {
         return -1;

@@ -5,17 +5,17 @@
 #include "qierr/Writer.h"
 #include "qihtl/String.h"
 
-// Tools of the path functions and of those who report failures of the operating system.
+// Helpers for the path functions and for reports of operating system failures.
 
-// Adds the object `internal_error` for an errno: its number, and its text if it has one.
+// Adds an object `internal_error` for an errno value, with its number and, if there is one, its
+// text.
 qierr_Writer qisysq_addErrno(qierr_Writer writer, std::int32_t error);
 
 namespace qisysq {
 
-// Reads a whole file. On success the buffer holds exactly its bytes, and a NUL behind them that
-// does not count. A file that cannot be opened gives qiapalerr_resourceNotFound, one that cannot be
-// read to its end qiapalerr_osFault, want of memory qiapalerr_memoryFull. Does nothing when the
-// status is already negative.
+// Reads a whole file into `buffer`. qiapalerr_resourceNotFound if it cannot be opened,
+// qiapalerr_osFault if it cannot be read to its end, qiapalerr_memoryFull if memory runs out. Does
+// nothing if the status is already negative.
 void readFileToBuffer(const char* fileName, qihtl::String* buffer, qierr_Status* status);
 
 }  // namespace qisysq

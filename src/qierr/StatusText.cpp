@@ -4,13 +4,13 @@
 #include "jsonz/jsonz.h"
 #include "qierr/Writer.h"
 
-// The text of a status as a whole: replacing it, finding its end, making room in it.
+// Operations on the whole JSON text of a status: replace it, find its end, enlarge its buffer.
 
 namespace {
 
 constexpr std::size_t tooLongText = 0x7FFFFFFE;
 constexpr std::uint32_t mostWanted = 0x7FFFFFFD;
-// The braces, the NUL and the end marker: no buffer that holds a text is smaller.
+// The size of the smallest buffer that holds a text: two braces, the NUL and the end marker.
 constexpr std::uint32_t emptyBuffer = 4;
 
 bool makeRoom(qierr_Status* status, std::uint32_t size) {
@@ -55,7 +55,7 @@ char* qierr_Status_growJson(char* pos, qierr_Status* status) {
         return nullptr;
     }
     const std::ptrdiff_t offset = pos - status->json;
-    // A buffer that claims to have grown and has not would be tried for ever.
+    // If reallocJson reports success without enlarging the buffer, retrying would never end.
     if (qierr_Status_jsonEnd(status, 2 * (capacity - 2)) == nullptr ||
         status->capacity <= capacity) {
         return nullptr;
