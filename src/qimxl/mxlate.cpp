@@ -1,8 +1,9 @@
 #include "qixlator/Registration.h"
 #include "qixlatorlua/LuaXlator.h"
 
-// Registers the translator of the service's own statuses, for the sessions of this program and for
-// other programs.
+// Folder qimxl: the translator of the service's own statuses, in Lua.
+//
+// This file registers that translator, for the sessions of this program and for other programs.
 
 namespace {
 

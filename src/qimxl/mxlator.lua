@@ -1,4 +1,4 @@
--- The translator: finds the description of a code, and puts the details of a status into words.
+-- The translator: finds the description of a code, and formats the details of a status as text.
 
 local cjson = require("cjson")
 local utils = require("qixlatorluautils")
@@ -12,7 +12,7 @@ mxlator.Ades = { "none", "qv", "qvi", "qstudio" }
 
 local unsupportedFormat = -52029
 
--- The usages whose value is the number of an attribute.
+-- The usage tags whose value is the number of an attribute.
 local attributeUsages = {
     kUsageTypeAttributeId = true,
     kUsageTypeAttributeIdentifier = true,
@@ -22,7 +22,7 @@ local attributeUsages = {
     kUsageTypeUnspecifiedProperty = true,
 }
 
--- The first of the modules that can be loaded, or nil.
+-- The first of these modules that can be loaded, or nil.
 local function requireFirst(names)
     for _, name in ipairs(names) do
         local success, module = pcall(require, name)
@@ -52,7 +52,7 @@ local function fromErrorTable(code, word)
     return errors.getString(code)
 end
 
--- Runs one search of explanation files. A failed one, as for want of a directory, finds nothing.
+-- Runs one search of explanation files. If it fails, as for a missing directory, the result is nil.
 local function search(find, lang, ...)
     local success, text = pcall(find, ...)
     if success and text then
@@ -80,7 +80,7 @@ local function fromSharedFiles(code, lang, directory)
     return search(find, lang, directory, code, lang) or search(find, 0, directory, code, 0)
 end
 
--- The description of a code, in the language of this number or else in English. ade is not used.
+-- The description of a code in the language with this number, or else in English. ade is not used.
 function mxlator.getStaticDesc(code, lang, ade)
     local pathsep = package.config:sub(1, 1)
     local word = mxlator.ThreeLetterLngStrings[lang + 1] or "zzz"
@@ -114,11 +114,11 @@ local function attributeTableNames(word, ade)
     return names
 end
 
--- The last whole number before which every other one is a number of the interpreter too.
+-- Up to this number, every whole number is exactly a number of the interpreter.
 local largestExact = 2 ^ 53
 
--- A value of JSON as text. One that is neither a string nor a number is its JSON text, since the
--- interpreter would tell its address.
+-- A JSON value as text. For anything but a string or a number this is its JSON text, since tostring
+-- would give an address.
 local function textOf(value)
     local kind = type(value)
     if kind == "string" then
@@ -140,11 +140,11 @@ local function term(terms, key)
     return terms.getString(key) or key
 end
 
--- The attribute of a number, or nil for what is no number. An unknown one has its number for a name.
+-- The attribute with this number, or nil if num is not a number. An unknown one has it as its name.
 local function attribute(attributes, num)
     local number = tonumber(num)
-    -- Eight digits whatever the number, also where a conversion out of range would be undefined. The
-    -- interpreter takes "nan" and "inf" for numbers, which have no remainder.
+    -- The remainder limits the number to eight digits; formatting a larger one would be undefined.
+    -- The interpreter accepts "nan" and "inf" as numbers; their remainder is not a number.
     local remainder = number and number % 4294967296
     if not remainder or remainder ~= remainder then
         return nil
@@ -167,8 +167,8 @@ local function enumText(entry, value, attributes)
     return found and found.enums[textOf(value)] or textOf(value)
 end
 
--- The value of a usage entry as a text or an array of texts. Nil where there is none, for a type that
--- is not known, and for an empty array, which would be encoded as an object.
+-- The value of a usage entry as a text or an array of texts. Nil if there is no value, if its type
+-- is unknown, and for an empty array, which would be encoded as an object.
 local function usageValue(entry, attributes)
     if entry.value == nil then
         return nil
@@ -190,7 +190,7 @@ local function usageValue(entry, attributes)
     return next(texts) and texts
 end
 
--- The item of one entry, or nil for one that is not shown.
+-- The item for one entry, or nil if the entry is not shown.
 local function itemOf(entry, terms, attributes)
     if type(entry) ~= "table" then
         return nil
@@ -223,7 +223,7 @@ local function addDebugItem(items, key, value)
     end
 end
 
--- Takes out of the status what is shown elsewhere; the rest is one item.
+-- Removes from the status what is shown elsewhere; the rest becomes one item.
 local function debugItems(errorContext, internalError)
     local items = {}
     addDebugItem(items, "Component", errorContext.component)
@@ -237,7 +237,7 @@ local function debugItems(errorContext, internalError)
     return items
 end
 
--- The json1 text of a status's JSON text, or a negative code. lang and ade are hints.
+-- The details of a status's JSON text in format json1, or a negative code. lang and ade are hints.
 function mxlator.getDynamicDesc(errjson, lang, ade, format)
     if format ~= "json1" then
         return unsupportedFormat

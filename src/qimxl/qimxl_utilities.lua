@@ -1,5 +1,5 @@
--- The two namings of the languages: the word of three letters and the name of the directory.
--- An unknown name gives what the last known one gave.
+-- Conversion between the two names of a language: the word of three letters and the directory name.
+-- For an unknown name the result is that of the last call with a known name.
 
 local qimxl_utilities = {}
 

@@ -4,7 +4,7 @@
 
 #include <cstring>
 
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
 namespace qixlator {
 

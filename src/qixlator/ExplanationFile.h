@@ -7,22 +7,22 @@
 
 namespace qixlator {
 
-// One pass through an open explanation file in search of one code.
+// Searches an open explanation file once for one code.
 class ExplanationFile {
   public:
-    // The file stays the caller's.
+    // The caller keeps ownership of the file.
     ExplanationFile(std::FILE* file, std::int32_t wantedCode) : file(file), wanted(wantedCode) {}
 
-    // Appends the lines of the first block of the code to `output`, as they stand. Faults of the
-    // file are reported in the status.
+    // Appends the lines of the first block for the code to `output`, unchanged. Errors in the file
+    // are reported in the status.
     void search(qihtl::String* output, qierr_Status* status);
 
   private:
-    // False at the end of the file. Longer lines arrive in pieces.
+    // Returns false at the end of the file. A line that exceeds the buffer is read in pieces.
     bool readLine();
     bool lineBegins(const char* tag) const;
     bool readHeading();
-    // Reads one error block; true if it was the wanted one.
+    // Reads one error block. Returns true if it is the wanted one.
     bool readErrorBlock(qihtl::String* output, qierr_Status* status);
     void skipComment();
 

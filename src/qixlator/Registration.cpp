@@ -37,7 +37,8 @@ XlatorRegistration& localRegistrations() {
 
 namespace {
 
-// Stands here and not beside its translator, so that every program with a local list has it.
+// Defined here and not beside its translator, so that the linker includes it in every program that
+// uses the local list.
 const XlatorRegistration defaultRegistration(localRegistrations(), defaultXlatorName, "{}",
                                              qixlator_default_create);
 

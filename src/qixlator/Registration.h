@@ -4,24 +4,24 @@
 
 namespace qixlator {
 
-// An entry of a registration list: how a translator is made. Entries are static objects: one links
-// itself in at the end of its list when it is constructed and unlinks itself when it is destroyed.
-// The lists change only then, so they are read without a lock.
+// An entry of a registration list: a translator's name and the function that creates it. Entries
+// are static objects. The constructor appends the entry to its list and the destructor removes it.
+// The lists do not change otherwise, so they are read without a lock.
 struct XlatorRegistration {
     using Create = XlatorInterface* (*)(const char* name, const char* registrationInfo,
                                         qierr_Status* status);
 
-    // An empty list.
+    // Constructs an empty list.
     XlatorRegistration() noexcept;
-    // An entry. The texts are not copied; `registrationInfo` is null where the caller of `create`
-    // brings one.
+    // Constructs an entry. The texts are not copied; `registrationInfo` is null if the caller of
+    // `create` passes one.
     XlatorRegistration(XlatorRegistration& list, const char* name, const char* registrationInfo,
                        Create create) noexcept;
     ~XlatorRegistration();
     XlatorRegistration(const XlatorRegistration&) = delete;
     XlatorRegistration& operator=(const XlatorRegistration&) = delete;
 
-    // The entry of this name in the list that this is the head of, or null.
+    // The entry with this name in the list whose head this is, or null.
     const XlatorRegistration* find(const char* wanted) const noexcept;
 
     XlatorRegistration* next;
@@ -31,10 +31,10 @@ struct XlatorRegistration {
     Create create;
 };
 
-// The translators that sessions of this program find.
+// The translators for sessions of this program.
 XlatorRegistration& localRegistrations();
 
-// The translators that this program lends to others.
+// The translators that this program offers to other programs.
 XlatorRegistration& exportedRegistrations();
 
 }  // namespace qixlator

@@ -6,20 +6,20 @@
 
 namespace qixlator {
 
-// How a translator ends depends on where it came from.
+// Destroys a translator. The way to do so depends on where the translator was created.
 class DestroyXlator {
   public:
     virtual ~DestroyXlator() = default;
     virtual void operator()(XlatorInterface* xlator) = 0;
 };
 
-// For a translator of this program.
+// For a translator that this program created.
 class DestroyLocalXlator : public DestroyXlator {
   public:
     void operator()(XlatorInterface* xlator) override;
 };
 
-// For a translator of the manager library.
+// For a translator that the manager library created.
 class DestroyExportedXlator : public DestroyXlator {
   public:
     explicit DestroyExportedXlator(const Session* session) noexcept : session(session) {}
@@ -37,16 +37,16 @@ struct XlatorEntry {
 
 class Session {
   public:
-    // Reserves room for the usual number of translators.
+    // Reserves memory for the usual number of translators.
     explicit Session(qierr_Status* status) noexcept;
-    // Ends the translators in the order of their creation, and then the manager.
+    // Destroys the translators in the order of their creation, then unloads the manager.
     ~Session();
     Session(const Session&) = delete;
     Session& operator=(const Session&) = delete;
 
-    // The translator of this name, made on first use and owned by the session: a registered one,
-    // else one of the manager library libqixlator.so.1. Null with a negative status when there is
-    // none. A manager that could not be loaded is not tried again.
+    // The translator with this name, created on first use and owned by the session: a registered
+    // one, or else one of the manager library libqixlator.so.1. Null with a negative status if
+    // there is none. If loading the manager fails, the session does not try again.
     XlatorInterface* find(const char* name, qierr_Status* status);
 
   private:
@@ -54,7 +54,7 @@ class Session {
 
     XlatorInterface* findOpen(const char* name) const;
     XlatorInterface* createExported(const char* name, qierr_Status* status);
-    // Takes the translator over; on failure it is destroyed and null returned.
+    // Takes ownership of the translator; on failure destroys it and returns null.
     XlatorInterface* keep(const char* name, XlatorInterface* xlator, DestroyXlator* destroyer,
                           qierr_Status* status);
     void loadManager(qierr_Status* status);

@@ -5,20 +5,20 @@
 #include "qisysq/stdpath.h"
 #include "qixlator/qixlator.h"
 #include "qixlator/qvErrorsParser.h"
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
 namespace {
 
 void destroyDefault(XlatorInterface*) {}
 
-// Searches in one language; false when that failed and `status` tells why.
+// Searches in one language. Returns false, with the reason in `status`, on failure.
 bool search(const char* errorsDirectory, std::int32_t code, std::int32_t language,
             qihtl::String* text, qierr_Status* status) {
     qixlator::findErrorDescriptionFromErrorsDir(errorsDirectory, code, language, text, status);
     return status->code >= 0;
 }
 
-// The requested language, then English. Nothing found leaves `text` empty.
+// Searches in the requested language, then in English. `text` stays empty if nothing is found.
 void searchWithFallback(const char* errorsDirectory, std::int32_t code, std::int32_t language,
                         qihtl::String* text, qierr_Status* status) {
     if (language != 0) {

@@ -5,7 +5,7 @@
 #include "qixlator/defaultXlator.h"
 #include "qixlator/json1Items.h"
 #include "qixlator/jsonText.h"
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
 namespace qixlator::json1 {
 
@@ -13,14 +13,14 @@ namespace {
 
 constexpr const char* lineEnds = "\r\n";
 
-// How the text of one error looks at its level; level 0 is the status itself.
+// Formats the text of one error according to its nesting level; level 0 is the status itself.
 class NestedFormatter {
   public:
     virtual ~NestedFormatter() = default;
     virtual void operator()(std::uint32_t level, qihtl::String* text, qierr_Status* status) = 0;
 };
 
-// Three blanks a level at the start of each line, and an empty line behind the text.
+// Indents each line by three blanks for each level and adds an empty line after the text.
 class RawTextFormatter : public NestedFormatter {
   public:
     void operator()(std::uint32_t level, qihtl::String* text, qierr_Status* status) override;
@@ -52,7 +52,7 @@ void RawTextFormatter::operator()(std::uint32_t level, qihtl::String* text, qier
     text->append("\n\n", 2, status);
 }
 
-// A text made by a translator, which goes back through the function that made it.
+// Owns a text that a translator allocated, and frees it with the same allocation function.
 class XlatorText {
   public:
     explicit XlatorText(char* text) : text(text) {}
@@ -66,14 +66,14 @@ class XlatorText {
     char* text;
 };
 
-// Where the walk through the nested errors stands at one level. The positions lie in the text of
-// the outermost status.
+// The iteration over the nested errors at one level. The positions point into the text of the
+// outermost status.
 struct NestedErrors {
-    // The error that they are the causes of.
+    // The error that contains these nested errors.
     const char* owner;
-    // The next one, or null.
+    // The next nested error, or null.
     const char* next;
-    // Whether they stand in an array.
+    // Whether the nested errors are elements of an array.
     bool listed;
 };
 
@@ -108,7 +108,7 @@ class Translation {
     NestedFormatter* formatter;
     qihtl::String* output;
     qierr_Status* status;
-    // Kept here rather than on the call stack, since errors may nest to any depth.
+    // On the heap instead of the call stack, since errors may nest to any depth.
     qihtl::Array<NestedErrors> levels;
 };
 
@@ -172,7 +172,7 @@ char* Translation::staticDesc(std::int32_t code, const qihtl::String& xlator, st
                                   nullptr, status);
 }
 
-// The default translator has none, which is no failure.
+// The default translator has no dynamic descriptions; that is not a failure.
 char* Translation::dynamicDesc(const char* json, const qihtl::String& xlator, std::uint32_t flags) {
     if ((flags & (includeDynamic | includeDebug)) == 0 || xlator.equals(defaultXlatorName)) {
         return nullptr;
@@ -194,7 +194,7 @@ void Translation::appendSection(const char* json1, const char* member, const cha
     text->append(suffix, status);
 }
 
-// Goes one level down to the causes of `owner`, if it has any.
+// Adds a level for the nested errors of `owner`, if it has any.
 void Translation::openNested(const char* owner) {
     const char* nested = jsonz_findMember(owner, "nested_error");
     if (nested == nullptr) {

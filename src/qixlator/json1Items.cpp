@@ -2,7 +2,7 @@
 
 #include "jsonz/jsonz.h"
 #include "qixlator/jsonText.h"
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
 namespace qixlator::json1 {
 
@@ -56,7 +56,7 @@ const TypedItemFormat formattedItemFormats[] = {
 
 namespace {
 
-// Lays the items of one array out.
+// Formats the items of one array.
 struct ItemLayout {
     const char* array;
     qihtl::String* output;
@@ -71,7 +71,8 @@ struct ItemLayout {
 };
 
 void ItemLayout::fail(const char* what, const char* value) const {
-    // The texts are copied first: nothing can be copied for a status that is negative.
+    // The texts are copied before the failure is set, since copying does nothing once the status is
+    // negative.
     qierr::Status copyStatus;
     qihtl::String arrayText;
     qihtl::String valueText;
@@ -170,7 +171,7 @@ void formatDynamicReportItems(const char* array, const TypedItemFormat* formats,
     while (position != nullptr && status->code >= 0) {
         jsonz_value read;
         const char* end = jsonz_readValue(position, &read);
-        // An item with a broken value is still looked into, to name the value.
+        // An item with an invalid value is still formatted, since that reports the value.
         if (*position == '{') {
             layout.item(position, formats);
         }

@@ -2,10 +2,10 @@
 
 #include "qihtl/String.h"
 
-// The items of a json1 text and the texts that stand around them.
+// Formatting of the items of a json1 text, with the prefixes and suffixes of their parts.
 namespace qixlator::json1 {
 
-// What stands around the sections of one error's text. Null means empty.
+// The texts before and after the sections of one error's text. Null means empty.
 struct SectionFormat {
     const char* staticPrefix = nullptr;
     const char* staticSuffix = nullptr;
@@ -15,7 +15,7 @@ struct SectionFormat {
     const char* debugSuffix = nullptr;
 };
 
-// What stands around the parts of one item. Null means empty.
+// The texts before and after the parts of one item. Null means empty.
 struct ItemFormat {
     const char* itemPrefix = nullptr;
     const char* itemSuffix = nullptr;
@@ -28,8 +28,8 @@ struct ItemFormat {
     const char* elementSeparator = nullptr;
 };
 
-// The format of the items of one type. A table of these ends with a null type, whose format serves
-// every type that is not named.
+// The format of the items of one type. A table of these ends with a null type, whose format applies
+// to every other type.
 struct TypedItemFormat {
     const char* type;
     ItemFormat format;
@@ -39,9 +39,9 @@ extern const SectionFormat sectionFormat;
 extern const TypedItemFormat rawItemFormats[];
 extern const TypedItemFormat formattedItemFormats[];
 
-// Appends the items of the JSON array at `array`, all or none. What is no array has no items.
-// qiapalerr_invalidParameter for an item that is no object or a value that is neither a string nor
-// an array of strings.
+// Appends the items of the JSON array at `array`, either all or none. Anything but an array has no
+// items. qiapalerr_invalidParameter for an item that is not an object, or whose value is neither a
+// string nor an array of strings.
 void formatDynamicReportItems(const char* array, const TypedItemFormat* formats,
                               qihtl::String* output, qierr_Status* status);
 

@@ -2,14 +2,15 @@
 
 #include "qihtl/String.h"
 
-// What the translator reads from JSON texts, on top of jsonz.
+// Copying of values from JSON texts that are read with jsonz.
 namespace qixlator {
 
-// Appends the string value at `position`, its escapes resolved. Nothing when there is no string;
-// what stands before a faulty escape.
+// Appends the string value at `position` with its escapes resolved, up to an invalid escape.
+// Appends nothing if there is no string.
 void appendJsonString(const char* position, qihtl::String* output, qierr_Status* status);
 
-// Appends the JSON text of the value at `position`: all that follows when it does not end.
+// Appends the JSON text of the value at `position`. If the value is incomplete, appends the rest of
+// the text.
 void appendJsonText(const char* position, qihtl::String* output, qierr_Status* status);
 
 }  // namespace qixlator

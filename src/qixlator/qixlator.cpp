@@ -6,7 +6,7 @@
 #include "qihtl/Allocator.h"
 #include "qixlator/Session.h"
 #include "qixlator/jsonText.h"
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
 namespace {
 

@@ -1,10 +1,11 @@
+// Folder qixlator: formats statuses as text, by translators and explanation files.
 #pragma once
 
 #include <qixlatormgr.h>
 
 #include <cstdint>
 
-// Puts statuses into words: the way in.
+// The entry functions of the translation. Typical use:
 //
 //     qixlator::Session* session = qixlator_createSession(&failure);
 //     qihtl::String text;
@@ -12,37 +13,37 @@
 //                                                  &failure);
 //     qixlator_destroySession(session);
 //
-// with the layout functions of json1.h. Nothing throws. Sessions of different threads are
-// independent.
+// with the functions of json1.h. No function throws. Sessions of different threads are independent.
 
 namespace qixlator {
 
-// A translation in progress: keeps the translators it has made. Belongs to one thread.
+// A translation session: owns the translators that are created in it. Used by one thread.
 class Session;
 
 }  // namespace qixlator
 
-// Bits 0 to 7 of an attribute word: the language. Bits 8 to 11: the environment that asks.
+// Bits 0 to 7 of an attribute word: the language. Bits 8 to 11: the ADE, the application
+// development environment of the caller.
 constexpr std::uint32_t qixlator_languageMask = 0xFF;
 constexpr std::uint32_t qixlator_adeShift = 8;
 constexpr std::uint32_t qixlator_adeMask = 0xF;
 
-// A new session for the caller to destroy, or null: with qiapalerr_memoryFull when memory runs out,
-// and when the status is already negative.
+// Creates a session, to be destroyed by the caller. Returns null if the status is already negative,
+// and with qiapalerr_memoryFull if memory runs out.
 qixlator::Session* qixlator_createSession(qierr_Status* status);
 
-// Ends the session with its translators. The session may be null.
+// Destroys the session and its translators. The session may be null.
 void qixlator_destroySession(qixlator::Session* session);
 
-// The description of a code by the named translator, made with `alloc`; the caller frees it through
-// the same function. Null with a negative status when it fails (qiapalerr_resourceNotFound: the
-// translator describes no codes), and null when the translator has no text.
+// The description of a code by the named translator, allocated with `alloc` and to be freed with it
+// by the caller. Null with a negative status on failure (qiapalerr_resourceNotFound if the
+// translator does not describe codes), and null if the translator has no text for the code.
 char* qixlator_getStaticDesc(qixlator::Session* session, std::int32_t code, const char* xlatorName,
                              std::uint32_t attributes, qixlator_Alloc alloc, void* allocContext,
                              qierr_Status* status);
 
 // The description of a status's JSON text, in the named format, by the translator that the text
-// names. As above; qiapalerr_resourceNotFound also when the text names no translator.
+// names. Result as above; qiapalerr_resourceNotFound also if the text names no translator.
 char* qixlator_getDynamicDesc(qixlator::Session* session, const char* json,
                               std::uint32_t attributes, const char* format, qixlator_Alloc alloc,
                               void* allocContext, qierr_Status* status);

@@ -9,7 +9,7 @@
 #include "qisysq/stdpath_util.h"
 #include "qixlator/DirectoryWalker.h"
 #include "qixlator/ExplanationFile.h"
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
 namespace qixlator {
 
@@ -41,8 +41,8 @@ void reportNoMemory(qierr_Status* status) {
     qierr_Writer_addString(writer, "qixlator", "failed to allocate memory");
 }
 
-// A record in its own block of memory, since both kinds are too large for the stack of a small
-// thread. Null when memory runs out.
+// Owns a record on the heap, since both record types are too large for a small thread stack. Null
+// if memory runs out.
 template <typename Record>
 class OnHeap {
   public:

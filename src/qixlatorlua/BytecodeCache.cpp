@@ -47,7 +47,7 @@ void BytecodeCache::compile(lua_State* L, const EmbeddedFile& file, qierr_Status
     if (result == 0) {
         Dump dump{&script.bytecode, status};
         lua_dump(L, writeDump, &dump);
-        // What is not used to its end is memory for the life of the process.
+        // The cache is kept until the process ends, so unused capacity is released.
         script.bytecode.shrink();
     } else if (result == LUA_ERRMEM) {
         qihtl_reportMemoryFull(status);
@@ -59,7 +59,7 @@ void BytecodeCache::compile(lua_State* L, const EmbeddedFile& file, qierr_Status
 }
 
 const BytecodeCache* BytecodeCache::ofEmbeddedFiles() {
-    // A constructor that throws makes the language try again at the next call.
+    // If the constructor throws, the static object is constructed again at the next call.
     struct Complete : BytecodeCache {
         explicit Complete(qierr::Status&& status) : BytecodeCache(embeddedFiles(), &status) {
             if (status.code < 0) {
@@ -85,7 +85,7 @@ const BytecodeCache::Script* BytecodeCache::find(const char* module, std::size_t
     return nullptr;
 }
 
-// The index function of package.preload: arguments are that table and the name of a module.
+// The __index function of package.preload. Its arguments are that table and the name of a module.
 int BytecodeCache::load(lua_State* L) {
     const auto* cache = static_cast<const BytecodeCache*>(lua_touserdata(L, lua_upvalueindex(1)));
     std::size_t length = 0;
@@ -108,7 +108,7 @@ int BytecodeCache::install(lua_State* L) const {
     lua_getglobal(L, "package");
     lua_getfield(L, -1, "preload");
     lua_newtable(L);
-    // The index function only reads the cache.
+    // The __index function does not modify the cache.
     lua_pushlightuserdata(L, const_cast<BytecodeCache*>(this));
     lua_pushcclosure(L, load, 1);
     lua_setfield(L, -2, "__index");

@@ -8,33 +8,34 @@ struct lua_State;
 
 namespace qixlatorlua {
 
-// The embedded scripts, compiled once. A state then reads a script as bytecode, debug information
-// included, when it is first required: results, errors and tracebacks are those of the source.
-// Constant once it is made, so that any number of states may use it at the same time.
+// The embedded scripts as bytecode. A state loads a script from it when the script is first
+// required. The bytecode includes the debug information, so results, errors and tracebacks are the
+// same as those of the source. Constant after construction, so any number of states may use it at
+// the same time.
 class BytecodeCache {
   public:
-    // Compiles the Lua files of the table. A failed allocation sets the status; a script that
-    // cannot be compiled does not: its message is kept.
+    // Compiles the Lua files of the table. A failed allocation sets the status. A script that
+    // cannot be compiled does not; its error message is kept.
     BytecodeCache(EmbeddedFiles files, qierr_Status* status);
 
-    // The cache of the embedded files, made on first use. Null when memory ran out; the next call
-    // tries again. Any thread.
+    // The cache of the embedded files, created on first use. Null if memory runs out; the next call
+    // then tries again. Any thread may call it.
     static const BytecodeCache* ofEmbeddedFiles();
 
-    // Offers the scripts to a state through package.preload, and writes the line of each script
-    // that could not be compiled to standard error. Returns 0, or 1 if there is such a script. The
-    // cache must outlive the state. Leaves the stack as it was. Raises a Lua error when memory runs
-    // out: call it in a protected call.
+    // Makes the scripts available to a state through package.preload, and writes a line to standard
+    // error for each script that could not be compiled. Returns 0, or 1 if there is such a script.
+    // The cache must outlive the state. Leaves the stack unchanged. Raises a Lua error if memory
+    // runs out, so it must run in a protected call.
     int install(lua_State* L) const;
 
-    // Bytes of bytecode.
+    // The size of the bytecode in bytes.
     std::uint64_t size() const;
 
   private:
     struct Script {
         const EmbeddedFile* file;
         qihtl::String bytecode;
-        // The compiler's message; empty if there is bytecode.
+        // The compiler's error message; empty if there is bytecode.
         qihtl::String failure;
     };
 

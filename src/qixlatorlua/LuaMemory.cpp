@@ -28,7 +28,7 @@ void* LuaArena::allocate(void* arena, void* block, std::size_t oldSize, std::siz
     return block == nullptr ? self->get(newSize) : self->resize(block, oldSize, newSize);
 }
 
-// A piece, linked in; an old one is resized and may move.
+// Allocates a piece and adds it to the list, or resizes `old`, which may move.
 LuaArena::Piece* LuaArena::getPiece(Piece* old, std::size_t size) {
     auto* piece = static_cast<Piece*>(qihtl_realloc(old, sizeof(Piece) + size));
     if (piece == nullptr) {
@@ -105,7 +105,7 @@ void* LuaArena::resize(void* block, std::size_t oldSize, std::size_t newSize) {
     }
     void* moved = get(newSize);
     if (moved == nullptr) {
-        // A block that shrinks stays where it is, if need be; its memory ends with the arena.
+        // Shrinking must not fail, so the block stays where it is.
         return newSize <= oldSize ? block : nullptr;
     }
     std::memcpy(moved, block, oldSize < newSize ? oldSize : newSize);

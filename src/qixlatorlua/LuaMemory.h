@@ -2,15 +2,16 @@
 
 #include <cstddef>
 
-// Where the memory of Lua states comes from. Both functions have the meaning of lua_Alloc and never
-// fail to shrink a block, on which the interpreter relies.
+// Allocators for Lua states. Both functions follow the rules of lua_Alloc; in particular, shrinking
+// a block never fails.
 namespace qixlatorlua {
 
-// Every block by itself, as the interpreter's own allocator does it. `context` is not used.
+// Allocates each block separately, like the interpreter's own allocator. `context` is not used.
 void* allocatePlainly(void* context, void* block, std::size_t oldSize, std::size_t newSize);
 
-// The memory of one state, which lives for one translation: small blocks are cut from large chunks,
-// sorted by size when they are given back, and freed with the arena. Used by one thread.
+// The memory of one state, for the length of one translation. Small blocks are cut from large
+// chunks; freed blocks are kept in a list for each size; all memory is released with the arena.
+// Used by one thread.
 class LuaArena {
   public:
     LuaArena() noexcept = default;
@@ -18,11 +19,11 @@ class LuaArena {
     LuaArena(const LuaArena&) = delete;
     LuaArena& operator=(const LuaArena&) = delete;
 
-    // A lua_Alloc, with the arena for its context. All blocks end with the arena.
+    // A lua_Alloc with the arena as its context.
     static void* allocate(void* arena, void* block, std::size_t oldSize, std::size_t newSize);
 
   private:
-    // What stands before each piece of memory that the arena got for itself.
+    // The header of each piece of memory that the arena has allocated.
     struct alignas(8) Piece {
         Piece* next;
         Piece* prev;

@@ -29,8 +29,8 @@ lua_State* newFastState() {
         qihtl_realloc(arena, 0);
         return nullptr;
     }
-    // A state lives for one translation. Until it has grown well beyond the usual, its garbage is
-    // freed with it.
+    // A state is used for one translation, so its garbage is freed with it. Only a state that grows
+    // unusually large is collected earlier (collectionLimit).
     lua_gc(L, LUA_GCSTOP, 0);
     return L;
 }
@@ -53,7 +53,7 @@ bool openLibraries(lua_State* L, qierr_Status* status) {
 }
 
 struct Preload {
-    // Null: compile each script.
+    // Null to compile each script.
     const BytecodeCache* cache;
     int result;
 };
@@ -83,9 +83,8 @@ void reportNoState(qierr_Status* status) {
     qierr_Writer_addString(writer, "debug", "failed to create lua state");
 }
 
-// What stands on the top of the stack as a text, "" for what is none. A number is written into
-// `buffer`: making a text of it inside the state could raise an error, which nobody would catch
-// here.
+// The string or number on top of the stack as text, "" for any other value. A number is formatted
+// into `buffer`: lua_tostring could raise an error, and no protected call would catch it here.
 const char* messageOnTop(lua_State* L, char* buffer, std::size_t size) {
     switch (lua_gettop(L) == 0 ? LUA_TNONE : lua_type(L, -1)) {
         case LUA_TSTRING:

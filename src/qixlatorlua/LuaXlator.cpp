@@ -8,13 +8,14 @@
 #include "qixlator/qixlator.h"
 #include "qixlatorlua/LuaState.h"
 
-// The functions that run inside lua_cpcall own nothing: a Lua error jumps over their frames.
+// The functions that run inside lua_cpcall must not own resources: a Lua error is a longjmp that
+// skips destructors.
 
 namespace qixlatorlua {
 
 namespace {
 
-// ---- Setting up ---------------------------------------------------------------------------------
+// ---- Setup --------------------------------------------------------------------------------------
 
 struct Setup {
     const char* name;
@@ -33,7 +34,7 @@ int setUpProtected(lua_State* L) {
     return 0;
 }
 
-// Codes are not mapped in this service.
+// This service does not map codes, so the function returns its argument.
 int unmapErrorCode(lua_State* L) {
     lua_pushinteger(L, luaL_checkinteger(L, 1));
     return 1;
@@ -57,15 +58,15 @@ bool setUp(lua_State* L, Setup setup, qierr_Status* status) {
     return result == 0;
 }
 
-// ---- Describing ---------------------------------------------------------------------------------
+// ---- Descriptions -------------------------------------------------------------------------------
 
-// The memory in KiB that a state may reach before its garbage is collected between calls.
+// The size in KiB above which the garbage of a state is collected between calls.
 constexpr int collectionLimit = 4096;
 
 struct Description {
     const char* function;
     std::int32_t code;
-    const char* json;  // null: a description of the code
+    const char* json;  // null to describe the code
     const char* format;
     std::uint32_t attributes;
     qixlator_Alloc alloc;
@@ -91,7 +92,7 @@ int pushArguments(lua_State* L, const Description& description) {
     return 4;
 }
 
-// Calls the script's function under the message handler of the scripts, if there is one.
+// Calls the function of the script, with the error function of the scripts if there is one.
 void callScript(lua_State* L, const Description& description) {
     lua_getglobal(L, "qixlatorlua_errHandler");
     const int handler = lua_isfunction(L, -1) ? lua_gettop(L) : 0;

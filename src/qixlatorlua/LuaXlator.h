@@ -1,37 +1,38 @@
+// Folder qixlatorlua: runs translators that are written in Lua.
 #pragma once
 
 #include <qixlatormgr.h>
 
 struct lua_State;
 
-// The host of a translator that is written in Lua. One host is one Lua state, made for one session.
+// A translator that is written in Lua. Each has one Lua state and belongs to one session.
 namespace qixlatorlua {
 
 struct LuaXlator : XlatorInterface {
-    // Null until the state is complete.
+    // Null until the state is completely set up.
     lua_State* L;
 };
 
-// How the state of a translator gets its scripts and its memory. Results, failures and what is
-// written to standard error are the same.
+// How a Lua state loads its scripts and allocates its memory. Results, failures and the output on
+// standard error are the same for both.
 enum class LuaRuntime {
-    // Compiles every script, and allocates each block by itself.
+    // Compiles every script and allocates each block separately.
     plain,
-    // Reads bytecode, compiled once in the process, when it is required, and allocates from an
-    // arena. Compiles every script when there is no memory for the bytecode.
+    // Loads a script as bytecode when it is required, and allocates from an arena. The bytecode is
+    // compiled once in the process; if there is no memory for it, every script is compiled.
     fast,
 };
 
-// Makes a translator: opens a state with the libraries and embedded scripts and sets it up by the
-// registration text, a JSON object with
+// Creates a translator: opens a state with the libraries and embedded scripts and configures it
+// with the registration text, a JSON object with
 //
-//   qixlatorlua_xlator    the module that is the translator
+//   qixlatorlua_xlator    the module that implements the translator
 //   qixlatorlua_settings  optional: an object for the scripts
 //   qixlatorlua_path      optional: directories to search for scripts, separated by semicolons
 //
-// Null with qiapalerr_memoryFull when memory runs out for the state, with
-// qiapalerr_softwareFaultAPALInternalUseOnly when Lua reports an error, and when the status is
-// already negative. The translator is ended by its own destroy.
+// Returns null if the status is already negative, with qiapalerr_memoryFull if memory for the state
+// runs out, and with qiapalerr_softwareFaultAPALInternalUseOnly if Lua reports an error. The
+// translator is freed by its function `destroy`.
 XlatorInterface* createLuaXlator(const char* name, const char* registrationInfo, LuaRuntime runtime,
                                  qierr_Status* status);
 

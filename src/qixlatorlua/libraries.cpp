@@ -6,7 +6,7 @@
 #include "qixlatorlua/restrictions.h"
 #include "stdint/luaopen_stdint.h"
 
-// The header of the JSON module declares a C function without saying so.
+// The header of the JSON module lacks extern "C".
 extern "C" {
 #include <lfs.h>
 #include <lua-cjson.h>
@@ -16,9 +16,9 @@ namespace qixlatorlua {
 
 namespace {
 
-// Opens the library of files. If that runs out of memory half-way, a handle of a standard file may
-// not know yet that it must not be closed: the collector would close the standard file of the whole
-// process. So the handles then lose what closes them.
+// Opens the io library. If memory runs out in the middle, the handle of a standard file may not be
+// marked yet as one that must not be closed, and the garbage collector would close that file for
+// the whole process. Therefore the __gc function of the handles is removed then.
 int openFiles(lua_State* L) {
     luaL_newmetatable(L, LUA_FILEHANDLE);
     const int handles = lua_gettop(L);
@@ -55,7 +55,7 @@ void openLibrary(lua_State* L, const LuaLibrary& library) {
     lua_pushstring(L, library.name);
     lua_call(L, 1, 1);
     if (library.name[0] != '\0') {
-        // Some of the modules leave it to their loader to make them known.
+        // Some modules do not register themselves in package.loaded.
         lua_getfield(L, LUA_REGISTRYINDEX, "_LOADED");
         lua_pushvalue(L, -2);
         lua_setfield(L, -2, library.name);

@@ -3,7 +3,7 @@
 #include <cstring>
 
 #include "qisysq/stdpath.h"
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
 namespace qixlatorlua {
 
@@ -24,7 +24,7 @@ constexpr Variable variables[] = {
     {"_tempDir", qisysq::getTempDir},
 };
 
-// A value may hold variables itself, and so itself: there must be an end.
+// The value of a variable may contain variables, even itself, so the replacements are limited.
 constexpr int maximumReplacements = 32;
 
 void reportInvalid(const char* path, qierr_Status* status) {

@@ -1,4 +1,4 @@
--- What the host calls first: sets a state up as one translator.
+-- Runs first in each new state: sets the state up as one translator.
 
 local json = require("json")
 local utils = require("qixlatorluautils")
@@ -8,12 +8,12 @@ qixlatorlua_name = nil
 qixlatorlua_xlator = nil
 qixlatorlua_settings = {}
 
--- The message handler of every call into the translator.
+-- The error function of every call into the translator.
 function qixlatorlua_errHandler(errorIn)
     return errorIn .. "\n" .. debug.traceback()
 end
 
--- The search path for scripts, of directories that may begin with a variable.
+-- The search path for scripts in these directories, which may begin with a variable.
 local function makePath(name, directories)
     local templates = {}
     for part in directories:gmatch("[^;]+") do
@@ -26,9 +26,9 @@ local function makePath(name, directories)
     return table.concat(templates, ";")
 end
 
--- name: of this translator. registrationInfo: the JSON object that says which module it is
--- (qixlatorlua_xlator), and may bring settings (qixlatorlua_settings) and directories to search,
--- separated by semicolons (qixlatorlua_path).
+-- name: the name of this translator. registrationInfo: a JSON object with the module that
+-- implements it (qixlatorlua_xlator) and optionally settings (qixlatorlua_settings) and directories
+-- to search, separated by semicolons (qixlatorlua_path).
 function qixlatorlua_setupEnv(name, registrationInfo)
     local info = json.decode(registrationInfo)
     qixlatorlua_name = name

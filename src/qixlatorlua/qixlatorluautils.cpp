@@ -12,8 +12,8 @@ namespace {
 
 constexpr const char* outcomeType = "qixlatorluautils.outcome";
 
-// What a native function works on. It lives in a Lua userdata, since a Lua error may jump over the
-// frame of the function at any call into Lua: the collector then ends it.
+// The working data of a native function. It is a Lua userdata, since any call into Lua may raise an
+// error that skips the destructors of the function; the garbage collector then destroys it.
 struct Outcome {
     qihtl::String text;
     qierr::Status status;
@@ -36,7 +36,7 @@ Outcome* newOutcome(lua_State* L) {
     return outcome;
 }
 
-// Returns the text, or raises the failure.
+// Returns the text to Lua, or raises the failure as a Lua error.
 int finish(lua_State* L, Outcome* outcome) {
     const bool failed = outcome->status.code < 0;
     if (failed) {
@@ -48,7 +48,7 @@ int finish(lua_State* L, Outcome* outcome) {
     return failed ? lua_error(L) : 1;
 }
 
-// The same for a search, where an empty text is none.
+// The same for a search: an empty text is returned as nil.
 int finishSearch(lua_State* L, Outcome* outcome) {
     if (outcome->status.code >= 0 && outcome->text.empty()) {
         outcome->reset();
@@ -121,7 +121,7 @@ extern "C" int luaopen_qixlatorluautils(lua_State* L) {
         {"convertLangToDir", convertLangToDir},
         {"findErrorDescriptionFromErrorsDir", findErrorDescriptionFromErrorsDir},
         {"findErrorDescriptionFromDir", findErrorDescriptionFromDir},
-        // Takes a directory too, whatever its name says: scripts rely on it.
+        // Despite its name this function takes a directory too; scripts rely on that.
         {"findErrorDescriptionFromFile", findErrorDescriptionFromDir},
         {nullptr, nullptr},
     };

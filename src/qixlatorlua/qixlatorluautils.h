@@ -2,13 +2,13 @@
 
 struct lua_State;
 
-// Opens the Lua module `qixlatorluautils`, by which the translator's scripts reach the paths and
-// the explanation files of the system. Each function raises a Lua error whose value is the JSON
-// text of the failure's status.
+// Opens the Lua module `qixlatorluautils`, which gives the translator's scripts access to the paths
+// and the explanation files of the system. On failure a function raises a Lua error whose value is
+// the JSON text of the status.
 //
-//   mbsToUtf8(language, text)                          the text; files are UTF-8 here
+//   mbsToUtf8(language, text)                          the text, unchanged: all files are UTF-8
 //   lookupVariable(translator, name)                   the variable's value, or ""
-//   expandPath(translator, path)                       the path, its variables replaced
+//   expandPath(translator, path)                       the path with its variables replaced
 //   convertLangToDir(language)                         the name of the language's directory
 //   findErrorDescriptionFromErrorsDir(directory, code, language)   the text, or nil
 //   findErrorDescriptionFromDir(directory, code)       the text, or nil

@@ -4,7 +4,7 @@
 #include <cstring>
 #include <lua.hpp>
 
-// Nothing here owns anything: a Lua error jumps over the frames of these functions.
+// These functions must not own resources: a Lua error is a longjmp that skips destructors.
 
 namespace qixlatorlua {
 
@@ -29,8 +29,9 @@ bool isReadable(const char* path) {
     return file != nullptr;
 }
 
-// Pushes the native module's path in package.cpath, or else a list of all places looked at, and
-// returns whether there is one. `module` is the stack index of the module's name.
+// Searches package.cpath for a native module. Pushes the path of the module, or else the list of
+// all paths that were tried, and returns whether it was found. `module` is the stack index of its
+// name.
 bool pushNativeModule(lua_State* L, int module) {
     luaL_gsub(L, lua_tostring(L, module), ".", LUA_DIRSEP);
     const int fileName = lua_gettop(L);
@@ -59,7 +60,9 @@ bool pushNativeModule(lua_State* L, int module) {
     return false;
 }
 
-// Finds the native module whose name is at the stack index `module`: not at all, or in vain.
+// Handles a native module, whose name is at the stack index `module`. Returns the list of paths
+// that were tried if there is no such module; raises an error if there is one, since it is never
+// loaded.
 int findNativeModule(lua_State* L, int module) {
     if (pushNativeModule(L, module)) {
         return luaL_error(L, "error loading module " LUA_QS " from file " LUA_QS ":\n\t%s",
@@ -73,7 +76,7 @@ int loadNativeModule(lua_State* L) {
     return findNativeModule(L, 1);
 }
 
-// The module may also be a part of a library named as the first word of its name.
+// The loader for a module a.b in the library of the module a.
 int loadFromRootModule(lua_State* L) {
     const char* name = luaL_checkstring(L, 1);
     const char* dot = std::strchr(name, '.');
@@ -106,8 +109,8 @@ int prompt(lua_State* L) {
     }
 }
 
-// Stores a loader that sees the package table as its environment, as the interpreter's own do. The
-// package table lies below the table of loaders.
+// Stores a loader with the package table as its environment, like the interpreter's own loaders.
+// The package table is below the table of loaders on the stack.
 void setLoader(lua_State* L, int index, lua_CFunction loader) {
     lua_pushcfunction(L, loader);
     lua_pushvalue(L, -3);

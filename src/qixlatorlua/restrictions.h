@@ -2,18 +2,18 @@
 
 struct lua_State;
 
-// What a translator's script cannot do, whatever the installed interpreter was built for. Each
-// function finds the table of its library on the top of the stack and leaves it there.
+// Restrictions for translator scripts, independent of how the installed interpreter was built. Each
+// function expects the table of its library on top of the stack and leaves it there.
 namespace qixlatorlua {
 
-// package.loadlib and the loaders of native modules answer as in an interpreter without dynamic
-// loading.
+// Makes package.loadlib and the loaders of native modules behave as in an interpreter without
+// dynamic loading.
 void disableNativeModules(lua_State* L);
 
-// io.popen raises "'popen' not supported".
+// Makes io.popen raise "'popen' not supported".
 void disablePrograms(lua_State* L);
 
-// debug.debug prompts with "hlua_debug> ".
+// Changes the prompt of debug.debug to "hlua_debug> ".
 void renameDebugPrompt(lua_State* L);
 
 }  // namespace qixlatorlua

@@ -221,7 +221,8 @@ TEST_F(LentXlatorTest, AnUnknownNameIsReported) {
     EXPECT_EQ(nullptr, create("qixlator_default", "{}", &status));
     EXPECT_EQ(-52005, status.code);
     EXPECT_EQ(
-        "{\"error_constant\":\"qiapalerr_invalidParameter\",\"file\":\"src/qixlator/exported.cpp\","
+        "{\"error_constant\":\"qiapalerr_invalidParameter\",\"file\":\"src/qixlator/"
+        "exportedXlators.cpp\","
         "\"line\":#,\"component\":\"qitrmcsvc\",\"qixlator_debug\":{\"qixlator_exported\":"
         "\"could not find xlator\",\"name\":\"qixlator_default\",\"registrationInfo\":\"{}\"}}",
         status.text());

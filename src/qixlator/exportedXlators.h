@@ -2,8 +2,7 @@
 
 #include <qixlatormgr.h>
 
-// Makes a translator that this program lends, for a manager library: see qixlatormgr.h.
-// qiapalerr_invalidParameter when the name is not one of exportedRegistrations(). Exported under
-// its plain name.
+// Creates a translator of this program for a manager library; see qixlator_exported_create_fn in
+// qixlatormgr.h. qiapalerr_invalidParameter if exportedRegistrations() has no such name.
 extern "C" __attribute__((visibility("default"))) XlatorInterface* qixlator_exported_create(
     const char* name, const char* registrationInfo, qierr_Status* status);

@@ -1,4 +1,4 @@
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
 namespace qixlator {
 

@@ -1,9 +1,10 @@
-#include "qixlator/exported.h"
+#include "qixlator/exportedXlators.h"
 
 #include "qixlator/Registration.h"
-#include "qixlator/report.h"
+#include "qixlator/reportFailure.h"
 
-// In one source with the export, so that whoever registers a translator brings the export along.
+// In the same source file as the exported function, so that the linker includes that function in
+// every program that registers a translator for others.
 qixlator::XlatorRegistration& qixlator::exportedRegistrations() {
     static XlatorRegistration list;
     return list;
