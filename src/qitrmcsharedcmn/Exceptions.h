@@ -1,3 +1,4 @@
+// Folder qitrmcsharedcmn: the service's exceptions and its lists of resource names.
 #pragma once
 
 #include <cstdint>
@@ -11,7 +12,7 @@ namespace nQITRMCSHAREDCMN100 {
 // The translator of every detail that the service adds to a status.
 constexpr const char* translatorName = "mxlator_qitrmc";
 
-// A fault of a request. `what` is null when no detail was added.
+// An error in a request. what() returns null if no detail was added.
 class BasicError : virtual public qierr::ExceptionBase, virtual public std::exception {
   public:
     BasicError(std::int32_t code, const qierr_SourcePosition& position) noexcept;
@@ -21,30 +22,30 @@ class BasicError : virtual public qierr::ExceptionBase, virtual public std::exce
     ~BasicError() override;
     const char* what() const noexcept override;
 
-    // Where details for the client are added.
+    // A writer for details that are sent to the client.
     qierr_Writer details() noexcept { return qierr_orderedData(translatorName, status()); }
 };
 
-// A fault of the program, which no request can cause. `what` as BasicError's.
+// An error in the program, which no request can cause. what() as in BasicError.
 class InternalError : virtual public qierr::ExceptionBase, virtual public std::exception {
   public:
-    // `comment` is for maintainers and never reaches a client.
+    // `comment` is for maintainers and is never sent to a client.
     InternalError(const char* comment, const qierr_SourcePosition& position) noexcept;
     InternalError(const InternalError& source) noexcept;
     ~InternalError() override;
     const char* what() const noexcept override;
 };
 
-// What a captured exception without a status is reported at. Its own place is unknown.
+// The source position that is reported for an exception without a status, whose own is unknown.
 inline constexpr qierr_SourcePosition capturePosition = QITRMC_HERE;
 
-// Turns the exception in flight into a status, from inside a handler: a status that it carries is
-// taken over; an allocation failure becomes outOfMemory and any other std::exception internalError
-// with its text. Any other kind of exception passes through.
+// Converts the current exception into a status; to be called in a catch block. A status that the
+// exception contains is moved; std::bad_alloc becomes outOfMemory, any other std::exception
+// internalError with its text. An exception of another type is rethrown.
 void captureCurrentException(qierr_Status* status);
 
-// A status around driver calls: filled by the call, it throws qierr::Exception from its destructor
-// when it ends negative and no exception is in flight. A warning is dropped.
+// A status to pass to a driver call. The destructor throws qierr::Exception if the status is
+// negative, except during stack unwinding. A warning is dropped.
 class ThrowingStatus : public qierr::Status {
   public:
     ThrowingStatus() = default;

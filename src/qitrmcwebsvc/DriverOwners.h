@@ -13,10 +13,10 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Owners of what the driver lends. Each is filled through its out pointers by a driver call and
-// gives everything back at its end, whether the call succeeded or not.
+// Owners of the memory and handles that driver functions return. A driver call fills an owner
+// through its out pointers; the destructor frees the contents, whether the call succeeded or not.
 
-// An array of texts. A text that the driver left out is read as an empty one.
+// An array of texts. A null text is read as an empty one.
 class DriverStringArray {
   public:
     class Iterator {
@@ -57,13 +57,13 @@ class DriverStringArray {
     std::uint32_t count = 0;
 };
 
-// An array of numbers, or of truth values of one byte each.
+// An array of numbers, or of Booleans of one byte each.
 template <typename Element>
 class DriverArray {
   public:
     DriverArray() = default;
-    // An array of the program's own, which the driver takes back like one that it lent: both come
-    // from malloc. Its elements are not set.
+    // An array that this program allocates. The driver frees it like its own, since both are
+    // allocated with malloc. The elements are not initialised.
     explicit DriverArray(std::uint32_t count)
         : array(static_cast<Element*>(std::malloc(count * sizeof(Element)))), count(count) {
         if (array == nullptr && count != 0)
@@ -95,17 +95,17 @@ class DriverString {
 
     char** out() { return &text; }
 
-    // Null when the driver gave none.
+    // Null if the driver returned no text.
     const char* get() const { return text; }
-    // A copy, empty when the driver gave none.
+    // A copy, empty if the driver returned no text.
     std::string copy() const { return text != nullptr ? text : ""; }
 
   private:
     char* text = nullptr;
 };
 
-// An open handle, 0 when there is none. What its closing reports is dropped: the work is done, or
-// has failed for a reason of its own.
+// An open handle, or 0. A failure to close it is ignored: by then the operation has either
+// succeeded or failed for another reason.
 template <void (*close)(std::uint32_t handle, qierr_Status* status)>
 class DriverHandle {
   public:

@@ -7,11 +7,11 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// One value of an enumeration of the driver, written in a request as a number or as a word.
+// A value of an enumeration of the driver. A request contains it as a number or by its name.
 class EnumType {
   public:
-    // Throws InternalError for a value that is neither an integer of the signed 32-bit range nor a
-    // text; a schema keeps such values out, but for a whole number written with a fraction.
+    // Throws InternalError for a value that is neither a signed 32-bit integer nor a text. Schemas
+    // reject such values, except a whole number that is written with a fraction.
     EnumType(const JsonValue& value, std::string enumerationName);
 
     const std::string& name() const { return enumerationName; }

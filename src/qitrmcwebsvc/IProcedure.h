@@ -5,13 +5,13 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// One JSON-RPC method. One object serves any number of requests at once.
+// One JSON-RPC method. One object executes any number of requests concurrently.
 class IProcedure {
   public:
     virtual ~IProcedure() = default;
 
-    // Checks the request against the method's schema, does the work and sets the result. Failure is
-    // an exception of the family std::exception; nothing has been set in the response then.
+    // Checks the request against the method's schema, executes it and sets the result. On failure
+    // throws an exception derived from std::exception, with the response unchanged.
     virtual void execute(const SingleRequest& request, SingleResponse& response) = 0;
 };
 

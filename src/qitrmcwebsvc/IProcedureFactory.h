@@ -6,7 +6,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Makes the one object of each procedure class: one make operation for each row of methods.def.
+// Creates the single object of each procedure class: one function for each row of methods.def.
 class IProcedureFactory {
   public:
     virtual ~IProcedureFactory() = default;

@@ -4,14 +4,14 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Decides whether a request has the parameters that its method asks for.
+// Checks whether a request has the parameters that its method requires.
 class ISchemaValidator {
   public:
     virtual ~ISchemaValidator() = default;
 
-    // Returns when the request conforms. Otherwise throws BasicError: with invalidRequest when
-    // "params" is not an object, and with invalidParams for any other fault. May be called by
-    // several threads at once.
+    // Returns if the request is valid. Otherwise throws BasicError: with invalidRequest if "params"
+    // is not an object, and with invalidParams for any other error. May be called by several
+    // threads concurrently.
     virtual void validate(const SingleRequest& request) = 0;
 };
 

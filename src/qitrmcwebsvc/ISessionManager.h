@@ -10,13 +10,13 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// The open sessions of the service, by the id that clients carry.
+// The open sessions of the service, by the id that clients use.
 //
 // access: 1 read only, 3 read and write. reservationTimeout: seconds to wait for a device that
-// another session holds. Any number of threads may call; each call runs alone, the driver's part of
-// it included, so a reservation that waits holds up every other call. Failures are thrown:
-// BasicError unknownSession for an unknown id, tooManySessions when no session with resources can
-// be added; qierr::Exception with the driver's status when the driver refuses; InternalError
+// another session holds. Any number of threads may call these functions. The calls are serialised,
+// including their driver calls, so a reservation that waits blocks every other call. Throws
+// BasicError unknownSession for an unknown id and tooManySessions if no session with resources can
+// be added; qierr::Exception with the driver's status if a driver call fails; InternalError
 // otherwise.
 class ISessionManager {
   public:
@@ -25,16 +25,16 @@ class ISessionManager {
     // Opens a session without resources and returns its id.
     virtual std::string createSession() = 0;
 
-    // Opens a session on resources, reserving the devices they belong to, and returns its id.
-    // forceReserve closes the sessions of this service that hold one of those devices, first.
+    // Opens a session on resources, reserves the devices that they belong to, and returns its id.
+    // With forceReserve, first closes the sessions of this service that hold one of those devices.
     virtual std::string createSession(ResourceKind kind, const std::vector<std::string>& names,
                                       std::int32_t access, const std::string& reservationGroup,
                                       double reservationTimeout, bool forceReserve) = 0;
 
-    // Looks a session up.
+    // Finds a session.
     virtual std::shared_ptr<SessionContext> getSessionContext(const std::string& sessionId) = 0;
 
-    // Closes a session. It stays open when the driver refuses.
+    // Closes a session. The session stays open if the driver call fails.
     virtual void closeSession(const std::string& sessionId) = 0;
 
     // Reserves devices for an open session.
@@ -42,7 +42,8 @@ class ISessionManager {
                                 std::int32_t access, const std::string& reservationGroup,
                                 double reservationTimeout) = 0;
 
-    // Releases devices. The session counts as holding none from then on, even if it holds others.
+    // Releases devices. From then on the session counts as holding no devices, even if it holds
+    // others.
     virtual void unreserveDevices(const std::string& sessionId,
                                   const std::vector<std::string>& names) = 0;
 };

@@ -1,17 +1,17 @@
 #pragma once
 
-// The JSON types of the whole service. Nothing else includes the JSON library for its values.
+// The JSON types of the whole service. Only this header includes the JSON library's value types.
 //
-// An allocation failure in any of them is a std::bad_alloc. An object or array whose growth failed
-// that way counts on room it does not have: destroy it, and never add to it again.
+// All of them report an allocation failure as std::bad_alloc. An object or array whose growth
+// failed has a capacity without the memory for it, so it must be destroyed and not added to.
 
 #include <rapidjson/allocators.h>
 
 #include "qitrmcwebsvc/ThrowingAllocator.h"
 
-// The library's own default allocator answers a failure with null, through which the library then
-// writes. Some parts, such as the stack of a deep copy and the compiled patterns of a schema, take
-// the default whatever their surroundings use: hence another default.
+// The library's default allocator returns null on failure, and the library writes through that
+// pointer. Some parts, such as the stack of a deep copy and the compiled patterns of a schema,
+// always use the default allocator. Therefore the default is replaced.
 #define CrtAllocator ::nQITRMCWEBSVC100::ThrowingAllocator
 #include <rapidjson/document.h>
 #include <rapidjson/pointer.h>

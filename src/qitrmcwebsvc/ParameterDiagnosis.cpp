@@ -24,12 +24,13 @@ const JsonValue* memberOfObject(const JsonValue* object, const std::string& name
     return findMember(*object, name.c_str());
 }
 
-// Formatting through a stream would share the global locale's caches, which threads fill unguarded.
+// String replacement instead of a stream: streams use caches of the global locale, which are filled
+// without a lock.
 std::string filledIn(const char* descriptionName, const std::string& value) {
     return boost::algorithm::replace_first_copy(getErrorDescription(descriptionName), "%s", value);
 }
 
-// The value of a keyword, by the pointer to the schema that has it.
+// The value of the failed keyword in the schema.
 const JsonValue& keywordValue(const JsonValue& schema, const SchemaFailure& failure) {
     const JsonValue* const value = resolve(schema, failure.schemaPointer + "/" + failure.keyword);
     if (!value)

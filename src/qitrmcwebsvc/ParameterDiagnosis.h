@@ -7,15 +7,15 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// The sentence that tells a client what is wrong, or "" when none is known. `schema` is the
+// The sentence that describes a failure to a client, or "" if there is none. `schema` is the
 // document that the pointers of the failure refer to.
 //
-// Besides the standard keywords it reads the schema's own "<keyword>ErrorDescription" members, each
-// of which names a sentence. Throws InternalError when the schema itself is at fault.
+// A schema may name the sentence for a keyword in a member "<keyword>ErrorDescription". Throws
+// InternalError if the schema itself is invalid.
 std::string describeFailure(const JsonValue& schema, const SchemaFailure& failure);
 
-// Throws the BasicError with invalidParams for this failure: with its sentence or, where none
-// is known, with its raw facts. Throws InternalError as describeFailure.
+// Throws BasicError invalidParams for this failure, with its sentence or, if there is none, with
+// the pointers and the keyword. Throws InternalError like describeFailure.
 [[noreturn]] void throwInvalidParams(const JsonValue& schema, const SchemaFailure& failure);
 
 }  // namespace nQITRMCWEBSVC100

@@ -5,8 +5,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Gives each procedure a validator of its own and a share of the one session manager, which the
-// factory makes. Throws InternalError for a schema that does not compile.
+// Creates the procedures, each with its own validator. All of them share one session manager, which
+// the factory creates. Throws InternalError for a schema that does not compile.
 class ProcedureFactory : public IProcedureFactory {
   public:
     ProcedureFactory();

@@ -12,8 +12,8 @@ void RequestAccessLock::lockShared() {
 void RequestAccessLock::lockExclusive() {
     std::unique_lock<std::mutex> hold(mutex);
     ++writers;
-    // One wait without a second test: whoever is woken is let in, beside a remaining shared holder
-    // too. That keeps a batch from waiting for the slowest of the requests that were there first.
+    // Waits once without checking the condition again, so that a batch does not have to wait for
+    // the slowest of the earlier requests. Shared holders may remain.
     if (writers > 1 || readers > 0)
         writersCondition.wait(hold);
 }

@@ -6,13 +6,13 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Decides which requests may overlap: single requests hold it shared, a batch exclusive. It guards
-// no data.
+// Determines which requests may run concurrently: single requests hold the lock shared, a batch
+// holds it exclusively. The lock protects no data.
 //
-// A shared caller counts once it is in; an exclusive caller counts from its arrival, which bars
-// shared callers that come later. An exclusive caller waits once and is let in by whatever wakes
-// it, so it may start while a shared holder that was there first is still running. Not recursive.
-// Every operation may throw std::system_error and then has released the mutex.
+// An exclusive caller that holds the lock or waits for it keeps later shared callers waiting. It
+// waits once and then acquires the lock without checking the state again, so it may start while
+// earlier shared holders are still running. Not recursive. Every operation may throw
+// std::system_error; the mutex is then released.
 class RequestAccessLock {
   public:
     RequestAccessLock() = default;
@@ -30,12 +30,12 @@ class RequestAccessLock {
 
     std::condition_variable readersCondition;
     std::condition_variable writersCondition;
-    std::int32_t readers = 0;  // holders
-    std::int32_t writers = 0;  // waiting callers and the holder
-    std::mutex mutex;          // held inside the four operations only
+    std::int32_t readers = 0;  // shared holders
+    std::int32_t writers = 0;  // exclusive holder and waiting exclusive callers
+    std::mutex mutex;          // held only inside the four operations
 };
 
-// Holds the lock shared for its own life.
+// Holds the lock shared during its lifetime.
 class SharedAccess {
   public:
     explicit SharedAccess(RequestAccessLock& accessLock) : lock(accessLock) { lock.lockShared(); }
@@ -47,7 +47,7 @@ class SharedAccess {
     RequestAccessLock& lock;
 };
 
-// Holds the lock exclusive for its own life.
+// Holds the lock exclusively during its lifetime.
 class ExclusiveAccess {
   public:
     explicit ExclusiveAccess(RequestAccessLock& accessLock) : lock(accessLock) {

@@ -18,15 +18,15 @@ void addDefaultParamsToObject(JsonValue& value, JsonPool& allocator) {
         value.AddMember("params", JsonValue(rapidjson::kObjectType), allocator);
 }
 
-// A body of a few bytes for each element makes a response of hundreds for each, under the exclusive
-// lock; the limit is far above any real batch.
+// An element of a few bytes can cause a response of hundreds of bytes, while the exclusive lock is
+// held. The limit is far above any realistic batch.
 constexpr rapidjson::SizeType maxBatchElements = 100000;
 
 bool isBatch(const JsonValue& root) {
     return root.IsArray() && !root.Empty() && root.Size() <= maxBatchElements;
 }
 
-// The id as it was sent, whatever its type; null where there is none.
+// The id of a request, of whatever type, or null if there is none.
 JsonValue copyId(const JsonValue& requestValue, JsonPool& allocator) {
     if (!requestValue.IsObject())
         return JsonValue();
@@ -34,14 +34,14 @@ JsonValue copyId(const JsonValue& requestValue, JsonPool& allocator) {
     return id == nullptr ? JsonValue() : JsonValue(*id, allocator);
 }
 
-// To be called from inside a handler.
+// To be called in a catch block.
 void setErrorFromCurrentException(SingleResponse& response) {
     qierr::Status status;
     captureCurrentException(&status);
     response.setError(status);
 }
 
-// The error of every element that a batch skips, in words that are made once.
+// The error of the batch elements that are skipped. Its text is produced only once.
 class SkippedError {
   public:
     void setOn(SingleResponse& response) {
@@ -118,7 +118,7 @@ bool RequestHandler::handleSingleRequest(JsonValue& requestValue, JsonValue& res
     return succeeded;
 }
 
-// What follows the first failure is answered but not run.
+// After the first failure, the remaining requests are answered with an error and not executed.
 void RequestHandler::handleBatchRequest(JsonValue& requests, JsonValue& responseValue,
                                         JsonPool& allocator) {
     responseValue.SetArray();

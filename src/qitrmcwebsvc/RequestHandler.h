@@ -1,3 +1,4 @@
+// Folder qitrmcwebsvc: the plug-in itself: HTTP checks, JSON-RPC, sessions, schemas, resources.
 #pragma once
 
 #include <map>
@@ -11,18 +12,20 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Turns the text of one HTTP body into the text of one HTTP response. One object serves all server
-// threads at once; no request may be running when it ends, which closes all sessions.
+// Processes the text of an HTTP body and returns the text of the HTTP response. One object is used
+// by all server threads concurrently. The destructor closes all sessions; no request may be running
+// then.
 class RequestHandler {
   public:
-    // Makes all procedures, and so compiles all schemas. Throws InternalError for a bad one.
+    // Creates all procedures and compiles their schemas. Throws InternalError for an invalid
+    // schema.
     RequestHandler();
     virtual ~RequestHandler() = default;
     RequestHandler(const RequestHandler&) = delete;
     RequestHandler& operator=(const RequestHandler&) = delete;
 
-    // Answers a single request or a batch. Returns one complete JSON text, an error text included;
-    // throws when not even an error can be put into words or memory is exhausted.
+    // Processes a single request or a batch. Returns one complete JSON text, also for an error.
+    // Throws if the text of an error cannot be produced or memory runs out.
     std::string handleRequest(const std::string& body);
 
   private:

@@ -6,7 +6,7 @@
 #include <utility>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcsharedcmn/parseUtilities.h"
+#include "qitrmcsharedcmn/resourceNames.h"
 #include "qitrmcwebsvc/DriverOwners.h"
 #include "qitrmcwebsvc/findMember.h"
 #include "qitrmcwebsvc/foldedText.h"
@@ -17,7 +17,7 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-// The first member that a request has decides.
+// In the order of precedence: only the first of these members that a request has is read.
 constexpr std::pair<const char*, ResourceKind> resourceMembers[] = {
     {"devices", ResourceKind::Device},
     {"physical_channels", ResourceKind::PhysicalChannel},
@@ -27,7 +27,7 @@ constexpr std::pair<const char*, ResourceKind> resourceMembers[] = {
     {"nvmem_area", ResourceKind::NvmemArea},
 };
 
-// Stand for lists that the driver keeps, and so are never looked up.
+// Names for lists that the driver maintains. They are not checked against the driver's names.
 constexpr std::array<const char*, 5> tokens = {"$ConnectedDevices", "$DefaultDevices",
                                                "$DefaultNVMEMAreas", "$DefaultPhysChans",
                                                "$ReservedDevices"};
@@ -42,7 +42,7 @@ bool isToken(const std::string& name) {
     throw error;
 }
 
-// One list of the driver's names, read when made.
+// A list of names that the constructor reads from the driver.
 class KnownNames {
   public:
     explicit KnownNames(nQITRMCAPI100_Session session) {
@@ -54,7 +54,7 @@ class KnownNames {
                                                     names.outArray(), names.outCount(), &status);
     }
 
-    // A list that could not be read knows no name.
+    // Returns false for every name if the list could not be read.
     bool contains(const std::string& name) const {
         return status.code >= 0 && std::any_of(names.begin(), names.end(), [&](const char* known) {
                    return equalFolded(name, known);
@@ -98,7 +98,7 @@ std::string RequestResource::joinedNames() const {
 void RequestResource::readNames(const JsonValue& value) {
     const auto append = [&](const JsonValue& text) {
         const std::string list(text.GetString(), text.GetStringLength());
-        // To the driver a list ends at its first NUL, and the names behind it would be lost.
+        // The driver reads a list up to its first NUL, so the names after it would be ignored.
         if (list.find('\0') != std::string::npos)
             refuseName(list);
         appendExpanded(resourceNames, list, NameKind::Path);

@@ -13,26 +13,27 @@ namespace nQITRMCWEBSVC100 {
 
 // The resources that a request names: their kind and their expanded names, in request order.
 //
-// Relies on a request that passed its schema. Failures are thrown: BasicError invalidResourceName
-// with the name that is unknown to the driver, cannot be parsed or holds a NUL.
+// Requires params that conform to their schema. Throws BasicError invalidResourceName, with the
+// name as a detail, for a name that the driver does not list, that cannot be parsed or that
+// contains a NUL.
 class RequestResource {
   public:
-    // Reads the request's members only.
+    // Reads the names from the params without checking them against the driver's lists.
     explicit RequestResource(const JsonValue& params);
 
-    // Reads the members and has the driver confirm each name; without any, takes the session's own
-    // default resources of `defaultKind`.
+    // Reads the names from the params and checks that the driver lists them. If the params name no
+    // resources, uses the session's default resources of `defaultKind`.
     RequestResource(const JsonValue& params, nQITRMCAPI100_Session driverSession,
                     ResourceKind defaultKind);
 
-    // As above, with the default kind of the session.
+    // The same with the default kind of the session.
     RequestResource(const JsonValue& params, const SessionContext& session);
 
     virtual ~RequestResource() = default;
 
     ResourceKind kind() const { return resourceKind; }
     const std::vector<std::string>& names() const { return resourceNames; }
-    // The names as the one text that driver calls take.
+    // The names as one comma-separated text, as driver functions expect them.
     std::string joinedNames() const;
 
   private:

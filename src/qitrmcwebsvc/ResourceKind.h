@@ -4,7 +4,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// What a request or a session acts on.
+// The kind of resources that a request or a session uses.
 enum class ResourceKind : std::int32_t {
     None = 0,
     Device = 1,

@@ -5,13 +5,13 @@
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-// The depth of a request's root is 1, that of a parameter 3, and that of an element of an array
-// parameter 4. The schemas ask no element to be an object or array, and tell those from a null
-// nowhere. So the validator, which looks at all open containers on each value, is shown a null in
-// their place: that alone makes deeply nested requests cost no more than flat ones.
+// The depth of a request's root is 1, of a parameter 3, of an element of an array parameter 4. The
+// schemas do not allow an object or array as an element, and treat it like a null. For each value
+// the validator visits all open containers, so passing it a null for each container at this depth
+// keeps the cost of deeply nested requests linear.
 constexpr int depthShownAsNull = 4;
 
-// How many bytes a character of UTF-8 has at most behind its first.
+// The maximum number of bytes after the first one of a UTF-8 sequence.
 constexpr std::size_t mostFollowingBytes = 3;
 
 bool isUnreserved(char c) {
@@ -32,9 +32,8 @@ void appendEscaped(std::string& text, char c) {
         text += {'%', hexDigits[byte >> 4], hexDigits[byte & 15]};
 }
 
-// The JSON library's own way to write a pointer takes a character that a name breaks off in from
-// behind the name. Here each byte stands for itself, so that the bytes of a request need not be
-// UTF-8.
+// Replaces the JSON library's function, which reads past the end of a name that ends in a truncated
+// UTF-8 sequence. Here each byte is escaped by itself, so a name need not be valid UTF-8.
 std::string uriFragment(const JsonPointer& pointer) {
     std::string text = "#";
     for (std::size_t i = 0; i < pointer.GetTokenCount(); ++i) {
@@ -46,7 +45,7 @@ std::string uriFragment(const JsonPointer& pointer) {
     return text;
 }
 
-// Whether the last character may be meant to have more bytes than there are.
+// Whether the text may end in a truncated UTF-8 sequence.
 bool mayBreakOff(const JsonValue& text) {
     const char* const end = text.GetString() + text.GetStringLength();
     const auto inspected = std::min<std::size_t>(mostFollowingBytes, text.GetStringLength());
@@ -76,7 +75,8 @@ bool SchemaRun::visit(const JsonValue& value, int depth) {
     return value.Accept(validator);
 }
 
-// The pattern engine takes such a character from behind the text, so there must be something.
+// For a truncated UTF-8 sequence the pattern engine reads past the end of the text, so the text is
+// copied with NULs after it.
 bool SchemaRun::visitBrokenOff(const JsonValue& text) {
     std::string followed(text.GetString(), text.GetStringLength());
     followed.append(mostFollowingBytes, '\0');

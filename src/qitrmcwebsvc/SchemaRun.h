@@ -7,25 +7,26 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Where and why a request broke its schema. Both pointers are JSON pointers in URI fragment form.
+// Where and why a request violates its schema. Both pointers are JSON pointers in URI fragment
+// form.
 struct SchemaFailure {
-    std::string documentPointer;  // the value or member that is wrong
-    std::string schemaPointer;    // the schema that it broke, "#" when there is none
-    std::string keyword;          // the keyword that it broke, empty when there is none
+    std::string documentPointer;  // the invalid value or member
+    std::string schemaPointer;    // the violated schema, "#" if there is none
+    std::string keyword;          // the violated keyword, empty if there is none
 };
 
-// One run of one request against one compiled schema. The time it takes grows linearly with the
-// size of the request, and its use of the call stack is bounded.
+// Validates one request against one compiled schema. The time is linear in the size of the request,
+// and the use of the call stack is bounded.
 class SchemaRun {
   public:
     // `schema` must outlive the run.
     explicit SchemaRun(const JsonSchemaDocument& schema);
 
-    // Whether `request` conforms. To be called once. Schemas share scratch memory with their runs:
-    // at most one thread may be in this function for a schema at a time.
+    // Whether `request` is valid. To be called once. The run uses memory of the schema, so only one
+    // thread at a time may call this function for a schema.
     bool accepts(const JsonValue& request);
 
-    // The first failure. Only for a run that did not accept; needs no lock.
+    // The first failure, if accepts() returned false. May run concurrently with other runs.
     SchemaFailure failure() const;
 
   private:
@@ -39,7 +40,7 @@ class SchemaRun {
     bool visitArray(const JsonValue& array, int depth);
 
     RunMemory memory;
-    Validator& validator;  // lives in `memory`, which ends it without destroying it
+    Validator& validator;  // allocated in `memory`, which frees it without calling its destructor
 };
 
 }  // namespace nQITRMCWEBSVC100

@@ -8,22 +8,22 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Checks the requests of one method against the method's schema, joined with the definitions that
-// all schemas share. Runs of one validator follow one another; what follows a failed run, to find
-// the words for it, overlaps with other runs.
+// Checks the requests of one method against the method's schema, merged with the definitions that
+// all schemas share. The runs of one validator are serialised; producing the error text after a
+// failed run is not.
 class SchemaValidator : public ISchemaValidator {
   public:
-    // `schemaText` is a JSON text and is not needed afterwards. Throws InternalError when it cannot
-    // be used.
+    // `schemaText` is a JSON text, which is not kept. Throws InternalError if it is not a valid
+    // schema.
     explicit SchemaValidator(const char* schemaText);
-    // The same with other definitions than the program's own.
+    // The same with other definitions than the embedded ones.
     SchemaValidator(const char* schemaText, const char* definitionsText);
 
     void validate(const SingleRequest& request) override;
 
   private:
     std::shared_ptr<JsonDocument> schemaDocument;
-    // Holds the memory of the definitions that the schema document took over.
+    // Owns the memory of the definitions that were moved into the schema document.
     std::shared_ptr<JsonDocument> definitionsDocument;
     std::shared_ptr<JsonSchemaDocument> compiledSchema;
     std::mutex validationMutex;

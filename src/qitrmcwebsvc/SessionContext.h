@@ -8,16 +8,16 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// What the service remembers of an open session. All else lives in the driver, behind the handle.
+// The data that the service keeps for an open session. All other data is in the driver.
 //
-// Plain data with shared owners: the session manager's table is one, each request that uses the
-// session another. Its end has no effect on the driver, so a request may outlive the driver session
-// and is then refused by the driver.
+// Owned jointly by the session manager's table and by each request that uses the session.
+// Destroying it has no effect on the driver. If the driver session is closed while a request uses
+// it, the driver calls of that request fail.
 struct SessionContext {
     // The kind of the resources on which the session was opened. Never changes.
     ResourceKind defaultResourceKind = ResourceKind::None;
-    // The access of the latest reservation; 0 before one and after a release. Read and written
-    // under the session manager's mutex.
+    // The access of the latest reservation; 0 without a reservation and after a release. Protected
+    // by the session manager's mutex.
     std::int32_t access = 0;
     // The driver's handle. Never changes.
     nQITRMCAPI100_Session driverSession = 0;

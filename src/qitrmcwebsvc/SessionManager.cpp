@@ -5,7 +5,7 @@
 #include <utility>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcsharedcmn/parseUtilities.h"
+#include "qitrmcsharedcmn/resourceNames.h"
 #include "qitrmcwebsvc/DriverOwners.h"
 #include "qitrmcwebsvc/callDriver.h"
 
@@ -34,14 +34,14 @@ OpenSession openFunction(ResourceKind kind) {
     throw InternalError("Unsupported resource type", QITRMC_HERE);
 }
 
-// The handle is a signed 32-bit number to the id, widened with its sign.
+// For the id, the handle is converted to a signed number and sign-extended to 64 bits.
 std::string sessionIdOf(nQITRMCAPI100_Session session) {
     const auto widened = static_cast<std::int64_t>(static_cast<std::int32_t>(session));
     return "_session" + std::to_string(static_cast<unsigned long long>(widened));
 }
 
-// The devices that resources of a kind belong to: a channel's or area's is what precedes its first
-// slash.
+// The devices that resources of a kind belong to. The name of a channel or area begins with the
+// name of its device and a slash.
 std::set<std::string> devicesOf(ResourceKind kind, const std::vector<std::string>& names) {
     std::set<std::string> devices;
     for (const std::string& name : names) {
@@ -53,7 +53,7 @@ std::set<std::string> devicesOf(ResourceKind kind, const std::vector<std::string
     return devices;
 }
 
-// A session that cannot tell what it holds counts as holding nothing.
+// If the driver cannot list a session's devices, the session counts as holding none.
 bool sessionHoldsAnyDevice(nQITRMCAPI100_Session session, const std::set<std::string>& devices) {
     qierr::Status status;
     DriverStringArray reserved;
@@ -63,7 +63,7 @@ bool sessionHoldsAnyDevice(nQITRMCAPI100_Session session, const std::set<std::st
                                            [&](const char* name) { return devices.count(name); });
 }
 
-// Closes a session that has just been opened unless it found its place in the table.
+// Closes a newly opened session unless it has been added to the table.
 class OpenedSession {
   public:
     explicit OpenedSession(nQITRMCAPI100_Session opened) : session(opened) {}
@@ -166,7 +166,7 @@ void SessionManager::unreserveDevices(const std::string& sessionId,
     context->access = 0;
 }
 
-// A handle that the driver issues again while its old session is still listed keeps the old entry.
+// If the driver returns a handle that is already in the table, the existing entry is kept.
 std::string SessionManager::addSession(const SessionContext& context) {
     OpenedSession opened(context.driverSession);
     std::string id = sessionIdOf(context.driverSession);
@@ -175,7 +175,7 @@ std::string SessionManager::addSession(const SessionContext& context) {
     return id;
 }
 
-// What was closed before a failure stays closed, and what follows it stays open.
+// On failure, the sessions that were already closed stay closed, and the others stay open.
 void SessionManager::closeSessionsReserving(const DeviceSet& devices) {
     if (devices.empty())
         return;
@@ -190,7 +190,7 @@ void SessionManager::closeSessionsReserving(const DeviceSet& devices) {
     }
 }
 
-// Sessions that only read are left out: displacing them is possible, waiting for them is not asked.
+// Sessions with read-only access are not included.
 std::vector<std::string> SessionManager::findSessionsReserving(const DeviceSet& devices) {
     std::lock_guard<std::recursive_mutex> hold(mutex);
     std::vector<std::string> ids;

@@ -8,8 +8,9 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// The one place that opens and closes driver sessions. Sessions have no expiry: one whose client is
-// gone stays until it is closed by id, displaced, or the manager ends and closes all that are left.
+// The only class that opens and closes driver sessions. Sessions do not expire: the session of a
+// client that has disappeared stays open until it is closed by its id, closed in favour of a
+// session with forceReserve, or closed by the manager's destructor.
 class SessionManager : public ISessionManager {
   public:
     SessionManager() = default;
@@ -32,7 +33,7 @@ class SessionManager : public ISessionManager {
   private:
     using DeviceSet = std::set<std::string>;
 
-    // All of these are called with the mutex held.
+    // The mutex is held when these functions are called.
     std::string addSession(const SessionContext& context);
     void closeSessionsReserving(const DeviceSet& devices);
     std::vector<std::string> findSessionsReserving(const DeviceSet& devices);

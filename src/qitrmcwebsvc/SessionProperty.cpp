@@ -3,7 +3,7 @@
 #include <string_view>
 #include <utility>
 
-#include "qitrmcsharedcmn/parseUtilities.h"
+#include "qitrmcsharedcmn/resourceNames.h"
 #include "qitrmcwebsvc/callDriver.h"
 #include "qitrmcwebsvc/invalidParams.h"
 
@@ -13,11 +13,11 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-// Data types: the scalars, and behind them the arrays in the same order.
+// The numbers of the data types: the scalar types, followed by their array types in the same order.
 constexpr std::int32_t firstScalarType = 1;
 constexpr std::int32_t scalarTypeCount = 7;
 
-// What a token in a list of resources stands for: the content of a property of the session.
+// A token in a list of resources, and the session property whose contents replace it.
 struct Token {
     std::string_view token;
     const char* property;
@@ -30,7 +30,7 @@ constexpr Token tokens[] = {
     {"$ReservedDevices", "Session.ReservedDevices"},
 };
 
-// Null for a name that is no token.
+// Null for a name that is not a token.
 const char* propertyBehindToken(const std::string& name) {
     for (const Token& candidate : tokens)
         if (candidate.token == name)
@@ -108,7 +108,7 @@ std::vector<std::string> SessionProperty::metaStringArray(const char* attribute)
     return std::vector<std::string>(values.begin(), values.end());
 }
 
-// The driver's lists are read anew each time: it may have changed them.
+// The driver's lists are read each time, since they may change.
 void SessionProperty::decideCategory(ResourceKind kind) {
     for (const PropertyCategory candidate : {PropertyCategory::Session, PropertyCategory::System}) {
         if (isPropertyName(session->driverSession, candidate, name)) {
@@ -126,8 +126,7 @@ bool SessionProperty::isOnResources() const {
            propertyCategory != PropertyCategory::Session;
 }
 
-// Tokens are replaced here, although the driver knows them, so that the number of resources is
-// known.
+// The driver would accept tokens, but the number of resources must be known.
 void SessionProperty::expandTokens() {
     std::vector<std::string> expanded;
     for (std::string& resource : resources) {

@@ -12,35 +12,35 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// One property of the system, of a session or of resources, open in the driver for the object's
-// life. Used by one thread.
+// One property of the system, of a session or of resources. It is open in the driver during the
+// lifetime of the object. Used by one thread.
 //
-// All operations throw qierr::Exception with the driver's status when the driver refuses.
+// All operations throw qierr::Exception with the driver's status if a driver call fails.
 class SessionProperty {
   public:
-    // Finds out what the property belongs to, opens it and learns its data type. A name of the
-    // session's or the system's properties is theirs, whatever resources come with it; any other
-    // name is a property of the resources.
+    // Determines the category of the property, opens it and reads its data type. If the session or
+    // the system has a property of this name, that property is used and the resources are ignored;
+    // otherwise the property belongs to the resources.
     //
-    // A scalar property on several resources has the array of its type, one element for each
-    // resource in their order.
+    // The type of a scalar property on several resources is the array of its type, with one element
+    // for each resource in their order.
     //
-    // Throws BasicError invalidParams when the name needs resources and there are none, and
-    // arrayOnSeveralResources when an array property is asked of several resources; InternalError
-    // for a kind of resources that does not exist.
+    // Throws BasicError invalidParams if the property needs resources and there are none, and
+    // arrayOnSeveralResources for an array property on several resources; InternalError for an
+    // unknown kind of resources.
     SessionProperty(std::shared_ptr<SessionContext> session, std::string name,
                     const RequestResource& resources);
 
     PropertyCategory category() const { return propertyCategory; }
-    // Whether the name stands in the driver's list for the category.
+    // Whether the driver's list for the category contains the name.
     bool isDriverDefined() const { return driverDefined; }
-    // A number of propertyTypes.def, or what else the driver gave.
+    // A number of propertyTypes.def, or an unknown number from the driver.
     std::int32_t dataType() const { return type; }
     bool isScalar() const;
     bool isArray() const;
 
-    // getBool, setBool and so on for each type. The driver has no function for some types of system
-    // and session properties: InternalError.
+    // getBool, setBool and so on for each type. Throws InternalError for the types of system and
+    // session properties for which the driver has no function.
 #define QITRMC_PROPERTY_TYPE(number, Type, Value) \
     Value get##Type() const;                      \
     void set##Type(const Value& value);

@@ -1,5 +1,5 @@
-// The typed reads and writes of SessionProperty: which function of the driver serves which
-// category, and how each type of value is passed to the driver and back.
+// The typed reads and writes of SessionProperty: the driver function for each category, and the
+// conversion of each type of value.
 
 #include <algorithm>
 
@@ -10,9 +10,9 @@ namespace nQITRMCWEBSVC100 {
 
 using namespace nQITRMCSHAREDCMN100;
 
-// The driver's functions for one read or write. Properties of resources are always served, those of
-// the system and of a session only where the driver has a function. Values: the parameters that
-// carry the value.
+// The driver's functions for one type of read or write. There is always one for properties of
+// resources, but not always for those of the system or a session. Values: the parameter types of
+// the value.
 template <typename... Values>
 struct SessionProperty::Functions {
     using Generic = void (*)(nQITRMCAPI100_Session, const char* resources, const char* property,
@@ -25,8 +25,8 @@ struct SessionProperty::Functions {
     bool genericServesSession = false;
 };
 
-// The function that serves the property's category, which takes only the value now. A category that
-// is not served is refused before anything is borrowed from the driver.
+// Binds all arguments but the value to the function for the property's category. Throws
+// InternalError if there is no function, before the driver has allocated anything.
 template <typename... Values>
 auto SessionProperty::choose(const Functions<Values...>& functions) const {
     const bool ofSession = propertyCategory == PropertyCategory::Session;
@@ -65,7 +65,7 @@ void SessionProperty::writeNumbers(const Functions<const Number*, std::uint32_t>
     choose(functions)(values.data(), static_cast<std::uint32_t>(values.size()));
 }
 
-// The driver's truth values are bytes.
+// The driver's Booleans are bytes.
 
 bool SessionProperty::getBool() const {
     return readNumber<std::uint8_t>(
@@ -182,7 +182,7 @@ std::string SessionProperty::getString() const {
     return value.copy();
 }
 
-// A session's text can be written, by the function for resources, but not read.
+// A text property of a session can be written, with the function for resources, but not read.
 void SessionProperty::setString(const std::string& value) {
     choose<const char*>({nQITRMCAPI100_setGenericPropertyString, nullptr, nullptr, true})(
         value.c_str());

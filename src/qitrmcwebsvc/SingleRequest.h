@@ -6,20 +6,20 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// One JSON-RPC request whose envelope is sound: "id" is an integer of 32 bits or a string,
-// "jsonrpc" is "2.0", and "method" is a string. What the other members hold is for others to check.
+// One JSON-RPC request with a valid envelope: "id" is a 32-bit integer or a string, "jsonrpc" is
+// "2.0", and "method" is a string. The other members are not checked here.
 class SingleRequest {
   public:
-    // Checks the envelope and takes `value` over, which becomes null. Its strings and members stay
-    // in the pool of their document, which must outlive this object. On failure `value` stays as it
-    // was and a BasicError with invalidRequest is thrown.
+    // Checks the envelope and moves `value` into this object. Its memory remains in the pool of its
+    // document, which must outlive this object. On failure throws BasicError invalidRequest, with
+    // `value` unchanged.
     explicit SingleRequest(JsonValue& value);
     virtual ~SingleRequest() = default;
 
     // The whole request object.
     const JsonValue& getRequest() const { return request; }
 
-    // The member "params", of whatever type, or a null value when there is none.
+    // The member "params", of whatever type, or a null value if there is none.
     const JsonValue& getParams() const;
 
     // The member "method" up to its first NUL.

@@ -11,8 +11,8 @@
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-// The codes of JSON-RPC itself, which stand bare; every other failure is a server error whose own
-// code and text travel in "data".
+// The codes of JSON-RPC itself, which are sent without "data". Every other failure is sent as a
+// server error, with its own code and text in "data".
 constexpr std::array<std::int32_t, 6> standingCodes = {
     qierr::codes::parseError,    qierr::codes::rpcInternalError, qierr::codes::invalidParams,
     qierr::codes::unknownMethod, qierr::codes::invalidRequest,   qierr::codes::serverError};

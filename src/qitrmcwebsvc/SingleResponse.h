@@ -6,16 +6,16 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// One JSON-RPC response in the making: an envelope with an id, which gains a result or an error.
+// One JSON-RPC response under construction: an envelope with an id, and later a result or an error.
 //
-// Its values lie in a pool that it does not own and that must outlive them. Used by one thread.
-// Nothing keeps a caller from setting both a result and an error, so a procedure sets its result
-// when its work is done.
+// Its values are allocated in a pool that it does not own and that must outlive them. Used by one
+// thread. A procedure must set its result last, since an error that is set later would be added
+// beside the result.
 class SingleResponse {
   public:
     // With a null id.
     explicit SingleResponse(JsonPool* allocator);
-    // With a deep copy of the id, of whatever type it is.
+    // With a deep copy of the id, of whatever type.
     SingleResponse(const JsonValue& id, JsonPool* allocator);
     virtual ~SingleResponse() = default;
     SingleResponse(const SingleResponse&) = delete;
@@ -23,12 +23,12 @@ class SingleResponse {
 
     // Moves a value into "result".
     void setResult(JsonValue&& value);
-    // Makes "result" an empty object.
+    // Sets "result" to an empty object.
     void setEmptyResult();
-    // Makes "error" of a status. Throws qierr::Exception when its text cannot be made; nothing is
-    // added then.
+    // Sets "error" from a status. Throws qierr::Exception if its text cannot be produced; the
+    // response is then unchanged.
     void setError(const qierr_Status& status);
-    // Moves an error object that another response made into "error".
+    // Moves the error object of another response into "error".
     void setError(JsonValue&& error);
 
     // The whole response, to be moved out.

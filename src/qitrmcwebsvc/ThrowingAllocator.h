@@ -4,13 +4,14 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// The base allocator of every JSON type, after the JSON library's concept of an allocator: the C
-// library's memory, with std::bad_alloc in place of null.
+// The base allocator of every JSON type. Implements the JSON library's allocator concept with
+// malloc and realloc, but throws std::bad_alloc where those return null.
 class ThrowingAllocator {
   public:
     static const bool kNeedFree = true;
 
-    // Written out so that making one does not write to it: all of them share one instance.
+    // User-provided so that value-initialisation does not write to the shared instance (see
+    // operator new).
     ThrowingAllocator() noexcept {}
 
     // Null for a size of 0.
@@ -18,8 +19,8 @@ class ThrowingAllocator {
     void* Realloc(void* block, std::size_t currentSize, std::size_t newSize);
     static void Free(void* block) noexcept;
 
-    // The library allocates an allocator for itself where it is given none, and loses it when the
-    // constructor that did so fails. There is nothing in one, so all are the same one.
+    // The library creates an allocator with new if none is passed, and leaks it if the constructor
+    // that does so fails. An allocator has no state, so new always returns the same instance.
     static void* operator new(std::size_t) noexcept;
     static void operator delete(void*) noexcept {}
 };

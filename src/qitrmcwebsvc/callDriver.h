@@ -4,8 +4,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Calls a function of the driver with these arguments and a status, and throws qierr::Exception
-// when the status comes back negative.
+// Calls a driver function with these arguments and a status. Throws qierr::Exception if the status
+// is negative afterwards.
 template <typename... Parameters, typename... Arguments>
 void callDriver(void (*function)(Parameters...), Arguments... arguments) {
     nQITRMCSHAREDCMN100::ThrowingStatus status;

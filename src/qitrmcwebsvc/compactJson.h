@@ -6,8 +6,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// A value as JSON text without blanks. JSON has no infinities and no NaN, but a driver may measure
-// one: each is printed as null.
+// A value as JSON text without blanks. An infinity or NaN, which a driver may return but JSON
+// cannot represent, is printed as null.
 std::string compactJson(const JsonValue& value);
 
 }  // namespace nQITRMCWEBSVC100

@@ -18,7 +18,7 @@ using nQITRMCSHAREDCMN100::ThrowingStatus;
 
 namespace {
 
-// English, whatever a client has set for its session, and the third of the environments that ask.
+// Always English, and ADE number 2 (see qixlator.h).
 constexpr std::uint32_t attributes = 0 | 2u << qixlator_adeShift;
 constexpr std::uint32_t flags = qixlator::json1::includeStatic | qixlator::json1::includeDynamic |
                                 qixlator::json1::includeNested;
@@ -39,8 +39,8 @@ void translate(qixlator::Session* session, const qierr_Status& status, qihtl::St
                                                  &failure);
 }
 
-// A text may quote bytes of a request or of a file that are no UTF-8, which no JSON text may hold.
-// Each such byte becomes the replacement character.
+// A text may quote bytes of a request or a file that are not valid UTF-8, which JSON does not
+// allow. Each such byte is replaced by the replacement character.
 std::string withValidUtf8(std::string_view text) {
     std::string valid;
     valid.reserve(text.size());
@@ -61,7 +61,7 @@ std::string withValidUtf8(std::string_view text) {
 std::string describeStatus(const qierr_Status& status) {
     const SessionOwner session = openSession();
     if (session == nullptr) {
-        return {};  // that failure was dropped, since an exception is in flight
+        return {};  // the failure is ignored during stack unwinding
     }
     qihtl::String text;
     translate(session.get(), status, &text);

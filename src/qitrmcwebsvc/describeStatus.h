@@ -6,12 +6,12 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// What a status says to a client: one line of English text, always valid UTF-8, and empty for a
-// success. Throws qierr::Exception when the translation fails; while an exception is in flight that
-// failure is dropped, and the text is what there is of it. Costs a translation session each time.
-// May run on any number of threads at once.
+// The text of a status for a client: one line of English in valid UTF-8, empty for a success.
+// Throws qierr::Exception if the translation fails. During stack unwinding such a failure is
+// ignored, and the text that was produced so far is returned. Each call opens a translation
+// session. Any number of threads may call it.
 //
-// A library of its own, so that tests of the service can link other words.
+// It is a library of its own, so that tests of the service can link another implementation.
 std::string describeStatus(const qierr_Status& status);
 
 }  // namespace nQITRMCWEBSVC100

@@ -4,7 +4,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// The value of an object's first member of this name, or null.
+// The value of an object's first member with this name, or null.
 inline const JsonValue* findMember(const JsonValue& object, const char* name) {
     const auto member = object.FindMember(name);
     return member == object.MemberEnd() ? nullptr : &member->value;

@@ -22,7 +22,7 @@ class FoldedCodePoints {
     }
 
   private:
-    // Beyond Unicode's last code point, so that a stray byte equals no letter.
+    // Greater than the last code point of Unicode, so that an invalid byte equals no character.
     static constexpr utf8proc_int32_t strayByteBase = 0x110000;
 
     void foldOne() {
@@ -58,8 +58,8 @@ char foldAscii(char c) {
     return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
 }
 
-// Drops what both texts begin with as far as they are ASCII, where a byte folds to a byte. False
-// when they differ there.
+// Removes the common prefix of ASCII characters, for which folding is a matter of single bytes.
+// Returns false if the texts differ there.
 bool dropEqualAscii(std::string_view& left, std::string_view& right) {
     std::size_t same = 0;
     while (same < left.size() && same < right.size() && isAscii(left[same]) &&

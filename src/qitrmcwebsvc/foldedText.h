@@ -4,9 +4,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Whether two UTF-8 texts are equal without regard to case, by full Unicode case folding, in which
-// one letter may stand for up to three. Bytes that are no UTF-8 are equal to themselves only.
-// Allocates nothing.
+// Compares two UTF-8 texts ignoring case, by full Unicode case folding, which may expand one
+// character to up to three. A byte that is not valid UTF-8 equals only itself. Does not allocate.
 bool equalFolded(std::string_view left, std::string_view right);
 
 }  // namespace nQITRMCWEBSVC100

@@ -12,7 +12,7 @@ constexpr std::uint32_t firstVariableSize = 32;
 constexpr std::uint32_t firstBodySize = 256;
 constexpr std::size_t mostOutput = std::numeric_limits<std::uint32_t>::max();
 
-// `read` takes a buffer and a pointer to its size. A buffer that is filled to its end has no NUL.
+// `read` takes a buffer and a pointer to its size. A completely filled buffer has no NUL.
 template <typename Read>
 int readText(std::uint32_t firstSize, std::string& out, Read read) {
     std::string buffer(firstSize, '\0');

@@ -4,8 +4,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Throws BasicError invalidParams with the sentence of this name (getErrorDescription) for the
-// client.
+// Throws BasicError invalidParams with the sentence of this name (see getErrorDescription).
 [[noreturn]] void throwInvalidParams(const char* descriptionName,
                                      const qierr_SourcePosition& position);
 

@@ -1,4 +1,4 @@
-// The skin of the library: what the embedded web server loads and calls.
+// The exported functions of the plug-in, which the embedded web server calls.
 
 #include <ws_runtime.h>
 
@@ -26,7 +26,7 @@ constexpr int httpServerError = 500;
 
 // Whether the switch was on at the last qitrmcInit.
 bool webServiceEnabled = false;
-// The one handler of the process. Outlives the flag when a later qitrmcInit finds the switch off.
+// The only request handler of the process. It is kept if a later qitrmcInit finds the switch off.
 std::unique_ptr<RequestHandler> requestHandler;
 
 struct IniFileOwner {
@@ -38,7 +38,7 @@ bool readSwitch() {
     if (!file)
         throw std::bad_alloc();
     const std::string path = std::string(qisysq_installRoot()) + "/etc/qinstal/share/qitrmc.ini";
-    // A file that cannot be read leaves the reader empty, and so the service off.
+    // If the file cannot be read, the file object stays empty and the service is disabled.
     IniFile_load(file.get(), path.c_str());
     std::uint32_t enable = 0;
     return IniFile_getInt(file.get(), "WebService", "Enable", &enable) > 0 && enable != 0;
@@ -60,7 +60,8 @@ bool cameThroughCall(const ws_Entry* entry) {
                                        qi::dsc::WideString("Call"));
 }
 
-// The checks of the gate, in their order, and behind them the request itself.
+// Checks the HTTP request and, if it is acceptable, processes its body. The checks have a fixed
+// order, which decides the response to a request that fails several of them.
 void serve(ws_Entry* entry, ws_Request* request) {
     if (!variableIs(request, "REQUEST_TRANSPORT", "http"))
         return refuse(request, httpNotFound, "Only HTTP protocol is supported.");
@@ -71,7 +72,7 @@ void serve(ws_Entry* entry, ws_Request* request) {
     std::string body;
     if (readPostBody(request, body) != 0)
         return SetHTTPResponseCode_QI_QVWS_(request, httpBadRequest);
-    // There is no handler when the last qitrmcInit failed, although the flag is set.
+    // If the last qitrmcInit failed, the flag is set but there is no request handler.
     if (!requestHandler)
         return SetHTTPResponseCode_QI_QVWS_(request, httpServerError);
     const std::string response = requestHandler->handleRequest(body);

@@ -10,7 +10,7 @@
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-// Sorted. Neither listed to clients nor known as names that the driver defines.
+// Sorted. These names are not listed to clients and do not count as driver-defined.
 constexpr std::string_view hiddenNames[] = {
     "Dev.AddedToLocalConfig",
     "Dev.Events",
@@ -46,7 +46,7 @@ const char* nameListOf(PropertyCategory category) {
     throw nQITRMCSHAREDCMN100::InternalError("Unsupported property category", QITRMC_HERE);
 }
 
-// One list as the driver gives it, read when made.
+// A list of names that the constructor reads from the driver.
 class ListedNames : public DriverStringArray {
   public:
     ListedNames(nQITRMCAPI100_Session session, const char* list) {

@@ -8,7 +8,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// What a property belongs to.
+// The kind of object that a property belongs to.
 enum class PropertyCategory : std::int32_t {
     System = 1,
     Session = 2,
@@ -17,12 +17,12 @@ enum class PropertyCategory : std::int32_t {
     NvmemArea = 5,
 };
 
-// The names of a category's properties as the driver lists them at this moment, without those that
-// are kept from clients. Throws qierr::Exception when the driver refuses its list, and
-// InternalError for a number that is no category.
+// The names of a category's properties as the driver lists them at this moment, without the names
+// that are hidden from clients. Throws qierr::Exception if the driver cannot list them, and
+// InternalError for an unknown category.
 std::set<std::string> propertyNames(nQITRMCAPI100_Session session, PropertyCategory category);
 
-// Whether propertyNames holds the name, without making the set. Compares bytes.
+// Whether propertyNames would contain the name, without building the set. Compares bytes.
 bool isPropertyName(nQITRMCAPI100_Session session, PropertyCategory category,
                     const std::string& name);
 

@@ -1,17 +1,18 @@
+// Folder qitrmcwebsvcerr: the sentences that describe invalid parameters.
 #pragma once
 
 #include <string>
 
 namespace nQITRMCWEBSVC100 {
 
-// The English sentence that tells a client of a parameter failure, by the name that the schemas and
-// the procedures use for it (descriptions.tsv).
+// The English sentence that describes an invalid parameter, by the name under which the schemas and
+// procedures refer to it (descriptions.tsv).
 //
-// Where the sentence has a "%s", that is left in place for the caller to fill. A sentence without
-// one must not pass through formatting.
+// A "%s" in the sentence is to be replaced by the caller. A sentence without "%s" must not be used
+// as a format.
 //
-// Throws InternalError for a name, compared as bytes, that is not in the table. May be called by
-// any thread once the program's static objects exist.
+// Throws InternalError for a name that is not in the table; names are compared as bytes. May be
+// called from any thread after static initialisation.
 std::string getErrorDescription(const std::string& name);
 
 }  // namespace nQITRMCWEBSVC100

@@ -11,7 +11,7 @@ from pathlib import Path
 
 def row(line: str) -> str:
     name, text = line.split("\t")
-    # For plain ASCII a JSON string is a C++ string literal as well.
+    # A JSON string of ASCII characters is also a C++ string literal.
     return f"{{{json.dumps(name)}, {json.dumps(text)}}},\n"
 
 

@@ -3,7 +3,7 @@
 
 #include "harnesses.h"
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcsharedcmn/parseUtilities.h"
+#include "qitrmcsharedcmn/resourceNames.h"
 
 namespace {
 

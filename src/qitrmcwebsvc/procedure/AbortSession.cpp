@@ -5,8 +5,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Ends whatever calls of a session are waiting in the driver. The session stays open and must still
-// be closed. Result: an empty object.
+// Aborts all calls of a session that wait in the driver. The session stays open and must still be
+// closed. Result: an empty object.
 void AbortSession::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     callDriver(nQITRMCAPI100_abortSession, session->driverSession);

@@ -2,7 +2,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Ends a session. Result: an empty object.
+// Closes a session. Result: an empty object.
 void CloseSession::run(const JsonValue& params, SingleResponse& response) const {
     sessionManager->closeSession(sessionIdOf(params));
     response.setEmptyResult();

@@ -6,7 +6,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Makes the pending writes of areas, or of all areas of devices, last. Result: an empty object.
+// Makes the pending writes of NVMEM areas, or of all areas of devices, permanent. Result: an empty
+// object.
 void CommitNvmemAreas::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, *session);

@@ -11,8 +11,7 @@ constexpr double driverChoosesTimeout = -1.0;
 
 }  // namespace
 
-// Connects devices of the session, for as long as the driver cares to wait. Result: an empty
-// object.
+// Connects devices of the session, with the driver's default timeout. Result: an empty object.
 void ConnectToDevices::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);

@@ -17,13 +17,13 @@ constexpr std::pair<const char*, const char*> identityProperties[] = {
 
 }  // namespace
 
-// Tells the network address and name of a chassis. Throws BasicError notChassis for a device that
-// is no chassis. Result: chassis_ip, chassis_hostname.
+// Reads the network address and host name of a chassis. Throws BasicError notChassis if the device
+// is not a chassis. Result: chassis_ip, chassis_hostname.
 void GetChassisIpOrHostname::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, *session);
     requireChassis(resource, session);
-    // The driver has to find the default chassis by itself.
+    // For a null name, the driver uses the session's default device.
     const auto device = params.FindMember("device");
     const char* name = device == params.MemberEnd() ? nullptr : device->value.GetString();
 

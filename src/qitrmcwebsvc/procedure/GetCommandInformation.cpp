@@ -19,7 +19,7 @@ constexpr std::pair<const char*, const char*> CommandInfoKeys[] = {
 
 }  // namespace
 
-// Tells what a command is. Result: description, document.
+// Reads the description of a command. Result: description, document.
 void GetCommandInformation::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, *session);

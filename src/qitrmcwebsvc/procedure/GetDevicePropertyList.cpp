@@ -12,7 +12,7 @@ namespace {
 
 struct Lists {
     PropertyCategory category;
-    const char* dynamicProperty;  // null where there is none
+    const char* dynamicProperty;  // null if there is none
 };
 
 Lists listsOf(ResourceKind kind) {
@@ -29,7 +29,8 @@ Lists listsOf(ResourceKind kind) {
     throwInvalidParams("MustSpecifyOneOfDeviceNvmemPhyChannel", QITRMC_HERE);
 }
 
-// A resource that cannot tell what it defines for itself still has the properties of its kind.
+// A failure to list the resource's own properties is ignored: the properties of its kind are listed
+// anyway.
 void addDynamicNames(JsonValue& result, nQITRMCAPI100_Session session,
                      const RequestResource& resource, const char* property, JsonPool& pool) {
     qierr::Status status;

@@ -6,7 +6,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Finds the module in a slot of a chassis. Throws BasicError notChassis for a device that is no
+// Finds the module in a slot of a chassis. Throws BasicError notChassis if the device is not a
 // chassis. Result: module, if there is one, and present.
 void GetModuleName::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);

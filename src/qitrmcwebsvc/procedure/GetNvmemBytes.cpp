@@ -16,8 +16,8 @@ struct Free {
 };
 using Buffer = std::unique_ptr<std::uint8_t[], Free>;
 
-// Null for a size of 0. The memory comes zeroed from the system without being touched, so that a
-// request for more than an area holds costs next to nothing before the driver refuses it.
+// Null for a size of 0. The system provides zeroed pages without touching them, so a request for
+// more bytes than an area has costs little before the driver rejects it.
 Buffer zeroedBuffer(std::uint32_t size) {
     if (size == 0)
         return nullptr;
@@ -29,8 +29,8 @@ Buffer zeroedBuffer(std::uint32_t size) {
 
 }  // namespace
 
-// Reads bytes of an NVMEM area. Result: data, and next_address, which is the address plus 1
-// whatever the count of bytes.
+// Reads bytes of an NVMEM area. Result: data, and next_address, which is the address plus 1 for any
+// number of bytes.
 void GetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, *session);

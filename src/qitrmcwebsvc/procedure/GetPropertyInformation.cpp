@@ -29,7 +29,7 @@ JsonValue enumValue(const SessionProperty& property, JsonPool& pool) {
     const std::vector<std::string> names = property.metaStringArray("Prop.Enum.ValueNames");
     const std::vector<std::int32_t> numbers = property.metaInt32Array("Prop.Enum.Values");
     JsonValue items(rapidjson::kObjectType);
-    // The two are of one length, unless the driver errs.
+    // The driver should return two lists of the same length.
     for (std::size_t i = 0; i < std::min(numbers.size(), names.size()); ++i)
         items.AddMember(textValue(names[i], pool), JsonValue(numbers[i]), pool);
     result.AddMember("values", items, pool);
@@ -38,9 +38,9 @@ JsonValue enumValue(const SessionProperty& property, JsonPool& pool) {
 
 }  // namespace
 
-// Tells what a property is. Result: description, document, max_value, min_value and unit where they
-// are not empty; data_type, access, driver_defined, pending_changes; for an enumerated property
-// enum.
+// Reads the attributes of a property. Result: description, document, max_value, min_value and unit
+// unless they are empty; data_type, access, driver_defined, pending_changes; for an enumerated
+// property enum.
 void GetPropertyInformation::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string name = textParam(params, "property");

@@ -8,7 +8,7 @@ void InitializeSession::run(const JsonValue& params, SingleResponse& response) c
     const ReservationParams reservation = reservationParams(params);
     const bool forceReserve = boolParam(params, "force_reserve", false);
     const RequestResource resource(params);
-    // A session without resources reserves nothing, whatever the reservation parameters say.
+    // A session without resources reserves nothing, so the reservation parameters are ignored.
     const std::string id =
         resource.kind() == ResourceKind::None
             ? sessionManager->createSession()

@@ -1,3 +1,4 @@
+// Folder procedure: the classes that execute the JSON-RPC methods.
 #pragma once
 
 #include <memory>
@@ -9,8 +10,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// The frame of every procedure: the request's schema first, the work after it. A procedure has no
-// state beside the two shared owners and catches no exception.
+// Base class of all procedures: validates the request against its schema, then executes it. A
+// procedure has no state besides these two shared objects and catches no exceptions.
 class Procedure : public IProcedure {
   public:
     Procedure(std::shared_ptr<ISessionManager> manager,
@@ -19,15 +20,15 @@ class Procedure : public IProcedure {
     void execute(const SingleRequest& request, SingleResponse& response) final;
 
   protected:
-    // The session that `params` names, to be held to the end of the request; its driver session may
-    // be closed meanwhile. Throws BasicError unknownSession.
+    // The session that `params` names, to be kept until the end of the request; its driver session
+    // may be closed in the meantime. Throws BasicError unknownSession.
     std::shared_ptr<SessionContext> sessionOf(const JsonValue& params) const;
 
     const std::shared_ptr<ISessionManager> sessionManager;
     const std::shared_ptr<ISchemaValidator> schemaValidator;
 
   private:
-    // Does the work with params that conform to the schema, and sets the result last.
+    // Executes the method with params that conform to the schema, and sets the result last.
     virtual void run(const JsonValue& params, SingleResponse& response) const = 0;
 };
 

@@ -36,8 +36,8 @@ std::uint64_t readRegister(std::uint32_t size, nQITRMCAPI100_Session session, co
 
 }  // namespace
 
-// Reads one register of a device. Result: next_address, which is the address plus 1 whatever the
-// size, and data.
+// Reads one register of a device. Result: next_address, which is the address plus 1 for any size,
+// and data.
 void ReadRegister::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);

@@ -14,16 +14,16 @@ void rename(const SessionContext& session, const std::string& oldName, const std
 
 }  // namespace
 
-// Renames the modules of a chassis after its new name and their slots, and the chassis last.
+// Renames the modules of a chassis, to names made of its new name and their slots, and then the
+// chassis.
 //
-// Nothing is undone on failure: the modules before it keep their new names, those after it and the
-// chassis their old ones. Throws BasicError notChassis for a device that is no chassis. Result:
-// new_module_names, new_chassis_name.
+// A failure is not rolled back: the modules that were already renamed keep their new names. Throws
+// BasicError notChassis if the device is not a chassis. Result: new_module_names, new_chassis_name.
 void RenameChassisAndAllConnectedModules::run(const JsonValue& params,
                                               SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string oldChassisName = textParam(params, "old_chassis_name");
-    // The driver reads a text up to its first NUL, so that is where a new name ends.
+    // The driver reads a text up to its first NUL, so the new name ends there.
     const std::string newChassisName = textParam(params, "new_chassis_name").c_str();
     JsonPool& pool = *response.getAllocator();
     ScratchParams chassisParams(pool);

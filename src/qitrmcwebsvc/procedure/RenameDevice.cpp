@@ -5,7 +5,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Renames one device, under whatever name the driver knows it. Result: an empty object.
+// Renames one device. Its name is passed to the driver without a check. Result: an empty object.
 void RenameDevice::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string device = textParam(params, "device");

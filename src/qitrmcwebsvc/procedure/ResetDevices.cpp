@@ -6,7 +6,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Puts devices into their state after power-on. Result: an empty object.
+// Resets devices to their power-on state. Result: an empty object.
 void ResetDevices::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);

@@ -19,8 +19,8 @@ std::vector<std::uint8_t> bytesOf(const JsonValue& data) {
 
 }  // namespace
 
-// Writes bytes to an NVMEM area; they last only after a commit. Result: next_address, which is the
-// address plus 1 whatever the count of bytes.
+// Writes bytes to an NVMEM area; a commit makes them permanent. Result: next_address, which is the
+// address plus 1 for any number of bytes.
 void SetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, *session);

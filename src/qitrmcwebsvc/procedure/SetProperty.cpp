@@ -17,7 +17,7 @@ const JsonValue& scalarUnwrap(const JsonValue& value, const SessionProperty& pro
     return property.isScalar() && value.IsArray() && value.Size() == 1 ? value[0] : value;
 }
 
-// A data type without a rule passes here; there is no way to write it.
+// Does not check a value of an unknown data type; run() throws for it.
 void checkRequestedType(const JsonValue& value, const SessionProperty& property) {
     const PropertyValueType* type = propertyValueType(property.dataType());
     if (type == nullptr || type->accepts(value))
@@ -30,9 +30,9 @@ void checkRequestedType(const JsonValue& value, const SessionProperty& property)
 
 }  // namespace
 
-// Writes a property, which takes effect with a commit. An array of one element may stand for a
-// scalar. Throws BasicError wrongValueType for a value that is not of the property's type. Result:
-// data_type.
+// Writes a property; the change takes effect with a commit. A scalar may be given as an array of
+// one element. Throws BasicError wrongValueType for a value that is not of the property's type.
+// Result: data_type.
 void SetProperty::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const std::string name = textParam(params, "property");

@@ -17,7 +17,7 @@ bool fits(std::uint64_t data, std::uint32_t size) {
 
 void writeRegister(std::uint32_t size, nQITRMCAPI100_Session session, const char* device,
                    std::uint32_t address, std::uint64_t data) {
-    // Each cuts the data to its own width.
+    // Each function truncates the data to its own width.
     switch (size) {
         case 8:
             return callDriver(nQITRMCAPI100_writeRegisterUInt8, session, device, address, data);
@@ -34,7 +34,7 @@ void writeRegister(std::uint32_t size, nQITRMCAPI100_Session session, const char
 }  // namespace
 
 // Writes one register of a device. Throws BasicError dataTooWide for data with bits above the
-// register's size. Result: next_address, which is the address plus 1 whatever the size.
+// register's size. Result: next_address, which is the address plus 1 for any size.
 void WriteRegister::run(const JsonValue& params, SingleResponse& response) const {
     const std::shared_ptr<SessionContext> session = sessionOf(params);
     const RequestResource resource(params, session->driverSession, ResourceKind::Device);

@@ -11,11 +11,10 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// What the procedures on a chassis share. Driver refusals are thrown as qierr::Exception; no
-// property stays open.
+// Functions for the procedures on a chassis. Failures of the driver are thrown as qierr::Exception.
 
-// Params with the one member "device", to ask about a device that no request names: its name is
-// expanded and checked as though a client had sent it.
+// Params with only the member "device", to read properties of a device that the request does not
+// name. The device's name is expanded and checked like one from a client.
 class ScratchParams {
   public:
     explicit ScratchParams(JsonPool& pool);
@@ -27,8 +26,8 @@ class ScratchParams {
     JsonValue params;
 };
 
-// Throws BasicError invalidParams unless the resources are one device, and notChassis unless it is
-// a chassis.
+// Throws BasicError invalidParams unless the resources are one device, and notChassis unless that
+// device is a chassis.
 void requireChassis(const RequestResource& resource,
                     const std::shared_ptr<SessionContext>& session);
 

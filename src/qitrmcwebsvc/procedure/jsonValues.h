@@ -9,16 +9,16 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// The building of results in the pool of a response. Failure is std::bad_alloc.
+// Functions that build results in the pool of a response. They throw std::bad_alloc on failure.
 
 // A copy of a text.
 JsonValue textValue(std::string_view text, JsonPool& pool);
 
-// Makes room in an array, so that filling it up to `count` elements allocates once.
+// Reserves room for `count` elements, so that filling the array allocates only once.
 void reserveElements(JsonValue& array, std::size_t count, JsonPool& pool);
 
-// Appends a null to an array that has room for it, to be set in place. That makes a long array of
-// numbers in a third of the time that it takes with values that are built first and moved in.
+// Appends a null to an array with room for it, and returns the element for the caller to set. For a
+// long array of numbers this takes a third of the time of moving complete values into the array.
 inline JsonValue& appendElement(JsonValue& array, JsonPool& pool) {
     array.PushBack(JsonValue(), pool);
     return *(array.End() - 1);

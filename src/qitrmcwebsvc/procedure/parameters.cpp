@@ -55,7 +55,7 @@ std::string sessionIdOf(const JsonValue& params) {
 }
 
 ReservationParams reservationParams(const JsonValue& params) {
-    // In the order in which a fault would be met.
+    // The first invalid parameter in this order determines the error.
     const std::int32_t access = accessParam(params);
     return {access, textParam(params, "reservation_group", ""),
             doubleParam(params, "reservation_timeout", 0.0)};

@@ -7,29 +7,29 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Reading of params that have passed their schema.
+// Functions that read params which conform to their schema.
 
 // A required text.
 std::string textParam(const JsonValue& params, const char* name);
-// An optional text, number of any form, or truth value.
+// An optional text, number or Boolean; `absent` is the value if it is missing.
 std::string textParam(const JsonValue& params, const char* name, const char* absent);
 double doubleParam(const JsonValue& params, const char* name, double absent);
 bool boolParam(const JsonValue& params, const char* name, bool absent);
 
-// A required integer of the unsigned 32-bit range.
+// A required unsigned 32-bit integer.
 std::uint32_t uintParam(const JsonValue& params, const char* name);
-// The width of a register in bits, "size". The schema compares numbers by value, so 8.0 is 8 here
-// too; 0 for what it should have kept out.
+// "size": the width of a register in bits. The schema compares numbers by value, so 8.0 is accepted
+// as 8. Returns 0 for a value that the schema does not allow.
 std::uint32_t registerSizeParam(const JsonValue& params);
 
-// The session that the request is about.
+// The id of the request's session.
 std::string sessionIdOf(const JsonValue& params);
 
-// How a client wants to hold devices.
+// How devices are to be reserved.
 struct ReservationParams {
     std::int32_t access;  // 1 read only, 3 read and write
     std::string group;
-    double timeout;  // seconds to wait for a device that is taken
+    double timeout;  // seconds to wait for a device that another session holds
 };
 
 ReservationParams reservationParams(const JsonValue& params);

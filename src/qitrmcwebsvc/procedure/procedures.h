@@ -6,8 +6,8 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// The procedure classes, one for each row of methods.def. The work of each is in the source file of
-// its name.
+// The procedure classes, one for each row of methods.def. Each class implements run() in the source
+// file of its name.
 #define QITRMC_METHOD(name, Class, schema)                                          \
     class Class final : public Procedure {                                          \
       public:                                                                       \

@@ -9,7 +9,8 @@
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-// The JSON form of one type: here of the integers, which the JSON library tells apart by itself.
+// The conversion between a C++ type and JSON. This is the one for integers, whose ranges the JSON
+// library checks; the other types have specialisations.
 template <typename Integer>
 struct JsonForm {
     static bool accepts(const JsonValue& value) { return value.Is<Integer>(); }

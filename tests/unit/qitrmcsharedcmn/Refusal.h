@@ -5,7 +5,7 @@
 #include <string>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcsharedcmn/parseUtilities.h"
+#include "qitrmcsharedcmn/resourceNames.h"
 
 namespace shared_test {
 

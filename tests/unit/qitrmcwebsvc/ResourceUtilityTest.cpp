@@ -1,4 +1,4 @@
-#include "qitrmcwebsvc/ResourceUtility.h"
+#include "qitrmcwebsvc/deviceCategory.h"
 
 #include "qierr/Exception.h"
 #include "support/ProcedureFixture.h"

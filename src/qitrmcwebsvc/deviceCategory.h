@@ -8,11 +8,11 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// Whether the one device that the resources name is of this product category, as the driver numbers
-// categories. The session's default devices count as one name.
+// Whether the device that the resources name has this product category; the driver defines the
+// numbers. The session's default devices count as one name.
 //
-// Throws BasicError invalidParams unless the resources are exactly one device; qierr::Exception
-// when the driver refuses to tell.
+// Throws BasicError invalidParams unless the resources are exactly one device; qierr::Exception if
+// the driver cannot read the category.
 bool isDeviceOfCategory(const RequestResource& resource,
                         const std::shared_ptr<SessionContext>& session, std::int32_t category);
 

@@ -1,4 +1,4 @@
-#include "qitrmcsharedcmn/parseUtilities.h"
+#include "qitrmcsharedcmn/resourceNames.h"
 
 #include <rapidjson/encodings.h>
 #include <rapidjson/memorystream.h>
@@ -32,7 +32,7 @@ bool isAllDigits(const std::string& text, std::size_t from) {
     return std::all_of(text.begin() + static_cast<std::ptrdiff_t>(from), text.end(), isDigit);
 }
 
-// Where the digits that end right before `end` begin.
+// The position of the first of the digits directly before `end`.
 std::size_t startOfDigits(const std::string& name, std::size_t end) {
     while (end > 0 && isDigit(name[end - 1])) {
         --end;
@@ -75,7 +75,7 @@ ParsedName parseSingle(const std::string& name) {
     return {name.substr(0, digits), number, number, true};
 }
 
-// Calls `use` with each part between commas, empty ones too.
+// Calls `use` with each part between commas, including empty parts.
 template <typename Use>
 void forEachPart(const std::string& names, Use use) {
     std::size_t begin = 0;
@@ -89,7 +89,7 @@ void forEachPart(const std::string& names, Use use) {
     }
 }
 
-// Whether `next` is the name that comes right after the range in `last`.
+// Whether `next` begins with the number that follows the range in `last`, with the same prefix.
 bool continues(const ParsedName& last, const ParsedName& next) {
     return next.hasNumber && last.hasNumber && next.start != 0 && last.end == next.start - 1 &&
            last.prefix == next.prefix;

@@ -1,4 +1,4 @@
-#include "qitrmcwebsvc/ResourceUtility.h"
+#include "qitrmcwebsvc/deviceCategory.h"
 
 #include "qitrmcwebsvc/SessionProperty.h"
 #include "qitrmcwebsvc/invalidParams.h"
