@@ -19,8 +19,8 @@
 #include "qitrmcapi.h"
 
 /*
- * Every status needs a function that makes room for its text. The text stays in front, the bytes
- * behind it are 0, and the last byte of the room is the letter J.
+ * Every status needs a function that enlarges the buffer of its text. The text is kept, the bytes
+ * after it are 0, and the last byte of the buffer is the letter J.
  */
 static int32_t resizeText(qierr_Status* status, uint32_t size) {
     char* room = NULL;
@@ -42,8 +42,8 @@ static int32_t resizeText(qierr_Status* status, uint32_t size) {
 }
 
 /*
- * A function whose status has failed before does nothing, so a row of calls needs one look at the
- * end of it.
+ * A function does nothing if its status already reports a failure, so a sequence of calls needs
+ * only one check at its end.
  */
 static void stopOnFailure(const qierr_Status* status) {
     if (status->code < 0) {
@@ -73,7 +73,7 @@ static void switchOn(nQITRMCAPI100_Session session, double volts, qierr_Status* 
     printf("Mod2/ch0 is set to %.2f V and switched on.\n", volts);
 }
 
-/* Waits until the multimeter sees the voltage within 10 mV, for two seconds at most. */
+/* Waits for at most two seconds until the multimeter reads the voltage within 10 mV. */
 static double settledVoltage(nQITRMCAPI100_Session session, double volts, qierr_Status* status) {
     const struct timespec pause = {0, 10 * 1000 * 1000};
     double measured = 0.0;
@@ -89,7 +89,7 @@ static double settledVoltage(nQITRMCAPI100_Session session, double volts, qierr_
     return measured;
 }
 
-/* A status that has failed is used again by setting its code to 0. */
+/* A status that reports a failure can be used again after its code is set to 0. */
 static void showFailure(nQITRMCAPI100_Session session, qierr_Status* status) {
     double voltage = 0.0;
     nQITRMCAPI100_getGenericPropertyDouble(session, "Mod3", "PSU.Voltage", &voltage, status);

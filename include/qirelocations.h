@@ -1,5 +1,5 @@
 /*
- * The optional relocation library, libqirelocations.so.0, by which a packaged system moves the
+ * The optional relocation library, libqirelocations.so.0. With it a packaged system changes the
  * standard installation directories.
  */
 #ifndef QIRELOCATIONS_H
@@ -15,9 +15,9 @@ extern "C" {
  * Looked up by the name "get_relocated_dir".
  *
  * key: the name of a standard directory, such as "bindir". buffer: receives the relocated
- * directory as NUL-terminated text; bufferSize bytes, at most 255 of them used.
- * Returns a positive count when a directory was written, 0 to keep the default, a negative number
- * on failure. May be called from any thread.
+ * directory as NUL-terminated text; it has bufferSize bytes, of which at most 255 are used.
+ * Returns a positive count if a directory was written, 0 to keep the default, a negative number on
+ * failure. May be called from any thread.
  */
 typedef int32_t (*get_relocated_dir_fn)(const char* key, char* buffer, uint32_t bufferSize);
 

@@ -5,18 +5,19 @@
  * Rules that hold for every function here:
  *
  *   - Any function may be called from any thread. Calls that wait (for a reservation, a command, a
- *     connection) do not hold up calls on other sessions; nQITRMCAPI100_abortSession ends the
- *     waits of its session.
- *   - The last argument of nearly every function is a status that belongs to the caller. It is
- *     filled on failure (negative) or with a warning (positive), its text through its own
- *     reallocJson. A function whose status is already negative does nothing. Out arguments are
- *     set to 0 or null on failure.
- *   - Texts are UTF-8 and NUL-terminated. Texts that come in stay the caller's and are not kept.
- *   - Several resources travel as one text: names separated by commas, with the short form
+ *     connection) do not block calls on other sessions; nQITRMCAPI100_abortSession ends the waits
+ *     of its session.
+ *   - The last argument of nearly every function is a status that belongs to the caller. The
+ *     function sets it on failure (negative) or with a warning (positive), and enlarges its text
+ *     with its reallocJson. A function whose status is already negative does nothing. Out
+ *     arguments are set to 0 or null on failure.
+ *   - Texts are UTF-8 and NUL-terminated. Texts that are passed in remain the caller's and are not
+ *     kept.
+ *   - Several resources are passed as one text: names separated by commas, with the short form
  *     "Mod1/ch0:3" for the numbered channels 0 to 3. The tokens "$ConnectedDevices",
- *     "$DefaultDevices", "$DefaultNVMEMAreas", "$DefaultPhysChans" and "$ReservedDevices" stand
- *     for the session's own lists.
- *   - Texts and arrays that come out belong to the caller, who gives them back through
+ *     "$DefaultDevices", "$DefaultNVMEMAreas", "$DefaultPhysChans" and "$ReservedDevices" are
+ *     replaced by the session's own lists.
+ *   - Texts and arrays that are returned belong to the caller, who frees them with
  *     nQITRMCAPI100_freeString, nQITRMCAPI100_freeArray or nQITRMCAPI100_freeStringArray.
  *   - Booleans are one byte: 0 false, anything else true.
  *   - Times are in seconds.
@@ -32,20 +33,20 @@
 extern "C" {
 #endif
 
-/* A session. Never 0 when open. A dead handle fails with a status and does no harm. */
+/* A session. Never 0 for an open one. Calls with an invalid handle fail with a status. */
 typedef uint32_t nQITRMCAPI100_Session;
-/* An open property or command. Never 0 when open. */
+/* An open property or command. Never 0 for an open one. */
 typedef uint32_t nQITRMCAPI100_Property;
 typedef uint32_t nQITRMCAPI100_Command;
 
-/* ---- What the driver lends ------------------------------------------------------------------ */
+/* ---- Freeing of returned memory ------------------------------------------------------------- */
 
-/* Takes back a text. Null is allowed. */
+/* Frees a text. Null is allowed. */
 void nQITRMCAPI100_freeString(char* text);
-/* Takes back an array of numbers or Booleans. Null is allowed. Such arrays come from malloc, so an
- * array that the caller made with malloc may be given back here too. */
+/* Frees an array of numbers or Booleans. Null is allowed. Such arrays are allocated with malloc, so
+ * an array that the caller allocated with malloc may be freed here too. */
 void nQITRMCAPI100_freeArray(void* array);
-/* Takes back an array of texts with its texts. Null with count 0 is allowed. */
+/* Frees an array of texts with its texts. Null with count 0 is allowed. */
 void nQITRMCAPI100_freeStringArray(char** array, uint32_t count);
 
 /* ---- Enumerations --------------------------------------------------------------------------- */
@@ -57,7 +58,7 @@ void nQITRMCAPI100_freeStringArray(char** array, uint32_t count);
 
 /* The value of an item; 0 for an unknown enumeration or item. */
 int32_t nQITRMCAPI100_translateStaticEnumStringToValue(const char* enumeration, const char* item);
-/* The item of a value, or an empty text. The text is borrowed: it lives as long as the library. */
+/* The item of a value, or an empty text. The text is static and must not be freed. */
 const char* nQITRMCAPI100_translateStaticEnumValueToString(const char* enumeration, int32_t value);
 
 /* ---- Sessions and reservations -------------------------------------------------------------- */
@@ -70,11 +71,11 @@ void nQITRMCAPI100_initializeSessionWithoutResources(nQITRMCAPI100_Session* sess
  * Open a session on resources of one kind, make them the session's defaults, and reserve the
  * devices that they belong to.
  *
- * timeout: what the closed driver does with this number is not known; callers pass 60.0.
+ * timeout: its use by the closed driver is not known; callers pass 60.0.
  * access: 1 read only, 3 read and write. reservationGroup: sessions that name the same group, not
  * the empty one, share devices. reservationTimeout: how long to wait for a device that another
- * session holds; 0 does not wait.
- * Fails with -250811 when a device is still held by another session at the end of the wait.
+ * session holds; 0 means not to wait.
+ * Fails with -250811 if another session still holds a device at the end of the wait.
  */
 void nQITRMCAPI100_initializeSessionWithDevices(nQITRMCAPI100_Session* session, const char* devices,
                                                 double timeout, int32_t access,
@@ -89,35 +90,35 @@ void nQITRMCAPI100_initializeSessionWithNvmemAreas(nQITRMCAPI100_Session* sessio
                                                    int32_t access, const char* reservationGroup,
                                                    double reservationTimeout, qierr_Status* status);
 
-/* Closes a session and gives up its reservations, connections, open properties and commands. */
+/* Closes a session and releases its reservations, connections, open properties and commands. */
 void nQITRMCAPI100_closeSession(nQITRMCAPI100_Session session, qierr_Status* status);
 
-/* Ends whatever calls of the session are waiting; they fail. The session stays open. */
+/* Aborts all calls of the session that wait; they fail. The session stays open. */
 void nQITRMCAPI100_abortSession(nQITRMCAPI100_Session session, qierr_Status* status);
 
-/* Reserves devices for an open session. Arguments and -250811 as at the opening of a session. */
+/* Reserves devices for an open session. Arguments and -250811 as when opening a session. */
 void nQITRMCAPI100_reserveDevices(nQITRMCAPI100_Session session, const char* devices,
                                   int32_t access, const char* reservationGroup,
                                   double reservationTimeout, qierr_Status* status);
 
-/* Gives up reservations. */
+/* Releases reservations. */
 void nQITRMCAPI100_unreserveDevices(nQITRMCAPI100_Session session, const char* devices,
                                     qierr_Status* status);
 
 /* ---- Devices -------------------------------------------------------------------------------- */
 
-/* Connects devices; timeout below 0 leaves the length of the wait to the driver. */
+/* Connects devices. With a negative timeout the driver uses its default. */
 void nQITRMCAPI100_connectToDevices(nQITRMCAPI100_Session session, const char* devices,
                                     double timeout, qierr_Status* status);
 void nQITRMCAPI100_disconnectFromDevices(nQITRMCAPI100_Session session, const char* devices,
                                          qierr_Status* status);
-/* Puts devices into their state after power-on. */
+/* Resets devices to their power-on state. */
 void nQITRMCAPI100_resetDevices(nQITRMCAPI100_Session session, const char* devices,
                                 qierr_Status* status);
 /* Renames one device, which may be a chassis. */
 void nQITRMCAPI100_renameDevice(nQITRMCAPI100_Session session, const char* device,
                                 const char* newName, qierr_Status* status);
-/* Reads one text property of a device. A null device stands for the session's default device. */
+/* Reads one text property of a device. A null device means the session's default device. */
 void nQITRMCAPI100_getDevicePropertyString(nQITRMCAPI100_Session session, const char* device,
                                            const char* property, char** value,
                                            qierr_Status* status);
@@ -265,7 +266,7 @@ void nQITRMCAPI100_commitPropertiesGeneric(nQITRMCAPI100_Session session, const 
  * resource. */
 void nQITRMCAPI100_openDriverDefinedProperty(nQITRMCAPI100_Session session, const char* property,
                                              nQITRMCAPI100_Property* handle, qierr_Status* status);
-/* Opens a property that one resource defines for itself. */
+/* Opens a property that is defined by one resource itself. */
 void nQITRMCAPI100_openGenericProperty(nQITRMCAPI100_Session session, const char* resource,
                                        const char* property, nQITRMCAPI100_Property* handle,
                                        qierr_Status* status);
@@ -306,7 +307,7 @@ void nQITRMCAPI100_getCommandPropertyString(nQITRMCAPI100_Command handle, const 
 
 /* ---- Registers ------------------------------------------------------------------------------ */
 
-/* Move one register of 8, 16, 32 or 64 bits of one device. address: in bytes. */
+/* Read or write one register of 8, 16, 32 or 64 bits of one device. address: in bytes. */
 
 void nQITRMCAPI100_readRegisterUInt8(nQITRMCAPI100_Session session, const char* device,
                                      uint32_t address, uint8_t* value, qierr_Status* status);
@@ -327,17 +328,17 @@ void nQITRMCAPI100_writeRegisterUInt64(nQITRMCAPI100_Session session, const char
 
 /* ---- Non-volatile memory -------------------------------------------------------------------- */
 
-/* Fills buffer, size bytes of the caller's, from an area. size 0 with a null buffer is allowed. */
+/* Reads size bytes of an area into buffer. size 0 with a null buffer is allowed. */
 void nQITRMCAPI100_getNvmemBytes(nQITRMCAPI100_Session session, const char* nvmemArea,
                                  uint32_t address, uint8_t* buffer, uint32_t size,
                                  qierr_Status* status);
-/* Writes bytes to an area; they last only after a commit. serialNumber, password: what an area
- * that is guarded asks for; empty otherwise. */
+/* Writes bytes to an area; a commit makes them permanent. serialNumber, password: credentials for a
+ * protected area; empty otherwise. */
 void nQITRMCAPI100_setNvmemBytes(nQITRMCAPI100_Session session, const char* nvmemArea,
                                  uint32_t address, const uint8_t* bytes, uint32_t size,
                                  const char* serialNumber, const char* password,
                                  qierr_Status* status);
-/* Makes the pending writes of areas, or of all areas of devices, last. */
+/* Makes the pending writes of areas, or of all areas of devices, permanent. */
 void nQITRMCAPI100_commitNvmemGeneric(nQITRMCAPI100_Session session, const char* resources,
                                       qierr_Status* status);
 

@@ -1,7 +1,7 @@
 /*
- * What the simulated driver offers beyond the driver's own functions: for hosts that want to know
- * early whether the chassis is there, and for tests. The closed driver has none of this; a program
- * that runs with both looks these functions up with dlsym.
+ * Functions that only the simulated driver has: for hosts that check at startup whether the chassis
+ * is available, and for tests. The closed driver does not have them; a program that works with both
+ * drivers looks them up with dlsym.
  */
 #ifndef QITRMCSIM_H
 #define QITRMCSIM_H
@@ -16,14 +16,15 @@ extern "C" {
  */
 
 /*
- * Starts the simulator, as the first call of the driver would, and takes no session's number.
- * Returns 0, or the status code that all calls of the driver fail with. *text is then a summary of
- * the chassis in lines for people to read, or null when the start failed: the reason stands on
- * standard error. The text goes back through nQITRMCAPI100_freeString. Any thread may call this.
+ * Starts the simulator like the first call of the driver, but without using a session number.
+ * Returns 0, or the status code with which all calls of the driver fail. *text is set to a readable
+ * summary of the chassis in several lines, to be freed with nQITRMCAPI100_freeString, or to null if
+ * the start failed; the reason is then on standard error. Any thread may call this.
  */
 int32_t qitrmcsim_start(char** text);
 
-/* How many things the driver has lent, or opened, that have not come back. */
+/* The numbers of objects that the driver has allocated or opened and that have not been freed or
+ * closed. */
 typedef struct {
     uint32_t texts;
     uint32_t numberArrays;
@@ -33,21 +34,20 @@ typedef struct {
     uint32_t sessions;
 } qitrmcsim_Outstanding;
 
-/* Counts what is outstanding at this moment; all 0 before the start. Any thread may call this. */
+/* Gets the current numbers; all are 0 before the start. Any thread may call this. */
 void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts);
 
 /* ---- Faults --------------------------------------------------------------------------------- */
 
 /*
- * Replaces all faults and events by those of a JSON text, whose form the simulator's README tells;
- * "{}" has none. Counts and times begin anew. A file that QITRMC_SIM_FAULTS names takes over again
- * when it changes.
+ * Replaces all faults and events by those of a JSON text, whose format the simulator's README
+ * describes; "{}" has none. Counts and times start again. When the file that QITRMC_SIM_FAULTS
+ * names changes, its faults replace these.
  *
- * Returns 0, or the negative code of a status; then everything is as it was: -250942 when the text
- * is not as it should be, -250954 when it is null, -250952 when the simulator itself cannot start,
- * -250950 without memory.
- * reason: set to null, or to words about a failure, to be given back through
- * nQITRMCAPI100_freeString. May be null when nobody wants to know.
+ * Returns 0, or a negative status code, and then changes nothing: -250942 if the text is invalid,
+ * -250954 if it is null, -250952 if the simulator cannot start, -250950 if memory runs out.
+ * reason: set to null, or to a description of the failure, to be freed with
+ * nQITRMCAPI100_freeString. May be null.
  */
 int32_t qitrmcsim_setFaults(const char* json, char** reason);
 

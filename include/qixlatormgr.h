@@ -1,6 +1,6 @@
 /*
- * Translators: objects that put a status into words, and the optional manager library
- * libqixlator.so.1, which knows the translators of other programs.
+ * Translators: objects that format a status as text, and the optional manager library
+ * libqixlator.so.1, which provides the translators of other programs.
  */
 #ifndef QIXLATORMGR_H
 #define QIXLATORMGR_H
@@ -14,27 +14,28 @@ extern "C" {
 #endif
 
 /*
- * Allocates for a translator, with the meaning of realloc: a null pointer allocates, size 0 frees
- * and returns null. Does nothing and returns null when status is already negative, unless size is
- * 0; sets a negative status when memory runs out.
+ * Allocates memory for a translator, like realloc: a null pointer allocates, size 0 frees and
+ * returns null. Does nothing and returns null if status is already negative, unless size is 0. Sets
+ * a negative status if memory runs out.
  */
 typedef void* (*qixlator_Alloc)(void* pointer, uint32_t size, void* allocContext,
                                 qierr_Status* status);
 
 /*
- * One translator. An implementation may keep fields of its own behind these. Used by one thread at
- * a time.
+ * One translator. An implementation may have fields of its own after these. Used by one thread at a
+ * time.
  *
- * attributes: bits 0 to 7 hold the language (0 English, 1 French, 2 German, 3 Japanese, 4 Korean,
- * 5 simplified Chinese), bits 8 to 11 the development environment that asks (0 none, 1 to 3).
- * The texts that come back are UTF-8, NUL-terminated, made with alloc, and belong to the caller,
- * who frees them through the same function. Null with a status that is not negative means that
- * there is no text.
+ * attributes: bits 0 to 7 are the language (0 English, 1 French, 2 German, 3 Japanese, 4 Korean,
+ * 5 simplified Chinese), bits 8 to 11 the ADE, the application development environment of the
+ * caller (0 none, 1 to 3).
+ * Returned texts are UTF-8, NUL-terminated and allocated with alloc. They belong to the caller, who
+ * frees them with the same function. Null with a status that is not negative means that there is no
+ * text.
  */
 typedef struct XlatorInterface {
     /* Always 16, on every platform. */
     uint32_t structSize;
-    /* Ends the translator and frees it. */
+    /* Destroys and frees the translator. */
     void (*destroy)(struct XlatorInterface* self);
     /* The description of a code. May be null. */
     char* (*getStaticDesc)(struct XlatorInterface* self, int32_t code, uint32_t attributes,
@@ -45,12 +46,12 @@ typedef struct XlatorInterface {
                             qierr_Status* status);
 } XlatorInterface;
 
-/* A session with the manager, which keeps the translators made in it. Opaque. */
+/* A session of the manager, which owns the translators that are created in it. Opaque. */
 typedef struct qixlatormgr_Session qixlatormgr_Session;
 
 /*
- * The entry points of the manager, looked up by these names. The status says what failed; after a
- * negative status the result is null.
+ * The functions of the manager, looked up by these names. A failure is reported in the status, and
+ * the result is then null.
  */
 typedef qixlatormgr_Session* (*qixlatormgr_createSession_fn)(qierr_Status* status);
 typedef void (*qixlatormgr_destroySession_fn)(qixlatormgr_Session* session);
@@ -59,10 +60,10 @@ typedef XlatorInterface* (*qixlatormgr_createXlator_fn)(qixlatormgr_Session* ses
 typedef void (*qixlatormgr_destroyXlator_fn)(qixlatormgr_Session* session, XlatorInterface* xlator);
 
 /*
- * Exported by a program that lends its translators, for the manager to call: makes the translator
- * of this name, set up by a registration text (a JSON object that the caller brings). The
- * translator is ended by its own destroy. Null with a negative status when the name is unknown or
- * the set-up fails.
+ * Exported by a program that offers its translators to others; called by the manager. Creates the
+ * translator of this name, configured with the registration text, a JSON object. The translator is
+ * freed by its function destroy. Returns null with a negative status if the name is unknown or the
+ * configuration fails.
  */
 typedef XlatorInterface* (*qixlator_exported_create_fn)(const char* name,
                                                         const char* registrationInfo,

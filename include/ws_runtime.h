@@ -1,10 +1,10 @@
 /*
- * The web runtime, libws_runtime.so.13: what the embedded web server offers to a service plug-in,
- * and what it expects of one.
+ * The web runtime, libws_runtime.so.13: the functions that the embedded web server provides for a
+ * service plug-in, and those that a plug-in must export.
  *
- * All functions may be called from any thread that is inside a plug-in's run function, with the
- * request handle which that run function was given, and with no other. No function frees or keeps
- * a pointer that it is given.
+ * The functions may be called only by a thread that executes the plug-in's run function, and only
+ * with the request handle that was passed to that run function. No function frees or keeps a
+ * pointer that is passed to it.
  */
 #ifndef WS_RUNTIME_H
 #define WS_RUNTIME_H
@@ -15,10 +15,10 @@
 extern "C" {
 #endif
 
-/* One HTTP request in flight. Opaque; valid for the length of one run call. */
+/* One HTTP request that is being processed. Opaque; valid during one run call. */
 typedef struct ws_Request ws_Request;
 
-/* Text of 32-bit characters from begin up to, not including, end. Both null means empty. */
+/* Text of 32-bit characters from begin up to, but not including, end. Both null means empty. */
 typedef struct ws_WideString {
     const uint32_t* begin;
     const uint32_t* end;
@@ -31,12 +31,12 @@ typedef struct ws_EntryOperations {
     void (*reserved0)(ws_Entry* entry);
     void (*reserved1)(ws_Entry* entry);
     void (*reserved2)(ws_Entry* entry);
-    /* The name under which the request came in. The text belongs to the server and is valid for
-     * the length of the run call. */
+    /* The name of the entry in the request. The text belongs to the server and is valid during the
+     * run call. */
     ws_WideString (*entryName)(const ws_Entry* entry);
 } ws_EntryOperations;
 
-/* The entry of a web service through which a request came. Owned by the server. */
+/* The entry of a web service to which a request was sent. Owned by the server. */
 struct ws_Entry {
     const ws_EntryOperations* operations;
 };
@@ -45,7 +45,7 @@ struct ws_Entry {
  * Reads one variable of the request as NUL-terminated text: "REQUEST_TRANSPORT" ("http" or
  * "https") or "REQUEST_METHOD" ("GET", "POST" and so on).
  *
- * size: in, the bytes in buffer; out, the bytes that the call needs when they do not fit.
+ * size: in, the size of buffer in bytes; out, the required size if the buffer is too small.
  * Returns 0 on success. Non-zero with *size not 0: call again with a buffer of *size bytes.
  * Non-zero with *size 0: there is no such variable.
  */
@@ -53,8 +53,8 @@ int ReadRequestVariable_C_REST_QI_QVWS_(ws_Request* request, const char* name, c
                                         uint32_t* size);
 
 /*
- * Reads the request's body. Arguments and result are those of the variable call; a body that
- * fits is followed by a NUL only where there is room for one, and *size is then left alone.
+ * Reads the request's body. Arguments and result as for ReadRequestVariable_C_REST_QI_QVWS_. A body
+ * that fits is followed by a NUL only if the buffer has room for it; *size is then not changed.
  */
 int ReadPostData_C_REST_QI_QVWS_(ws_Request* request, char* buffer, uint32_t* size);
 
@@ -68,9 +68,10 @@ void SetHTTPResponseMimeType_C_REST_QI_QVWS_(ws_Request* request, const char* ty
 void WriteOutput_C_REST_QI_QVWS_(ws_Request* request, const char* data, uint32_t length);
 
 /*
- * What a plug-in exports, each under the name given here with the plug-in's prefix in front, for
- * example "qitrmcRun". The server calls Init once before the first request and Finalize once after
- * the last, never while a request is in flight; Run from any number of threads at once.
+ * The functions that a plug-in exports. Each name is the plug-in's prefix and the last word of the
+ * type's name, for example "qitrmcRun". The server calls Init once before the first request and
+ * Finalize once after the last, never while a request is being processed. It calls Run from any
+ * number of threads concurrently.
  */
 typedef void (*ws_PluginInit)(void);
 typedef void (*ws_PluginPause)(void);

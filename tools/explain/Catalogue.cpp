@@ -27,7 +27,7 @@ std::string_view withoutGroup(std::string_view name) {
     return name.substr(name.find('_') + 1);
 }
 
-// How many characters must be put in, left out or replaced to make one text of the other.
+// The edit distance: the number of insertions, deletions and replacements of characters.
 std::size_t distance(const std::string& left, const std::string& right) {
     std::vector<std::size_t> row(right.size() + 1);
     std::iota(row.begin(), row.end(), 0);
@@ -43,7 +43,7 @@ std::size_t distance(const std::string& left, const std::string& right) {
     return row.back();
 }
 
-// A part of a name is as good as the name.
+// A text that is part of a name counts as equal to it.
 std::size_t distanceToName(const std::string& given, std::string_view name) {
     const std::string whole = lowered(name);
     if (whole.find(given) != std::string::npos)
@@ -51,7 +51,7 @@ std::size_t distanceToName(const std::string& given, std::string_view name) {
     return std::min(distance(given, whole), distance(given, lowered(withoutGroup(name))));
 }
 
-// The entries of the least distances, in the order of the table where they are equal.
+// The entries with the smallest distances; those with equal distances in the order of the table.
 std::vector<Entry> nearest(std::vector<std::pair<std::int64_t, Entry>> distances) {
     std::stable_sort(distances.begin(), distances.end(),
                      [](const auto& left, const auto& right) { return left.first < right.first; });

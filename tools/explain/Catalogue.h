@@ -16,17 +16,17 @@ struct Entry {
 // In the order of the tables.
 const std::vector<Entry>& catalogue();
 
-// Null when no status has the code.
+// Null if no status has the code.
 const Entry* findCode(std::int32_t code);
 
-// Letter case does not count, and the name of a group in front, such as "qitrmcsim_", may be left
-// out where another status does not have the short name. Null when no status has the name.
+// Ignores letter case. A prefix such as "qitrmcsim_" may be omitted if no other status has the
+// shortened name. Null if no status has the name.
 const Entry* findName(std::string_view name);
 
-// The three codes nearest to one that is unknown, the nearest first.
+// The three codes nearest to an unknown code, the nearest first.
 std::vector<Entry> nearestCodes(std::int32_t code);
 
-// The names, up to three, that a mistyped or shortened one may stand for, the likeliest first.
+// Up to three names for a mistyped or shortened name, the most similar first.
 std::vector<Entry> similarNames(std::string_view name);
 
 }  // namespace explain

@@ -4,7 +4,7 @@
 
 namespace explain {
 
-// What was asked for has no words. Exit status 1.
+// There is no text for the request. Exit status 1.
 struct Failure : std::runtime_error {
     using std::runtime_error::runtime_error;
 };

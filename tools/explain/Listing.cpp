@@ -16,7 +16,7 @@ struct Free {
     void operator()(utf8proc_uint8_t* text) const { std::free(text); }
 };
 
-// The text as it is compared without regard to letter case; as it is when it is no UTF-8.
+// The text in case-folded form; unchanged if it is not valid UTF-8.
 std::string folded(const std::string& text) {
     utf8proc_uint8_t* result = nullptr;
     const auto options =
@@ -29,7 +29,7 @@ std::string folded(const std::string& text) {
     return {reinterpret_cast<const char*>(result), static_cast<std::size_t>(length)};
 }
 
-// Up to a full stop with a blank behind it, or the ideographic one, which has none.
+// Up to a full stop that is followed by a blank, or to an ideographic full stop.
 std::string firstSentence(const std::string& text) {
     constexpr std::string_view ideographicStop = "。";
     const std::string line = text.substr(0, text.find('\n'));

@@ -8,15 +8,15 @@
 
 namespace explain {
 
-// All entries that the explanation files have, a line each with code, name and first sentence.
-// Throws Failure when there is none.
+// All entries in the explanation files, one line each with code, name and first sentence. Throws
+// Failure if there are none.
 std::string listAll(Translator& translator);
 
-// The entries whose name or text contains the word. Letter case does not count. Throws Failure when
-// there is none.
+// The entries whose name or text contains the word, ignoring letter case. Throws Failure if there
+// are none.
 std::string listMatches(const std::string& word, Translator& translator);
 
-// The entries that may have been meant, each a line as above behind a line end.
+// Similar entries, each as a line end followed by a line as above.
 std::string suggestions(const std::vector<Entry>& entries, Translator& translator);
 
 }  // namespace explain

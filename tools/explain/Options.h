@@ -19,10 +19,10 @@ struct Options {
     bool debug = false;
 };
 
-// Makes `app` fill `options`, which must live as long.
+// Adds the options to `app`, which stores their values in `options`; `options` must outlive `app`.
 void addOptions(CLI::App& app, Options& options);
 
-// Throws UsageError for options that do not go together.
+// Throws UsageError for options that cannot be combined.
 void checkOptions(const Options& options);
 
 }  // namespace explain

@@ -35,7 +35,7 @@ bool isNumber(const std::string& text) {
            text.find_first_not_of("0123456789", digits) == std::string::npos;
 }
 
-// More than any status has.
+// The limit of a name's length; all statuses have shorter names.
 constexpr std::size_t longestName = 100;
 
 bool isName(const std::string& text) {
@@ -45,7 +45,7 @@ bool isName(const std::string& text) {
            std::all_of(text.begin(), text.end(), isWordCharacter);
 }
 
-// Only few codes are positive, so any other positive number has lost its sign.
+// Few codes are positive, so any other positive number is taken as a code without its minus sign.
 std::int32_t codeOfNumber(const std::string& text) {
     std::int32_t number = 0;
     const char* const end = text.data() + text.size();

@@ -15,8 +15,8 @@ struct Question {
     std::string details;  // a JSON object, or empty
 };
 
-// The status that the operands mean. Throws UsageError, and for an unknown name a Failure that
-// lists similar ones in words of the translator.
+// The status that the operands name. Throws UsageError, and for an unknown name a Failure that
+// lists similar names with their texts.
 Question readQuestion(const Options& options, Translator& translator);
 
 }  // namespace explain

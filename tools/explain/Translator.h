@@ -10,21 +10,21 @@
 namespace explain {
 
 struct Translation {
-    std::int32_t failure = 0;  // the code why there is no text, or 0
+    std::int32_t failure = 0;  // the status code if there is no text, or 0
     std::string text;
 };
 
-// The translator of the service, in one language.
+// Produces the texts of statuses in one language.
 class Translator {
   public:
     // Throws std::bad_alloc.
     explicit Translator(std::uint32_t language);
 
-    // The text of a status with all that its details hold. Labels are marked in a formatted text;
-    // `debug` adds the items for maintainers.
+    // The text of a status with all its details. Labels are marked in a formatted text; `debug`
+    // adds the items for maintainers.
     Translation translate(const Question& question, bool formatted, bool debug);
 
-    // The text of a code alone; empty when no explanation file has it.
+    // The text of a code alone; empty if no explanation file has it.
     std::string explanation(std::int32_t code);
 
   private:

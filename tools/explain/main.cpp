@@ -1,4 +1,4 @@
-// qitrmc-explain: prints what the translator of the service says for a status.
+// qitrmc-explain: prints the text of the service's translator for a status.
 
 #include <CLI/CLI.hpp>
 #include <cstdio>
@@ -16,7 +16,7 @@ namespace {
 
 using namespace explain;
 
-// What to say about a code that no explanation file has.
+// The message for a code that no explanation file has.
 std::string withoutText(std::int32_t code, Translator& translator) {
     const std::string number = std::to_string(code);
     if (const Entry* const entry = findCode(code))
@@ -28,7 +28,7 @@ std::string withoutText(std::int32_t code, Translator& translator) {
            suggestions(nearestCodes(code), translator);
 }
 
-// What to say beside a translation or instead of it; empty when all went well.
+// The message in addition to a translation or in place of it; empty on success.
 std::string doubtAbout(const Question& question, const Translation& translation,
                        Translator& translator) {
     if (translator.explanation(question.code).empty())

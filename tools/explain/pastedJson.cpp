@@ -14,13 +14,13 @@ jsonz_value read(const char* position) {
     return value;
 }
 
-// The object or array that is the member of this name. Null when there is none.
+// The member with this name if it is an object. Null otherwise.
 const char* objectMember(const char* object, const char* key) {
     const char* const member = jsonz_findMember(object, key);
     return read(member).type == jsonz_typeObject ? member : nullptr;
 }
 
-// Empty when the member is no whole number of 32 bits, or 0.
+// Empty if the member is 0 or not a 32-bit integer.
 std::optional<std::int32_t> codeMember(const char* object, const char* key) {
     const jsonz_value value = read(jsonz_findMember(object, key));
     if (value.type != jsonz_typeNumber)
@@ -33,7 +33,7 @@ std::optional<std::int32_t> codeMember(const char* object, const char* key) {
     return code;
 }
 
-// An error object has a text beside its code; details have none.
+// An error object has a message in addition to its code; details have none.
 bool isErrorObject(const char* object) {
     return read(jsonz_findMember(object, "message")).type == jsonz_typeString;
 }
