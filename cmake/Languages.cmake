@@ -1,4 +1,4 @@
-# The rows of share/languages.tsv, for the build.
+# Reads share/languages.tsv into lists for the build.
 
 set(languages_file "${PROJECT_SOURCE_DIR}/share/languages.tsv")
 set_property(DIRECTORY "${PROJECT_SOURCE_DIR}" APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS

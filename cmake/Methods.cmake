@@ -1,5 +1,5 @@
-# The rows of src/qitrmcwebsvc/methods.def, for the build: each method has a source file of its class
-# and a schema.
+# Reads src/qitrmcwebsvc/methods.def into lists for the build: each method has a schema and a source
+# file named after its class.
 
 set(methods_file "${PROJECT_SOURCE_DIR}/src/qitrmcwebsvc/methods.def")
 set_property(DIRECTORY "${PROJECT_SOURCE_DIR}" APPEND PROPERTY CMAKE_CONFIGURE_DEPENDS
@@ -20,7 +20,7 @@ foreach(row IN LISTS methods_rows)
   endif()
 endforeach()
 
-# Sorted by the names of the methods, those in lower case first.
+# Sorted by method name, with names in lower case first.
 list(SORT lower_case_rows)
 list(SORT upper_case_rows)
 list(TRANSFORM lower_case_rows REPLACE "${methods_row}" "\\3")

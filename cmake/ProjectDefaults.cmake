@@ -1,4 +1,4 @@
-# What every target of this project is built with.
+# The settings for all targets of this project.
 
 set(CMAKE_C_STANDARD 99)
 set(CMAKE_C_STANDARD_REQUIRED ON)
@@ -7,7 +7,7 @@ set(CMAKE_CXX_STANDARD 17)
 set(CMAKE_CXX_STANDARD_REQUIRED ON)
 set(CMAKE_CXX_EXTENSIONS OFF)
 
-# Everything may end in a shared library, and a shared library exports only what it names.
+# All code may be linked into a shared library, which exports only the symbols that it lists.
 set(CMAKE_POSITION_INDEPENDENT_CODE ON)
 set(CMAKE_C_VISIBILITY_PRESET hidden)
 set(CMAKE_CXX_VISIBILITY_PRESET hidden)
@@ -22,13 +22,13 @@ if(QITRMC_CCACHE)
   set(CMAKE_CXX_COMPILER_LAUNCHER "${QITRMC_CCACHE}")
 endif()
 
-# On a 32-bit target readdir and stat fail for a file whose inode number or place in its directory
-# has 64 bits, unless files and times are counted in 64 bits everywhere.
+# On a 32-bit target readdir and stat fail for a file whose inode number or directory offset needs
+# 64 bits, unless these types have 64 bits in all of the code.
 add_compile_definitions(_FILE_OFFSET_BITS=64 _TIME_BITS=64)
 
 add_compile_options(-Wall -Wextra -Werror)
-# The control program runs from debug-free paths: file names in error reports are relative to the
-# project, the same on every machine that builds it.
+# File names in error reports are relative to the project, so they are the same on every build
+# machine.
 add_compile_options("-fmacro-prefix-map=${PROJECT_SOURCE_DIR}/=")
 
 set(QITRMC_SANITIZE "" CACHE STRING "Sanitizers to build with, for example address,undefined")
@@ -42,7 +42,7 @@ endif()
 set(QITRMC_GENERATED "${PROJECT_BINARY_DIR}/generated")
 file(MAKE_DIRECTORY "${QITRMC_GENERATED}/qierr")
 
-# qitrmc_library(NAME sources...): one folder of the plug-in as a static library whose headers are
+# qitrmc_library(NAME sources...): one folder of the plug-in as a static library. Its headers are
 # included as <folder>/<header>.
 function(qitrmc_library name)
   add_library(${name} STATIC ${ARGN})

@@ -1,8 +1,8 @@
-# Lays out a tree that looks like a controller's file system in the build folder, so that a
-# development build finds its configuration and shared files without touching the machine's.
+# Creates a copy of a controller's directory layout in the build folder, so that a development build
+# finds its configuration and shared files there and does not use those of the machine.
 
 # qitrmc_stage(SOURCE DESTINATION): copies a file to DESTINATION, an absolute path on a controller,
-# below QITRMC_ROOT. Nothing is staged for a build with an empty root: there an installation does it.
+# below QITRMC_ROOT. Does nothing if that is empty: the files are then installed.
 function(qitrmc_stage source destination)
   if(QITRMC_ROOT)
     configure_file("${source}" "${QITRMC_ROOT}${destination}" COPYONLY)

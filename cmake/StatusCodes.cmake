@@ -1,4 +1,4 @@
-# qitrmc_status_codes(FORM OUTPUT): generates C++ from the tables of the status codes; FORM is an
+# qitrmc_status_codes(FORM OUTPUT): generates C++ from the tables of the status codes. FORM is an
 # option of make_codes.py.
 function(qitrmc_status_codes form output)
   set(statuses "${PROJECT_SOURCE_DIR}/share/statuses")

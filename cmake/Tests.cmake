@@ -1,11 +1,11 @@
-# How the unit tests are built and registered.
+# Functions that build and register unit tests.
 
 find_package(GTest REQUIRED)
 include(GoogleTest)
 
-# qitrmc_unit_test(NAME SOURCES ... LIBRARIES ... [LABELS concurrent]): one test program of GoogleTest
-# cases, each case registered with CTest on its own. The label "concurrent" makes the thread
-# sanitizer run them too.
+# qitrmc_unit_test(NAME SOURCES ... LIBRARIES ... [LABELS concurrent]): one GoogleTest program, with
+# each test case registered separately in CTest. Tests with the label "concurrent" also run under
+# the thread sanitizer.
 function(qitrmc_unit_test name)
   cmake_parse_arguments(PARSE_ARGV 1 test "" "LABELS" "SOURCES;LIBRARIES")
   add_executable(${name} ${test_SOURCES})

@@ -4,18 +4,18 @@
 usage: make_methods.py [--page FILE]
        make_methods.py --record HOST
 
-The page is made of what the program itself uses, so that it cannot tell something else:
+The page is generated from the sources of the program itself, so that it cannot differ from them:
 
     ../src/qitrmcwebsvc/methods.def   the methods and their order
     ../src/embedded/schemas           the parameters with their types and limits
     ../share/statuses                 the names of the error codes
-    methods.json                      what none of these says: purposes, meanings, results, errors
-    exchanges.json                    one exchange of each method, as it was recorded
+    methods.json                      all other information: purposes, meanings, results, errors
+    exchanges.json                    one recorded exchange of each method
 
-With --record, HOST is the program qitrmc-host. A fresh one with the built-in chassis serves each
-exchange, after the requests that methods.json names for it, and exchanges.json is written anew.
+With --record, HOST is the program qitrmc-host. For each exchange it is started with the built-in
+chassis and receives the preparatory requests that methods.json lists. exchanges.json is replaced.
 
-The same sources always give the same page. A fault of the sources is reported on standard error.
+The page depends only on these sources. An error in them is reported on standard error.
 """
 
 import argparse
@@ -39,14 +39,14 @@ sys.path.insert(0, str(ROOT / "share" / "statuses"))
 from status_tables import SIMULATED_RAISER, read_statuses
 
 METHOD_ROW = re.compile(r'QITRMC_METHOD\(\s*"(\w+)",\s*\w+,\s*"([\w.]+)"\s*\)')
-# The id of the first session that a fresh host opens with the built-in chassis.
+# The id of the first session after a start of the host with the built-in chassis.
 FIRST_SESSION = "_session1"
 PATIENCE_SECONDS = 60
 WITHOUT_RESOURCES = "Without any of them the session's default resources are meant."
 
 
 class Fault(Exception):
-    """A source does not say what the page needs."""
+    """A source lacks information for the page."""
 
 
 def read_json(path):
@@ -63,7 +63,7 @@ def read_methods():
 
 
 def limits_of(schema):
-    """Put the limits of a schema into words."""
+    """Describe the limits of a schema."""
     words = []
     if "pattern" in schema:
         words.append(f"matches `{schema['pattern']}`")
@@ -81,7 +81,7 @@ def limits_of(schema):
 
 
 def type_of(schema, definitions):
-    """Put the type of a schema into words."""
+    """Describe the type of a schema."""
     if "$ref" in schema:
         return type_of(resolved(schema, definitions), definitions)
     if "oneOf" in schema:
@@ -100,7 +100,7 @@ def resolved(schema, definitions):
 
 
 def exclusive_members(schema):
-    """Return the parameters of which a request may name one, in order."""
+    """Return the parameters of which a request may contain only one, in order."""
     return [form["required"][0] for form in schema.get("oneOf", []) if "required" in form]
 
 
@@ -134,7 +134,7 @@ def named_codes(codes, statuses):
 
 
 def error_lines(codes, statuses):
-    """List codes with their names, those of the simulated driver apart."""
+    """List codes with their names, those of the simulated driver separately."""
     simulated = [code for code in codes if statuses[code].raiser == SIMULATED_RAISER]
     real = [code for code in codes if code not in simulated]
     if not real:
@@ -199,8 +199,8 @@ def request_text(method, params, id):
 
 
 def play(method, entry, ask):
-    """Return the exchange of a method with a fresh host. ask(body) posts a text and returns the
-    answer's text."""
+    """Return the exchange of a method with a newly started host. ask(body) posts a text and returns
+    the text of the response."""
     for number, (step, params) in enumerate(entry["before"], start=1):
         answer = json.loads(ask(request_text(step, params, number)))
         if "result" not in answer:

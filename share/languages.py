@@ -1,9 +1,9 @@
 #!/usr/bin/python3
 """The languages of all texts, from languages.tsv, the only list of them.
 
-Its rows are in the order in which the program carries the dictionaries. Its columns: the number by
-which the translator knows the language, the word of three letters that names its columns and files,
-its folder in the shared directory, the language code of its locales, and what separates two
+The rows are in the order of the embedded dictionaries. The columns are the number that the
+translator uses for the language, the word of three letters in the names of columns and files, the
+folder in the shared directory, the language code of its locales, and the separator between two
 sentences.
 
 usage: languages.py OUTPUT    writes C++ initialisers of word and locale, in the order of the numbers

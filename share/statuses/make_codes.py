@@ -3,9 +3,9 @@
 
 usage: make_codes.py (--header | --rows) OUTPUT
 
-  --header  the constants that the service names. The codes of the platform keep the names that their
-            failures carry; the others are in the namespace qierr::codes. The codes of the simulated
-            driver are left out: only the simulator names them.
+  --header  the constants for the service. Codes of the platform have the names that their failures
+            report; the others are in the namespace qierr::codes. Codes of the simulated driver are
+            left out, since only the simulator uses them.
   --rows    initialisers of code and name, of every code
 """
 

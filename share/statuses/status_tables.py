@@ -1,13 +1,13 @@
 """Reads and checks the tables of the status codes.
 
-The texts of a code stand in one place each:
+Each code has its texts in one table:
 
     catalogue.tsv                        every code that the service itself raises, in all languages
     ../../simulator/status/statuses.tsv  the codes that the simulated driver raises, in English; the
                                          simulator makes its own constants from that table
     driver.tsv                           the translations of the codes of that table, and their raiser
 
-Every fault is reported as "file:line: what is wrong".
+Every error is reported as "file:line: what is wrong".
 """
 
 import re
@@ -29,14 +29,14 @@ HERE = Path(__file__).resolve().parent
 CATALOGUE = HERE / "catalogue.tsv"
 DRIVER = HERE / "driver.tsv"
 SIMULATOR = HERE.parent.parent / "simulator" / "status" / "statuses.tsv"
-# Stands before the names of the simulator's own codes in the details of its failures.
+# The prefix of the names of the simulator's own codes in the details of its failures.
 SIMULATOR_PREFIX = "qitrmcsim_"
 
 CODE = re.compile(r"-?[1-9][0-9]*")
 CONSTANT = re.compile(r"[a-z][A-Za-z0-9]*(_[a-z][A-Za-z0-9]*)?")
-# The explanation files look like XML, but their reader takes every character as it stands.
+# The explanation files look like XML, but their reader does not decode entities.
 MARKUP = re.compile(r"[<>&]")
-# The reader cuts longer lines, the line feed included, and looks for tags in the pieces.
+# The limit includes the line feed. The reader splits longer lines and looks for tags in the pieces.
 LONGEST_LINE = 1023
 
 def text_columns(languages):
@@ -92,7 +92,7 @@ def read_table(path, columns, faults):
 
 
 def cell_faults(cell):
-    """Name what is wrong with the form of one cell, whatever it says."""
+    """Yield the formal errors of one cell, regardless of its content."""
     if not cell:
         yield "is empty"
     if cell != cell.strip() or "  " in cell:
@@ -106,7 +106,7 @@ def cell_faults(cell):
 
 
 def row_faults(row, raisers):
-    """Name what is wrong with one row taken by itself."""
+    """Yield the errors of a single row."""
     for column, cell in row.items():
         for fault in cell_faults(cell):
             yield f"{column} {fault}"
@@ -117,7 +117,7 @@ def row_faults(row, raisers):
 
 
 def sound_rows(path, columns, raisers, faults):
-    """Return {code: (place, row)} of the rows whose form is right."""
+    """Return {code: (place, row)} of the rows without formal errors."""
     rows = {}
     for place, row in read_table(path, columns, faults):
         wrong = list(row_faults(row, raisers))
@@ -162,7 +162,7 @@ def driver_status(place, code, english, other):
 
 
 def status_faults(status):
-    """Name what is wrong with the constant and with the texts of a status as they are used."""
+    """Yield the errors of a status's constant and of its final texts."""
     if not CONSTANT.fullmatch(status.constant):
         yield f"constant {status.constant!r} is no name in lower camel case"
     for language in LANGUAGES:

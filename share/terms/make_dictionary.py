@@ -3,8 +3,8 @@
 
 Usage: make_dictionary.py LANGUAGE OUTPUT [--tables DIR]
 
-Every fault of the tables is reported on standard error as "file:line: what is wrong", and
-nothing is written then. The same tables always give the same bytes.
+Every error in the tables is reported on standard error as "file:line: what is wrong", and then
+nothing is written. The output depends only on the tables.
 """
 
 import argparse
@@ -35,7 +35,7 @@ class Faults(Exception):
 
 
 def read_table(path):
-    """Return the rows of a table as (line number, cells) pairs, the header line left out."""
+    """Return the rows of a table, without the header line, as (line number, cells) pairs."""
     try:
         lines = path.read_bytes().removesuffix(b"\n").split(b"\n")
     except OSError as error:
@@ -54,7 +54,7 @@ def read_table(path):
 
 
 def text_faults(column, text):
-    """Name what is wrong with the form of one cell, whatever it says."""
+    """Yield the formal errors of one cell, regardless of its content."""
     if text != text.strip():
         yield f"{column} begins or ends with a blank"
     if any(unicodedata.category(character) == "Cc" for character in text):
@@ -74,7 +74,7 @@ def same_as_english(remark):
 
 
 def english_only_faults(key, translations):
-    """Name what is wrong with a row that is marked as having no translation."""
+    """Yield the errors of a row that is marked as having no translation."""
     if not USAGE_KEY.fullmatch(key):
         yield f"only usage types may be {ENGLISH_ONLY}"
     for language, text in translations.items():
@@ -83,7 +83,7 @@ def english_only_faults(key, translations):
 
 
 def translation_faults(english, translations, remark):
-    """Name what is wrong with the translations of an ordinary row."""
+    """Yield the errors in the translations of an ordinary row."""
     same = same_as_english(remark)
     if same is None:
         yield f"unknown remark {remark!r}"
@@ -98,7 +98,7 @@ def translation_faults(english, translations, remark):
 
 
 def row_faults(cells, key_form):
-    """Name everything that is wrong with one row taken by itself."""
+    """Yield all errors of a single row."""
     if len(cells) != len(HEADER):
         yield f"{len(cells)} columns instead of {len(HEADER)}"
         return
@@ -117,7 +117,7 @@ def row_faults(cells, key_form):
 
 
 def merge_tables(directory):
-    """Return key to {language: text} over all tables; a text is empty where there is none."""
+    """Return {key: {language: text}} of all tables; a missing text is empty."""
     terms, first_places, faults = {}, {}, []
     for name, key_form in TABLES.items():
         path = directory / name
