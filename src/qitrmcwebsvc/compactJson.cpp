@@ -9,11 +9,12 @@ namespace {
 
 using Length = rapidjson::SizeType;
 
-// The JSON library makes room for six bytes of each byte of a text and two quotes, and reckons that
-// in 32 bits.
+// The JSON library reserves six bytes for each byte of a text plus two for the quotes, and computes
+// that size in 32 bits.
 constexpr Length longestText = (std::numeric_limits<Length>::max() - 2) / 6;
 
-// Refuses what the JSON library cannot write.
+// Handles the values that the JSON library cannot write: prints an infinity or NaN as null, and
+// throws std::bad_alloc for a text that is too long.
 class GuardedWriter : public JsonWriter {
   public:
     using JsonWriter::JsonWriter;

@@ -6,7 +6,7 @@
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-// An exponent with more digits than this, leading zeros apart, is lowered.
+// An exponent with more digits than this, not counting leading zeros, is reduced.
 constexpr std::size_t safeDigits = 9;
 constexpr std::size_t countableDigits = 200'000'000;
 
@@ -14,7 +14,7 @@ bool isDigit(char c) {
     return c >= '0' && c <= '9';
 }
 
-// Where the digits of an exponent part such as "e-0123" stand, from the first that is not zero.
+// The positions of the digits of an exponent such as "e-0123", without leading zeros.
 struct ExponentDigits {
     std::size_t begin = 0;
     std::size_t end = 0;
@@ -34,7 +34,7 @@ ExponentDigits negativeExponentAt(const char* text) {
     return digits;
 }
 
-// Every exponent has its minus sign, and few texts hold many of those.
+// A fast check: every exponent in question has a minus sign, which is rare in requests.
 bool mayHoldLongExponent(const char* text) {
     for (const char* minus = text; (minus = std::strchr(minus, '-')) != nullptr; ++minus)
         if (minus != text && negativeExponentAt(minus - 1).tooMany())
@@ -42,7 +42,7 @@ bool mayHoldLongExponent(const char* text) {
     return false;
 }
 
-// The position behind the string whose opening quote is at `position`.
+// The position after the string whose opening quote is at `position`.
 std::size_t behindString(const std::string& text, std::size_t position) {
     for (++position; position < text.size() && text[position] != '"'; ++position)
         if (text[position] == '\\')

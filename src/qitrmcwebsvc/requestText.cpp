@@ -16,9 +16,9 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-// The nearest double to the literal at `text`, which `approximation` is close to. The reader's own
-// exact conversion is no choice: a long literal with small digits first makes it read outside its
-// tables, and for some others its result is far off.
+// The nearest double to the literal at `text`. `approximation` is a value close to it. The reader's
+// own exact conversion cannot be used: for long literals that begin with small digits it reads
+// outside its tables, and for some others its result is far off.
 double nearestDouble(const char* text, const char* textEnd, double approximation) {
     double value = 0.0;
     const std::errc failure = std::from_chars(text, textEnd, value).ec;
@@ -28,22 +28,22 @@ double nearestDouble(const char* text, const char* textEnd, double approximation
     return std::copysign(tooBig ? std::numeric_limits<double>::infinity() : 0.0, approximation);
 }
 
-// Stands between the reader and the document: refuses what the reader lets through although the
-// rest of the service, or a response that quotes the request, could not carry it.
+// Receives the values that the reader parses and adds them to the document. It rejects values that
+// the reader accepts but the rest of the service cannot process or print.
 class GuardedDocument {
   public:
     using Ch = JsonDocument::Ch;
     using SizeType = rapidjson::SizeType;
 
-    // `read` is what the reader reads, up to `end`.
+    // `read` is the stream of the reader; its text ends at `end`.
     GuardedDocument(JsonDocument& guarded, const rapidjson::StringStream& read, const char* end)
         : document(guarded), stream(read), textEnd(end) {}
 
-    // The reader's own check misses some literals that are too big, such as 10e308.
+    // The reader itself does not detect all literals that are too big, for example 10e308.
     bool numberTooBig() const { return sawInfinity; }
 
     bool Double(double approximation) {
-        // The reader moves its stream on behind a literal when the literal is accepted.
+        // The reader advances its stream only after this function, so the literal begins there.
         const double value = nearestDouble(stream.src_, textEnd, approximation);
         sawInfinity = std::isinf(value);
         return !sawInfinity && document.Double(value);

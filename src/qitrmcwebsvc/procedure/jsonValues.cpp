@@ -13,14 +13,14 @@ constexpr rapidjson::SizeType largestSize = std::numeric_limits<rapidjson::SizeT
 }  // namespace
 
 JsonValue textValue(std::string_view text, JsonPool& pool) {
-    // The JSON library counts in 32 bits, the NUL behind a text included.
+    // The JSON library stores sizes in 32 bits, including the NUL after a text.
     if (text.size() >= largestSize)
         throw std::bad_alloc();
     return JsonValue(text.data(), static_cast<rapidjson::SizeType>(text.size()), pool);
 }
 
 void reserveElements(JsonValue& array, std::size_t count, JsonPool& pool) {
-    // The JSON library multiplies without a look at the result.
+    // The JSON library does not check this multiplication for overflow.
     if (count > largestSize || count > PTRDIFF_MAX / sizeof(JsonValue))
         throw std::bad_alloc();
     array.Reserve(static_cast<rapidjson::SizeType>(count), pool);
