@@ -1,9 +1,9 @@
-// A driver that costs nothing, linked in place of the real one so that what is measured is the
-// service. Its answers are constant and lie in constant memory wherever the interface allows it.
+// A driver whose functions do almost nothing, linked in place of the real one so that only the
+// service is measured. It returns constants, in constant memory where the interface allows it.
 //
 // Its names: devices Mod1 to Mod18, channels Mod1/ch0 to Mod1/ch7, the NVMEM area Mod1/user, and
 // property lists as long as those of a real system. Every property is a Double of resources, or an
-// array of them as long as the resources are many. Each session opened gets the next handle.
+// array with one Double for each resource. Each session opened gets the next handle.
 
 #include <qitrmcapi.h>
 
@@ -87,7 +87,7 @@ constexpr List lists[] = {
     list("Dev.NVMEM.Areas", areas),
 };
 
-// An unknown list is empty. The texts are lent for good: nobody writes to them.
+// An unknown list is empty. The texts are constants, which the caller does not modify.
 void lendList(const char* name, char*** array, std::uint32_t* count) {
     const auto found = std::find_if(std::begin(lists), std::end(lists), [&](const List& candidate) {
         return std::strcmp(candidate.name, name) == 0;
@@ -110,7 +110,7 @@ std::atomic<Session> lastSession{0};
 
 extern "C" {
 
-// ---- What is lent -------------------------------------------------------------------------------
+// ---- Freeing ------------------------------------------------------------------------------------
 
 void nQITRMCAPI100_freeString(char*) {}
 void nQITRMCAPI100_freeStringArray(char**, std::uint32_t) {}

@@ -4,10 +4,10 @@
 
 #include "qitrmcwebsvc/RequestHandler.h"
 
-// The service on the free driver.
+// The service with the driver of FreeDriver.cpp.
 class Service {
   public:
-    // A request of a method; `params` is the inside of its params object.
+    // A request of a method; `params` is the text between the braces of its params object.
     static std::string request(const std::string& method, const std::string& params);
 
     // Opens a session and returns its id. `devices` may be empty.
@@ -19,5 +19,5 @@ class Service {
     nQITRMCWEBSVC100::RequestHandler handler;
 };
 
-// Whether a response reports success, in all its elements.
+// Whether a response and all its elements report success.
 bool isSuccess(const std::string& response);

@@ -1,7 +1,7 @@
-// The yardstick of the whole service: an HTTP server of the same library and with the same threads
-// as the development host, which answers every POST with one fixed text.
+// The reference for the whole service: an HTTP server with the same library and threads as the
+// development host, which responds to every POST with one fixed text.
 //
-// Usage: qitrmc-bench-bare-server TEXT. Prints the line that the host prints, and serves until its
+// Usage: qitrmc-bench-bare-server TEXT. Prints the same line as the host, and runs until its
 // standard input ends.
 
 #include <microhttpd.h>

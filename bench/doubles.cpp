@@ -1,5 +1,5 @@
-// A literal becomes the nearest double: what that costs beside the JSON library's own conversion,
-// which is one unit off for about a third of the long ones.
+// Measures the conversion of a literal to the nearest double, and for comparison the JSON library's
+// own conversion, which is off by one unit for about a third of the long literals.
 
 #include <benchmark/benchmark.h>
 

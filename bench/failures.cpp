@@ -1,7 +1,7 @@
-// What it costs to put a failure into words: the translator as it is, and beside it the same one as
-// plainly as it could be built, which compiles every script for each failure. Both take the whole
-// road of describeStatus. "peakBytes" is the most memory that one of them holds at once,
-// "keptBytes" what the process keeps for all of them.
+// Measures the production of the text of a failure: with the translator of the service, and for
+// comparison with LuaRuntime::plain, which compiles every script for each failure. Both are called
+// through describeStatus. "peakBytes" is the maximum memory in use during one call, "keptBytes" the
+// memory that the process keeps afterwards.
 
 #include <benchmark/benchmark.h>
 #include <malloc.h>
@@ -35,8 +35,8 @@ void account(std::int64_t change) {
 
 }  // namespace
 
-// In place of the translators' own door to memory. Counts as cheaply as it can be done, for the one
-// thread of the benchmarks, since that falls on the many requests of the plain way.
+// Replaces the allocation function of the translation layers. Counts without a lock, for the single
+// thread of the benchmarks, since the cost of counting is added to each of the many allocations.
 void* qihtl_realloc(void* block, std::size_t size) {
     const auto oldSize = static_cast<std::int64_t>(::malloc_usable_size(block));
     if (size == 0) {

@@ -1,5 +1,5 @@
-// Requests that grow in one respect: what each part of them costs should not depend on how many
-// there are. The name of a benchmark says what is counted, its argument how many.
+// Measures requests that grow in one respect. The time for each part should not depend on the
+// number of parts. The name of a benchmark says what is counted, its argument is the count.
 
 #include <benchmark/benchmark.h>
 
@@ -27,7 +27,7 @@ std::string text(const std::string& part, Count count) {
 }
 
 // ---- Requests -----------------------------------------------------------------------------------
-// Each makes the text of a request on `session`, a member with the id of an open session.
+// Each function returns a request; `session` is its member with the id of an open session.
 
 using MakeRequest = std::string (*)(const std::string& session, Count count);
 
@@ -74,7 +74,7 @@ std::string nvmemBytesWritten(const std::string& session, Count count) {
         session + R"(,"nvmem_area":"Mod1/user","address":0,"data":)" + array("200", count));
 }
 
-// A request that does next to nothing, with further members.
+// A request with little work and with further members.
 std::string closing(const std::string& session, const std::string& members) {
     return R"({"jsonrpc":"2.0","id":1,"method":"abortSession","params":{)" + session + "}," +
            members + "}";

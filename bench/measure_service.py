@@ -1,8 +1,8 @@
 #!/usr/bin/python3
 """Measures the whole service over HTTP: measure_service.py BUILD_DIR RESULTS.json
 
-Requests in a second with wrk, beside a server of the same HTTP library that answers with a fixed
-text; the memory of the process; the time to start. All in one run, in turns, on loopback.
+Requests per second with wrk, compared with a server of the same HTTP library that responds with a
+fixed text; the memory of the process; the time to start. All in one run, alternating, on loopback.
 """
 
 import contextlib
@@ -26,7 +26,7 @@ MIXED_REQUESTS = 10000
 
 
 class Server:
-    """A process that prints where it listens, on a port of its own choice."""
+    """A process that listens on a free port and prints its address."""
 
     def __init__(self, *command):
         begin = time.perf_counter()
@@ -75,7 +75,7 @@ def get_property(session, device="Mod1"):
 
 
 def requests_per_second(server, script, body=""):
-    """One round of wrk. A request that is not answered with HTTP 200 ends the measurement."""
+    """One run of wrk. A response other than HTTP 200 ends the measurement."""
     report = subprocess.run(
         ["wrk", "-t2", f"-c{CONNECTIONS}", f"-d{SECONDS}s", "-s", HERE / script, server.url],
         env={**os.environ, "BODY": body}, check=True, capture_output=True, text=True).stdout

@@ -1,10 +1,10 @@
 #!/usr/bin/python3
-"""Prints the tables of a benchmark run and, as its last lines, the ratios that matter:
+"""Prints the tables of a benchmark run and, as its last lines, the important ratios:
 
     report.py BENCHMARKS.json SERVICE.json
 
-Either file may be missing, as after a run with a filter. Times are medians of processor time, which
-other work on the machine disturbs least.
+Either file may be missing, for example after a run with a filter. Times are medians of processor
+time, which is least affected by other work on the machine.
 """
 
 import json
@@ -40,7 +40,7 @@ class Benchmarks:
 
 
 def print_table(title, rows):
-    """Rows of texts; the first one names the columns, all but the first of which are numbers."""
+    """Print rows of texts, the first with the column names. Columns after the first are numbers."""
     widths = [max(map(len, column)) for column in zip(*rows)]
     print(f"\n{title}")
     for row in rows:

@@ -1,5 +1,5 @@
-// Requests while many sessions are open, spread over all of them: what a request costs should not
-// depend on how many there are. The argument is the number of open sessions.
+// Measures requests that are spread over many open sessions. The time of a request should not
+// depend on the number of sessions, which is the argument.
 
 #include <benchmark/benchmark.h>
 
@@ -10,7 +10,7 @@
 
 namespace {
 
-// Many open sessions, asked one after the other in an order that no cache could like.
+// Many open sessions, which are used in an order that defeats caches.
 class Sessions {
   public:
     Sessions(std::size_t count, const char* devices) {

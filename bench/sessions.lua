@@ -1,4 +1,4 @@
--- For wrk: opens sessions and closes them again. The connections of a thread share what is open.
+-- For wrk: opens and closes sessions. The connections of a thread share the open sessions.
 
 local open = '{"jsonrpc":"2.0","id":1,"method":"initializeSession"}'
 local close = '{"jsonrpc":"2.0","id":1,"method":"closeSession","params":{"session_id":"%s"}}'

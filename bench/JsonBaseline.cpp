@@ -1,4 +1,4 @@
-#include "Floor.h"
+#include "JsonBaseline.h"
 
 #include <rapidjson/document.h>
 #include <rapidjson/schema.h>
@@ -18,7 +18,7 @@ void parse(rapidjson::Document& document, const char* text) {
 
 }  // namespace
 
-struct Floor::Documents {
+struct JsonBaseline::Documents {
     Documents(const char* schemaFile, const std::string& responseText) {
         parse(schema, embeddedText(schemaFile));
         parse(definitions, embeddedText("definitions.json"));
@@ -38,12 +38,13 @@ struct Floor::Documents {
     std::unique_ptr<rapidjson::SchemaDocument> compiled;
 };
 
-Floor::Floor(const char* schemaFile, const std::string& request, const std::string& response)
+JsonBaseline::JsonBaseline(const char* schemaFile, const std::string& request,
+                           const std::string& response)
     : documents(std::make_unique<Documents>(schemaFile, response)), request(request) {}
 
-Floor::~Floor() = default;
+JsonBaseline::~JsonBaseline() = default;
 
-std::size_t Floor::run() const {
+std::size_t JsonBaseline::run() const {
     rapidjson::Document document;
     document.Parse(request.c_str());
     bool valid = !document.HasParseError();

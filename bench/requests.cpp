@@ -1,12 +1,12 @@
-// Requests on the driver that costs nothing, each beside its floor: what the JSON library alone
-// takes to parse, validate and print the same texts.
+// Measures requests with a driver whose functions do almost nothing ("road"), and as the lower
+// bound the JSON library alone, which parses, validates and prints the same texts ("floor").
 
 #include <benchmark/benchmark.h>
 
 #include <memory>
 #include <string>
 
-#include "Floor.h"
+#include "JsonBaseline.h"
 #include "Service.h"
 
 namespace {
@@ -15,8 +15,8 @@ struct Case {
     const char* name;
     const char* method;
     const char* schemaFile;
-    const char* params;  // what follows the session id
-    int elements;        // 0: a single request, else the size of a batch
+    const char* params;  // the params after the session id
+    int elements;        // the size of a batch, 0 for a single request
 };
 
 constexpr const char* getPropertySchema = "procedure_get_property.json";
@@ -44,7 +44,7 @@ std::string textOf(const Case& measured, const std::string& session) {
     return batch + "]";
 }
 
-void runRoad(benchmark::State& state, const Case& measured) {
+void runService(benchmark::State& state, const Case& measured) {
     Service service;
     const std::string text = textOf(measured, service.openSession("Mod1"));
     if (!isSuccess(service.answer(text)))
@@ -53,23 +53,23 @@ void runRoad(benchmark::State& state, const Case& measured) {
         benchmark::DoNotOptimize(service.answer(text));
 }
 
-void runFloor(benchmark::State& state, const Case& measured) {
+void runBaseline(benchmark::State& state, const Case& measured) {
     Service service;
     const std::string text = textOf(measured, service.openSession("Mod1"));
     const std::string response = service.answer(text);
-    const Floor floor(measured.schemaFile, text, response);
-    // Numbers may be printed in another form than they were sent in, but not here.
-    if (floor.run() != response.size())
+    const JsonBaseline baseline(measured.schemaFile, text, response);
+    // The baseline prints the numbers of these responses in the same form as the service.
+    if (baseline.run() != response.size())
         state.SkipWithError("the floor does not print the response");
     for (auto _ : state)
-        benchmark::DoNotOptimize(floor.run());
+        benchmark::DoNotOptimize(baseline.run());
 }
 
 const bool registered = [] {
     for (const Case& measured : cases) {
         const std::string name = std::string("/") + measured.name;
-        benchmark::RegisterBenchmark(("road" + name).c_str(), runRoad, measured);
-        benchmark::RegisterBenchmark(("floor" + name).c_str(), runFloor, measured);
+        benchmark::RegisterBenchmark(("road" + name).c_str(), runService, measured);
+        benchmark::RegisterBenchmark(("floor" + name).c_str(), runBaseline, measured);
     }
     return true;
 }();
