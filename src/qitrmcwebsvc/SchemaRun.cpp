@@ -9,7 +9,7 @@ namespace {
 // schemas do not allow an object or array as an element, and treat it like a null. For each value
 // the validator visits all open containers, so passing it a null for each container at this depth
 // keeps the cost of deeply nested requests linear.
-constexpr int depthShownAsNull = 4;
+constexpr int depthPassedAsNull = 4;
 
 // The maximum number of bytes after the first one of a UTF-8 sequence.
 constexpr std::size_t mostFollowingBytes = 3;
@@ -46,7 +46,7 @@ std::string uriFragment(const JsonPointer& pointer) {
 }
 
 // Whether the text may end in a truncated UTF-8 sequence.
-bool mayBreakOff(const JsonValue& text) {
+bool mayEndInTruncatedUtf8(const JsonValue& text) {
     const char* const end = text.GetString() + text.GetStringLength();
     const auto inspected = std::min<std::size_t>(mostFollowingBytes, text.GetStringLength());
     return std::any_of(end - inspected, end,
@@ -64,20 +64,20 @@ bool SchemaRun::accepts(const JsonValue& request) {
 
 bool SchemaRun::visit(const JsonValue& value, int depth) {
     const bool isContainer = value.IsObject() || value.IsArray();
-    if (isContainer && depth >= depthShownAsNull)
+    if (isContainer && depth >= depthPassedAsNull)
         return validator.Null();
     if (value.IsObject())
         return visitObject(value, depth);
     if (value.IsArray())
         return visitArray(value, depth);
-    if (value.IsString() && mayBreakOff(value))
-        return visitBrokenOff(value);
+    if (value.IsString() && mayEndInTruncatedUtf8(value))
+        return visitTruncatedText(value);
     return value.Accept(validator);
 }
 
 // For a truncated UTF-8 sequence the pattern engine reads past the end of the text, so the text is
 // copied with NULs after it.
-bool SchemaRun::visitBrokenOff(const JsonValue& text) {
+bool SchemaRun::visitTruncatedText(const JsonValue& text) {
     std::string followed(text.GetString(), text.GetStringLength());
     followed.append(mostFollowingBytes, '\0');
     return validator.String(followed.data(), text.GetStringLength(), true);

@@ -35,7 +35,7 @@ class SchemaRun {
                                           rapidjson::BaseReaderHandler<JsonEncoding>, RunMemory>;
 
     bool visit(const JsonValue& value, int depth);
-    bool visitBrokenOff(const JsonValue& text);
+    bool visitTruncatedText(const JsonValue& text);
     bool visitObject(const JsonValue& object, int depth);
     bool visitArray(const JsonValue& array, int depth);
 

@@ -13,12 +13,12 @@ namespace {
 
 // The codes of JSON-RPC itself, which are sent without "data". Every other failure is sent as a
 // server error, with its own code and text in "data".
-constexpr std::array<std::int32_t, 6> standingCodes = {
+constexpr std::array<std::int32_t, 6> jsonRpcCodes = {
     qierr::codes::parseError,    qierr::codes::rpcInternalError, qierr::codes::invalidParams,
     qierr::codes::unknownMethod, qierr::codes::invalidRequest,   qierr::codes::serverError};
 
 bool isStandingCode(std::int32_t code) {
-    return std::find(standingCodes.begin(), standingCodes.end(), code) != standingCodes.end();
+    return std::find(jsonRpcCodes.begin(), jsonRpcCodes.end(), code) != jsonRpcCodes.end();
 }
 
 std::string describeServerError() {

@@ -17,7 +17,7 @@ namespace {
 using namespace explain;
 
 // The message for a code that no explanation file has.
-std::string withoutText(std::int32_t code, Translator& translator) {
+std::string messageWithoutText(std::int32_t code, Translator& translator) {
     const std::string number = std::to_string(code);
     if (const Entry* const entry = findCode(code))
         return "The explanation files have no text for " + number + " (" +
@@ -29,10 +29,10 @@ std::string withoutText(std::int32_t code, Translator& translator) {
 }
 
 // The message in addition to a translation or in place of it; empty on success.
-std::string doubtAbout(const Question& question, const Translation& translation,
-                       Translator& translator) {
+std::string warningAbout(const Question& question, const Translation& translation,
+                         Translator& translator) {
     if (translator.explanation(question.code).empty())
-        return withoutText(question.code, translator);
+        return messageWithoutText(question.code, translator);
     if (translation.failure != 0)
         return "The details cannot be put into words (code " + std::to_string(translation.failure) +
                "). Give the code alone to see what it means.";
@@ -47,12 +47,12 @@ void explainStatus(const Options& options, Translator& translator) {
     const Question question = readQuestion(options, translator);
     const Translation translation =
         translator.translate(question, options.formatted, options.debug);
-    const std::string doubt = doubtAbout(question, translation, translator);
+    const std::string warning = warningAbout(question, translation, translator);
     if (translation.failure != 0)
-        throw Failure(doubt);
+        throw Failure(warning);
     std::printf("%s\n", translation.text.c_str());
-    if (!doubt.empty())
-        complain(doubt);
+    if (!warning.empty())
+        complain(warning);
 }
 
 void run(const Options& options) {
