@@ -58,14 +58,14 @@ std::vector<std::string> statusTexts() {
     };
 }
 
-// A request and the one driver call of it that is to fail.
+// A request, and the driver call within it that fails.
 struct Target {
     const char* name;
     bool isReserved;  // the device is reserved by a session that is opened before
     const char* method;
     const char* params;  // null for those of the session that was opened before
     const char* driverCall;
-    // What becomes of the request when the call fails; 0 for the code of the failure.
+    // The expected outcome of the request when the call fails; 0 for the code of the failure.
     std::int32_t outcome;
 };
 
@@ -87,7 +87,7 @@ const Target targets[] = {
     {"CloseByForce", true, open, byForce, "closeSession", 0},
     {"Close", true, "closeSession", nullptr, "closeSession", 0},
     {"Abort", true, "abortSession", nullptr, "abortSession", 0},
-    // A session that cannot tell what it holds counts as holding nothing.
+    // A session whose reservations cannot be read counts as holding none.
     {"FindReservedByForce", true, open, byForce, "getSessionPropertyStringArray", -250811},
     {"FindReservedForReport", true, open, onDevice, "getSessionPropertyStringArray", -250811},
 };
@@ -112,7 +112,7 @@ class DriverFaultTest : public ServiceTest, public testing::WithParamInterface<T
             << testing::PrintToString(outcomes) << " in place of " << expected;
     }
 
-    // The service after the driver works as it should again.
+    // The service once the driver works again.
     void expectSoundServiceOnSoundDriver() {
         sessions.answerCalls();
         sessions.warn(0, "");
@@ -120,7 +120,7 @@ class DriverFaultTest : public ServiceTest, public testing::WithParamInterface<T
     }
 };
 
-TEST_P(DriverFaultTest, ARefusalOfAnyKindIsAnswered) {
+TEST_P(DriverFaultTest, EveryKindOfDriverErrorIsReportedToTheClient) {
     for (const std::string& text : statusTexts()) {
         for (const std::int32_t code :
              {-1, -250811, -250955, -52006, -32603, -32602, -32001, -32000, lowest}) {
@@ -134,7 +134,7 @@ TEST_P(DriverFaultTest, ARefusalOfAnyKindIsAnswered) {
     }
 }
 
-TEST_P(DriverFaultTest, AWarningOfAnyKindIsDropped) {
+TEST_P(DriverFaultTest, EveryKindOfDriverWarningIsDropped) {
     const bool isReport = std::string(GetParam().name) == "OpenOnReservedDevices" ||
                           std::string(GetParam().name) == "FindReservedForReport";
     for (const std::string& text : statusTexts()) {
@@ -154,7 +154,7 @@ INSTANTIATE_TEST_SUITE_P(Faults, DriverFaultTest, testing::ValuesIn(targets),
 
 class OddDriverTest : public ServiceTest {
   protected:
-    // The outcomes of requests for a device that is reserved by a session which answers so.
+    // The outcomes of requests for a device reserved by a session that gives this answer.
     void expectHeldBySessionThatTells(const RecordingDriver::Reply& reply) {
         for (const char* params : {onDevice, byForce}) {
             ASSERT_EQ(outcomesOfPost(call(open, onDevice)), Outcomes{0});
@@ -166,7 +166,7 @@ class OddDriverTest : public ServiceTest {
     }
 };
 
-TEST_F(OddDriverTest, AnArrayOfNothingHoldsNoDevice) {
+TEST_F(OddDriverTest, AnEmptyReservationListHoldsNoDevice) {
     RecordingDriver::Reply reply;
     expectHeldBySessionThatTells(reply);
     reply.countOfNoArray = 7;
@@ -177,14 +177,14 @@ TEST_F(OddDriverTest, AnArrayOfNothingHoldsNoDevice) {
     expectHeldBySessionThatTells(reply);
 }
 
-TEST_F(OddDriverTest, AnArrayThatIsLentWithAFailureIsGivenBack) {
+TEST_F(OddDriverTest, AnArrayReturnedWithAnErrorIsFreed) {
     RecordingDriver::Reply reply;
     reply.value = std::vector<std::string>{"A", "B"};
     reply.code = -1;
     expectHeldBySessionThatTells(reply);
 }
 
-TEST_F(OddDriverTest, ASessionOfHandle0IsNoneWhereThereAreResources) {
+TEST_F(OddDriverTest, SessionHandle0IsAnErrorForASessionWithResources) {
     for (const char* kind : {"devices", "physical_channels", "nvmem_areas"}) {
         for (const char* function :
              {"initializeSessionWithDevices", "initializeSessionWithPhysChans",
@@ -197,7 +197,7 @@ TEST_F(OddDriverTest, ASessionOfHandle0IsNoneWhereThereAreResources) {
     }
 }
 
-TEST_F(OddDriverTest, ASessionOfHandle0IsLikeAnyOtherWithoutResources) {
+TEST_F(OddDriverTest, SessionHandle0IsValidForASessionWithoutResources) {
     driver.give("initializeSessionWithoutResources", std::uint64_t{0});
     driver.give("closeSession(0)", {});
     EXPECT_EQ(outcomesOfPost(call(open, "{}")), Outcomes{0});
@@ -207,7 +207,7 @@ TEST_F(OddDriverTest, ASessionOfHandle0IsLikeAnyOtherWithoutResources) {
     expectSoundService();
 }
 
-TEST_F(OddDriverTest, AHandleThatIsIssuedTwiceIsOneSession) {
+TEST_F(OddDriverTest, AHandleIssuedTwiceIsOneSession) {
     driver.give("initializeSessionWithoutResources", std::uint64_t{4294967295});
     driver.give("closeSession(4294967295)", {});
     EXPECT_EQ(outcomesOfPost(call(open, "{}")), Outcomes{0});
@@ -220,7 +220,7 @@ TEST_F(OddDriverTest, AHandleThatIsIssuedTwiceIsOneSession) {
     expectSoundService();
 }
 
-TEST_F(OddDriverTest, AnEnumerationOfAnyValueIsPassedOn) {
+TEST_F(OddDriverTest, UnknownEnumerationValuesArePassedOn) {
     for (const std::int32_t value : {lowest, -1, 0, 77, highest}) {
         driver.give("translateStaticEnumStringToValue", std::int64_t{value});
         driver.give("translateStaticEnumStringToValue(\"ReservationAccess\", \"ReadOnly\")",

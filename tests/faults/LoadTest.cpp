@@ -21,7 +21,7 @@ void onAllThreads(const std::function<void(int thread)>& work) {
         thread.join();
 }
 
-// The session in a text that says of one that it was opened.
+// The handle of the session in a response to an opening request.
 Handle openedIn(const std::string& text) {
     const std::string start = "\"session_id\":\"_session";
     const std::size_t at = text.find(start);
@@ -93,7 +93,7 @@ class Client {
         EXPECT_EQ(send(requestFor("closeSession", anyOpen())), Outcomes{orUnknown()});
         open.erase(anyOpen());
     }
-    // What follows a close of a session in a batch finds it closed and does not reach the driver.
+    // In a batch, requests after the one that closes the session fail and do not reach the driver.
     void closeInBatch() {
         const Handle session = anyOpen();
         const std::string body = "[" + requestFor("abortSession", session) + "," +
@@ -129,7 +129,7 @@ class Client {
     std::set<Handle> open;
 };
 
-TEST_F(LoadTest, EveryClientFindsItsOwnSessionsAndNoOther) {
+TEST_F(LoadTest, EveryClientSeesOnlyItsOwnSessions) {
     std::vector<std::set<Handle>> known(threadCount);
     onAllThreads([&](int thread) {
         Client client(thread, [&](const std::string& body, std::string& response) {
@@ -166,7 +166,7 @@ TEST_F(LoadTest, ASessionIsClosedOnceHoweverManyTry) {
     EXPECT_EQ(sessions.open(), std::vector<Handle>{});
 }
 
-TEST_F(LoadTest, ADeviceThatAllTakeByForceEndsWithOne) {
+TEST_F(LoadTest, ADeviceThatAllClientsForceEndsUpWithOneSession) {
     onAllThreads([&](int) {
         for (int i = 0; i < 50; ++i)
             openSession(R"({"devices":"contested","force_reserve":true})");
@@ -175,7 +175,7 @@ TEST_F(LoadTest, ADeviceThatAllTakeByForceEndsWithOne) {
     EXPECT_EQ(sessions.open().size(), 1u);
 }
 
-TEST_F(LoadTest, BatchesDoNotMix) {
+TEST_F(LoadTest, ConcurrentBatchesDoNotInterleave) {
     constexpr int elements = 5;
     std::vector<Handle> handles(threadCount);
     std::generate(handles.begin(), handles.end(), [&] { return openSession(); });

@@ -9,7 +9,7 @@
 
 namespace {
 
-// A request whose memory fails. In bodies "@" stands for the latest session that was opened.
+// A request during which memory fails. In bodies "@" stands for the session opened last.
 struct Scenario {
     const char* name;
     std::vector<std::string> before;
@@ -40,7 +40,7 @@ const std::string openForced = call(
 const std::string openChannels = call(
     "initializeSession", R"({"physical_channels":["A/aChannelWithALongName0:30","B/ch1,B/ch2"]})");
 
-// A method on a session without resources, with more members of params.
+// A method on a session without resources, with further members of params.
 Scenario onSession(const char* method, const std::string& members) {
     const std::string separator = members.empty() ? "" : ",";
     return {method,
@@ -136,7 +136,7 @@ class RequestAllocationTest : public ServiceTest, public testing::WithParamInter
         return at == body.npos ? body : body.replace(at, 1, std::to_string(sessions.opened()));
     }
 
-    // Runs the request with one fault. Returns whether it struck.
+    // Runs the request with one fault. Returns whether the fault was reached.
     bool postWithFault(const std::string& body, int successes) {
         ws_Request request;
         request.body = body;
@@ -154,8 +154,8 @@ class RequestAllocationTest : public ServiceTest, public testing::WithParamInter
         return struck;
     }
 
-    // A request under a fault ends as without it, or for want of memory. Of a batch the latter may
-    // hold for one element, and then those behind it are skipped, or for the whole.
+    // A request under a fault succeeds as without it or fails with out of memory. In a batch, one
+    // element may fail so, and then the elements after it are skipped, or the whole batch may.
     bool isExcused(const Outcomes& outcomes) const {
         if (outcomes == Outcomes{httpServerError} || outcomes == Outcomes{outOfMemory} ||
             lacksWords(outcomes))
@@ -173,10 +173,10 @@ class RequestAllocationTest : public ServiceTest, public testing::WithParamInter
     const Scenario scenario = std::get<Scenario>(GetParam());
 };
 
-TEST_P(RequestAllocationTest, IsAnsweredWholeOrRefusedAndLeavesASoundService) {
+TEST_P(RequestAllocationTest, SucceedsOrFailsAsAWholeAndLeavesTheServiceUsable) {
     constexpr int limit = 5000;
     int successes = 0;
-    // Has the translator compile its scripts, which it does once in a process.
+    // Makes the translator compile its scripts, which happens once per process.
     outcomesOfPost("{}");
     for (bool struck = true; struck && successes < limit && !HasFailure(); ++successes) {
         SCOPED_TRACE("allocation " + std::to_string(successes + 1));

@@ -16,15 +16,15 @@ void qitrmcFinalize();
 void qitrmcRun(ws_Entry* entry, ws_Request* request);
 }
 
-// The base of tests that put faults before the whole plug-in: it is enabled and runs on a driver
-// that keeps sessions. In the end no session may be left in the driver, and no call may ever have
-// been made for one that was not open.
+// The base of tests that inject faults into the whole plug-in: the plug-in is enabled and runs on
+// a driver that keeps sessions. At the end no session may be left in the driver, and no call may
+// have been made for a session that was not open.
 class ServiceTest : public DriverTest {
   protected:
     using Lines = std::vector<std::string>;
     using Outcomes = std::vector<std::int32_t>;
 
-    // Stands for the code of HTTP among outcomes.
+    // Stands for an HTTP error status among the outcomes.
     static constexpr std::int32_t httpServerError = 500;
     static constexpr std::int32_t outOfMemory = -250801;
     static constexpr std::int32_t skipped = -32001;
@@ -44,8 +44,8 @@ class ServiceTest : public DriverTest {
         DriverTest::TearDown();
     }
 
-    // Whether a request was answered with the failure to put what befell it into words: for want of
-    // memory, because of a fault in a status, or because nobody knows the words.
+    // Whether a request failed because its failure could not be described: because memory ran out,
+    // because of a fault in a status, or because there is no text for the code.
     static bool lacksWords(const Outcomes& outcomes) {
         for (const std::int32_t code : {-52000, -52003, -52005, -52006})
             if (QITRMC_WORDS_MAY_FAIL && outcomes == Outcomes{code})
@@ -68,7 +68,7 @@ class ServiceTest : public DriverTest {
         return request.done;
     }
 
-    // How a body was answered, once it is sure that the answer is either whole or none.
+    // How a body was answered, once it is certain that the response is either complete or absent.
     static Outcomes outcomesOf(const Lines& done) {
         if (done == Lines{"code 500"})
             return {httpServerError};
@@ -83,8 +83,8 @@ class ServiceTest : public DriverTest {
     }
     Outcomes outcomesOfPost(const std::string& body) { return outcomesOf(post(body)); }
 
-    // Shows that the service is as good as before: the access lock is free for either kind of
-    // request, nothing is lent, and each session of the driver can be closed by its id.
+    // Checks that the service works as before: the access lock is free for either kind of request,
+    // all that the driver lent is freed, and each session of the driver can be closed by its id.
     void expectSoundService() {
         EXPECT_EQ(driver.outstanding(), 0);
         EXPECT_EQ(outcomesOfPost("[" + call("initializeSession", "{}") + "]"), Outcomes{0});

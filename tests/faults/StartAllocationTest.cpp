@@ -18,11 +18,11 @@ class StartAllocationTest : public ServiceTest,
   protected:
     enum class Start { done, outOfMemory };
 
-    // Initialises with one fault. Returns how that ended if the fault struck.
+    // Initialises with one fault. Returns how that ended if the fault was reached.
     std::optional<Start> startWithFault(int successes) {
 #if defined(__SANITIZE_ADDRESS__)
-        // The JSON library loses what it has compiled so far when the memory for the rest of a
-        // schema is missing. That can happen at the start only.
+        // The JSON library leaks what it has compiled so far when memory for the rest of a schema
+        // runs out. That can happen only at the start.
         __lsan::ScopedDisabler expected;
 #endif
         AllocationFault fault(successes, GetParam());
@@ -35,8 +35,8 @@ class StartAllocationTest : public ServiceTest,
         return fault.hasStruck() ? std::make_optional(start) : std::nullopt;
     }
 
-    // The next allocation to fail. The validators of all methods are built alike, so the later ones
-    // are tried at ever greater intervals.
+    // The next allocation to fail. The validators of all methods are built alike, so the later
+    // allocations are tried at increasing intervals.
     static int after(int successes) {
         return successes + 1 + successes / 50;
     }
@@ -44,7 +44,7 @@ class StartAllocationTest : public ServiceTest,
     const std::string open = call("initializeSession", "{}");
 };
 
-TEST_P(StartAllocationTest, EndsForWantOfMemoryAndCanBeRepeated) {
+TEST_P(StartAllocationTest, FailsWhenMemoryRunsOutAndCanBeRepeated) {
     int tried = 0;
     for (int successes = 0;; successes = after(successes)) {
         SCOPED_TRACE("allocation " + std::to_string(successes + 1));
@@ -53,8 +53,8 @@ TEST_P(StartAllocationTest, EndsForWantOfMemoryAndCanBeRepeated) {
         if (!start)
             break;
         ++tried;
-        // Memory that is missing for the configuration leaves the service switched off; without a
-        // handler it can say nothing, but must not fall over.
+        // When memory for the configuration runs out, the service stays disabled. Without a handler
+        // it cannot respond, but must not crash.
         if (*start == Start::outOfMemory)
             EXPECT_EQ(outcomesOfPost(open), Outcomes{httpServerError});
         else
@@ -67,7 +67,7 @@ TEST_P(StartAllocationTest, EndsForWantOfMemoryAndCanBeRepeated) {
     RecordProperty("allocations", tried);
 }
 
-TEST_P(StartAllocationTest, IsSwitchedOnBeforeItHasAHandler) {
+TEST_P(StartAllocationTest, IsEnabledBeforeItHasAHandler) {
     const std::string configuration = "/etc/qinstal/share/qitrmc.ini";
     qitrmcFinalize();
     root.write(configuration, "[WebService]\nEnable=0\n");
@@ -81,7 +81,7 @@ TEST_P(StartAllocationTest, IsSwitchedOnBeforeItHasAHandler) {
     expectSoundService();
 }
 
-TEST_P(StartAllocationTest, LeavesTheRunningHandlerInPlaceWhenThereIsNoMemoryForANewOne) {
+TEST_P(StartAllocationTest, KeepsTheRunningHandlerWhenThereIsNoMemoryForANewOne) {
     EXPECT_EQ(outcomesOfPost(open), Outcomes{0});
     // The configuration takes fewer allocations than this, the handler many more.
     ASSERT_EQ(startWithFault(200), Start::outOfMemory);

@@ -45,7 +45,7 @@ TEST_P(CorpusTest, PassesItsHarness) {
     const std::string harness = GetParam().substr(0, GetParam().find('/'));
     ASSERT_EQ(harnesses.count(harness), 1u) << "no such harness: " << harness;
     const std::string content = contentOf(GetParam());
-    // Twice, as the first must leave nothing behind.
+    // Twice, because the first run must leave no state behind.
     for (int run = 0; run < 2; ++run)
         EXPECT_NO_THROW(harnesses.at(harness)(content));
 }

@@ -13,7 +13,7 @@ namespace {
 
 using nQITRMCWEBSVC100::JsonDocument;
 
-// A text in memory of exactly its size, so that a step beyond its NUL is noticed.
+// A text in a block of exactly its size, so that a sanitizer notices a read past its NUL.
 std::unique_ptr<char[]> exactCopy(std::string_view text) {
     auto copy = std::make_unique<char[]>(text.size() + 1);
     std::copy(text.begin(), text.end(), copy.get());
@@ -36,7 +36,7 @@ void readString(const jsonz_value& value) {
     jsonz_equals(value.text, value.length, output.get());
 }
 
-// Reads the text in every way. Returns whether it is accepted whole.
+// Reads the text with every function. Returns whether the whole text is accepted.
 void read(const char* text) {
     jsonz_value value;
     const char* const end = jsonz_readValue(text, &value);

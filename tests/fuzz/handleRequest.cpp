@@ -18,7 +18,7 @@ class Service {
 
     std::string answer(const std::string& body) { return handler.handleRequest(body); }
 
-    // Ends what a request has begun, so that the next finds the service as it was.
+    // Closes the sessions that a request opened, so that the next one finds the service as it was.
     void closeAll() {
         for (const ModelledSessions::Handle session : sessions.open()) {
             const std::string id = std::to_string(session);

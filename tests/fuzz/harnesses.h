@@ -3,12 +3,12 @@
 #include <stdexcept>
 #include <string_view>
 
-// What hostile input is sent through: by the fuzzer without end, and by the tests from the files of
-// the corpus. A harness returns when all is well. It may keep what is expensive to make, but no
-// input may have an effect on the next.
+// The functions that receive hostile input, from the fuzzer and, in the tests, from the files of
+// the corpus. A harness returns when the input is handled correctly. It may keep what is expensive
+// to make, but no input may affect the next.
 namespace fuzz {
 
-// The product answered an input as it must not.
+// Thrown when the code under test handles an input wrongly.
 class Finding : public std::logic_error {
   public:
     using std::logic_error::logic_error;

@@ -23,7 +23,7 @@ ENVELOPE = ["jsonrpc", "id", "method", "params", "2.0", "_session1", "$Connected
 
 
 def documented(method) -> str:
-    """The request of the method's page, which a fresh service carries out in its first session."""
+    """The request on the method's page, which a fresh service accepts in its first session."""
     params = methods.request(method.name).params_in("_session1")
     return request_text(method, list(params.items()))
 
@@ -61,7 +61,7 @@ def write_chassis(folder: Path):
 
 
 def members_of(schema) -> set[str]:
-    """The names of all members that a JSON Schema tells of."""
+    """The names of all members that a JSON Schema describes."""
     if isinstance(schema, list):
         return set().union(*map(members_of, schema))
     if not isinstance(schema, dict):

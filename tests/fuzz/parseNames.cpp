@@ -10,7 +10,7 @@ namespace {
 using namespace nQITRMCSHAREDCMN100;
 using Names = std::vector<std::string>;
 
-// What `work` gives, or nothing when it refuses the names as it may.
+// The result of `work`, or nothing when it refuses the names, which is allowed.
 template <typename Work>
 auto unlessRefused(Work work) -> std::optional<decltype(work())> {
     try {
@@ -40,8 +40,8 @@ void fuzz::parseNames(std::string_view input) {
     require(names->size() > commasIn(text), "a part of the list is missing");
     require(names->size() <= std::max(maxNamesWithRanges, commasIn(text) + 1), "too many names");
 
-    // Names as they come out of a list never need to be refused on their own, and a list that is
-    // short enough to be read again means the same.
+    // Names that come out of a list never need to be refused on their own, and a compressed list
+    // that is short enough to be parsed again means the same.
     const std::optional<std::string> shorter =
         unlessRefused([&] { return compressNames(*names, kind); });
     require(shorter.has_value(), "a name of an expanded list was refused");

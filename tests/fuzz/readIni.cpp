@@ -9,7 +9,7 @@
 
 namespace {
 
-// A file without a place on a disk.
+// A file in memory.
 class MemoryFile {
   public:
     explicit MemoryFile(std::string_view content) : descriptor(::memfd_create("ini", 0)) {

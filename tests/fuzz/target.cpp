@@ -1,4 +1,4 @@
-// The entry of the fuzzer into the harness QITRMC_HARNESS. A finding ends the program.
+// The fuzzer's entry point into the harness QITRMC_HARNESS. A finding ends the program.
 
 #include <cstddef>
 #include <cstdint>

@@ -35,7 +35,7 @@ std::map<std::string, Checked, std::less<>> checkedSchemas() {
     return all;
 }
 
-// What holds of every request that is accepted, whatever the engine that checked it.
+// What holds for every accepted request, whichever engine checked it.
 void requireConformity(const JsonValue& params, const JsonValue& schema) {
     fuzz::require(params.IsObject(), "params of a wrong type were accepted");
     for (const auto& member : params.GetObject())

@@ -7,8 +7,8 @@
 #include <filesystem>
 #include <string>
 
-// Gives the process a locale with a decimal comma, made from the sources of the package `locales`
-// in a temporary folder, for as long as the object lives.
+// While the object exists, the process has a locale with a decimal comma, built in a temporary
+// folder from the sources of the package `locales`.
 class CommaLocale {
   public:
     CommaLocale() {
@@ -16,11 +16,11 @@ class CommaLocale {
         EXPECT_NE(nullptr, mkdtemp(folder.data()));
         const std::string command =
             "localedef --quiet -c -i de_DE -f UTF-8 '" + folder + "/de_DE.UTF-8'";
-        EXPECT_EQ(0, std::system(command.c_str()));
+        EXPECT_EQ(std::system(command.c_str()), 0);
         setenv("LOCPATH", folder.c_str(), 1);
         setenv("LC_ALL", "de_DE.UTF-8", 1);
         EXPECT_NE(nullptr, std::setlocale(LC_ALL, ""));
-        EXPECT_STREQ(",", std::localeconv()->decimal_point);
+        EXPECT_STREQ(std::localeconv()->decimal_point, ",");
     }
     CommaLocale(const CommaLocale&) = delete;
     CommaLocale& operator=(const CommaLocale&) = delete;

@@ -8,8 +8,8 @@
 
 #include "support/RecordingDriver.h"
 
-// The base of tests on the recording driver: starts from a driver that knows nothing and checks in
-// the end that everything that it lent came back.
+// The base of tests on the recording driver: starts from a driver without any answers and checks
+// at the end that everything that the driver lent was given back.
 class DriverTest : public ::testing::Test {
   protected:
     using Calls = std::vector<std::string>;

@@ -8,7 +8,7 @@ namespace {
 
 constexpr int tooSmall = 7;
 
-// A text that fits exactly gets no NUL behind it.
+// A text that fills the buffer exactly gets no NUL after it.
 int fill(const std::string& text, char* buffer, std::uint32_t* size) {
     if (text.size() > *size) {
         *size = static_cast<std::uint32_t>(text.size());

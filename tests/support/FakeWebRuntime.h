@@ -6,10 +6,10 @@
 #include <string>
 #include <vector>
 
-// One HTTP request as the web runtime offers it, for tests of the plug-in's skin. Writes down what
-// the plug-in does, in order: "code 404", "type text/plain", "write abc".
+// One HTTP request as the web runtime presents it, for tests of the plug-in's entry points. Records
+// what the plug-in does, in order: "code 404", "type text/plain", "write abc".
 struct ws_Request {
-    // A text that does not fit the buffer makes the first call fail and tell the size.
+    // A text that does not fit the buffer makes the first call fail and return the size.
     std::map<std::string, std::string> variables = {{"REQUEST_TRANSPORT", "http"},
                                                     {"REQUEST_METHOD", "POST"}};
     std::string body;

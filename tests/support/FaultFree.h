@@ -1,7 +1,7 @@
 #pragma once
 
-// Keeps the allocation faults of this thread away from a stand-in while it works, so that they
-// strike the code under test alone. May nest.
+// While it exists, the allocation faults of this thread are suspended, so that a stand-in is spared
+// and only the code under test is affected. May nest.
 class FaultFree {
   public:
     FaultFree() { ++depth; }

@@ -9,8 +9,8 @@
 #include "support/RecordingDriver.h"
 
 // Makes the recording driver keep sessions as a real driver does: it opens them under the handles
-// 1, 2, 3 and so on, reserves the devices of their resources for them and for nobody else, and
-// refuses any other call for a handle that is not open.
+// 1, 2, 3 and so on, reserves the devices of their resources for them alone, and refuses any other
+// call for a handle that is not open.
 class ModelledSessions {
   public:
     using Handle = std::uint32_t;
@@ -19,11 +19,11 @@ class ModelledSessions {
     static constexpr std::int32_t deviceReserved = -250811;
     static constexpr std::int32_t notOpen = -250955;
 
-    // Replaces the replies to all calls that are modelled. Can be repeated to undo replies that a
-    // test has put in between. The driver must not be called any more once the model has ended.
+    // Replaces the replies to all calls that are modelled. May be called again to undo replies that
+    // a test has set since. The driver must not be called after the model is destroyed.
     void answerCalls();
 
-    // Lets every call that succeeds from now on bear this positive code and text.
+    // Every call that succeeds from now on returns this positive code and text.
     void warn(std::int32_t code, std::string json);
 
     // The handles of the sessions that are open now.

@@ -10,7 +10,7 @@
 #include <string>
 #include <thread>
 
-// A thread of which a test can learn whether it waits for something.
+// A thread that lets a test find out whether it is waiting.
 class ObservedThread {
   public:
     explicit ObservedThread(std::function<void()> work)
@@ -28,7 +28,7 @@ class ObservedThread {
 
     bool hasEnded() const { return ended; }
 
-    // Returns true once the thread sleeps without interruption, false once it has ended.
+    // Returns true once the thread is blocked in a wait, false once it has ended.
     bool waitUntilBlocked() const {
         for (int sleeping = 0; sleeping < 200; ::sched_yield()) {
             if (ended)

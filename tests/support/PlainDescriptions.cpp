@@ -27,7 +27,7 @@ std::string text(const JsonValue& value) {
     return buffer.GetString();
 }
 
-// A status that ran out of memory, or comes from a broken driver, may lack any member.
+// A status that ran out of memory, or that a broken driver made, may lack any member.
 std::string member(const JsonValue& item, const char* name) {
     const auto found = item.FindMember(name);
     return found != item.MemberEnd() ? text(found->value) : "";

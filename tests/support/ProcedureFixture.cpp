@@ -20,7 +20,7 @@ std::string compact(const JsonValue& value) {
     return std::string(buffer.GetString(), buffer.GetSize());
 }
 
-// Where the failure arose is left out.
+// The source position of the failure is left out.
 std::string written(const qierr_Status& status) {
     const std::string details = orderedDataOf(status);
     return std::to_string(status.code) + (details.empty() ? "" : " " + details);

@@ -31,15 +31,15 @@ class ProcedureFixture : public DriverTest {
     // The same with the whole of params.
     std::string request(const std::string& method, const std::string& params);
 
-    // Answers of the driver from now on.
+    // Sets the driver's answers from now on.
     void give(const std::string& call, RecordingDriver::Value value);
     void fail(const std::string& call, std::int32_t code, const std::string& json = "");
-    // Fails one call of those with the same text; `earlier` of them are answered as before.
+    // Makes one of the calls with the same text fail; `earlier` of them are answered as before.
     void failLater(const std::string& call, int earlier, std::int32_t code);
     // The data type of every property.
     void giveDataType(std::int32_t number);
 
-    // Tells that the code under test gives the driver one array of its own to free.
+    // Declares that the code under test gives the driver one array of its own to free.
     void expectOwnArray() { driver.lend(); }
 
     // The text of the latest failure's status.
@@ -50,9 +50,9 @@ class ProcedureFixture : public DriverTest {
     std::unique_ptr<nQITRMCWEBSVC100::ProcedureFactory> factory;
 };
 
-// The calls after the one that tells a property's data type.
+// The calls after the one that reads a property's data type.
 Texts afterOpening(const Texts& calls);
 
-// The text of an answer that fails with one detail.
+// The text of a failure with one detail.
 std::string failure(std::int32_t code, const std::string& usage, const std::string& value);
 std::string internalError(const std::string& comment);

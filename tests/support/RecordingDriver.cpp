@@ -72,7 +72,7 @@ namespace {
 
 using Reply = RecordingDriver::Reply;
 
-// ---- How arguments are written down -------------------------------------------------------------
+// ---- How arguments are recorded -----------------------------------------------------------------
 
 std::string written(const char* text) {
     return text == nullptr ? "null" : "\"" + std::string(text) + "\"";
@@ -123,7 +123,7 @@ Reply called(const char* name, const std::string& arguments, qierr_Status* statu
     return reply;
 }
 
-// ---- How replies are handed out -----------------------------------------------------------------
+// ---- How replies are returned -------------------------------------------------------------------
 
 template <typename Number>
 Number numberIn(const Reply& reply) {

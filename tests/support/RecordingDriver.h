@@ -10,11 +10,11 @@
 #include <variant>
 #include <vector>
 
-// A driver that does nothing but write down how it is called and answer as a test tells it.
+// A driver that only records its calls and returns what a test has set.
 //
-// Linked in place of the real driver. A call is written down as its name without prefix and its
-// arguments, statuses and out arguments left out: `reserveDevices(7, "Mod1", 3, "", 0.5)`. Calls
-// that give something back are written down too: `freeStringArray(2)`.
+// Linked in place of the real driver. A call is recorded as its name without prefix and its
+// arguments, without statuses and out arguments: `reserveDevices(7, "Mod1", 3, "", 0.5)`. Calls
+// that free something are recorded too: `freeStringArray(2)`.
 class RecordingDriver {
   public:
     using Value = std::variant<std::monostate, double, std::int64_t, std::uint64_t, std::string,
@@ -26,9 +26,9 @@ class RecordingDriver {
         std::int32_t code = 0;
         std::string json = {};
         std::function<void()> during = {};  // runs inside the call
-        // The count that is told where an array is asked for and `value` is none.
+        // The count that is returned for an array when `value` holds none.
         std::uint32_t countOfNoArray = 0;
-        // Works the reply out from the text of the call, in place of all of the above.
+        // Computes the reply from the text of the call, in place of all of the above.
         std::function<Reply(const std::string& call)> workedOut = {};
     };
 
@@ -37,7 +37,7 @@ class RecordingDriver {
     // Forgets everything. Called by the fixture before each test.
     void reset();
 
-    // Answers calls whose text, or whose name alone, is `call`. The text wins over the name.
+    // Sets the reply to calls whose text, or whose name alone, is `call`. The text has priority.
     void reply(const std::string& call, Reply reply);
     // The same for one value, or for a failure.
     void give(const std::string& call, Value value) { reply(call, {std::move(value)}); }
@@ -46,13 +46,13 @@ class RecordingDriver {
     }
 
     std::vector<std::string> calls() const;
-    // The calls since the last time this was asked.
+    // The calls since the previous call of this function.
     std::vector<std::string> takeCalls();
-    // Texts, arrays and arrays of texts that were lent and not given back.
+    // Strings, arrays and arrays of strings that were lent and not given back.
     int outstanding() const;
 
-    // For the driver's functions. Whatever memory is needed for writing down and for lending is
-    // there, also while allocations fail.
+    // For the driver's functions. Memory for recording and for lending is available even while
+    // allocations fail.
     Reply record(const std::string& name, const std::string& arguments);
     void lend() { count(+1); }
     void takeBack(const void* lent) { count(lent != nullptr ? -1 : 0); }

@@ -2,8 +2,8 @@
 
 #include <string>
 
-// A tree in a temporary folder that takes the place of the target's file system for the code under
-// test, which must be linked with this library in place of qisysq_root. One at a time.
+// A tree in a temporary folder that replaces the target's file system for the code under test,
+// which must be linked with this library in place of qisysq_root. Only one may exist at a time.
 class TestRoot {
   public:
     TestRoot();
@@ -11,12 +11,12 @@ class TestRoot {
     TestRoot(const TestRoot&) = delete;
     TestRoot& operator=(const TestRoot&) = delete;
 
-    // Writes a file under its absolute path on the target, folders included.
+    // Writes a file under its absolute path on the target and creates its folders.
     void write(const std::string& path, const std::string& content) const;
     void makeDirectory(const std::string& path) const;
-    // Lets a directory of this machine appear under an absolute path on the target.
+    // Makes a directory of this machine appear under an absolute path on the target.
     void showDirectory(const std::string& path, const std::string& directory) const;
     void remove(const std::string& path) const;
-    // Where a path of the target lies.
+    // The path on this machine of a path on the target.
     std::string locate(const std::string& path) const;
 };

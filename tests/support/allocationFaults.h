@@ -1,8 +1,8 @@
 #pragma once
 
-// Makes allocations of this thread fail: of malloc, calloc and realloc where the test program's own
-// code calls them (it is linked with --wrap for each), and of operator new everywhere. Stand-ins
-// that are FaultFree are spared.
+// Makes allocations of this thread fail: malloc, calloc and realloc where the test program's own
+// code calls them (it is linked with --wrap for each), and operator new everywhere. Stand-ins that
+// hold a FaultFree are exempt.
 class AllocationFault {
   public:
     enum class Extent { one, allFromThere };

@@ -1,4 +1,4 @@
-"""Strategies of hypothesis for chassis descriptions: sound ones, and sound ones edited at random."""
+"""Hypothesis strategies for chassis descriptions: valid ones, and valid ones edited at random."""
 
 import copy
 
@@ -14,7 +14,7 @@ NUMBERS = ["Double", *BOUNDS]
 TEXTS = st.text(st.characters(blacklist_categories=["Cs"], blacklist_characters="\0"), max_size=12)
 PLAIN_NAMES = st.from_regex(r"[A-Za-z][A-Za-z._]{0,7}", fullmatch=True)
 PROPERTY_NAMES = PLAIN_NAMES.map(lambda name: f"Own.{name}")
-# In steps of a thousandth, which survive every reader of numbers to the last bit.
+# In steps of a thousandth, which every reader of numbers preserves to the last bit.
 THOUSANDTHS = (-10**12, 10**12)
 REALS = st.integers(*THOUSANDTHS).map(lambda number: number / 1000)
 TIMES = st.sampled_from([0, 0.001, 1e-06])
@@ -97,7 +97,7 @@ WAVES = st.fixed_dictionaries(
 
 @st.composite
 def motions(draw, about):
-    """How a property moves, or nothing when it cannot."""
+    """How a property moves, or None when it cannot."""
     if about["type"] in ("DoubleArray", "Int32Array") and "enum" not in about:
         return {"waveform": draw(WAVES), **draw(st.fixed_dictionaries({}, optional={
             "noise": SIZES}))}
@@ -174,7 +174,7 @@ def devices(draw, name, enums, moving):
 
 @st.composite
 def descriptions(draw, moving=False):
-    """A sound description, which has a chassis and knows every member of the format. moving:
+    """A valid description, which has a chassis and uses every member of the format. moving:
     whether some of its values move."""
     enums = draw(st.dictionaries(PLAIN_NAMES, st.dictionaries(
         PLAIN_NAMES, st.integers(*BOUNDS["Int32"]), max_size=4), max_size=2))
@@ -222,7 +222,7 @@ def at(node, path):
 
 @st.composite
 def edited(draw, sound=None):
-    """A description with up to three edits, each of which may or may not do harm."""
+    """A description with up to three edits, each of which may or may not make it invalid."""
     root = [copy.deepcopy(draw(descriptions(moving=True) if sound is None else sound))]
     for _ in range(draw(st.integers(1, 3))):
         path = draw(st.sampled_from([path for path in places(root) if path]))

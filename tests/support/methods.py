@@ -1,11 +1,11 @@
-"""The methods of the service: their names, and for each a request that is right.
+"""The methods of the service: their names, and a well-formed request for each.
 
     for method in methods.NAMES:
         session = methods.request(method).prepare(ask)
 
 The names are those of methods.def. The requests are the documented ones of docs/methods.json, with
-what has to go before each; a test that needs other values puts them in place of the documented ones,
-and cannot give a parameter that the method does not have.
+the calls that prepare them; a test that needs other values replaces documented ones by them, and
+cannot give a parameter that the method does not have.
 """
 
 import json
@@ -37,8 +37,8 @@ class Request:
     before: tuple
 
     def prepare(self, ask):
-        """Has everything done that goes before. ask(method, params) returns a result. Returns the
-        id of the session that was opened, None for a method that needs none."""
+        """Makes the calls that prepare the request. ask(method, params) returns a result. Returns
+        the id of the session that was opened, None for a method that needs none."""
         session_id = None
         for method, params in self.before:
             result = ask(method, in_session(method, params, session_id))
@@ -50,7 +50,7 @@ class Request:
 
 
 def request(method, opened_on=None, without=(), **members):
-    """The documented request with other members. A resource takes the place of the documented one.
+    """The documented request with other members. A given resource replaces the documented one.
 
     opened_on: params of initializeSession for the session, if not the documented ones
     without: documented members to leave out

@@ -60,7 +60,7 @@ std::int32_t outcomeIn(const JsonValue& response) {
 
 std::string responseFault(const std::string& text) {
     JsonDocument document;
-    // What follows a NUL must not be overlooked.
+    // Text after a NUL must not be overlooked.
     document.Parse<rapidjson::kParseIterativeFlag>(text.data(), text.size());
     if (document.HasParseError() || text.find('\0') != text.npos)
         return "not one JSON value";

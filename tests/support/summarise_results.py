@@ -1,8 +1,8 @@
 #!/usr/bin/python3
 """Adds up the JUnit result files that it is given and names every failed test.
 
-The last line is "N passed, N failed". Exits 1 when a test failed or none ran. A file that is missing
-or broken counts as a failure: its test runner died.
+The last line is "N passed, N failed". Exits 1 when a test failed or none ran. A file that is
+missing or broken counts as a failure, because its test runner crashed.
 """
 
 import pathlib

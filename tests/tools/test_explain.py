@@ -1,4 +1,4 @@
-"""qitrmc-explain, the program that puts a status into words for a support engineer."""
+"""qitrmc-explain, the program that shows the text of a status to a support engineer."""
 
 import csv
 import json
@@ -59,7 +59,7 @@ def codes():
 
 
 @pytest.mark.parametrize("language", LANGUAGES)
-def test_every_code_has_words_in_every_language_on_both_roads(language):
+def test_every_code_has_a_text_in_every_language_from_both_translators(language):
     catalogue = {int(row["code"]): row for row in rows("statuses/catalogue.tsv")}
     seen = set()
     for code in codes():
@@ -76,7 +76,7 @@ def test_every_code_has_words_in_every_language_on_both_roads(language):
 
 
 def shown(tag, number):
-    """An attribute is shown by its number where no table names it."""
+    """An attribute without a name in any table is shown by its number."""
     return f"0x{number:08X}" if tag in ATTRIBUTE_TAGS else str(number)
 
 
@@ -87,18 +87,18 @@ def test_every_tag_has_a_label_in_every_language(language):
     entries = [usage(row["key"], str(number)) for number, row in enumerate(tables)]
     text = explained("--language", language, "-", stdin=details(*entries, code=-250800))
     lines = text.split("\n\n", 1)[1].splitlines()
-    # A tag that only English has is shown as it stands in the other languages.
+    # A tag that only English has is shown unchanged in the other languages.
     assert lines == [f"{row[language] or row['key']}: {shown(row['key'], number)}"
                      for number, row in enumerate(tables)]
 
 
-def test_details_stand_behind_the_description_with_their_labels():
+def test_details_follow_the_description_with_their_labels():
     text = explained(-250811, details(usage("kUsageTypeDevice", "Mod1"),
                                       usage("kUsageTypeReservedBySessions", ["a", "b"])))
     assert text.split("\n\n")[1] == "Device: Mod1\nReserved by Sessions: a, b\n"
 
 
-def test_the_code_may_stand_in_the_text():
+def test_the_code_may_be_part_of_the_text():
     assert explained('{"code": -250811}') == explained(-250811)
 
 
@@ -133,7 +133,7 @@ def test_a_code_may_lack_its_minus_sign(code):
     assert explained(code) == NOT_CHASSIS
 
 
-def test_a_code_that_is_positive_is_taken_as_it_is():
+def test_a_positive_code_is_not_negated():
     assert explained(250990) == (
         "A device was not held by this session, so there was nothing to give up. "
         "Nothing needs to be done.\n")
@@ -149,7 +149,7 @@ def test_a_name_of_a_group_may_be_shortened(name):
     assert explained(name) == OUTPUT_ON
 
 
-def test_a_whole_name_comes_before_a_shortened_one():
+def test_an_exact_name_takes_precedence_over_a_prefix():
     assert explained("outOfMemory").startswith("The service ran out of memory. ")
     assert explained("qitrmcsim_outOfMemory").startswith("The driver ran out of memory. ")
 
@@ -191,7 +191,7 @@ def test_an_error_without_data_is_explained_by_its_own_code():
     SERVER_ERROR,
     {"code": -250812, "message": "The device is not a chassis."},
 ])
-def test_the_members_of_an_error_object_are_not_taken_for_details(error):
+def test_the_members_of_an_error_object_are_not_shown_as_details(error):
     assert explained(json.dumps({**error, "nested_error": {"code": -250800}})) == NOT_CHASSIS
 
 
@@ -230,11 +230,11 @@ def test_every_language_has_its_locale(locale, language):
     assert explained(-250812, LANG=locale) == explained("--language", language, -250812)
 
 
-def test_an_option_comes_before_the_environment():
+def test_an_option_takes_precedence_over_the_environment():
     assert explained("--language", "eng", -250812, LC_ALL="de_DE.UTF-8") == NOT_CHASSIS
 
 
-def test_the_value_of_an_option_may_stand_behind_an_equals_sign():
+def test_the_value_of_an_option_may_follow_an_equals_sign():
     assert explained("--language=deu", -250812) == NOT_CHASSIS_DEU
 
 
@@ -273,7 +273,7 @@ def test_a_search_folds_letters_beyond_ascii(word, line):
     assert explained("--search", word, "--language", "deu") == line
 
 
-def test_a_word_that_is_no_utf_8_matches_nothing():
+def test_a_word_that_is_not_utf_8_matches_nothing():
     word = "g\udcfcltig"
     result = subprocess.run([BUILD_DIR / "bin" / "qitrmc-explain", "--search", word], env={},
                             capture_output=True, timeout=60)
@@ -322,7 +322,7 @@ def test_a_search_without_a_match_is_a_failure_that_says_so():
     (("--search", "x", -1), "--list and --search go with no code, name or JSON text."),
     (("--list", "--search", "x"), "--list and --search do not go together."),
 ])
-def test_a_wrong_command_line_is_told(arguments, words):
+def test_a_wrong_command_line_is_reported(arguments, words):
     result = run(*arguments)
     assert (result.returncode, result.stdout) == (2, "")
     assert result.stderr == f"qitrmc-explain: {words}\n{HINT}"
@@ -341,18 +341,18 @@ resources at once.
 
 @pytest.mark.parametrize("operand", [-250834, 250834, '{"code":-250834}',
                                      '{"error":{"code":-32000,"data":{"qitrmc_code":-250834}}}'])
-def test_an_unknown_code_is_told_in_plain_words_with_the_nearest_ones(operand):
+def test_an_unknown_code_is_reported_with_the_nearest_codes(operand):
     result = run(operand)
     assert (result.returncode, result.stdout, result.stderr) == (1, "", NEAR_250834)
 
 
-def test_details_of_an_unknown_code_are_shown_all_the_same():
+def test_details_of_an_unknown_code_are_still_shown():
     result = run(-250834, details(usage("kUsageTypeDevice", "Mod1")))
     assert (result.returncode, result.stdout, result.stderr) == (
         0, "Error description not found\n\nDevice: Mod1\n", NEAR_250834)
 
 
-def test_the_farthest_codes_have_nearest_ones():
+def test_codes_at_the_ends_of_the_range_have_nearest_codes():
     for code in ("-2147483648", "2147483647"):
         result = run(code)
         assert (result.returncode, result.stdout) == (1, "")
@@ -364,7 +364,7 @@ def test_the_farthest_codes_have_nearest_ones():
     ("OutptOn", "-250936  qitrmcsim_outputOn: The output is on."),
     ("chassis", "-250812  notChassis: The device is not a chassis."),
 ])
-def test_an_unknown_name_is_told_in_plain_words_with_similar_ones(name, likeliest):
+def test_an_unknown_name_is_reported_with_similar_names(name, likeliest):
     result = run(name)
     assert (result.returncode, result.stdout) == (1, "")
     head, first, *others = result.stderr.splitlines()
@@ -373,21 +373,21 @@ def test_an_unknown_name_is_told_in_plain_words_with_similar_ones(name, likelies
     assert len(others) <= 2
 
 
-def test_a_name_like_no_other_leads_to_the_list():
+def test_an_unknown_name_without_similar_names_refers_to_the_list():
     result = run("qqqqqqqqqqqq")
     assert (result.returncode, result.stdout, result.stderr) == (
         1, "", "qitrmc-explain: No status has the name qqqqqqqqqqqq. --list shows all that are known.\n")
 
 
 @pytest.mark.parametrize("status", ['{"nested_error":3}', '{"translator":"none"}'])
-def test_details_without_words_are_told_without_internal_text(status):
+def test_details_without_a_text_are_reported_without_internal_text(status):
     result = run(-250812, status)
     assert (result.returncode, result.stdout) == (1, "")
     assert re.fullmatch(r"qitrmc-explain: The details cannot be put into words \(code -5200[56]\)\. "
                         r"Give the code alone to see what it means\.\n", result.stderr)
 
 
-def test_a_controller_without_explanation_files_is_told(tmp_path):
+def test_missing_explanation_files_are_reported(tmp_path):
     def bare(*arguments):
         result = run(*arguments, program="qitrmc-explain_cwd", folder=tmp_path)
         assert (result.returncode, result.stdout) == (1, "")

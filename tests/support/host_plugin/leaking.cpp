@@ -1,4 +1,4 @@
-// A plug-in that keeps what the driver lends it.
+// A plug-in that does not free what the driver lends it.
 
 #include <qitrmcapi.h>
 
@@ -15,7 +15,7 @@ void qitrmcInit() {
     qierr_Status status = {0, 0, keepNoDetails, nullptr};
     nQITRMCAPI100_Session session = 0;
     nQITRMCAPI100_initializeSessionWithoutResources(&session, &status);
-    // The driver's own ledger keeps the text reachable, so no leak checker minds.
+    // The driver's own list keeps the text reachable, so no leak checker reports it.
     char* text = nullptr;
     nQITRMCAPI100_getGenericPropertyString(session, "Mod1", "Dev.ProductName", &text, &status);
     nQITRMCAPI100_Property property = 0;

@@ -1,5 +1,5 @@
-// The service, whose functions this library passes on, in a process that follows the locale of its
-// user. That locale must have a decimal comma.
+// Gives the host the functions of the service, which it links, in a process that uses the locale of
+// its user. That locale must have a decimal comma.
 
 #include <clocale>
 #include <cstdio>

@@ -1,5 +1,5 @@
-// A plug-in that answers with what the host gave it. The entry chooses what it does; an entry that
-// is not in the table is served by `describe`.
+// A plug-in that answers with what the host passed to it. The entry selects what it does; an entry
+// that is not in the table is served by `describe`.
 
 #include <ws_runtime.h>
 
@@ -20,7 +20,7 @@ struct Read {
     std::string bytes;  // all of the buffer
 };
 
-// Reads the body with a buffer of `size` bytes, each of them "#" before.
+// Reads the body into a buffer of `size` bytes, each of them "#" before.
 Read readBody(ws_Request* request, uint32_t size) {
     Read read{0, size, std::string(size, '#')};
     read.result = ReadPostData_C_REST_QI_QVWS_(request, &read.bytes[0], &read.size);
@@ -95,7 +95,7 @@ void wait(ws_Request* request) {
     write(request, "released");
 }
 
-// Ends when as many requests wait as the body says.
+// Returns when as many requests wait as the body says.
 void awaitWaiting(ws_Request* request) {
     const int wanted = std::stoi(body(request));
     std::unique_lock<std::mutex> lock(mutex);
