@@ -23,7 +23,7 @@ BUILD_DIR = pathlib.Path(os.environ.get("QITRMC_BUILD_DIR", ROOT / "build" / "de
 # A plug-in that answers with what it was asked.
 TEST_PLUGIN = BUILD_DIR / "lib" / "libhost_test_plugin.so"
 
-# Far more than anything here takes: it only ends a test that would never end.
+# Far more than anything here takes: it only ends a test that would otherwise hang.
 PATIENCE = 60
 
 # Longer than any test leaves its connection idle, so that no test meets a connection closed by the
@@ -32,7 +32,7 @@ IDLE_SECONDS = 600
 
 
 class HostError(AssertionError):
-    """The host did not do what every test relies on."""
+    """The host broke an assumption that every test relies on."""
 
 
 class Host:

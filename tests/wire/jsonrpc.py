@@ -1,4 +1,4 @@
-"""JSON-RPC over a running host: requests as bytes, the bytes that must answer them, and a client.
+"""JSON-RPC over a running host: requests as bytes, the expected response bytes, and a client.
 
 Ids, params and results are JSON texts here, not Python values, so that a test states every byte
 that it compares. A byte that is not UTF-8 stands in them as os.fsdecode() writes it.
@@ -36,7 +36,7 @@ def result_response(result="{}", id="1"):
 
 
 def error_response(id, code):
-    """The answer to a failure, with the code as the service raised it."""
+    """The response to a failure, with the code as the service raised it."""
     if code in STANDING_CODES:
         error = f'{{"code":{code},"message":"{ANY_TEXT}"}}'
     else:
@@ -123,7 +123,7 @@ class Client:
             self.close_session(session_id)
 
     def close_if_opened(self, answer):
-        """Closes the session that an answer tells of, if it tells of one."""
+        """Closes the session that an answer names, if it names one."""
         opened = re.search(rb'"result":\{"session_id":"(_session[0-9]+)"\}', answer)
         if opened:
             self.close_session(opened[1].decode())

@@ -1,4 +1,4 @@
-"""What the tests of the host have in common: its test plug-in, and hosts that serve it."""
+"""Fixtures for the tests of the host: its test plug-in, and hosts that serve it."""
 
 import os
 import subprocess
@@ -12,7 +12,7 @@ from hostlib import BUILD_DIR, TEST_PLUGIN, Host
 def start_host():
     """Starts hosts of the test plug-in with further options and environment.
 
-    Those that still run at the end of the test must end well, and none may have met a sanitizer.
+    Hosts that still run at the end of the test must exit cleanly, without a sanitizer report.
     """
     hosts = []
 

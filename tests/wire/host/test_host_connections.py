@@ -1,4 +1,4 @@
-"""Many clients, slow clients, the end of the host, HTTPS, and want of memory."""
+"""Many clients, slow clients, shutdown, HTTPS, and lack of memory."""
 
 import concurrent.futures
 import contextlib
@@ -36,7 +36,7 @@ def seconds_until_closed(client):
 
 @contextlib.contextmanager
 def waiting_requests(host, count):
-    """Has `count` requests wait in the plug-in; gives their futures, and releases them after."""
+    """Makes `count` requests wait in the plug-in; yields their futures, then releases them."""
     with concurrent.futures.ThreadPoolExecutor(count) as pool:
         waiting = [pool.submit(host.post, b"", "Wait") for _ in range(count)]
         host.post(b"%d" % count, "AwaitWaiting")
@@ -109,14 +109,14 @@ def test_many_clients_at_once_each_get_their_own_answer(host):
         assert all(pool.map(converse, range(32)))
 
 
-def test_more_clients_than_places_are_all_served(start_host):
+def test_more_clients_than_connection_slots_are_all_served(start_host):
     host = start_host("--threads", "2")
     with concurrent.futures.ThreadPoolExecutor(16) as pool:
         answers = pool.map(lambda i: host.post(b"%d" % i, "Echo")[2], range(200))
         assert list(answers) == [b"%d" % i for i in range(200)]
 
 
-def test_a_rush_of_clients_waits_for_places(start_host):
+def test_clients_beyond_the_connection_limit_wait_for_a_slot(start_host):
     host = start_host("--threads", "2")
     with contextlib.ExitStack() as stack:
         clients = [stack.enter_context(host.raw_socket()) for _ in range(200)]
@@ -133,7 +133,7 @@ def test_a_rush_of_clients_waits_for_places(start_host):
     b"POST /qitrmc/Echo HTTP/1.1\r\nHost: localhost\r\nContent-Length: 10\r\n\r\nabc",
     raw_post("Nothing", b"")[:30],
 ], ids=["nothing", "request line", "half a body", "half a head"])
-def test_a_silent_client_loses_its_connection(start_host, start):
+def test_a_silent_client_is_disconnected(start_host, start):
     host = start_host("--timeout", "1")
     with host.raw_socket() as client:
         client.sendall(start)
@@ -149,7 +149,7 @@ def test_an_idle_connection_is_closed_after_its_request(start_host):
         assert 1 <= seconds_until_closed(client) < 10
 
 
-def test_a_client_that_drips_a_head_loses_its_connection(start_host):
+def test_a_client_that_sends_its_head_too_slowly_is_disconnected(start_host):
     host = start_host("--timeout", "1")
     with host.raw_socket() as client:
         client.sendall(b"POST /qitrmc/Echo HTTP/1.1\r\n")
@@ -165,11 +165,11 @@ def test_a_client_that_drips_a_head_loses_its_connection(start_host):
     assert time.monotonic() - begin >= 1
 
 
-def test_a_client_that_does_not_fetch_its_response_loses_its_connection(start_host):
+def test_a_client_that_does_not_read_its_response_is_disconnected(start_host):
     host = start_host("--timeout", "1")
     with host.raw_socket() as client:
         client.sendall(raw_post("Much", b"100000000"))
-        # Looking for the end of the connection makes sense from here on alone.
+        # Only from here on is the closed connection the one under test.
         assert select.select([client], [], [], PATIENCE)[0], "the response does not begin"
         deadline = time.monotonic() + PATIENCE
         while len(open_sockets(host)) > 1:
@@ -198,7 +198,7 @@ def test_a_request_in_the_plugin_outlives_the_timeout(start_host):
     assert waiting[0].result()[::2] == (200, b"released")
 
 
-def test_silent_clients_in_all_places_give_way_long_before_the_timeout(start_host):
+def test_silent_clients_in_all_slots_are_disconnected_long_before_the_timeout(start_host):
     host = start_host("--threads", "3", "--timeout", "86400")
     with contextlib.ExitStack() as stack:
         silent = [stack.enter_context(host.raw_socket()) for _ in range(6)]
@@ -207,7 +207,7 @@ def test_silent_clients_in_all_places_give_way_long_before_the_timeout(start_hos
         assert host.post(b"abc", "Echo")[2] == b"abc"
 
 
-def test_requests_in_flight_end_before_the_host_does(start_host, tmp_path):
+def test_requests_in_flight_are_completed_before_the_host_exits(start_host, tmp_path):
     log = tmp_path / "log"
     host = start_host(HOST_PLUGIN_LOG=str(log))
     with host.raw_socket() as open_before, waiting_requests(host, 3) as waiting:
@@ -215,19 +215,19 @@ def test_requests_in_flight_end_before_the_host_does(start_host, tmp_path):
         assert read_response(open_before) == (200, b"1")
         host.process.send_signal(signal.SIGTERM)
         wait_until_refused(host)
-        # The last way in: a connection from before. It is no longer served...
+        # A connection that was opened before is the last way in. It is no longer served ...
         open_before.sendall(raw_post("Release", b""))
         assert read_response(open_before) == (503, b"The server is stopping.\n")
         assert not any(future.done() for future in waiting)
         assert host.process.poll() is None
         host.process.send_signal(signal.SIGTERM)
-    # ... so a second signal has to end what would wait for ever.
+    # ... so a second signal has to end what would otherwise wait forever.
     assert host.process.wait(PATIENCE) == -signal.SIGTERM
     assert "finalize" not in log.read_text()
 
 
 def wait_until_refused(host):
-    """Waits until the host accepts nobody any more."""
+    """Waits until the host accepts no more connections."""
     deadline = time.monotonic() + PATIENCE
     while time.monotonic() < deadline:
         try:
@@ -240,7 +240,7 @@ def wait_until_refused(host):
 
 
 @pytest.mark.parametrize("end_signal", [signal.SIGTERM, signal.SIGINT])
-def test_a_signal_lets_the_request_in_flight_end(start_host, tmp_path, end_signal):
+def test_a_signal_lets_the_request_in_flight_complete(start_host, tmp_path, end_signal):
     log = tmp_path / "log"
     host = start_host(HOST_PLUGIN_LOG=str(log))
     body = b"x" * 1000
@@ -290,8 +290,8 @@ def test_clients_that_vanish_do_no_harm(host):
 @pytest.mark.parametrize("options, transport", [
     ((), b"http"), (("--pass-transport",), b"https"),
 ], ids=["as it is behind a proxy", "as it is"])
-def test_the_plugin_sees_plain_http_behind_https_unless_told(start_host, certificate, options,
-                                                             transport):
+def test_the_plugin_sees_plain_http_behind_https_by_default(start_host, certificate, options,
+                                                            transport):
     host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1], *options)
     assert host.first_line.startswith("Listening on https://127.0.0.1:")
     status, _, body = host.post(b"x" * 1000)
@@ -302,7 +302,7 @@ def test_the_plugin_sees_plain_http_behind_https_unless_told(start_host, certifi
     assert host.stop() == 0
 
 
-def test_plain_http_on_an_https_port_is_cut_and_the_host_lives_on(start_host, certificate):
+def test_plain_http_on_an_https_port_is_disconnected(start_host, certificate):
     host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1])
     with host.raw_socket() as client:
         client.sendall(raw_post("Echo", b"abc"))
@@ -314,7 +314,7 @@ def test_plain_http_on_an_https_port_is_cut_and_the_host_lives_on(start_host, ce
     assert host.post(b"abc", "Echo")[2] == b"abc"
 
 
-def test_a_silent_client_of_https_loses_its_connection(start_host, certificate):
+def test_a_silent_https_client_is_disconnected(start_host, certificate):
     host = start_host("--tls-cert", certificate[0], "--tls-key", certificate[1], "--timeout", "1")
     with host.raw_socket() as client:
         assert 1 <= seconds_until_closed(client) < 10
@@ -331,7 +331,7 @@ def test_a_tls_file_that_cannot_be_read_is_named(refused_start, certificate, tmp
 
 
 @pytest.mark.parametrize("content", [b"", b"not a key", None], ids=["empty", "text", "mismatch"])
-def test_tls_files_that_do_not_serve_are_refused(refused_start, certificate, tmp_path, content):
+def test_unusable_tls_files_are_refused(refused_start, certificate, tmp_path, content):
     key = tmp_path / "key.pem"
     if content is None:
         subprocess.run(["openssl", "genrsa", "-out", key, "2048"], check=True, capture_output=True)
@@ -361,7 +361,7 @@ def limit_memory(host, size):
 @pytest.mark.parametrize("entry, body", [
     ("Echo", b"x" * 300_000_000), ("Much", b"300000000"),
 ], ids=["request", "response"])
-def test_want_of_memory_fails_one_request_only(start_host, entry, body):
+def test_lack_of_memory_fails_one_request_only(start_host, entry, body):
     host = start_host("--max-body", "4294967295")
     limit_memory(host, 300 * 1024 * 1024)
     try:
@@ -373,7 +373,7 @@ def test_want_of_memory_fails_one_request_only(start_host, entry, body):
 
 
 @needs_memory_limit
-def test_clients_that_get_no_thread_take_no_place(start_host):
+def test_clients_that_get_no_thread_take_no_connection_slot(start_host):
     host = start_host("--threads", "2")
     with host.raw_socket() as holder:
         holder.sendall(raw_post("Echo", b"abc"))

@@ -1,4 +1,4 @@
-"""Requests of web pages, and requests to a name that the host does not have."""
+"""Requests from web pages, and requests for a name that the host does not have."""
 
 import re
 import socket
@@ -89,8 +89,8 @@ def test_the_hosts_own_origin_is_served(host):
     assert host.post(b"abc", "Echo", {"Origin": upper})[0] == 200
 
 
-def test_a_site_that_took_the_hosts_address_is_refused(host):
-    """DNS rebinding: to the browser, page and host are of one origin."""
+def test_a_site_whose_name_resolves_to_the_hosts_address_is_refused(host):
+    """DNS rebinding: the browser regards page and host as one origin."""
     port = host.address[1]
     for origin in ({}, {"Origin": f"http://evil.example:{port}"}):
         answer = host.post(b"abc", "Echo", {"Host": f"Evil.example:{port}", **origin})
@@ -119,7 +119,7 @@ def test_the_listen_address_is_served(start_host, listen, name):
 
 
 def address_of_this_machine():
-    """One that is no loopback address; nothing is sent."""
+    """An address that is not a loopback address; nothing is sent."""
     with socket.socket(socket.AF_INET, socket.SOCK_DGRAM) as probe:
         try:
             probe.connect(("192.0.2.1", 9))
@@ -129,7 +129,7 @@ def address_of_this_machine():
 
 
 @pytest.mark.parametrize("listen", ["0.0.0.0:0", "[::]:0"])
-def test_a_host_on_all_addresses_takes_the_address_that_was_connected_to(start_host, listen):
+def test_a_host_on_all_addresses_accepts_the_address_that_was_connected_to(start_host, listen):
     address = address_of_this_machine()
     host = start_host("--listen", listen)
     with socket.create_connection((address, host.address[1]), timeout=PATIENCE) as client:
@@ -152,7 +152,7 @@ def test_a_header_that_comes_twice_is_refused(start_host, twice):
 
 
 @pytest.mark.parametrize("name", ["", "a b", "127.0.0.1@evil.example", "[::1", "localhost:x"])
-def test_a_host_that_is_no_host_is_refused(host, name):
+def test_a_malformed_host_header_is_refused(host, name):
     assert "is not a name or address" in text_of(host.post(b"", "Echo", {"Host": name}))
 
 
@@ -206,7 +206,7 @@ def test_options_without_a_preflight_reach_the_plugin(start_host):
         assert b"method OPTIONS\n" in body
 
 
-def test_a_client_that_asks_first_is_spared_sending_a_body_from_another_site(host):
+def test_expect_100_continue_from_another_site_is_refused_before_the_body(host):
     with host.raw_socket() as client:
         client.sendall(b"POST /qitrmc/Echo HTTP/1.1\r\nHost: localhost\r\nContent-Length: 3\r\n"
                        b"Origin: http://evil.example\r\nExpect: 100-continue\r\n\r\n")

@@ -1,4 +1,4 @@
-"""What a request becomes for the plug-in, and what its response becomes for the client."""
+"""What the plug-in sees of a request, and what the client sees of the plug-in's response."""
 
 import http.client
 
@@ -18,7 +18,7 @@ def test_the_plugin_sees_entry_transport_method_and_body(host):
     assert seen["body"] == "3"
 
 
-def test_a_variable_that_is_unknown_has_no_size(host):
+def test_an_unknown_variable_has_no_size(host):
     assert described(host.post(b"")[2])["other"] == "none, size 0"
 
 
@@ -75,7 +75,7 @@ def test_a_body_of_any_size_is_read_whole(host, size, first_read_failed):
 
 
 @pytest.mark.parametrize("size", [0, 255, 256, 257, 65536, 3000000])
-def test_a_body_comes_and_goes_unchanged(host, size):
+def test_a_body_is_passed_unchanged_in_both_directions(host, size):
     text = bytes(33 + i % 94 for i in range(size))
     status, headers, body = host.post(text, "Echo")
     assert (status, body) == (200, text)
@@ -92,14 +92,14 @@ def test_a_chunked_body_is_put_together(host):
     connection.close()
 
 
-def test_a_response_that_says_nothing_is_200_and_plain_text(host):
+def test_a_response_without_code_type_or_body_is_200_and_plain_text(host):
     status, headers, body = host.post(b"", "Nothing")
     assert (status, headers["Content-Type"], body) == (200, "text/plain", b"")
     assert headers["Content-Length"] == "0"
 
 
 @pytest.mark.parametrize("code", [200, 201, 400, 404, 500, 503, 599])
-def test_the_code_is_the_plugins(host, code):
+def test_the_plugin_sets_the_status_code(host, code):
     status, _, body = host.post(b"%d" % code, "Code")
     assert (status, body) == (code, b"coded")
 
@@ -114,12 +114,12 @@ def test_a_code_that_has_no_body_leaves_it_out(host):
 
 
 @pytest.mark.parametrize("code", [0, -1, 99, 100, 101, 199, 600, 1000, 2147483647])
-def test_a_code_that_no_response_can_have_is_500(host, code):
+def test_an_invalid_status_code_is_500(host, code):
     status, _, body = host.post(b"%d" % code, "Code")
     assert (status, body) == (500, b"The service failed on this request.\n")
 
 
-def test_the_content_type_is_the_plugins(host):
+def test_the_plugin_sets_the_content_type(host):
     assert host.post(b"image/png", "Type")[1]["Content-Type"] == "image/png"
 
 
@@ -137,7 +137,7 @@ def test_a_large_response_is_complete(host):
     ("Throw", "The plug-in's qitrmcRun failed: thrown on request\n"),
     ("ThrowNumber", "The plug-in's qitrmcRun failed: an exception of an unknown kind\n"),
 ])
-def test_an_exception_out_of_the_plugin_is_500_and_the_host_lives_on(host, entry, text):
+def test_an_exception_from_the_plugin_is_500_and_the_host_keeps_serving(host, entry, text):
     status, headers, body = host.post(b"", entry)
     assert (status, headers["Content-Type"]) == (500, "text/plain")
     assert body == b"The service failed on this request.\n"
@@ -145,7 +145,7 @@ def test_an_exception_out_of_the_plugin_is_500_and_the_host_lives_on(host, entry
     assert host.post(b"abc", "Echo")[2] == b"abc"
 
 
-def test_a_body_of_the_limit_is_taken_and_one_byte_more_refused(start_host):
+def test_a_body_at_the_limit_is_accepted_and_one_byte_more_is_refused(start_host):
     host = start_host("--max-body", "1000")
     assert host.post(b"x" * 1000, "Echo")[0] == 200
     status, headers, body = host.post(b"x" * 1001, "Echo")
@@ -158,7 +158,7 @@ def test_the_limit_is_16_mebibytes_by_default(host):
     assert host.post(b"x" * 16777217, "Nothing")[0] == 413
 
 
-def test_a_chunked_body_above_the_limit_is_refused_on_a_connection_that_lives(start_host):
+def test_a_chunked_body_above_the_limit_is_refused_and_the_connection_stays_open(start_host):
     host = start_host("--max-body", "1000")
     connection = host.connection()
     connection.request("POST", "/qitrmc/Echo", iter([b"x" * 600] * 2), encode_chunked=True)
@@ -183,14 +183,14 @@ def test_a_refused_body_is_not_kept_in_memory(start_host):
     assert peak_kilobytes() - before < 20_000
 
 
-def test_a_client_that_asks_first_is_spared_sending_a_refused_body(host):
+def test_expect_100_continue_is_refused_before_a_body_above_the_limit(host):
     with host.raw_socket() as client:
         client.sendall(b"POST /qitrmc/Echo HTTP/1.1\r\nHost: localhost\r\n"
                        b"Content-Length: 16777217\r\nExpect: 100-continue\r\n\r\n")
         assert client.recv(100).startswith(b"HTTP/1.1 413 ")
 
 
-def test_a_client_that_asks_first_is_told_to_go_on(host):
+def test_expect_100_continue_is_answered_with_100_for_an_acceptable_body(host):
     with host.raw_socket() as client:
         client.sendall(b"POST /qitrmc/Echo HTTP/1.1\r\nHost: localhost\r\nContent-Length: 3\r\n"
                        b"Expect: 100-continue\r\n\r\n")
@@ -201,7 +201,7 @@ def test_a_client_that_asks_first_is_told_to_go_on(host):
         assert (response.status, response.read()) == (200, b"abc")
 
 
-def test_what_is_not_http_is_refused_and_the_host_lives_on(host):
+def test_what_is_not_http_is_refused_and_the_host_keeps_serving(host):
     with host.raw_socket() as client:
         client.sendall(b"\x16\x03\x01\x02\x00\x01\x00\r\n\r\n")
         client.recv(1000)

@@ -57,7 +57,7 @@ def test_hands_the_seed_and_the_time_scale_to_the_driver(start_host):
     assert "time scale calls" in lines
 
 
-def test_without_options_the_variables_of_the_driver_are_left_alone(start_host):
+def test_without_options_the_environment_of_the_driver_is_unchanged(start_host):
     host = start_host(QITRMC_SIM_SEED="5", QITRMC_SIM_TIME_SCALE="10")
     lines = host.post(b"")[2].decode().splitlines()
     assert "seed 5" in lines
@@ -114,7 +114,7 @@ def test_an_address_of_another_machine_is_refused(refused_start):
     assert message.startswith("Cannot listen on 192.0.2.1:0: Cannot assign requested address.")
 
 
-def test_a_name_that_is_no_address_is_refused(refused_start):
+def test_a_name_that_is_not_an_address_is_refused(refused_start):
     message = refused_start("--listen", "no.such.host.invalid:0", "--plugin", TEST_PLUGIN)
     assert message.startswith("Cannot listen on no.such.host.invalid:0: ")
 
@@ -125,7 +125,7 @@ def test_a_missing_plugin_file_is_named(refused_start, tmp_path):
         f"There is no plug-in file {path}. Build it, or name another with --plugin.")
 
 
-def test_a_file_that_is_no_library_is_refused(refused_start, tmp_path):
+def test_a_file_that_is_not_a_library_is_refused(refused_start, tmp_path):
     path = tmp_path / "text.so"
     path.write_text("not a library")
     message = refused_start("--listen", "127.0.0.1:0", "--plugin", path)
@@ -149,7 +149,7 @@ def copy_of_the_program(folder):
     return program
 
 
-def test_without_a_plugin_option_the_places_beside_the_program_are_searched(tmp_path):
+def test_without_a_plugin_option_the_folders_beside_the_program_are_searched(tmp_path):
     program = copy_of_the_program(tmp_path)
     result = subprocess.run([program, "--listen", "127.0.0.1:0"], capture_output=True, text=True)
     assert result.returncode == 1
@@ -219,7 +219,7 @@ def test_the_runtime_exports_exactly_the_five_functions():
     ]
 
 
-def test_the_runtime_is_known_by_its_versioned_name_and_loaded_by_the_host():
+def test_the_runtime_has_its_versioned_soname_and_is_loaded_by_the_host():
     def dynamic_section(path):
         return subprocess.run(["readelf", "-d", os.fspath(path)], check=True, capture_output=True,
                               text=True).stdout

@@ -1,4 +1,4 @@
-"""The trace of the driver's calls and the summary of the chassis, as a person meets them."""
+"""The trace of the driver's calls and the summary of the chassis, as a user sees them."""
 
 import re
 
@@ -38,7 +38,7 @@ def test_the_summary_follows_the_address():
         ["slot", "1", "Mod1"], ["slot", "2", "Mod2"], ["slot", "4", "Mod4"], ["slot", "5", "Mod5"]]
 
 
-def test_what_the_plug_in_has_not_given_back_is_said_at_the_end():
+def test_what_the_plug_in_has_not_freed_is_reported_at_the_end():
     with Host(plugin=BUILD_DIR / "lib" / "libhost_leaking_plugin.so") as host:
         assert host.stop() == 0
         assert host.stderr == ("qitrmc-host: The plug-in has not given back to the driver: "

@@ -22,7 +22,7 @@ def write_program(path, text):
 
 @pytest.fixture
 def repository(tmp_path):
-    """A folder with scripts/run, a finished build and build steps that do nothing, yet only there."""
+    """A folder with scripts/run, a finished build and build steps that only check their folder."""
     folder = tmp_path / "the repository"
     for part in ("scripts", "build/release", "tools"):
         (folder / part).mkdir(parents=True)
@@ -35,7 +35,7 @@ def repository(tmp_path):
 
 @pytest.fixture
 def run(repository, tmp_path):
-    """Starts scripts/run in another folder. Gives the process and the two lines that it prints."""
+    """Starts scripts/run in another folder. Returns the process and the two lines printed."""
     started = []
     user_folder = tmp_path / "user"
     user_folder.mkdir()
@@ -61,7 +61,7 @@ def answer_to_printed_line(line):
                           check=True, timeout=60).stdout
 
 
-def test_files_were_looked_for_in_the_repository_and_not_where_the_user_stands(run, tmp_path):
+def test_files_were_looked_for_in_the_repository_instead_of_the_users_folder(run, tmp_path):
     shutil.copy(ROOT / "simulator" / "chassis" / "small.json", tmp_path / "user" / "rack.json")
     (tmp_path / "user" / "faults.json").write_text('{"faults": []}')
     process, listening, line = run("--chassis", "rack.json", "--state", "state", "--faults",
@@ -90,7 +90,7 @@ def test_the_script_finds_the_repository_from_a_relative_path(run, tmp_path, com
     assert '"session_id":"_session1"' in answer_to_printed_line(line)
 
 
-def test_the_printed_line_checks_the_certificate_only_where_there_is_none(run):
+def test_the_printed_line_skips_the_certificate_check_only_behind_https(run):
     assert run()[2].startswith("Try:  curl -s http://127.0.0.1:")
 
 

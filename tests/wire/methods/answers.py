@@ -1,7 +1,7 @@
-"""What the tests of the methods compare: sessions to ask in, and whole answers of failures.
+"""What the tests of the methods compare: sessions, and complete error responses.
 
-A failure is told by its code and by the details behind its explanation, as "Label: value" texts in
-their order. The explanations themselves stand in the tables that the product is built from.
+A failure is given by its code and by the details after its explanation, as "Label: value" texts in
+their order. The explanations come from the tables that the product is built from.
 """
 
 import contextlib
@@ -30,7 +30,7 @@ EXPLANATIONS = _explanations()
 
 
 def error(code, text, id="1"):
-    """The answer to a failure with a code and the whole text of its message."""
+    """The response to a failure with a code and the whole text of its message."""
     def member(name, text):
         return f'"{name}":' + json.dumps(text, ensure_ascii=False)
 
@@ -43,14 +43,14 @@ def error(code, text, id="1"):
 
 
 def failure(code, *details, id="1"):
-    """The answer to a failure with labelled details: they follow the explanation behind an empty
-    line, one to a line, and a blank stands for each line feed."""
+    """The response to a failure with labelled details: they follow the explanation after an empty
+    line, one per line, and each line feed is a blank."""
     text = EXPLANATIONS[code]
     return error(code, text + "  " + " ".join(details) if details else text, id)
 
 
 def wrong_parameter(pointer, details):
-    """The answer to params that do not fit the schema of their method."""
+    """The response to params that do not fit the schema of their method."""
     return failure(-32602, f"Parameter: {pointer}", f"Details: {details}")
 
 
@@ -62,7 +62,7 @@ class Session:
         self.id = session_id
 
     def body(self, method, params="", id="1"):
-        """A request in this session. params: the members behind session_id, as JSON text."""
+        """A request in this session. params: the members after session_id, as JSON text."""
         rest = "," + params if params else ""
         return call(method, f'{{"session_id":"{self.id}"{rest}}}', id)
 

@@ -1,4 +1,4 @@
-"""Fixtures of the tests of the methods, beside the host with the chassis Bench and its client."""
+"""Fixtures for the tests of the methods, beside the host with the chassis Bench and its client."""
 
 import json
 

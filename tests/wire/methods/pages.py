@@ -1,4 +1,4 @@
-"""Reading of the documents whose examples are tests."""
+"""Reads the documents whose examples are run as tests."""
 
 import json
 import re
@@ -8,7 +8,7 @@ TEXT_OR_BLANKS = re.compile(r'("(?:[^"\\]|\\.)*")|\s+')
 
 
 def compact(text):
-    """JSON without the blanks outside of its texts."""
+    """JSON without the blanks outside its strings."""
     return TEXT_OR_BLANKS.sub(lambda match: match[1] or "", text)
 
 
@@ -21,6 +21,6 @@ def blocks_of(page):
 
 
 def id_of(text):
-    """What an answer has in common with its request."""
+    """The id that a response shares with its request."""
     message = json.loads(text)
     return message["id"] if isinstance(message, dict) else tuple(one["id"] for one in message)

@@ -1,9 +1,9 @@
-"""A chassis that shows what the simulator's own one lacks.
+"""A chassis with everything that the simulator's built-in one lacks.
 
 Unit1, Unit2  properties of every type without limits, on the device and on the channels ch0 to ch3;
-              registers at both ends of the addresses and such that do something; NVMEM areas of 1 byte, of 1 MiB and guarded
-              in every way. Unit2 has no serial number.
-Crate         a chassis whose modules stand out of order: Four in slot 4, then One in slot 1, which
+              registers at both ends of the addresses and registers with side effects; NVMEM areas
+              of 1 byte, of 1 MiB and with every protection. Unit2 has no serial number.
+Crate         a chassis whose modules are out of order: Four in slot 4, then One in slot 1, which
               is a chassis itself, then Last in slot 64
 Empty         a chassis without modules, whose name and address are not ASCII
 Bare          a chassis that does not know its host name

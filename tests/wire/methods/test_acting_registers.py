@@ -1,4 +1,4 @@
-"""Registers of the chassis Bench that do something, and a command of it that can fail.
+"""Registers of the chassis Bench that have side effects, and one of its commands that can fail.
 
 Mod1  1024  flags: 0x80000005 after power-on; ones that are written clear their bits
       1028  a write carries out DMM.Trigger
@@ -24,7 +24,7 @@ def session(own_bench):
 
 
 def bits(number):
-    """A real number as the whole number that its register holds."""
+    """A real number as the integer that its register holds."""
     return int.from_bytes(struct.pack("<d", number), "little")
 
 
@@ -88,7 +88,7 @@ def test_a_register_keeps_to_the_limits_of_its_property(session):
     assert holds(session, "Mod1", 1040, 32, 2**32 - 1000)
 
 
-def test_voltages_stand_in_registers(session):
+def test_voltages_are_held_in_registers(session):
     assert write(session, "Mod2", 1024, 64, bits(12.5)) == written(1024)
     assert value(session, "PSU.Voltage", '"physical_channels":"Mod2/ch0:1"') == answer_of(
         "DoubleArray", "[12.5,0.0]")

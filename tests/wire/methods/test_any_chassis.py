@@ -1,7 +1,7 @@
-"""Walks through chassis that nobody wrote: any sound description loads, and all methods serve it.
+"""Walks through generated chassis: any valid description loads, and all methods serve it.
 
-Each walk is a model of its chassis: every answer is known from the description and from what the
-walk did before.
+Each walk is a model of its chassis: every response is predicted from the description and from what
+the walk did before.
 """
 
 import json
@@ -18,13 +18,13 @@ from walker import (Resource, Walker, areas_of, channels_of, content_of, devices
 sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "support"))
 from chassis_descriptions import BOUNDS, descriptions  # noqa: E402
 
-# A failure is told as it was found: each attempt to make it smaller would start a host.
+# Failures are reported as found, without shrinking: each attempt to shrink one would start a host.
 SETTINGS = settings(max_examples=40, phases=[Phase.generate], deadline=None, database=None, derandomize=True,
                     suppress_health_check=list(HealthCheck))
 
 
 def another_value(about, enums):
-    """A value that a property may have, not the one of the description where there is a choice."""
+    """A value that a property may have, if possible another one than in the description."""
     kind = about["type"].removesuffix("Array")
     if "enum" in about:
         scalar = max(enums[about["enum"]].values())
@@ -48,7 +48,7 @@ def assert_value(walker, resource, name, value, enums):
 
 
 def write_properties(walker, resource, enums):
-    """Writes all that can be written, and finds it again."""
+    """Writes every writable property and reads it back."""
     for name, about in resource.properties.items():
         value = another_value(about, enums)
         if access_to(about) == "ReadOnly":
@@ -76,7 +76,7 @@ def run_commands(walker, resource, enums):
 
 
 def use_areas(walker, device):
-    """Writes to the areas, and commits that. Returns what they hold then, by their names."""
+    """Writes to the areas and commits them. Returns their contents afterwards, by name."""
     lasting = {}
     for area in areas_of(device):
         about, content = area.about, bytearray(content_of(area.about))
@@ -140,7 +140,7 @@ def use_device(walker, device, enums):
 
 
 def use_chassis(walker, chassis):
-    """The methods of a chassis. Gives it and its modules new names."""
+    """Exercises the methods of a chassis. Gives it and its modules new names."""
     walker.open(devices=chassis["name"])
     by_slot = {module["slot"]: module["name"] for module in chassis["modules"]}
     for slot in range(1, 65):

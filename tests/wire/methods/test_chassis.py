@@ -1,4 +1,4 @@
-"""The chassis: its modules by slot, its place in the network, and its renaming."""
+"""The chassis: its modules by slot, its network address, and its renaming."""
 
 import pytest
 
@@ -36,7 +36,7 @@ def module(session, slot, device=""):
 @pytest.mark.parametrize("slot, answer", [(1, found("Mod1")), (2, found("Mod2")), (3, EMPTY),
                                           (4, found("Mod4")), (5, found("Mod5")), (6, EMPTY),
                                           (4294967295, EMPTY)])
-def test_a_slot_tells_its_module(bench, slot, answer):
+def test_the_module_of_each_slot_is_returned(bench, slot, answer):
     assert module(bench, slot, '"device":"Bench"') == answer
 
 
@@ -50,7 +50,7 @@ def test_a_chassis_without_modules_has_empty_slots(session):
     assert module(session, 1, '"device":"Empty"') == EMPTY
 
 
-# Where a chassis is asked for: the device named, and what comes of it.
+# For each device named in the request: the expected response.
 NO_CHASSIS = [
     ('"device":"Unit1"', NOT_A_CHASSIS), ('"device":"Four"', NOT_A_CHASSIS),
     ('"device":"Crate,Empty"', ONE_DEVICE), ('"device":"Crate,Crate"', ONE_DEVICE),
@@ -99,7 +99,7 @@ def test_the_default_device_is_the_chassis(client):
 
 def test_two_default_devices_are_not_one_chassis(client):
     with session_on(client, '{"devices":"Bench,Mod1"}') as session:
-        # The token for them is one name, and what it stands for has no single category.
+        # The token for them is one name, but its devices have no single category.
         refused = failure(-250966, "Property Name: Dev.ProductCategory")
         assert module(session, 2) == refused
         assert session.ask("GetChassisIpOrHostname") == refused
@@ -112,16 +112,16 @@ def identity(session, device=""):
 @pytest.mark.parametrize("device, answer", [
     ('"device":"Bench"', '{"chassis_ip":"192.0.2.10","chassis_hostname":"bench"}'),
     ('"device":"bENCH"', '{"chassis_ip":"192.0.2.10","chassis_hostname":"bench"}')])
-def test_a_chassis_tells_where_it_is_in_the_network(bench, device, answer):
+def test_a_chassis_returns_its_address_and_host_name(bench, device, answer):
     assert identity(bench, device) == result_response(answer)
 
 
-def test_a_name_in_the_network_may_be_any_text(session):
+def test_a_host_name_may_be_any_text(session):
     assert identity(session, '"device":"Empty"') == result_response(
         '{"chassis_ip":"2001:db8::1","chassis_hostname":"gehäuse.example"}')
 
 
-def test_a_chassis_that_lacks_one_of_the_two_fails(session):
+def test_a_chassis_without_address_or_host_name_is_an_error(session):
     assert identity(session, '"device":"Bare"') == failure(
         -250964, "Property Name: Dev.TCPIP.Hostname", "Resource Name: Bare")
     assert identity(session, '"device":"Crate"') == failure(
@@ -129,7 +129,7 @@ def test_a_chassis_that_lacks_one_of_the_two_fails(session):
 
 
 @pytest.mark.parametrize("device, answer", NO_CHASSIS)
-def test_only_one_chassis_tells_where_it_is(session, device, answer):
+def test_the_address_is_returned_for_exactly_one_chassis(session, device, answer):
     assert identity(session, device) == answer
 
 
@@ -167,14 +167,14 @@ def test_a_chassis_is_renamed_with_all_its_modules(own_bench):
         assert session.ask("getProperty", '"property":"Dev.Name"') == result_response(
             '{"data_type":"String","value":"Prüfstand-Mod4"}')
         assert rename(session, "Bench", "x") == failure(-250828, "Requested Value: Bench")
-        # Under its own name again, and under another after it.
+        # Renamed to its own name, and then to another one.
         assert rename(session, "Prüfstand", "Prüfstand") == renamed(
             "Prüfstand", "Prüfstand-Mod1", "Prüfstand-Mod2", "Prüfstand-Mod4", "Prüfstand-Mod5")
         assert rename(session, "Prüfstand", "B") == renamed("B", "B-Mod1", "B-Mod2", "B-Mod4",
                                                              "B-Mod5")
 
 
-def test_the_new_names_stand_in_the_order_of_the_modules(session):
+def test_the_new_names_are_in_the_order_of_the_modules(session):
     assert rename(session, "Crate", "C") == renamed("C", "C-Mod4", "C-Mod1", "C-Mod64")
     for old, new in (("C", "Crate"), ("C-Mod4", "Four"), ("C-Mod1", "One"), ("C-Mod64", "Last")):
         assert session.ask("renameDevice", f'"device":"{old}","new_device_name":"{new}"') == DONE
@@ -208,7 +208,7 @@ def test_a_name_that_is_taken_stops_the_renaming(own_bench):
         assert devices(session) == names("Bench", "B-Mod1", "Mod2", "Mod4", "B-Mod2")
 
 
-def test_a_name_that_cannot_be_changes_nothing(own_bench):
+def test_an_invalid_name_changes_nothing(own_bench):
     with session_on(own_bench) as session:
         for new, told, fault in [
                 ("a,b", "a,b-Mod1", "a name must not hold a comma, a slash or a colon"),
@@ -217,7 +217,7 @@ def test_a_name_that_cannot_be_changes_nothing(own_bench):
             assert rename(session, "Bench", new) == failure(
                 -250985, f"Requested Value: {told}", f"Details: {fault}")
         assert devices(session) == names("Bench", "Mod1", "Mod2", "Mod4", "Mod5")
-        # The modules' names would do without the chassis's.
+        # An empty prefix gives the modules valid names, but it is not a valid name for the chassis.
         assert rename(session, "Bench", "") == failure(
             -250985, "Requested Value: ", "Details: a name must not be empty")
         assert devices(session) == names("Bench", "-Mod1", "-Mod2", "-Mod4", "-Mod5")

@@ -1,4 +1,4 @@
-"""Commands: which there are, what they are, and how they run, end and are aborted."""
+"""Commands: which exist, what they are, and how they run, end and are aborted."""
 
 import pytest
 
@@ -111,13 +111,13 @@ def test_a_command_runs_on_several_resources(session):
                                             '[18446744073709551615,18446744073709551615,0]}')
 
 
-def test_a_command_that_takes_a_while_is_waited_for(session):
+def test_the_response_waits_until_a_slow_command_ends(session):
     assert execute(session, "Unit.Short", '"devices":"Unit2"') == DONE
     assert any_int32(session, "Unit2") == int32(8)
 
 
 @pytest.mark.parametrize("timeout", ["0", "0.001"])
-def test_a_command_is_given_up_after_its_time(session, timeout):
+def test_a_command_is_aborted_after_its_timeout(session, timeout):
     put_int32(session, "Unit2", 0)
     assert execute(session, "Unit.Short", f'"devices":"Unit2","timeout":{timeout}') == timed_out(
         "Unit.Short", timeout)
@@ -142,7 +142,7 @@ def test_a_command_that_cannot_run_is_refused(session, rest, answer):
     assert any_int32(session, "Unit1") == int32(0)
 
 
-def test_the_default_resources_carry_a_command_out(rack):
+def test_a_command_without_resources_runs_on_the_default_resources(rack):
     with session_on(rack, '{"devices":"Unit1,Unit2"}') as session:
         assert execute(session, "Unit.Set") == DONE
         assert any_int32(session, "Unit2") == int32(7)
@@ -151,7 +151,7 @@ def test_the_default_resources_carry_a_command_out(rack):
             -250975, "Command Name: Unit.Set", "Resource Name: Unit1/big")
 
 
-def test_a_device_of_another_session_carries_no_command_out(rack, session):
+def test_a_command_is_refused_on_a_device_of_another_session(rack, session):
     with session_on(rack, '{"devices":"Unit1"}'):
         assert execute(session, "Unit.Set", '"devices":"Unit1"') == failure(
             -250811, "Device: Unit1")
@@ -190,7 +190,7 @@ def test_an_abort_ends_the_waits_of_its_own_session_only(session, running):
 
 
 @pytest.mark.concurrent
-def test_a_register_starts_no_command_of_a_device_that_is_busy(session, running):
+def test_a_register_cannot_start_a_command_on_a_busy_device(session, running):
     waiting, busy = running
     register = '"device":"Unit1","address":3080,"size":32,"data":1'
     assert session.ask("writeRegister", register) == BUSY

@@ -33,7 +33,7 @@ def test_devices_are_connected_and_disconnected(rack):
         assert names_in(session, "ConnectedDevices") == names("Unit2", "Unit1")
         assert session.ask("disconnectFromDevices", '"devices":"Unit2"') == DONE
         assert names_in(session, "ConnectedDevices") == names("Unit1")
-        # That a device was not connected is a warning, which nobody sees.
+        # Disconnecting a device that is not connected is a warning, which is dropped.
         assert session.ask("disconnectFromDevices", '"devices":["Unit2","Unit1"]') == DONE
         assert names_in(session, "ConnectedDevices") == names()
 
@@ -60,7 +60,7 @@ def test_one_name_and_an_array_of_one_name_are_alike(rack, method):
 
 
 @pytest.mark.parametrize("method", ON_DEVICES)
-def test_the_default_devices_stand_in_for_none(rack, method):
+def test_without_devices_the_default_devices_are_used(rack, method):
     with session_on(rack, '{"devices":"Unit1,Unit2"}') as session:
         assert session.ask(method) == DONE
         held = () if method == "unreserveDevices" else ("Unit1", "Unit2")
@@ -79,29 +79,29 @@ def test_the_default_devices_stand_in_for_none(rack, method):
     ('"device":"Unit1"', wrong_parameter("#/params/device", UNSUPPORTED)),
     ('"force_reserve":true', wrong_parameter("#/params/force_reserve", UNSUPPORTED)),
 ])
-def test_what_names_no_device_is_refused(session, method, devices, answer):
+def test_devices_that_are_missing_or_invalid_are_refused(session, method, devices, answer):
     assert session.ask(method, devices) == answer
 
 
-def test_a_channel_s_session_has_default_devices(rack):
+def test_a_session_on_channels_has_default_devices(rack):
     with session_on(rack, '{"physical_channels":"Unit1/ch0:1"}') as session:
         assert session.ask("connectToDevices") == DONE
         assert names_in(session, "ConnectedDevices") == names("Unit1")
 
 
 def silent(device):
-    """A cause, indented by three blanks on each of its lines, with a blank for each line feed."""
+    """A nested cause, with its indentation of three blanks and a blank for each line feed."""
     return f"     {EXPLANATIONS[-250989]}        Device: {device}"
 
 
-def test_a_device_that_does_not_answer_is_told_with_its_cause(session):
+def test_an_unreachable_device_is_reported_with_its_cause(session):
     assert session.ask("connectToDevices", '"devices":["Unit1","Dead"]') == error(
         -250988, EXPLANATIONS[-250988] + "  The following devices cannot be reached: "
         "Device: Dead  Timeout: 10" + silent("Dead"))
     assert names_in(session, "ConnectedDevices") == names()
 
 
-def test_each_device_that_does_not_answer_is_a_cause(session):
+def test_each_unreachable_device_is_reported_as_a_cause(session):
     assert session.ask("connectToDevices", '"devices":["Lost","Dead"]') == error(
         -250988, EXPLANATIONS[-250988] + "  The following devices cannot be reached: "
         "Device: Lost Device: Dead  Timeout: 10" + silent("Lost") + silent("Dead"))
@@ -123,12 +123,12 @@ def test_a_device_is_reserved_for_reading(rack, session, access):
         assert reader.ask("reserveDevices", f'"devices":"Unit1","access":{access}') == DONE
         assert session.ask("reserveDevices", '"devices":"Unit1","access":1') == DONE
         assert session.ask("unreserveDevices", '"devices":"Unit1"') == DONE
-        # A reader stands in the way and is not told.
+        # A reading session that prevents the reservation is not named.
         assert session.ask("reserveDevices", '"devices":"Unit1"') == failure(
             -250811, "Device: Unit1")
 
 
-def test_the_sessions_in_the_way_are_told_in_the_order_of_their_ids(rack, session):
+def test_the_sessions_that_hold_a_device_are_listed_in_the_order_of_their_ids(rack, session):
     group = '"devices":"Unit1","reservation_group":"g"'
     with session_on(rack) as first, session_on(rack) as second:
         assert second.ask("reserveDevices", group) == DONE
@@ -144,13 +144,13 @@ def test_the_sessions_in_the_way_are_told_in_the_order_of_their_ids(rack, sessio
             -250811, "Device: Unit1")
 
 
-def test_several_devices_in_the_way_are_told_together(rack, session):
+def test_several_reserved_devices_are_reported_together(rack, session):
     with session_on(rack, '{"devices":"Unit1,Unit2"}') as holder:
         assert session.ask("reserveDevices", '"devices":["Unit1","Unit2"]') == failure(
             -250811, "Devices: Unit1, Unit2", f"Reserved by Sessions: {holder.id}")
 
 
-def test_a_session_that_gave_up_a_part_is_told_no_more(rack, session):
+def test_a_session_that_released_one_of_its_devices_is_no_longer_named_as_holder(rack, session):
     with session_on(rack, '{"devices":"Unit1,Unit2"}') as holder:
         assert holder.ask("unreserveDevices", '"devices":"Unit1"') == DONE
         assert session.ask("reserveDevices", '"devices":"Unit2"') == failure(
@@ -160,7 +160,7 @@ def test_a_session_that_gave_up_a_part_is_told_no_more(rack, session):
             -250811, "Device: Unit2", f"Reserved by Sessions: {holder.id}")
 
 
-def test_a_reservation_waits_no_longer_than_it_says(rack, session):
+def test_a_reservation_waits_no_longer_than_its_timeout(rack, session):
     with session_on(rack, '{"devices":"Unit1"}') as holder:
         assert session.ask("reserveDevices", '"devices":"Unit1","reservation_timeout":0.01') == (
             failure(-250811, "Device: Unit1", f"Reserved by Sessions: {holder.id}"))
@@ -168,7 +168,7 @@ def test_a_reservation_waits_no_longer_than_it_says(rack, session):
             failure(-250962, "Timeout: -1"))
 
 
-def test_what_a_session_does_not_hold_is_given_up_without_a_word(session):
+def test_releasing_a_device_that_the_session_does_not_hold_succeeds(session):
     assert session.ask("unreserveDevices", '"devices":"Unit1"') == DONE
 
 
@@ -179,7 +179,7 @@ def test_a_reservation_does_not_give_a_session_default_devices(rack):
         assert session.ask("resetDevices") == failure(-250959)
 
 
-def test_a_reset_puts_back_what_power_on_gives(rack):
+def test_a_reset_restores_the_state_after_power_on(rack):
     with session_on(rack, '{"devices":"Unit1"}') as session:
         for name, resource in (("Any.Int32", '"devices":"Unit1"'),
                                ("Any.Int32", '"physical_channels":"Unit1/ch2"')):
@@ -195,7 +195,7 @@ def test_a_reset_puts_back_what_power_on_gives(rack):
             '{"next_address":1,"data":0}')
 
 
-def test_a_reader_and_a_stranger_reset_nothing(rack, session):
+def test_a_reset_is_refused_without_a_reservation_for_writing(rack, session):
     with session_on(rack, '{"devices":"Unit1","access":1}') as reader:
         assert reader.ask("resetDevices") == error(
             -250972, EXPLANATIONS[-250972] +
@@ -239,7 +239,7 @@ def test_a_renamed_device_is_known_by_its_new_name(rack):
     ("Unit1", "x" * 65, failure(-250985, "Requested Value: " + "x" * 65,
                                 "Details: a name has at most 64 bytes")),
 ])
-def test_a_name_that_cannot_be_is_refused_by_the_driver(session, old, new, answer):
+def test_an_invalid_name_is_refused_by_the_driver(session, old, new, answer):
     assert rename(session, old, new) == answer
 
 

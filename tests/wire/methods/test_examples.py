@@ -1,11 +1,11 @@
-"""The programs in examples/, run as a newcomer runs them."""
+"""The programs in examples/, run as a new user runs them."""
 
 import subprocess
 
 from hostlib import BUILD_DIR
 
 
-def test_the_voltage_example_says_what_it_did():
+def test_the_voltage_example_prints_what_it_did():
     result = subprocess.run([BUILD_DIR / "bin" / "example_voltage"], capture_output=True, text=True,
                             timeout=60)
     assert (result.returncode, result.stderr) == (0, "")

@@ -1,6 +1,6 @@
-"""The reference of the methods lists the codes that they fail with: each of them is provoked here.
+"""The reference lists the error codes of each method: each of them is provoked here.
 
-What the failures say is compared where the methods are tested; here it is the list that matters.
+The texts of the failures are tested with their methods; here only the list is tested.
 """
 
 import contextlib
@@ -16,7 +16,7 @@ PAGE_TABLE = pathlib.Path(__file__).resolve().parents[3] / "docs" / "methods.jso
 
 
 def bad_names(member):
-    """A name that is not known, and a bad range that is not UTF-8 either."""
+    """An unknown name, and a malformed range that is not valid UTF-8 either."""
     return [(-250828, f'"{member}":"Unit9"'), (-250832, f'"{member}":"Unit1/ch2:1\udcff"')]
 
 
@@ -44,8 +44,8 @@ def with_more(cases, more):
 PROPERTY = '"property":"Any.Int32"'
 COMMAND = '"command":"Unit.Bare"'
 
-# Method: code, params behind session_id, and how the session is opened (opening) and what another
-# one holds (held), where it is not nothing.
+# Method: code, params after session_id, and, where needed, how the session is opened (opening) and
+# what another session holds (held).
 FAILURES = {
     "initializeSession": [
         (-250811, UNIT1, TAKEN), (-250828, '"physical_channels":"a/b2:1"'),
@@ -149,8 +149,8 @@ FAILURES = {
         (-250966, "", {"opening": '{"devices":"Unit1,Unit2"}'})],
 }
 
-# What takes two connections, a hundred sessions or a state folder, and has a test of its own; and
-# -250987, which would take ten seconds and has one with the driver alone.
+# Codes with a test of their own because they need two connections, a hundred sessions or a state
+# folder; and -250987, which would take ten seconds and is tested with the driver alone.
 PROVOKED_ELSEWHERE = {"initializeSession": {-250901, -250931}, "connectToDevices": {-250963, -250987},
                       "executeCommand": {-250931, -250963, -250977}, "renameDevice": {-250931},
                       "setProperty": {-250931}, "commitProperties": {-250931},

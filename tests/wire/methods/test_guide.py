@@ -1,4 +1,4 @@
-"""The exchanges of docs/guide.md, sent in their order to a service that was just started.
+"""The exchanges of docs/guide.md, sent in their order to a newly started service.
 
 They are compared byte by byte, but for the blanks and line feeds between the tokens of JSON, which
 wrap them on the page. The ids of sessions are those of a fresh service, so that nothing has to be
@@ -24,8 +24,8 @@ def exchanges():
 
 
 def wait_until_busy(host, request):
-    """Returns when the device of a command carries it out. A second command without any time is
-    refused then, and given up without an effect before."""
+    """Returns once the device is executing the command. A second command without any timeout is
+    refused from then on, and before that times out without an effect."""
     params = json.loads(request)["params"]
     probe = call("executeCommand", {**params, "timeout": 0})
     with Client(host) as client:
@@ -36,7 +36,7 @@ def wait_until_busy(host, request):
             assert code == OUT_OF_TIME
 
 
-def test_the_exchanges_of_the_guide_come_back(own_host):
+def test_the_exchanges_of_the_guide_are_reproduced(own_host):
     blocks = exchanges()
     waiting = {}
     for (kind, text), following in zip(blocks, [*blocks[1:], None]):
@@ -59,5 +59,5 @@ def test_every_request_of_the_guide_is_answered_in_it():
     assert len(set(asked)) == len(asked) > 30
 
 
-def test_blanks_in_texts_are_compared():
+def test_blanks_inside_strings_are_compared():
     assert compact('{"a b" : [1, "x \\" y"]}\n') == '{"a b":[1,"x \\" y"]}'

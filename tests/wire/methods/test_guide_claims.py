@@ -1,4 +1,4 @@
-"""What docs/guide.md claims without an exchange: limits, restarts, and the registers of Bench."""
+"""Claims of docs/guide.md that no exchange shows: limits, restarts, and the registers of Bench."""
 
 import json
 import pathlib
@@ -26,7 +26,7 @@ def renaming(name):
     return request
 
 
-# What is beyond a limit, the answer to it, and what is not beyond it.
+# A request beyond a limit, the response to it, and a request within the limit.
 BODIES = [
     (nested(1001), error_response("null", -32700), nested(1000)),
     (call("x", '{"a":1e309}'), error_response("null", -32700), call("x", '{"a":1e308}')),
@@ -50,7 +50,7 @@ def test_a_range_of_1024_names_is_read_and_one_of_1025_refused(client):
     with client.session() as session:
         texts = [json.loads(client.ask_whole(reading(last)))["error"]["data"]["qitrmc_message"]
                  for last in (1023, 1024)]
-    # The first is read as a range, of which the service misses the first channel that is not there.
+    # 1024 names are read as a range, and its first unknown channel is reported.
     assert [text.rpartition("Requested Value: ")[2] for text in texts] == ["Mod2/ch2", "Mod2/ch0:1024"]
 
 
@@ -85,7 +85,7 @@ def test_a_restart_closes_all_sessions():
         client.close_session(client.open_session('{"devices":"Mod1"}'))
 
 
-def test_an_unexplained_code_keeps_code_and_id_only_with_details():
+def test_an_unexplained_code_is_reported_with_code_and_id_only_if_it_has_details():
     details = {"usage": "kUsageTypeDevice", "value": "Mod1"}
     faults = {"faults": [
         {"function": "abortSession", "status": {"code": -77777, "json": ""}},

@@ -1,4 +1,4 @@
-"""docs/methods.md says what the program does: it is up to date, and its exchanges come back."""
+"""docs/methods.md describes what the program does: it is up to date, and its exchanges are real."""
 
 import json
 import pathlib
@@ -20,7 +20,7 @@ EXCHANGES = json.loads((DOCS / "exchanges.json").read_text(encoding="utf-8"))
 
 @pytest.fixture
 def sources(monkeypatch, tmp_path):
-    """Changes a source for the length of a test: sources("TABLE", value) or with text."""
+    """Replaces a source during a test: sources("TABLE", value), or the same with its text."""
     def put(name, content):
         path = tmp_path / name
         text = content if isinstance(content, str) else json.dumps(content)
@@ -46,7 +46,7 @@ def test_the_page_has_a_section_for_each_method():
     assert sections == ["Errors of every method", *methods]
 
 
-def test_a_method_without_an_entry_is_a_fault(sources):
+def test_a_method_without_an_entry_is_an_error(sources):
     methods = make_methods.METHODS.read_text(encoding="utf-8")
     row = 'QITRMC_METHOD("newMethod", NewMethod,\n              "procedure_close_session.json")\n'
     sources("METHODS", methods.replace("#undef", row + "#undef"))
@@ -55,34 +55,34 @@ def test_a_method_without_an_entry_is_a_fault(sources):
 
 
 @pytest.mark.parametrize("method", TABLE["methods"])
-def test_a_missing_entry_is_a_fault(sources, method):
+def test_a_missing_entry_is_an_error(sources, method):
     sources("TABLE", {**TABLE, "methods": without(TABLE["methods"], method)})
     with pytest.raises(make_methods.Fault, match="TABLE"):
         make_methods.page_text()
 
 
-def test_a_missing_exchange_is_a_fault(sources):
+def test_a_missing_exchange_is_an_error(sources):
     sources("EXCHANGES", EXCHANGES[:-1])
     with pytest.raises(make_methods.Fault, match="EXCHANGES"):
         make_methods.page_text()
 
 
 @pytest.mark.parametrize("part", ["purpose", "result", "errors"])
-def test_a_missing_part_of_an_entry_is_a_fault(sources, part):
+def test_a_missing_part_of_an_entry_is_an_error(sources, part):
     entry = without(TABLE["methods"]["readRegister"], part)
     sources("TABLE", {**TABLE, "methods": {**TABLE["methods"], "readRegister": entry}})
     with pytest.raises(make_methods.Fault, match=part):
         make_methods.page_text()
 
 
-def test_a_parameter_without_meaning_is_a_fault(sources):
+def test_a_parameter_without_a_description_is_an_error(sources):
     sources("TABLE", {**TABLE, "parameters": without(TABLE["parameters"], "force_reserve")})
     with pytest.raises(make_methods.Fault, match="force_reserve"):
         make_methods.page_text()
 
 
 @pytest.mark.parametrize("recorded", EXCHANGES, ids=lambda exchange: exchange["method"])
-def test_a_recorded_exchange_comes_back(recorded):
+def test_a_recorded_exchange_is_reproduced(recorded):
     method = recorded["method"]
     with clean_host() as host:
         played = make_methods.play(method, TABLE["methods"][method],

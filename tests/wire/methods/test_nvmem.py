@@ -1,4 +1,4 @@
-"""NVMEM: bytes both ways, from none to a mebibyte, what guards an area, and the commit."""
+"""NVMEM: reading and writing of 0 bytes to 1 MiB, the protections of an area, and the commit."""
 
 import pytest
 
@@ -65,7 +65,7 @@ def test_bytes_are_read_back_as_they_were_written(session):
     assert session.ask("getNvmemBytes", of("Unit1/big", reading(999, 3))) == read("[0,0,1]", 1000)
 
 
-def test_a_mebibyte_goes_both_ways(session):
+def test_a_mebibyte_is_written_and_read_back(session):
     whole = "[" + ",".join(str(i * 7 % 256) for i in range(MEBIBYTE)) + "]"
     assert session.ask("setNvmemBytes", of("Unit2/big", writing(0, whole))) == written(1)
     assert session.ask("getNvmemBytes", of("Unit2/big", reading(0, MEBIBYTE))) == read(whole, 1)
@@ -106,10 +106,10 @@ def wrong_serial(given):
     ("Unit1/both", f"{PASSWORD},{SERIAL}", written(1)),
     ("Unit1/both", SERIAL, WRONG_PASSWORD),
     ("Unit1/both", PASSWORD, wrong_serial("")),
-    # The guards come before the bytes.
+    # The protections are checked before the bytes.
     ("Unit1/both", "", wrong_serial("")),
 ])
-def test_a_guarded_area_asks_who_writes(session, area, guards, answer):
+def test_a_protected_area_needs_its_serial_number_or_password(session, area, guards, answer):
     before = session.ask("getNvmemBytes", of(area, reading(0, 4)))
     bytes_ = writing(0, "[9,8,7,6]")
     assert session.ask("setNvmemBytes", of(area, bytes_, *filter(None, [guards]))) == answer
@@ -119,7 +119,7 @@ def test_a_guarded_area_asks_who_writes(session, area, guards, answer):
 
 @pytest.mark.parametrize("name, flags", [("big", "000"), ("serial", "100"), ("password", "010"),
                                          ("both", "110"), ("closed", "001")])
-def test_an_area_tells_how_it_is_guarded(session, name, flags):
+def test_the_protections_of_an_area_are_properties(session, name, flags):
     guards = ("NVMEMArea.SerialNumWanted", "NVMEMArea.PasswordWanted", "NVMEMArea.Writable")
     expected = (flags[0] == "1", flags[1] == "1", flags[2] == "0")
     for prop, flag in zip(guards, expected):
@@ -144,7 +144,7 @@ def get(session, area):
 @pytest.mark.parametrize("commit", ['"nvmem_areas":"Unit2/byte"', '"devices":"Unit2"',
                                     '"nvmem_areas":["Unit2/big","unit2/BYTE"]',
                                     '"devices":["Unit2","Unit1"]'])
-def test_a_commit_makes_written_bytes_last(rack, session, commit):
+def test_a_commit_makes_written_bytes_permanent(rack, session, commit):
     with session_on(rack, '{"devices":"Unit2","reservation_group":"g"}') as owner:
         put(owner, "Unit2/byte", 1)
         assert is_pending(owner, "Unit2/byte")
@@ -163,7 +163,7 @@ def test_a_reset_drops_what_was_not_committed(session):
     assert get(session, "Unit2/byte") == before
 
 
-def test_the_default_areas_stand_in_for_none(rack):
+def test_without_areas_the_default_areas_are_used(rack):
     with session_on(rack, '{"nvmem_areas":"Unit2/byte"}') as session:
         assert session.ask("setNvmemBytes", writing(0, "[5]")) == written(1)
         assert session.ask("getNvmemBytes", reading(0, 1)) == read("[5]", 1)
@@ -209,7 +209,7 @@ ONE_OF = "You must specify none or only one of the following parameters: devices
      wrong_parameter("#/params", ONE_OF)),
     ("commitNvmemAreas", '"devices":"Unit9"', failure(-250828, "Requested Value: Unit9")),
 ])
-def test_what_names_no_bytes_of_an_area_is_refused(session, method, params, answer):
+def test_params_that_do_not_select_bytes_of_an_area_are_refused(session, method, params, answer):
     assert session.ask(method, params) == answer
 
 

@@ -1,4 +1,4 @@
-"""Where a property is looked for: in the session, in the system, on the resources named."""
+"""Where a property is searched: in the session, in the system, or on the resources named."""
 
 import pytest
 
@@ -16,7 +16,7 @@ VALUES = {"Bool": ("false", "true"), "Double": ("0.0", "2.5"), "Int32": ("0", "-
           "Int32Array": ("[]", "[-5]"), "Int64Array": ("[]", "[-5]"),
           "StringArray": ("[]", '["x"]'), "UInt32Array": ("[]", "[5]"),
           "UInt64Array": ("[]", "[5]")}
-# What the driver can do for properties that belong to no resource.
+# What the driver supports for properties that belong to no resource.
 READABLE = {"Sys": {"Bool", "Double", "UInt64", "StringArray"},
             "Session": {"Double", "StringArray"}}
 WRITABLE = {"Sys": {"Bool", "Double"}, "Session": {"Double", "String", "StringArray"}}
@@ -35,14 +35,14 @@ def session(rack):
 
 
 @pytest.mark.parametrize("prefix, type", EVERY)
-def test_a_property_of_no_resource_is_read_where_the_driver_can(session, prefix, type):
+def test_a_property_without_a_resource_is_read_if_its_type_is_supported(session, prefix, type):
     readable = type in READABLE[prefix]
     assert session.ask("getProperty", f'"property":"{prefix}.Any.{type}"') == (
         value(type, VALUES[type][0]) if readable else failure(INTERNAL_ERROR))
 
 
 @pytest.mark.parametrize("prefix, type", EVERY)
-def test_a_property_of_no_resource_is_written_where_the_driver_can(session, prefix, type):
+def test_a_property_without_a_resource_is_written_if_its_type_is_supported(session, prefix, type):
     first, other = VALUES[type]
     prop = f'"property":"{prefix}.Any.{type}"'
     answer = session.ask("setProperty", f'{prop},"value":{other}')
@@ -56,7 +56,7 @@ def test_a_property_of_no_resource_is_written_where_the_driver_can(session, pref
         session.ask("setProperty", f'{prop},"value":{first}')
 
 
-def test_a_value_is_checked_before_the_driver_is_asked_for_what_it_cannot_do(session):
+def test_a_value_is_checked_before_the_support_of_the_driver(session):
     assert session.ask("setProperty", '"property":"Sys.Any.Int32","value":1.0') == failure(
         -250819, "Requested Data Type: Int32")
 
@@ -64,19 +64,19 @@ def test_a_value_is_checked_before_the_driver_is_asked_for_what_it_cannot_do(ses
 @pytest.mark.parametrize("resources", [
     '"devices":"Unit1"', '"devices":["Unit1","Unit2"]', '"devices":"$DefaultDevices"',
     '"devices":[]', '"physical_channels":"Unit1/ch0:3"', '"nvmem_areas":"Unit1/big"'])
-def test_resources_beside_a_property_of_the_session_are_ignored(session, resources):
+def test_resources_given_with_a_property_of_the_session_are_ignored(session, resources):
     assert session.ask("getProperty", f'"property":"Session.ReservedDevices",{resources}') == value(
         "StringArray", '["Unit1","Unit2"]')
     assert session.ask("getProperty", f'"property":"Sys.Simulated",{resources}') == value(
         "Bool", "true")
 
 
-def test_unknown_resources_are_refused_even_where_they_do_not_matter(session):
+def test_unknown_resources_are_refused_even_where_resources_are_ignored(session):
     assert session.ask("getProperty", '"property":"Sys.Simulated","devices":"Unit9"') == failure(
         -250828, "Requested Value: Unit9")
 
 
-def test_the_session_s_own_properties_tell_of_it(session):
+def test_the_properties_of_a_session_describe_it(session):
     assert session.ask("getProperty", '"property":"Session.DefaultDevices"') == value(
         "StringArray", '["Unit1","Unit2"]')
     assert session.ask("getProperty", '"property":"Session.ConnectedDevices"') == value(
@@ -121,7 +121,7 @@ def test_without_resources_only_listed_names_are_known(rack, method, more, name)
 @pytest.mark.parametrize("name, nearest", [
     ("No.Such", []), ("any.int32", ["Nearest Name: Any.Int32"]),
     ("dev.name", ["Nearest Name: Dev.Name"]), ("Any.Int32 ", ["Nearest Name: Any.Int32"]), ("", [])])
-def test_an_unknown_name_on_a_resource_is_the_driver_s_to_refuse(session, name, nearest):
+def test_an_unknown_name_on_a_resource_is_refused_by_the_driver(session, name, nearest):
     details = [f"Property Name: {name}", "Resource Name: Unit1", *nearest]
     assert session.ask("getProperty", f'"property":"{name}","devices":"Unit1"') == failure(
         -250964, *details)
@@ -129,7 +129,7 @@ def test_an_unknown_name_on_a_resource_is_the_driver_s_to_refuse(session, name, 
         failure(-250964, *details))
 
 
-def test_a_hidden_name_is_still_open_to_those_who_name_a_resource(session):
+def test_an_unlisted_property_can_be_read_with_a_resource(session):
     assert session.ask("getProperty", '"property":"Dev.Events","devices":"Unit1"') == value(
         "StringArray", "[]")
 
@@ -137,7 +137,7 @@ def test_a_hidden_name_is_still_open_to_those_who_name_a_resource(session):
 @pytest.mark.parametrize("resources", ['"devices":[]', '"devices":""', '"devices":["",""]',
                                        '"devices":"$ConnectedDevices"', '"physical_channels":[]',
                                        '"nvmem_areas":"$DefaultNVMEMAreas"'])
-def test_a_list_that_is_empty_in_the_end_leaves_it_to_the_driver(session, resources):
+def test_an_empty_list_of_resources_is_refused_by_the_driver(session, resources):
     answer = session.ask("getProperty", f'"property":"Any.Int32",{resources}')
     if resources in ('"devices":""', '"devices":["",""]'):
         assert answer == failure(-250828, "Requested Value: ")
@@ -182,14 +182,14 @@ def test_letter_case_of_resource_names_does_not_matter(session, resources, answe
         "String", answer)
 
 
-def test_a_property_that_can_only_be_written_is_not_read(session):
+def test_a_write_only_property_is_not_read(session):
     prop = '"property":"Info.Secret","devices":"Unit1"'
     assert session.ask("setProperty", f'{prop},"value":"x"') == result_response(
         '{"data_type":"String"}')
     assert session.ask("getProperty", prop) == failure(-250969, "Property Name: Info.Secret")
 
 
-def test_a_property_that_can_only_be_read_is_not_written(session):
+def test_a_read_only_property_is_not_written(session):
     assert session.ask("setProperty", '"property":"Info.Plain","devices":"Unit1","value":1') == (
         failure(-250968, "Property Name: Info.Plain", "Resource Name: Unit1"))
 
@@ -202,7 +202,7 @@ def test_a_value_beyond_its_limits_is_refused(session, sent, read):
                                     "Maximum Value: 1e+300")
 
 
-def test_a_value_that_is_no_item_of_its_enumeration_is_refused(session):
+def test_a_value_outside_its_enumeration_is_refused(session):
     assert session.ask("setProperty", '"property":"Info.Mode","devices":"Unit1","value":4') == (
         failure(-250970, "Property Name: Info.Mode", "Resource Name: Unit1", "Requested Value: 4",
                 'Allowed Values: Zulu (3), Alpha (-2147483648), ä "b" (2147483647)'))
@@ -216,7 +216,7 @@ def test_a_value_that_is_no_item_of_its_enumeration_is_refused(session):
 COMMENT = '"property":"Dev.Comment","devices":"Empty"'
 
 
-def test_a_reader_does_not_write(rack):
+def test_a_session_that_reserves_for_reading_cannot_write(rack):
     with session_on(rack, '{"devices":"Empty","access":1}') as reader:
         assert reader.ask("getProperty", COMMENT) == value("String", '""')
         assert reader.ask("setProperty", f'{COMMENT},"value":"x"') == error(

@@ -1,4 +1,4 @@
-"""Which properties there are, what they are, and what is pending."""
+"""Which properties exist, what they are, and which changes are pending."""
 
 import pytest
 
@@ -48,7 +48,7 @@ def session(rack):
         yield opened
 
 
-def test_the_properties_of_the_session_stand_before_those_of_the_system(bench):
+def test_the_properties_of_the_session_come_before_those_of_the_system(bench):
     assert bench.ask("getSessionPropertyList") == result_response(
         f'{{"properties":[{SESSION_NAMES},{SYSTEM_NAMES}]}}')
 
@@ -63,7 +63,8 @@ def test_the_properties_of_the_session_stand_before_those_of_the_system(bench):
                                             '"DMM.Voltage","DMM.SampleClock"')),
     ('"nvmem_area":"Mod1/user"', lists(AREA_NAMES)),
     ('"nvmem_area":"Mod1/user,Mod2/user"', lists(AREA_NAMES)),
-    # The driver's own list is that of one resource; that it fails for others is not told.
+    # The driver lists properties of its own for one resource only; its failure for several is
+    # not reported.
     ('"device":"Mod1,Mod5"', lists(DEVICE_NAMES)),
     ('"physical_channel":"Mod1/ch0:3"', lists(CHANNEL_NAMES)),
     ('"device":"$ConnectedDevices"', lists(DEVICE_NAMES)),
@@ -79,7 +80,7 @@ def test_a_resource_has_properties_of_its_kind_and_of_its_own(bench, resource, a
                                                '"DMM.Voltage","DMM.SampleClock"')),
     ('{"nvmem_areas":"Mod1/user"}', lists(AREA_NAMES)),
 ])
-def test_the_default_resource_stands_in_for_none(client, params, answer):
+def test_without_a_resource_the_default_resource_is_used(client, params, answer):
     with session_on(client, params) as session:
         assert session.ask("getDevicePropertyList") == answer
 
@@ -157,13 +158,13 @@ def test_an_array_on_several_resources_is_not_described(session):
 
 @pytest.mark.parametrize("name, nearest", [
     ("No.Such", []), ("info.full", ["Nearest Name: Info.Full"])])
-def test_what_is_not_there_is_not_described(session, name, nearest):
+def test_an_unknown_property_or_resource_is_not_described(session, name, nearest):
     assert session.ask("getPropertyInformation", f'"property":"{name}","device":"Unit1"') == (
         failure(-250964, f"Property Name: {name}", "Resource Name: Unit1", *nearest))
 
 
 class Held:
-    """Info.Held, which takes effect at a commit, as one session sees it."""
+    """Info.Held, which takes effect at a commit, as seen from one session."""
 
     def __init__(self, session, many, one):
         self.session, self.many, self.one = session, many, one
@@ -228,7 +229,7 @@ def test_the_default_resources_are_committed(rack):
         assert held.is_now("1")
 
 
-def test_nothing_cannot_be_committed(session):
+def test_a_commit_without_exactly_one_list_of_resources_is_refused(session):
     assert session.ask("commitProperties") == failure(-250959)
     assert session.ask("commitProperties", '"devices":[]') == failure(-250959)
     assert session.ask("commitProperties", '"devices":"Unit1","physical_channels":"Unit1/ch0"') == (

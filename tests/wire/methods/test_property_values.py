@@ -1,5 +1,5 @@
-"""Values of properties: every type both ways without loss, alone, as array and over several
-resources."""
+"""Values of properties: every type is written and read without loss, as a single value, as an array
+and over several resources."""
 
 import json
 
@@ -16,7 +16,7 @@ def same(*texts):
     return [(text, text) for text in texts]
 
 
-# Type: pairs of what is written and what is read back then.
+# Type: pairs of the value that is written and the value that is then read.
 VALUES = {
     "Bool": same("true", "false"),
     "Double": same("0.0", "-0.0", "1.5", "0.1", "-1.7976931348623157e308",
@@ -24,7 +24,7 @@ VALUES = {
                    "3.14159265358979", "-123456789.123457", "1e-7", "1e300") + [
         # An integer is converted, and as an integer -0 is 0.
         ("1", "1.0"), ("-7", "-7.0"), ("0", "0.0"), ("-0", "0.0"), ("4294967296", "4294967296.0"),
-        # The nearest double to an integer that none holds, and of two the even one.
+        # The double nearest to an integer that no double represents, and of two the even one.
         ("9007199254740993", "9007199254740992.0"),
         ("1e2", "100.0"), ("1E+2", "100.0"), ("1e-400", "0.0")],
     "Int32": same("0", "1", "-1", "2147483647", "-2147483648"),
@@ -39,7 +39,7 @@ VALUES = {
     "UInt64": same("0", "9007199254740993", "9223372036854775808", "18446744073709551615"),
 }
 
-# Type: what is no value of it, among what the schema lets through for a single value.
+# Type: invalid values that the schema accepts for a single value.
 WRONG = {
     "Bool": ["0", "1", '"true"', '""'],
     "Double": ["true", '"1"', '""'],
@@ -51,8 +51,8 @@ WRONG = {
     "UInt32": ["-1", "1.0", "4294967296", "-2147483648", "true", '"1"'],
     "UInt64": ["-1", "1.0", "1e2", "18446744073709551616", "-9223372036854775808", "true", '"1"'],
 }
-# Type: one right value, to stand beside a wrong one in an array. The schema lets arrays of one
-# kind through only.
+# Type: one valid value, to be put beside an invalid one in an array. The schema accepts only arrays
+# of one kind.
 GOOD = {"Bool": "true", "Double": "1.5", "Int32": "1", "Int64": "1", "String": '"x"',
         "UInt32": "1", "UInt64": "1"}
 
@@ -80,7 +80,7 @@ def session(rack):
 
 
 class Property:
-    """A property of the rack as one test sees it."""
+    """A property of the rack, as used by one test."""
 
     def __init__(self, session, name, resources='"devices":"Unit1"'):
         self.session = session
@@ -160,7 +160,7 @@ def test_one_wrong_element_refuses_the_array(session, type, text):
 
 
 @pytest.mark.parametrize("type", SCALARS)
-def test_a_single_value_is_no_array_and_several_are_no_single_value(session, type):
+def test_a_single_value_and_an_array_are_not_interchangeable(session, type):
     good = GOOD[type]
     assert Property(session, f"Any.{type}Array").set(good) == wrong_type(f"{type}Array")
     assert Property(session, f"Any.{type}").set(f"[{good},{good}]") == wrong_type(type)
@@ -205,7 +205,7 @@ def test_a_token_stands_for_the_devices_of_the_session(rack, type):
             prop = Property(session, f"Any.{type}", f'"devices":"{token}"')
             assert prop.set(f"[{first},{second}]") == written(f"{type}Array")
             assert prop.get() == value(f"{type}Array", f"[{first},{second}]")
-        # No resource at all means the default ones.
+        # Without a resource the default ones are used.
         assert session.ask("getProperty", f'"property":"Any.{type}"') == value(
             f"{type}Array", f"[{first},{second}]")
         connected = Property(session, f"Any.{type}", '"devices":"$ConnectedDevices"')
@@ -247,20 +247,20 @@ def test_a_token_of_several_devices_cannot_spread_an_array_either(rack):
 
 
 @pytest.mark.parametrize("count", [1, 3])
-def test_each_resource_gets_a_value_of_its_own(session, count):
+def test_the_number_of_values_must_equal_the_number_of_resources(session, count):
     prop = Property(session, "Any.Int32", '"devices":["Unit1","Unit2"]')
     assert prop.set("[" + ",".join("5" * count) + "]") == failure(
         -250967, "Property Name: Any.Int32", f"Value Count: {count}")
 
 
-def test_a_large_array_goes_both_ways(session):
+def test_a_large_array_is_written_and_read_back(session):
     numbers = "[" + ",".join(str(2**53 + 1 + i) for i in range(50000)) + "]"
     prop = Property(session, "Any.UInt64Array", '"physical_channels":"Unit1/ch0"')
     assert prop.set(numbers) == written("UInt64Array")
     assert prop.get() == value("UInt64Array", numbers)
 
 
-def test_a_long_text_goes_both_ways(session):
+def test_a_long_text_is_written_and_read_back(session):
     text = '"' + "é😀x" * 40000 + '"'
     prop = Property(session, "Any.String", '"physical_channels":"Unit1/ch0"')
     assert prop.set(text) == written("String")

@@ -1,4 +1,4 @@
-"""Registers of the four widths, at both ends of the addresses and beyond what a device maps."""
+"""Registers of the four widths, at both ends of the addresses and outside what a device maps."""
 
 import pytest
 
@@ -35,19 +35,19 @@ def misaligned(address, width):
     return failure(-250979, f"Register Address: {address}", f"Register Width: {width}")
 
 
-# Each width at the first and at the last address that it fits, with the address behind.
+# Each width at the first and at the last address where it fits, with the address after it.
 PLACES = [(0, 8, 1), (0, 16, 1), (0, 32, 1), (0, 64, 1), (8, 64, 9), (TOP, 8, 0),
           (TOP - 1, 16, TOP), (TOP - 3, 32, TOP - 2), (TOP - 7, 64, TOP - 6)]
 
 
 @pytest.mark.parametrize("address, size, behind", PLACES)
-def test_the_next_address_is_one_further_whatever_the_width(session, address, size, behind):
+def test_the_next_address_is_one_higher_for_every_width(session, address, size, behind):
     for data in (0, 1, MOST[size] // 2 + 1, MOST[size] - 1, MOST[size]):
         assert session.ask("writeRegister", at(address, size, f'"data":{data}')) == written(behind)
         assert session.ask("readRegister", at(address, size)) == read(behind, data)
 
 
-def test_an_odd_64_bit_number_loses_nothing(session):
+def test_a_64_bit_number_that_no_double_represents_is_exact(session):
     number = 2**53 + 1
     assert session.ask("writeRegister", at(8, 64, f'"data":{number}')) == written(9)
     assert session.ask("readRegister", at(8, 64)) == read(9, number)
@@ -61,11 +61,11 @@ def test_registers_of_other_widths_show_the_same_bytes(session):
 
 
 @pytest.mark.parametrize("size", [8, 16, 32])
-def test_data_that_is_wider_than_the_register_reaches_no_register(session, size):
+def test_data_that_is_wider_than_the_register_is_refused_before_the_driver(session, size):
     assert session.ask("writeRegister", at(0, size, '"data":7')) == written(1)
     for data in (MOST[size] + 1, 2**53 + 1, MOST[64]):
         assert session.ask("writeRegister", at(0, size, f'"data":{data}')) == failure(-250860)
-        # The width comes before the driver, which has no register there.
+        # The width is checked before the driver looks for a register; there is none at 512.
         assert session.ask("writeRegister", at(512, size, f'"data":{data}')) == failure(-250860)
     assert session.ask("readRegister", at(0, size)) == read(1, 7)
 
@@ -79,14 +79,14 @@ def test_an_address_without_a_register_is_refused(session, address, size):
 
 @pytest.mark.parametrize("address, size", [(1, 16), (2, 32), (4, 64), (TOP, 16), (TOP, 32),
                                            (TOP, 64), (3, 32), (2049, 16)])
-def test_an_address_that_the_width_does_not_divide_is_refused(session, address, size):
+def test_an_address_that_is_not_a_multiple_of_the_width_is_refused(session, address, size):
     assert session.ask("readRegister", at(address, size)) == misaligned(address, size)
     assert session.ask("writeRegister", at(address, size, '"data":0')) == misaligned(address, size)
 
 
 @pytest.mark.parametrize("size, data", [(8, 0x01), (16, 0x2301), (32, 0x67452301),
                                         (64, 0xefcdab8967452301)])
-def test_a_register_that_can_only_be_read_is_not_written(session, size, data):
+def test_a_read_only_register_is_not_written(session, size, data):
     assert session.ask("writeRegister", at(1024, size, '"data":0')) == failure(
         -250980, "Register Address: 1024")
     assert session.ask("readRegister", at(1024, size)) == read(1025, data)
@@ -107,7 +107,7 @@ def test_one_device_is_read(session, device, answer):
     assert session.ask("readRegister", at(0, 8, device)) == answer
 
 
-def test_a_session_on_nothing_or_on_areas_has_to_name_a_device(rack):
+def test_only_a_session_without_resources_has_to_name_a_device(rack):
     with session_on(rack) as session:
         assert session.ask("readRegister", at(0, 8)) == failure(-250959)
     with session_on(rack, '{"nvmem_areas":"Unit2/big"}') as session:
@@ -143,7 +143,7 @@ def test_params_beyond_their_limits_are_refused(session, params, pointer, detail
     assert session.ask(method, params) == wrong_parameter(f"#/params/{pointer}", details)
 
 
-def test_the_required_params_are_all_told(session):
+def test_all_missing_required_params_are_named(session):
     assert session.ask("readRegister", '"address":0') == wrong_parameter(
         "#/params", "The following parameter(s) is required: session_id, address, size.")
     assert session.ask("writeRegister", '"address":0,"size":8') == wrong_parameter(

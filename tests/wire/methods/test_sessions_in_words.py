@@ -1,4 +1,4 @@
-"""What the failures around sessions say, and what the params common to many methods are told."""
+"""The error texts about sessions, and about the params that many methods share."""
 
 import pytest
 
@@ -28,7 +28,7 @@ def test_a_closed_session_is_unknown(client):
         -250833, f"Session ID: {session_id}")
 
 
-def test_an_unknown_session_comes_before_all_else_that_is_wrong(client):
+def test_an_unknown_session_takes_precedence_over_other_errors(client):
     params = '{"session_id":"_session0","property":"No.Such","devices":"Mod3"}'
     assert client.ask_whole(call("getProperty", params)) == failure(
         -250833, "Session ID: _session0")
@@ -44,7 +44,7 @@ def test_an_unknown_session_comes_before_all_else_that_is_wrong(client):
     ('{"session_id":"_session1","a/b ~":1}', "/a~1b%20~0",
      "This parameter you specified is unsupported."),
 ])
-def test_the_first_fault_of_params_is_told(client, params, pointer, details):
+def test_the_first_fault_of_params_is_reported(client, params, pointer, details):
     assert client.ask_whole(call("closeSession", params)) == wrong_parameter(
         f"#/params{pointer}", details)
 
@@ -65,13 +65,13 @@ def test_the_first_fault_of_params_is_told(client, params, pointer, details):
      "Wrong parameter data type. The data type must be boolean."),
     ('{"devices":"a","nvmem_areas":"b"}', "", ONE_OF),
 ])
-def test_what_a_session_cannot_be_opened_with_is_told(client, params, pointer, details):
+def test_invalid_params_of_an_opening_are_reported(client, params, pointer, details):
     assert client.ask_whole(call("initializeSession", params)) == wrong_parameter(
         f"#/params{pointer}", details)
 
 
 @pytest.mark.parametrize("params", ["[]", "null", '"session_id"', "1"])
-def test_params_that_are_no_object_are_an_invalid_member(client, params):
+def test_params_that_are_not_an_object_are_an_invalid_member(client, params):
     assert client.ask_whole(call("closeSession", params)) == failure(
         -32600, "Invalid Member: params")
 
@@ -85,24 +85,24 @@ def test_params_that_are_no_object_are_an_invalid_member(client, params):
     ('{"devices":[]}', failure(-250959)),
     ('{"devices":"Mod1","reservation_timeout":-0.5}', failure(-250962, "Timeout: -0.5")),
 ])
-def test_what_no_session_can_be_opened_on_is_told(client, params, answer):
+def test_invalid_resources_of_an_opening_are_reported(client, params, answer):
     assert client.ask_whole(call("initializeSession", params)) == answer
 
 
-def test_the_session_in_the_way_is_named(client):
+def test_the_session_that_holds_a_device_is_named(client):
     with session_on(client, '{"devices":"Mod1"}') as holder:
         for params in ('{"devices":["Mod2","Mod1"]}', '{"nvmem_areas":"Mod1/user"}'):
             assert client.ask_whole(call("initializeSession", params)) == failure(
                 -250811, "Device: Mod1", f"Reserved by Sessions: {holder.id}")
 
 
-def test_a_reader_in_the_way_is_not_named(client):
+def test_a_session_that_holds_a_device_for_reading_is_not_named(client):
     with session_on(client, '{"devices":"Mod1","access":1}'):
         assert client.ask_whole(call("initializeSession", '{"devices":"Mod1"}')) == failure(
             -250811, "Device: Mod1")
 
 
-def test_the_limit_of_sessions_is_told(own_bench):
+def test_the_limit_of_sessions_is_reported(own_bench):
     for _ in range(LIMIT):
         own_bench.open_session()
     assert own_bench.ask_whole(call("initializeSession", '{"devices":"Mod1"}')) == failure(-250901)

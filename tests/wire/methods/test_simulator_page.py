@@ -35,7 +35,7 @@ def merge(node, addition):
 
 
 class Step:
-    """A chassis, the faults, and what is asked of it."""
+    """A chassis, the faults, and the requests sent to it."""
 
     def __init__(self, description):
         self.description = json.loads(json.dumps(description))
@@ -67,7 +67,7 @@ class Step:
 
 
 class Page:
-    """The steps of the page, and the broken files with their refusals."""
+    """The steps of the page, and the invalid files with their error texts."""
 
     def __init__(self):
         self.steps = []
@@ -99,12 +99,12 @@ def test_each_step_loads_and_answers_as_the_page_says():
     assert len(page.steps) >= 9
 
 
-def test_the_chassis_of_the_page_is_whole_in_the_end():
+def test_the_chassis_of_the_page_is_complete_at_the_end():
     modules = Page().steps[-1].description["devices"][0]["modules"]
     assert {"channels", "nvmem_areas", "registers"} <= modules[0].keys()
 
 
-def test_each_broken_file_is_refused_in_the_words_of_the_page(tmp_path):
+def test_each_invalid_file_is_refused_with_the_error_text_of_the_page(tmp_path):
     broken = Page().broken
     assert [kind for kind, _ in broken] == ["broken", "refusal"] * (len(broken) // 2) != []
     for (_, text), (_, refusal) in zip(broken[::2], broken[1::2]):

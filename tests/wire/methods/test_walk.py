@@ -1,5 +1,5 @@
-"""Walks through the chassis that ship as clients would take them: one that knows nothing and asks,
-and one that works with the modules of the chassis Bench.
+"""Walks through the shipped chassis as clients would: one client that discovers everything, and one
+that works with the modules of the chassis Bench.
 
 What the first one finds is compared with the description that the simulator reads.
 """
@@ -22,7 +22,7 @@ def walker(own_bench):
 
 
 class Near:
-    """Equals every number that is as far away as this, or less."""
+    """Equals every number within this distance."""
 
     def __init__(self, value, distance):
         self.value = value
@@ -33,14 +33,14 @@ class Near:
 
 
 class Counted:
-    """Equals every whole number that a counter may show."""
+    """Equals every integer that a counter may have."""
 
     def __eq__(self, number):
         return isinstance(number, int) and number >= 0
 
 
 class Wave:
-    """Equals every record of so many samples that lie this far from 0, or less."""
+    """Equals every record of this many samples that lie within this distance of 0."""
 
     def __init__(self, samples, distance):
         self.samples = samples
@@ -50,7 +50,8 @@ class Wave:
         return len(values) == self.samples and all(abs(v) <= self.distance for v in values)
 
 
-# What moves on the chassis Bench while all settings are as after power-on. Noise goes six deviations away at most.
+# What changes on the chassis Bench while all settings are as after power-on. Noise stays within six
+# standard deviations.
 MOVING = {
     ("Bench", "Dev.Temperature"): Near(31.5, 0.5 + 0.12),
     ("Mod1", "Dev.Temperature"): Near(36.25, 0.75 + 0.12),
@@ -72,13 +73,13 @@ def described(name):
 
 @pytest.fixture(scope="module", params=["bench", "small", "full"])
 def shipped(request):
-    """A walker through a chassis that ships, and the description of it."""
+    """A walker through a shipped chassis, and the description of the chassis."""
     path = CHASSIS / f"{request.param}.json"
     with clean_host(("--chassis", path)) as host, Client(host) as client:
         yield Walker(client), described(request.param)
 
 
-def test_the_full_chassis_is_one():
+def test_the_full_chassis_has_nearly_all_slots_and_a_hundred_channels():
     chassis, = described("full")["devices"]
     slots = [module["slot"] for module in chassis["modules"]]
     assert chassis["properties"]["Chassis.SlotCount"]["value"] == 18
@@ -86,13 +87,13 @@ def test_the_full_chassis_is_one():
     assert sum(len(channels_of(device)) for device in devices_of(described("full"))) >= 100
 
 
-def test_the_small_chassis_is_one():
+def test_the_small_chassis_has_two_slots_and_one_module():
     chassis, = described("small")["devices"]
     assert chassis["properties"]["Chassis.SlotCount"]["value"] == 2
     assert [module["slot"] for module in chassis["modules"]] == [1]
 
 
-def test_a_client_that_knows_nothing_finds_everything(shipped):
+def test_a_client_without_prior_knowledge_finds_everything(shipped):
     walker, description = shipped
     walker.open()
     assert walker.read("Sys.Devices") == [device["name"] for device in devices_of(description)]

@@ -12,7 +12,7 @@ class Failed(Exception):
 
 
 class Walker:
-    """A client that makes Python values of the answers."""
+    """A client that turns responses into Python values."""
 
     def __init__(self, client):
         self.client = client
@@ -28,7 +28,7 @@ class Walker:
         return answer["result"]
 
     def fails(self, method, **params):
-        """The code of a call that must fail."""
+        """Returns the code of a call that must fail."""
         try:
             result = self.do(method, **params)
         except Failed as failure:
@@ -58,7 +58,7 @@ class Resource:
         self.properties = about.get("properties", {})
         self.commands = about.get("commands", {})
         self.live = about.get("live", {})
-        # How methods call it that take one resource, and those that take several.
+        # The resource in methods that take one resource, and in those that take several.
         self.one = {kind: name}
         self.many = {self.ONE[kind]: name}
 
@@ -82,7 +82,7 @@ def areas_of(device):
 
 
 class Moves:
-    """Equals every value that a property may have while it moves."""
+    """Equals every value that a changing property may have."""
 
     def __init__(self, about):
         self.about = about
@@ -97,7 +97,7 @@ class Moves:
 
 
 class Number:
-    """Equals every text of one number: how the driver writes limits is its own affair."""
+    """Equals every text of one number, because the driver is free in how it writes limits."""
 
     def __init__(self, value):
         self.value = value
@@ -112,7 +112,7 @@ class Number:
 
 
 def expected_information(about, enums):
-    """What getPropertyInformation has to tell of a property of its own."""
+    """The expected result of getPropertyInformation for a property of its own."""
     told = {name: about[name] for name in ("description", "document") if about.get(name)}
     told |= {f"{name}_value": Number(about[name]) for name in ("max", "min") if name in about}
     if about.get("unit"):
@@ -133,8 +133,8 @@ def expected_value(about, enums, value=None):
 
 
 def explore_resource(walker, resource, enums, moving=None):
-    """Asks for all that a resource has, and compares it with its description. moving: what equals
-    properties of the device that move, by their names."""
+    """Reads all that a resource has, and compares it with its description. moving: for
+    properties of the device that change, the values they are compared with, by name."""
     one, many = resource.one, resource.many
     names = walker.do("getDevicePropertyList", **one)["dynamic_properties"]
     assert names == list(resource.properties)
@@ -163,7 +163,7 @@ def explore_areas(walker, device):
             "data": list(content_of(area.about)), "next_address": 1}
 
 
-# How a value of each type stands in registers of eight and of four bytes.
+# How a value of each type is stored in registers of eight and of four bytes.
 PACKED = {("Double", 8): "<d", ("UInt64", 8): "<Q", ("Int32", 4): "<i"}
 
 
@@ -178,7 +178,7 @@ def register_content(block, device):
 
 
 def widest_access(block):
-    """The most bytes that can be moved at the beginning of a block."""
+    """The width in bytes of the widest access at the beginning of a block."""
     fits = [width for width in (8, 4, 2, 1)
             if block["address"] % width == 0 and block["size"] % width == 0]
     return block["width"] // 8 if "width" in block else fits[0]
@@ -199,7 +199,7 @@ def explore_registers(walker, device):
 
 
 def explore_device(walker, device, enums, moving=None):
-    """All of a device in the state after power-on. moving: as for explore_resource()."""
+    """All of a device in the state after power-on. moving: see explore_resource()."""
     name = device["name"]
     for prop, value in device.get("values", {}).items():
         still = Moves({"type": "Double"}) if prop in device.get("live", {}) else value

@@ -1,4 +1,4 @@
-"""The words of failures, and the answers that hold them."""
+"""The texts of failures, and the responses that contain them."""
 
 import json
 

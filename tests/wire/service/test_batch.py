@@ -1,4 +1,4 @@
-"""Batches: one response for each element in its place, and none run after the first failure."""
+"""Batches: one response per element, in order; no element runs after the first failure."""
 
 import pytest
 
@@ -13,7 +13,7 @@ NO_ID = "null"
 # Stands for the id of any session.
 SESSION = b"<session>"
 
-# What is sent as id of an element that is not run, and what comes back.
+# The id sent in an element that is not run, and the id in its response.
 SKIPPED_IDS = [
     ("1", "1"), ("-2147483648", "-2147483648"), ("2147483648", "2147483648"),
     ("9223372036854775808", "9223372036854775808"), ("1.5", "1.5"), ("1.0", "1.0"),
@@ -24,7 +24,7 @@ SKIPPED_IDS = [
 FAILING = call("x")
 FAILED = error_response("1", UNKNOWN_METHOD)
 
-# What cannot be run, as an element, and what answers it.
+# Elements that cannot be run, with their responses.
 FAULTY_ELEMENTS = [
     (b"1", error_response(NO_ID, INVALID_REQUEST)),
     (b"1.5", error_response(NO_ID, INVALID_REQUEST)),
@@ -50,7 +50,7 @@ FAULTY_ELEMENTS = [
 
 
 def opened(client, answer, expected):
-    """Closes the sessions that a batch opened. The answer must be like the expected one, in which
+    """Closes the sessions that a batch opened. The response must match the expected one, in which
     SESSION stands for a session id."""
     ids, rest = [], answer
     for piece in expected.split(SESSION)[:-1]:
@@ -72,7 +72,7 @@ def test_a_batch_of_one_is_answered_by_an_array_of_one(client):
     assert client.ask(batch(FAILING)) == batch(FAILED)
 
 
-def test_the_answers_stand_in_the_order_of_the_requests(client):
+def test_the_responses_are_in_the_order_of_the_requests(client):
     ids = ["3", "1", '"b"', '"a"', "2"]
     answer = client.ask(batch(*(call("initializeSession", id=id) for id in ids)))
     assert len(set(opened(client, answer, batch(*map(open_result, ids))))) == len(ids)
@@ -92,7 +92,7 @@ def test_a_session_is_used_and_closed_in_one_batch(client):
                            error_response('"c"', UNKNOWN_SESSION), error_response("1", SKIPPED))
 
 
-def test_a_device_that_one_element_gives_up_is_free_for_the_next(client):
+def test_a_device_that_one_element_releases_is_free_for_the_next(client):
     holder = client.open_session('{"devices":"Mod1"}')
     answer = client.ask(batch(call("closeSession", {"session_id": holder}),
                               call("initializeSession", '{"devices":"Mod1"}', "2")))
@@ -121,13 +121,13 @@ def test_a_faulty_element_fails_and_stops_the_batch(client, element, answer):
 
 
 def skipped(answer):
-    """The answer to an element that was not run, from the one to it when it was run."""
+    """The response to an element that was skipped, made from its response when it was run."""
     id = answer.split(b'"id":', 1)[1].rsplit(b',"error":', 1)[0].decode()
     return error_response(id, SKIPPED)
 
 
 @pytest.mark.parametrize("element, answer", FAULTY_ELEMENTS, ids=lambda text: ascii(text)[2:50])
-def test_a_faulty_element_leaves_what_ran_before_it_as_it_is(client, element, answer):
+def test_a_faulty_element_does_not_undo_the_elements_before_it(client, element, answer):
     with client.session() as session_id:
         abort = call("abortSession", {"session_id": session_id}, '"a"')
         assert client.ask(batch(abort, abort, element)) == batch(

@@ -1,4 +1,4 @@
-"""What the host says of a chassis file that the simulated driver cannot load."""
+"""What the host reports about a chassis file that the simulated driver cannot load."""
 
 import os
 import subprocess
@@ -32,7 +32,7 @@ def test_a_chassis_file_that_is_not_json_ends_the_start(tmp_path):
     assert err.splitlines()[0].startswith("qitrmcapi: FILE: ")
 
 
-def test_the_check_takes_no_session_number_from_the_clients(own_host):
+def test_the_check_at_the_start_uses_up_no_session_number(own_host):
     body = b'{"jsonrpc":"2.0","id":1,"method":"initializeSession"}'
     assert own_host.post(body)[2] == (
         b'{"jsonrpc":"2.0","id":1,"result":{"session_id":"_session1"}}')

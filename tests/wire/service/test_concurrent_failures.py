@@ -1,4 +1,4 @@
-"""Failures that are put into words at the same time: every byte of each answer."""
+"""Failures that are described at the same time: every byte of each response."""
 
 import threading
 
@@ -14,7 +14,7 @@ CONNECTIONS = 8
 # Requests of each connection.
 REQUESTS = 60
 
-# One request of each kind, with its answer. Each bears a mark of its own in its id and in a detail.
+# One request of each kind, with its response. Its id and one of its details contain the mark.
 
 def unknown_method(mark):
     return call(f"m{mark}", id=mark), standing(-32601, text(METHOD, f"Method: m{mark}"), id=mark)
@@ -59,7 +59,7 @@ KINDS = (unknown_method, unknown_session, unsupported_parameter, malformed_name,
 
 
 def ask_all(host, number, start, wrong):
-    """Asks for one failure after another, and adds what was answered otherwise to `wrong`."""
+    """Sends one failing request after another, and adds unexpected responses to `wrong`."""
     with Client(host) as client:
         start.wait()
         for count in range(REQUESTS):
@@ -70,7 +70,7 @@ def ask_all(host, number, start, wrong):
                 wrong.append((body, answer, expected))
 
 
-def test_failures_that_overlap_keep_their_own_words(host):
+def test_failures_that_overlap_keep_their_own_texts(host):
     start = threading.Barrier(CONNECTIONS)
     wrong, unfinished = [], set(range(CONNECTIONS))
 

@@ -1,4 +1,4 @@
-"""The envelope of a request: id, jsonrpc, method and params, and how the id comes back."""
+"""The envelope of a request: id, jsonrpc, method and params, and how the id is returned."""
 
 import pytest
 
@@ -10,7 +10,7 @@ UNKNOWN_SESSION = -250833
 
 NOT_UTF8 = b"\xff\xc0\x80".decode("utf-8", "surrogateescape")
 
-# What is sent as id, and what comes back. None of these is the id of a request that is run.
+# The id that is sent, and the id in the response. None of these ids is accepted.
 REFUSED_IDS = [
     ("null", "null"),
     ("true", "true"),
@@ -72,14 +72,14 @@ def envelope(**members):
 
 
 @pytest.mark.parametrize("sent, echoed", REFUSED_IDS)
-def test_an_id_that_is_no_32_bit_integer_and_no_string_is_refused_and_echoed(client, sent, echoed):
+def test_an_id_other_than_a_32_bit_integer_or_string_is_refused_and_echoed(client, sent, echoed):
     assert client.ask(call("x", id=sent)) == error_response(echoed, INVALID_REQUEST)
 
 
 @pytest.mark.parametrize("sent", ["18446744073709551616", "-9223372036854775809", "0.1",
                                   "1234.5625", "1e300", "-2.5e-300", "5e-324"])
-def test_an_id_that_only_a_double_holds_is_echoed_with_its_value(client, sent):
-    """Several texts stand for one double, so its value is compared."""
+def test_an_id_that_only_a_double_represents_is_echoed_with_its_value(client, sent):
+    """Several texts represent one double, so its value is compared."""
     answer = client.ask(call("x", id=sent))
     echoed = answer.split(b'"id":')[1].split(b",")[0].decode()
     assert float(echoed) == float(sent) and not echoed.lstrip("-").isdigit()
@@ -101,7 +101,7 @@ def test_a_request_without_id_for_a_known_method_opens_no_session(client):
 
 
 @pytest.mark.parametrize("name", ["ID", "Id", "id ", "id\\u0000", ""])
-def test_an_id_under_another_name_is_no_id(client, name):
+def test_an_id_under_another_name_is_ignored(client, name):
     body = f'{{"jsonrpc":"2.0","{name}":1,"method":"x"}}'.encode()
     assert client.ask(body) == error_response("null", INVALID_REQUEST)
 
@@ -146,7 +146,7 @@ def test_an_unknown_method_is_reported_whatever_its_params(client, params):
 
 
 @pytest.mark.parametrize("params", ["[]", "[1]", "1", "1.5", '"x"', '""', "null", "true", "false"])
-def test_params_that_are_no_object_make_an_invalid_request(client, params):
+def test_params_that_are_not_an_object_make_an_invalid_request(client, params):
     answer = client.ask(envelope(method='"closeSession"', params=params))
     assert answer == error_response("1", INVALID_REQUEST)
 
@@ -158,7 +158,7 @@ def test_params_that_are_no_object_make_an_invalid_request(client, params):
     ('{"id":"a","method":"x"}', '"a"'),
     ('{"id":1.5,"jsonrpc":"2.0","method":"x"}', "1.5"),
 ])
-def test_a_fault_of_the_envelope_comes_before_the_unknown_method(client, body, echoed):
+def test_a_faulty_envelope_takes_precedence_over_an_unknown_method(client, body, echoed):
     assert client.ask(body.encode()) == error_response(echoed, INVALID_REQUEST)
 
 

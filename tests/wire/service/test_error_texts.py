@@ -1,4 +1,4 @@
-"""The exact words of every failure that a request can cause."""
+"""The exact texts of every failure that a request can cause."""
 
 import json
 
@@ -36,7 +36,7 @@ def test_a_body_that_is_not_json(client, body, details, offset):
 
 
 @pytest.mark.parametrize("body", [b"[]", b"1", b'"x"', b"null"])
-def test_a_root_that_is_no_request(client, body):
+def test_a_root_that_is_not_a_request(client, body):
     assert client.ask_whole(body) == standing(-32600, text(REQUEST), id="null")
 
 
@@ -175,7 +175,7 @@ def test_an_array_property_on_several_resources(client, session):
         -250829, text(SEVERAL, "Devices: Mod1,Mod2"))
 
 
-def test_a_device_that_is_no_chassis(client, session):
+def test_a_device_that_is_not_a_chassis(client, session):
     params = {"session_id": session, "slot_number": 1, "device": "Mod1"}
     assert client.ask_whole(call("getModuleName", params)) == wrapped(-250812, text(NOT_CHASSIS))
 
@@ -185,12 +185,12 @@ def test_data_wider_than_the_register(client, session):
     assert client.ask_whole(call("writeRegister", params)) == wrapped(-250860, text(TOO_WIDE))
 
 
-def test_an_access_with_a_fraction_is_taken_for_a_fault_of_the_program(client):
+def test_an_access_with_a_fraction_is_an_internal_error(client):
     assert client.ask_whole(call("initializeSession", '{"devices":"Mod1","access":1.0}')) == wrapped(
         -250800, text(INTERNAL))
 
 
-def test_a_taken_device_is_told_with_the_sessions_that_hold_it(client):
+def test_a_reserved_device_is_reported_with_the_sessions_that_hold_it(client):
     group = '"reservation_group":"g"'
     with client.session(f'{{"devices":"Mod1",{group}}}') as first:
         with client.session(f'{{"devices":"Mod1",{group}}}') as second:

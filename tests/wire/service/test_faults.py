@@ -1,4 +1,4 @@
-"""The service over a driver that misbehaves on demand."""
+"""The service over a driver that fails on demand."""
 
 import json
 import os
@@ -21,8 +21,8 @@ UNREACHED = {
     "getSystemPropertyUInt64": "the one such property, Sys.ConfigChangeCount, is hidden from clients",
 }
 
-# A close that fails after the driver has ended the session leaves the service with a dead session,
-# which it goes on to ask what it holds.
+# A close that fails after the driver has closed the session leaves the service with an invalid
+# session, which it still queries for its reservations.
 SESSION_ENDED = -250955
 
 NESTED = {"code": -9, "causes": [{"code": -8, "details": [{"header": "kA"}]}]}
@@ -68,13 +68,13 @@ TYPED = {f"Any.{name}": {"type": name, "value": value, "access": "ReadWrite"}
          for one, item in VALUES.items() for name, value in ((one, item), (f"{one}Array", [item]))}
 CHASSIS = json.loads((ROOT / "simulator" / "chassis" / "bench.json").read_text(encoding="utf-8"))
 CHASSIS["devices"][0]["modules"][0]["properties"] |= TYPED
-# Those of the system and of the session that have functions of their own.
+# The properties of the system and of the session that have functions of their own.
 SCOPED = {"Sys.Devices": ["A"], "Sys.DiscoveryEnabled": True, "Sys.DiscoveryInterval": 10.0,
           "Session.Timeout": 5.0, "Session.DefaultDevices": ["Mod1"]}
 
 
 def requests():
-    """Requests that lead into every function of the driver that the service calls."""
+    """Requests that lead to every function of the driver that the service calls."""
     for method in methods.NAMES:
         yield request(method)
     yield request("initializeSession", without=["devices"])
@@ -99,7 +99,7 @@ def requests():
 
 
 class FaultyHost:
-    """A host whose faults are replaced while it runs, and whose calls of the driver are traced."""
+    """A host whose faults are replaced while it runs, and whose driver calls are traced."""
 
     def __init__(self, host):
         self.host = host
@@ -112,7 +112,8 @@ class FaultyHost:
         os.replace(fresh, self.path)
 
     def calls(self):
-        """The lines of the trace since this was last called, from the name of the function on."""
+        """The lines of the trace since the previous call of this function, from the name of the
+        driver function on."""
         return [line.split(" ", 2)[2] for line in self.trace.read().splitlines()]
 
 
@@ -156,7 +157,7 @@ def devices(client, session):
 
 
 def restore_names(client, names):
-    """Gives the devices these names back, in their order."""
+    """Gives the devices these names again, in their order."""
     with client.session() as session:
         for new, old in zip(names, devices(client, session)):
             if new != old:
@@ -168,8 +169,8 @@ NAMES = ["Bench", "Mod1", "Mod2", "Mod4", "Mod5"]
 
 
 def calls_behind(faulty, client, wanted, fault):
-    """The calls of the driver behind a request that meets a fault. What goes before it meets none,
-    and afterwards all is as it was."""
+    """The driver calls made for a request that meets a fault. The calls that prepare the request
+    meet none, and afterwards the state is restored."""
     session = wanted.prepare(lambda *step: expect_result(client, *step))
     faulty.put(fault)
     faulty.calls()
@@ -227,7 +228,7 @@ def read(client, session, device):
 
 # The service itself refuses a name that the system does not list.
 @pytest.mark.parametrize("event, code", [("pulled", -250828), ("connection_lost", -250941)])
-def test_two_clients_see_a_device_leave_and_come_back(faulty, client, event, code):
+def test_two_clients_see_a_device_removed_and_inserted_again(faulty, client, event, code):
     with Client(faulty.host) as other:
         sessions = [each.open_session() for each in (client, other)]
         for each, session in zip((client, other), sessions):
@@ -248,7 +249,7 @@ def test_two_clients_see_a_device_leave_and_come_back(faulty, client, event, cod
             each.ask(call("closeSession", {"session_id": session}))
 
 
-def test_a_batch_stops_at_the_request_that_a_fault_strikes(faulty, client):
+def test_a_batch_stops_at_the_request_that_a_fault_affects(faulty, client):
     session = client.open_session()
     faulty.put({"faults": [{"resource": "Mod2", "function": "getGeneric*",
                             "status": {"code": -77777}}]})
@@ -273,7 +274,7 @@ def test_an_abort_ends_a_delay(faulty, client):
         client.ask(call("closeSession", {"session_id": session}))
 
 
-def test_faults_of_the_opening_do_not_keep_the_host_from_starting():
+def test_faults_in_opening_sessions_do_not_prevent_the_host_from_starting():
     faults = json.dumps({"faults": [{"function": "initialize*", "calls": {"count": 1},
                                      "status": {"code": -77777}}]}).encode()
     with clean_host(("--faults", "faults.json"), {"faults.json": faults}) as host:

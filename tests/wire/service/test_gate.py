@@ -1,4 +1,4 @@
-"""What a request passes on its way to the service: switch, transport, method, entry, body."""
+"""The checks before a request is processed: setting, transport, method, entry, body."""
 
 import subprocess
 
@@ -33,7 +33,7 @@ def test_a_head_is_refused_without_a_body(host):
     assert headers["Content-Length"] == str(len(NOT_POST))
 
 
-def test_the_method_is_looked_at_before_the_entry(host):
+def test_the_method_is_checked_before_the_entry(host):
     status, _, body = host.request("GET", "/qitrmc/Other")
     assert (status, body) == (404, NOT_POST)
 
@@ -57,7 +57,7 @@ def test_the_letter_case_of_the_entry_does_not_matter(host, entry):
 
 @pytest.mark.parametrize("entry", ["Cal", "Calls", "xCall", "Call%20", "%20Call", "C%C3%A4ll",
                                    "Other", "Call%00", "Ca-ll", "%F0%9F%98%80"])
-def test_another_entry_is_not_found_and_says_nothing(host, entry):
+def test_another_entry_is_not_found_and_has_an_empty_body(host, entry):
     status, _, body = host.post(REQUEST, entry)
     assert (status, body) == (404, b"")
 
@@ -99,7 +99,7 @@ def test_an_absent_body_is_an_empty_body(host):
 @pytest.mark.parametrize("length", [*range(250, 262), 510, 511, 512, 513, 4095, 4096, 4097, 65535,
                                     65536, 65537])
 def test_a_body_of_any_length_arrives_whole(host, length):
-    """The last byte decides: without it the request would be cut."""
+    """The last byte closes the JSON text: without it the request would be a parse error."""
     with Client(host) as client:
         body = REQUEST[:-1].ljust(length - 1) + b"}"
         assert len(body) == length
@@ -119,7 +119,7 @@ def test_a_long_answer_arrives_whole(client):
 
 @pytest.fixture(scope="module")
 def certificate(tmp_path_factory):
-    """The options of a host that serves HTTPS with a certificate of its own making."""
+    """The options of a host that serves HTTPS with a self-signed certificate."""
     directory = tmp_path_factory.mktemp("tls")
     key, certificate = directory / "key.pem", directory / "certificate.pem"
     subprocess.run(["openssl", "req", "-x509", "-newkey", "rsa:2048", "-nodes", "-subj",
@@ -130,7 +130,7 @@ def certificate(tmp_path_factory):
 
 @pytest.fixture(scope="module")
 def secure_host(certificate):
-    """A host that shows the plug-in the real transport."""
+    """A host that passes the real transport to the plug-in."""
     with Host(options=(*certificate, "--pass-transport")) as running:
         yield running
 
@@ -142,7 +142,7 @@ def test_the_secure_transport_is_refused_before_anything_else(secure_host, metho
     assert (status, body) == (404, NOT_HTTP)
 
 
-def test_a_host_with_tls_files_serves_and_not_only_refuses(certificate):
+def test_a_host_with_tls_files_serves_requests(certificate):
     with Host(options=certificate) as host:
         assert host.base_url.startswith("https://")
         status, _, body = host.post(REQUEST)

@@ -1,6 +1,6 @@
-"""Bodies made to hurt: big, deep, wide, or of texts that nobody sends.
+"""Hostile bodies: very long, deep or wide ones, and unusual texts.
 
-Each is answered in time that grows with its length alone, and the service goes on afterwards.
+Each is answered in a time that grows linearly with its length, and the service keeps working.
 """
 
 import time
@@ -13,8 +13,8 @@ PARSE_ERROR = error_response("null", -32700)
 UNKNOWN_METHOD = error_response("1", -32601)
 INVALID_PARAMS = error_response("1", -32602)
 
-# Seconds that a body may take under a sanitizer on a busy machine. What grows with the square of
-# its length takes many times as much.
+# Seconds that a body may take under a sanitizer on a busy machine. Processing in quadratic time
+# takes many times as long.
 BOUND = 40
 
 MANY = 100_000
@@ -24,7 +24,7 @@ MAX_BODY = 16 * 1024 * 1024
 
 @pytest.fixture(autouse=True)
 def service_goes_on(client):
-    """Bounds the time of each test here, and asks for an ordinary answer behind it."""
+    """Limits the time of each test here, and checks an ordinary request afterwards."""
     begin = time.monotonic()
     yield
     assert time.monotonic() - begin < BOUND
@@ -57,13 +57,13 @@ def test_a_request_nested_deeply_is_a_parse_error(client, method, params, id):
 
 
 @pytest.mark.parametrize("opening, closing", [("[", "]"), ('{"a":', "}")], ids=["arrays", "objects"])
-def test_a_hundred_levels_are_no_trouble(client, opening, closing):
+def test_a_hundred_levels_of_nesting_are_accepted(client, opening, closing):
     nested = opening * 100 + "1" + closing * 100
     assert client.ask(call("x", id=nested)) == error_response(nested, -32600)
     assert client.ask(call("x", f'{{"a":{nested}}}')) == UNKNOWN_METHOD
 
 
-def test_a_value_nested_far_beyond_any_use_is_judged_by_the_schema(client):
+def test_a_very_deeply_nested_value_is_refused_by_the_schema(client):
     nested = "[" * 900 + "1" + "]" * 900
     answer = client.ask(call("initializeSession", f'{{"devices":{nested}}}'))
     assert answer == INVALID_PARAMS
@@ -100,7 +100,7 @@ def test_a_wide_value_inside_a_wrong_value_is_refused(client):
     assert client.ask(call("initializeSession", f'{{"devices":{wide}}}')) == INVALID_PARAMS
 
 
-def test_a_wide_id_comes_back(client):
+def test_a_wide_id_is_echoed(client):
     wide = "[" + ",".join(str(number) for number in range(MANY)) + "]"
     assert client.ask(call("x", id=wide)) == error_response(wide, -32600)
 
@@ -149,7 +149,7 @@ def test_a_body_of_one_byte_more_is_refused_by_the_host(host):
     b":", b",", b"Mod1/ch0:\xff", b"{}", b"'; --", b"\\\"", b"\\\\", b"\\n\\r\\t"], ids=ascii)
 @pytest.mark.parametrize("member", ["devices", "physical_channels", "nvmem_areas"])
 @pytest.mark.parametrize("form", [b'"%b"', b'["%b"]', b'["Mod1","%b"]'], ids=["text", "array", "two"])
-def test_strange_names_get_a_complete_answer(client, member, text, form):
+def test_unusual_names_get_a_complete_response(client, member, text, form):
     body = (b'{"jsonrpc":"2.0","id":1,"method":"initializeSession","params":{"' + member.encode() +
             b'":' + form.replace(b"%b", text) + b"}}")
     answer = client.ask(body)
@@ -162,7 +162,7 @@ def test_strange_names_get_a_complete_answer(client, member, text, form):
 @pytest.mark.parametrize("group", [b"\xff", b"\xc0\x80", b"\\u0000", b"a\\u0000b", b"\\udc00",
                                    b"\xed\xa0\x80", b"%s%n", b"g" * 1_000_000],
                          ids=lambda text: ascii(text)[:20])
-def test_strange_groups_open_a_session(client, group):
+def test_unusual_groups_open_a_session(client, group):
     body = (b'{"jsonrpc":"2.0","id":1,"method":"initializeSession",'
             b'"params":{"devices":"Mod1","reservation_group":"' + group + b'"}}')
     answer = client.ask(body)
@@ -172,7 +172,7 @@ def test_strange_groups_open_a_session(client, group):
 
 @pytest.mark.parametrize("access", [b"\xff", b"ReadOnly\\u0000", b"\\u0000", b"\\udc00",
                                     b"ReadWrite\\u0000x"], ids=ascii)
-def test_strange_words_for_access_are_refused(client, access):
+def test_unusual_words_for_access_are_refused(client, access):
     body = (b'{"jsonrpc":"2.0","id":1,"method":"initializeSession","params":{"access":"' + access +
             b'"}}')
     assert client.ask(body) == INVALID_PARAMS

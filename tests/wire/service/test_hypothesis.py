@@ -1,4 +1,4 @@
-"""Whatever is posted, the answer is one complete JSON-RPC response of the right form."""
+"""Whatever is posted, the response is one complete, well-formed JSON-RPC response."""
 
 import json
 
@@ -42,7 +42,7 @@ NEAR_REQUESTS = st.fixed_dictionaries({}, optional={
 
 
 def as_json(value):
-    """Lone surrogates of Python texts are written as escapes."""
+    """Writes lone surrogates of Python texts as escapes."""
     return json.dumps(value).encode()
 
 
@@ -51,8 +51,8 @@ def refuse_constant(name):
 
 
 def parse(answer):
-    """The response as Python value; everything but exactly one JSON text is an error. Bytes of ids
-    that are not UTF-8 come back as they went."""
+    """The response as Python value; anything but exactly one JSON text is an error. Bytes of ids
+    that are not UTF-8 are returned as they were sent."""
     return json.loads(answer.decode("utf-8", "surrogateescape"), parse_constant=refuse_constant)
 
 
@@ -122,14 +122,14 @@ def test_any_json_value_gets_a_response_for_each_of_its_requests(client, value):
 
 @SETTINGS
 @given(request=NEAR_REQUESTS)
-def test_anything_like_a_request_gets_one_response(client, request):
+def test_anything_similar_to_a_request_gets_one_response(client, request):
     answer = ask_and_check(client, as_json(request))
     assert isinstance(answer, dict)
 
 
 @SETTINGS
 @given(request=REQUESTS)
-def test_a_sound_envelope_comes_back_with_its_id(client, request):
+def test_the_id_of_a_valid_envelope_is_returned(client, request):
     answer = ask_and_check(client, as_json(request))
     assert answer["id"] == request["id"] or answer["error"]["code"] == -32700
 

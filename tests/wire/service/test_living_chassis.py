@@ -1,4 +1,4 @@
-"""Values of the chassis Bench that move, and runs that can be repeated byte by byte."""
+"""Values of the chassis Bench that change over time, and runs that are repeatable byte by byte."""
 
 import json
 import math
@@ -21,7 +21,7 @@ def open_all(client):
 
 
 def everything(client, session):
-    """The answers to the questions for every property of every device and channel, in order."""
+    """The responses to reading every property of every device and channel, in order."""
     def get(**params):
         answers.append(ask(client, "getProperty", session_id=session, **params))
         return json.loads(answers[-1]).get("result", {}).get("value")
@@ -42,7 +42,7 @@ def everything(client, session):
 
 
 def run(seed):
-    """A whole run with a host of its own, as the bytes of all answers."""
+    """A complete run with a host of its own, as the bytes of all responses."""
     with clean_host(("--seed", seed, "--time-scale", "calls")) as host, Client(host) as client:
         session = open_all(client)
         answers = everything(client, session)
@@ -73,7 +73,7 @@ def moved(client, session, prop, **resource):
                           **resource))["result"]["value"]
 
 
-def test_the_multimeter_sees_what_the_power_supply_gives():
+def test_the_multimeter_measures_the_output_of_the_power_supply():
     with clean_host(("--time-scale", "calls")) as host, Client(host) as client:
         session = open_all(client)
         channels = {"physical_channels": "Mod2/ch0:1"}
@@ -94,7 +94,7 @@ def test_the_multimeter_sees_what_the_power_supply_gives():
         assert [abs(round(value, 1)) for value in volts] == [12.0, 5.0, 0.0, 0.0]
 
 
-def test_the_fans_take_their_time():
+def test_the_fans_change_their_speed_gradually():
     with clean_host(("--time-scale", "calls")) as host, Client(host) as client:
         session = open_all(client)
         ask(client, "setProperty", session_id=session, property="Chassis.FanSpeed", value=4800,

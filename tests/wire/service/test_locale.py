@@ -1,4 +1,4 @@
-"""The host's process follows a locale with a decimal comma: numbers keep their point."""
+"""Numbers keep their decimal point while the host's process uses a locale with a decimal comma."""
 
 import json
 import subprocess
@@ -11,7 +11,7 @@ from jsonrpc import Client, call, result_response
 
 CODE = -3000001  # known to no explanation file
 
-# The code of the cause is a whole number in another form.
+# The code of the cause is a whole number in exponent form.
 STATUS = """{"translator": "mxlator_qitrmc", "translator_info": {"ordered_data": [
 {"type": "usage", "usage": "kUsageTypeDetails", "value": 0.5, "value_type": "double"},
 {"type": "usage", "usage": "kUsageTypeOffset", "value": [-1.25, 3], "value_type": "double"}]},
@@ -68,7 +68,7 @@ def test_numbers_are_read_and_written_with_a_point(client, session):
             '{"data_type":"Double","value":%s}' % value)
 
 
-def test_a_decimal_comma_is_no_json(client, session):
+def test_a_decimal_comma_is_not_json(client, session):
     assert b'"code":-32700' in set_level(client, session, "1,5")
 
 

@@ -1,7 +1,7 @@
 """Which requests overlap.
 
-The slow request here is a reservation that waits for a device until its time is over. It holds up
-every request that looks for a session, so the quick ones here need none.
+The slow request here is a reservation that waits for a device until its timeout. It blocks every
+request that looks up a session, so the quick requests here need no session.
 """
 
 import threading
@@ -13,8 +13,8 @@ from jsonrpc import Client, batch, call, error_response, result_response
 
 pytestmark = pytest.mark.concurrent
 
-# Seconds that a slow request takes. A quick one that is held up takes more than half of them, one
-# that is not takes less, on a busy machine too.
+# Seconds that a slow request takes. A quick request that is blocked takes more than half of them,
+# one that is not takes less, on a busy machine too.
 SLOW = 1.5
 
 RESERVED = error_response("1", -250811)
@@ -26,13 +26,13 @@ QUICK_BATCH = batch(QUICK)
 LOOKUP = call("closeSession", {"session_id": "_session999999"})
 WAITING = call("initializeSession", {"devices": "Mod1", "reservation_timeout": SLOW})
 
-# How often the claims are tried that hold only when the requests arrive in the order of sending.
+# How often the tests are tried that hold only when the requests arrive in the order of sending.
 ATTEMPTS = 20
 
 
 @pytest.fixture(autouse=True)
 def holder(client):
-    """The session that holds the device that the slow requests wait for."""
+    """The session that holds the device for which the slow requests wait."""
     with client.session('{"devices":"Mod1"}') as session_id:
         yield session_id
 
@@ -46,8 +46,8 @@ def clients(host):
 
 
 def longest_while_unanswered(slow, quick, body):
-    """Sends a request again and again until another client's is answered. Returns the longest time
-    that one took, and the set of answers."""
+    """Sends a request repeatedly until another client's is answered. Returns the longest time that
+    one took, and the set of responses."""
     longest, answers = 0, set()
     while not slow.is_answered():
         begin = time.monotonic()
@@ -65,7 +65,7 @@ def test_single_requests_overlap(clients):
     assert longest < SLOW / 2
 
 
-def test_a_waiting_reservation_holds_up_requests_that_need_a_session(clients):
+def test_a_waiting_reservation_blocks_requests_that_need_a_session(clients):
     slow, quick, _ = clients
     slow.send(WAITING)
     longest, answers = longest_while_unanswered(slow, quick, LOOKUP)
@@ -102,7 +102,7 @@ def test_batches_wait_for_a_running_batch(clients):
 
 
 @pytest.mark.parametrize("body, code", [(b"{", -32700), (b"[]", -32600)])
-def test_what_is_no_request_waits_for_no_batch(clients, body, code):
+def test_a_body_without_requests_does_not_wait_for_a_batch(clients, body, code):
     slow, quick, _ = clients
     slow.send(batch(WAITING))
     longest, answers = longest_while_unanswered(slow, quick, body)
@@ -112,8 +112,9 @@ def test_what_is_no_request_waits_for_no_batch(clients, body, code):
 
 
 def a_single_request_behind_a_waiting_batch(clients):
-    """A slow single request, a batch behind it, and then single requests until the slow one is
-    answered: the longest time that one took. The batch may overtake the slow one on its way in."""
+    """Sends a slow single request, then a batch, then single requests until the slow one is
+    answered. Returns the longest time that one of them took. The batch may overtake the slow one
+    on arrival."""
     slow, waiting, quick = clients
     slow.send(WAITING)
     assert quick.ask(QUICK) == UNKNOWN_METHOD
@@ -125,14 +126,14 @@ def a_single_request_behind_a_waiting_batch(clients):
     return longest
 
 
-def test_a_waiting_batch_holds_off_later_single_requests(clients):
+def test_a_waiting_batch_delays_later_single_requests(clients):
     assert any(a_single_request_behind_a_waiting_batch(clients) > SLOW / 2
                for _ in range(ATTEMPTS))
 
 
 def a_batch_behind_two_single_requests(clients):
-    """Two slow single requests, of which the second waits behind the first in the driver, and a
-    batch behind them: whether the batch was held up for about one of them, and no longer."""
+    """Sends two slow single requests, of which the second waits behind the first in the driver, and
+    then a batch. Returns whether the batch was delayed for about one of them, and no longer."""
     first, second, waiting = clients
     first.send(WAITING)
     second.send(WAITING)
@@ -149,7 +150,7 @@ def test_a_batch_starts_when_the_first_of_two_single_requests_ends(clients):
 
 
 def test_a_close_and_a_reservation_that_waits_for_it_run_one_after_the_other(clients, client):
-    """The close cannot end the wait: it waits for the session table. Either may come first."""
+    """The close cannot end the wait, as it waits for the session table. Either may come first."""
     slow, closing, _ = clients
     holder = client.open_session('{"devices":"Mod2"}')
     slow.send(call("initializeSession", {"devices": "Mod2", "reservation_timeout": SLOW}))
@@ -176,7 +177,7 @@ def test_the_lock_is_free_after_failures_of_every_kind(clients):
 
 
 def in_threads(count, work):
-    """Runs work(number) in threads of their own; a failure in any of them fails the test."""
+    """Runs work(number) in threads of their own; an exception in any of them fails the test."""
     failures = []
 
     def run(number):
@@ -194,7 +195,7 @@ def in_threads(count, work):
         raise failures[0]
 
 
-def test_everyone_is_answered_with_his_own_id(host):
+def test_every_client_is_answered_with_its_own_id(host):
     def work(number):
         with Client(host) as own:
             for turn in range(50):
@@ -223,8 +224,8 @@ def test_a_device_has_one_owner_at_a_time(host):
 
 
 def test_nothing_runs_between_the_elements_of_a_batch(host, client):
-    """One client gives up a device and takes it again in a batch; another never gets it. Both send
-    batches only: a single request that is ending may let a batch in early."""
+    """One client releases a device and takes it again in a batch; another one never gets it. Both
+    send only batches, because a single request that is ending may let a batch in early."""
     held = [client.open_session('{"devices":"Mod2"}')]
     finished = threading.Event()
 

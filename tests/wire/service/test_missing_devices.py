@@ -1,4 +1,4 @@
-"""The codes that docs/simulator.md promises for devices that were pulled or do not answer."""
+"""The codes that docs/simulator.md lists for devices that were removed or do not answer."""
 
 import json
 import os
@@ -56,7 +56,7 @@ def faulty_host():
 
 
 def strike(host, *events):
-    """Puts the events into force from the next call of the driver on."""
+    """Makes the events take effect from the next driver call on."""
     new = host.directory / "faults.new"
     new.write_text(json.dumps({"events": events}), encoding="utf-8")
     os.rename(new, host.directory / FAULTS)
@@ -86,8 +86,8 @@ def with_session(session, method, params):
 
 @pytest.mark.parametrize("event, column", EVENTS)
 @pytest.mark.parametrize("method, params, pulled, lost", REQUESTS)
-def test_the_code_tells_who_missed_the_device(faulty_host, client, session, event, column, method,
-                                              params, pulled, lost):
+def test_each_method_has_its_codes_for_a_missing_device(faulty_host, client, session, event, column,
+                                                        method, params, pulled, lost):
     strike(faulty_host, {"device": "Mod1", "event": event})
     answer = client.ask_whole(with_session(session, method, params))
     assert code_of(answer) == (pulled, lost)[column]

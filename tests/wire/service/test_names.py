@@ -1,4 +1,4 @@
-"""Devices with names of other scripts, found whatever their letter case."""
+"""Devices with names in other scripts, found in any letter case."""
 
 import json
 
@@ -12,7 +12,7 @@ NO_SUCH_DEVICE = error_response("1", -250956)  # from the driver
 UNKNOWN_NAME = error_response("1", -250828)
 UNKNOWN_METHOD = error_response("1", -32601)
 
-# As the chassis spells a name, and as a client may write it.
+# The name in the chassis file, and the name as a client may write it.
 FOLDED = [("Größe", "Größe"), ("Größe", "GRÖSSE"), ("Größe", "grÖẞe"), ("Straße", "strasse"),
           ("ΣΊΣΥΦΟΣ", "σίσυφος"), ("İx", "i\u0307X"), ("ﬃ", "FFI"), ("ﬃ", "ﬀi"), ("ﬃ", "fﬁ"),
           ("Модуль", "МОДУЛЬ"), ("Plain", "pLAIN"), ("日本", "日本"), ("😀x", "😀X")]
@@ -44,7 +44,7 @@ def test_a_session_is_opened_on_a_device_in_any_letter_case(client, name, writte
 
 
 @pytest.mark.parametrize("written", NOT_FOLDED)
-def test_a_name_that_differs_in_more_than_letter_case_is_no_device(client, written):
+def test_a_name_that_differs_in_more_than_letter_case_is_unknown(client, written):
     for text in json_texts(written):
         answer = client.ask(call("initializeSession", f'{{"devices":{text}}}'))
         assert answer == NO_SUCH_DEVICE

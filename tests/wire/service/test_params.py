@@ -1,7 +1,7 @@
-"""The params of every method: what is let through and what is refused.
+"""The params of every method: what is accepted and what is refused.
 
-The table below says what the methods take. Params that are right get past the check and then fail,
-because their session does not exist; params that are wrong fail with -32602.
+The table below lists what the methods take. Valid params pass the check and then fail, because
+their session does not exist; invalid params fail with -32602.
 """
 
 import itertools
@@ -20,7 +20,7 @@ NOT_TEXT = ["1", "1.5", "null", "true", "false", "[]", '["x"]', "{}"]
 NOT_NUMBER = ['""', '"1"', "null", "true", "false", "[]", "[1]", "{}"]
 NOT_INTEGER = NOT_NUMBER + ["1.5", "1.0", "1e2", "18446744073709551616", "-9223372036854775809"]
 
-# Kind of value: JSON texts that are let through, JSON texts that are refused.
+# Kind of value: JSON texts that are accepted, JSON texts that are refused.
 KINDS = {
     "session": (['"_session999999"', '"_session0999999"', '"_session18446744071562069999"',
                  '"_session99999999999999999999999999"', '"_session999999\\u0000x"'],
@@ -130,7 +130,7 @@ def params_of(members):
 
 
 def least(method):
-    """The fewest params that are right, as member -> text."""
+    """The smallest set of valid params, as member -> text."""
     return {name: good(kind) for name, kind in METHODS[method].required.items()}
 
 
@@ -185,8 +185,8 @@ def opens(answer):
 
 
 def is_past_the_schema(method, params):
-    """How right params are answered. A session without resources opens whatever else is said, but
-    names of resources need not exist, and the driver knows access only as an integer."""
+    """How valid params are answered. A session without resources opens with any other params, but
+    named resources need not exist, and the driver accepts access only as an integer."""
     if method != "initializeSession":
         return lambda answer: answer == UNKNOWN_SESSION
     if params.endswith(('"access":1.0}', '"access":3.0}')):
@@ -198,18 +198,18 @@ def is_past_the_schema(method, params):
 
 
 @pytest.mark.parametrize("method, params", cases(right_params()))
-def test_right_params_are_let_through(ask, method, params):
+def test_valid_params_are_accepted(ask, method, params):
     ask(method, params, is_past_the_schema(method, params))
 
 
 @pytest.mark.parametrize("method, params", cases(wrong_params()))
-def test_wrong_params_are_refused(ask, method, params):
+def test_invalid_params_are_refused(ask, method, params):
     ask(method, params, lambda answer: answer == INVALID_PARAMS)
 
 
 @pytest.mark.parametrize("params", ["[]", "[{}]", "0", "1.5", '""', '"x"', "null", "true", "false"])
 @pytest.mark.parametrize("method", METHODS)
-def test_params_that_are_no_object_make_an_invalid_request(ask, method, params):
+def test_params_that_are_not_an_object_make_an_invalid_request(ask, method, params):
     ask(method, params, lambda answer: answer == INVALID_REQUEST)
 
 

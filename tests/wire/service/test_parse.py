@@ -1,4 +1,4 @@
-"""What is JSON and what is not, as the body of a request."""
+"""What is JSON and what is not, in the body of a request."""
 
 import pytest
 
@@ -76,7 +76,7 @@ def test_a_batch_cut_at_any_byte_runs_nothing(client):
 
 
 @pytest.mark.parametrize("body", INVALID_ROOTS, ids=ascii)
-def test_a_root_that_is_no_request_is_an_invalid_request(client, body):
+def test_a_root_that_is_not_a_request_is_an_invalid_request(client, body):
     assert client.ask(body) == INVALID_REQUEST
 
 
@@ -100,7 +100,7 @@ def test_an_escaped_nul_does_not_cut_a_body(client):
     assert client.ask(call("x", '{"a":"\\u0000"}')) == UNKNOWN_METHOD
 
 
-def test_a_single_low_surrogate_comes_back_as_its_three_bytes(client):
+def test_a_single_low_surrogate_is_returned_as_its_three_bytes(client):
     echoed = b'"\xed\xb0\x80"'.decode("utf-8", "surrogateescape")
     assert client.ask(call("x", id='"\\udc00"')) == error_response(echoed, -32601)
 
@@ -109,7 +109,7 @@ def test_a_single_low_surrogate_comes_back_as_its_three_bytes(client):
     b"\xff", b"\xc0\x80", b"\xed\xa0\x80", b"\xf5\x80\x80\x80", b"\xe2\x82", b"\x80", b"\xf0\x9f"],
     ids=ascii)
 def test_bytes_that_are_not_utf8_pass_through(client, text):
-    """The host's own body is compared, since such bytes are no text in Python."""
+    """The body is compared as bytes, since it is not a text in Python."""
     body = b'{"jsonrpc":"2.0","id":"' + text + b'","method":"x"}'
     assert client.ask(body) == error_response(
         '"' + text.decode("utf-8", "surrogateescape") + '"', -32601)
@@ -125,7 +125,7 @@ def test_a_parse_error_leaves_the_connection_usable(host):
         connection.close()
 
 
-# A number whose exponent is at the end of what 32 bits hold, and places behind its point: zero.
+# A number whose exponent is the lowest that 32 bits hold, with digits after the point: it is zero.
 TINY = ["0.0000000001e-2147483639", "-0.0000000001e-2147483639", "0.1e-2147483647",
         "0.00000000001E-2147483638", "1.5e-2147483639", "0.1e-99999999999999999999",
         "0." + "0" * 400 + "1e-2147483639", "1e-2147483648", "0.1e-000000002147483647",
@@ -157,24 +157,24 @@ def test_text_after_a_vanishing_number_is_still_a_parse_error(client, number):
 
 @pytest.mark.parametrize("number", ["10e308", "-10e308", "100e307", "1e309", "1" + "0" * 309,
                                     "0.1e310", "17976931348623159e292"])
-def test_a_number_beyond_every_double_is_a_parse_error(client, number):
+def test_a_number_above_the_largest_double_is_a_parse_error(client, number):
     assert client.ask(call("x", id=number)) == PARSE_ERROR
     assert client.ask(call("initializeSession",
                            f'{{"reservation_timeout":{number}}}')) == PARSE_ERROR
 
 
-def test_a_big_number_that_a_double_holds_is_served(client):
+def test_a_large_number_that_a_double_represents_is_accepted(client):
     with client.session('{"reservation_timeout":1e308}'):
         pass
 
 
-def test_the_first_of_two_params_counts_for_a_procedure(client):
+def test_a_procedure_uses_the_first_of_two_equal_params(client):
     body = (b'{"jsonrpc":"2.0","id":1,"method":"closeSession",'
             b'"params":{"session_id":"_session999998"},"params":{"session_id":"_session999999"}}')
     assert client.ask(body) == error_response("1", -250833)
 
 
-def test_every_one_of_two_equal_members_is_checked(client):
+def test_both_of_two_equal_members_are_checked(client):
     for first, second in (('"_session999999"', "5"), ("5", '"_session999999"')):
         answer = client.ask(call("closeSession",
                                  f'{{"session_id":{first},"session_id":{second}}}'))

@@ -1,4 +1,4 @@
-"""Sessions: how they are opened on resources, found again, displaced and closed.
+"""Sessions: how they are opened on resources, identified, displaced and closed.
 
 The chassis is the simulator's own: Bench with Mod1 (channels ch0 to ch3), Mod2 (ch0, ch1), Mod4 (ch0
 to ch7) and Mod5, each module with the NVMEM areas user and calibration.
@@ -39,7 +39,7 @@ def aborting(session_id):
 
 
 def is_taken(client, device):
-    """Whether a session holds a device so that no other can have it for itself."""
+    """Whether a session holds a device exclusively."""
     answer = client.ask(opening(devices=device))
     client.close_if_opened(answer)
     return answer == RESERVED
@@ -107,7 +107,7 @@ REFUSED_OPENINGS = [
     ('{"physical_channels":["Mod1/ch0","Mod1/ch4:1"]}', INVALID_NAME),
     ('{"devices":"Mod1/ch4:1"}', INVALID_NAME),
     ('{"nvmem_areas":"Mod1/user4:1"}', INVALID_NAME),
-    # Two kinds of resources are refused before any of them is looked at.
+    # Two kinds of resources are refused before any of them is looked up.
     ('{"devices":"Mod1","physical_channels":"Mod1/ch4:1"}', INVALID_PARAMS),
 ]
 
@@ -120,7 +120,7 @@ def test_a_session_holds_the_devices_of_its_resources_until_it_is_closed(client,
 
 
 @pytest.mark.parametrize("params, answer", REFUSED_OPENINGS)
-def test_an_opening_that_is_refused_holds_nothing(client, params, answer):
+def test_a_refused_opening_reserves_nothing(client, params, answer):
     assert client.ask(call("initializeSession", params)) == answer
     assert taken_devices(client) == []
 
@@ -133,7 +133,7 @@ def test_the_longest_ranges_reach_the_driver(client, range):
 
 @pytest.mark.parametrize("text", [b"Mod1/ch4:1\xff", b"\xff/ch4:1", b"Mod1/\xc0\x80:1",
                                   b"Mod1/\xed\xa0\x80ch:1", b"Mod1/\xf5\x80\x80\x80ch2:1"], ids=ascii)
-def test_a_bad_range_that_is_not_utf8_is_told_from_a_bad_range(client, text):
+def test_a_malformed_range_that_is_not_utf8_has_its_own_code(client, text):
     body = (b'{"jsonrpc":"2.0","id":1,"method":"initializeSession","params":{"physical_channels":"' +
             text + b'"}}')
     assert client.ask(body) == NOT_UTF8
@@ -149,7 +149,7 @@ def test_readers_share_a_device(client, access):
 
 
 @pytest.mark.parametrize("access", ["", ',"access":3', ',"access":"ReadWrite"'])
-def test_a_writer_keeps_a_device_to_itself(client, access):
+def test_a_session_that_writes_holds_its_device_exclusively(client, access):
     params = f'{{"devices":"Mod1"{access}}}'
     with client.session(params):
         assert client.ask(call("initializeSession", params)) == RESERVED
@@ -164,7 +164,7 @@ def test_another_access_is_refused(client, access):
 
 
 @pytest.mark.parametrize("access", ["1.0", "3.0", "3e0"])
-def test_an_access_that_is_equal_but_no_integer_is_an_internal_error(client, access):
+def test_an_access_that_is_equal_but_not_an_integer_is_an_internal_error(client, access):
     for resources in ("", ',"devices":"Mod1"'):
         params = f'{{"access":{access}{resources}}}'
         assert client.ask(call("initializeSession", params)) == INTERNAL_ERROR
@@ -183,7 +183,7 @@ def test_sessions_of_one_group_share_a_device(client):
         assert client.ask(opening(devices="Mod1", reservation_group="")) == RESERVED
 
 
-def test_the_empty_group_is_no_group(client):
+def test_sessions_of_the_empty_group_do_not_share_a_device(client):
     with client.session('{"devices":"Mod1","reservation_group":""}'):
         assert client.ask(opening(devices="Mod1", reservation_group="")) == RESERVED
 
@@ -221,7 +221,7 @@ def test_an_id_that_is_not_a_session_s_is_unknown(client, other):
         assert client.ask(closing(other.format(session_id))) == UNKNOWN_SESSION
 
 
-def test_a_session_belongs_to_whoever_knows_its_id(client, host):
+def test_a_session_can_be_used_by_any_client_that_knows_its_id(client, host):
     session_id = client.open_session('{"devices":"Mod1"}')
     with Client(host) as other:
         assert other.ask(aborting(session_id)) == result_response()
@@ -229,7 +229,7 @@ def test_a_session_belongs_to_whoever_knows_its_id(client, host):
     assert client.ask(closing(session_id)) == UNKNOWN_SESSION
 
 
-def test_the_end_of_a_connection_ends_no_session(client, host):
+def test_closing_a_connection_closes_no_session(client, host):
     with Client(host) as other:
         session_id = other.open_session('{"devices":"Mod1"}')
     assert taken_devices(client) == ["Mod1"]
@@ -284,7 +284,7 @@ def test_force_reserve_compares_names_byte_by_byte(client):
         assert client.ask(aborting(holder)) == result_response()
 
 
-def test_a_forced_opening_that_fails_has_closed_the_holders_all_the_same(client):
+def test_a_forced_opening_that_fails_has_still_closed_the_holders(client):
     holder = client.open_session('{"devices":"Mod1"}')
     assert client.ask(opening(devices=["Mod1", "Mod3"], force_reserve=True)) == NO_SUCH_DEVICE
     assert client.ask(closing(holder)) == UNKNOWN_SESSION
@@ -334,7 +334,7 @@ def test_only_a_table_of_exactly_a_hundred_refuses(own_host):
         client.open_session('{"devices":"Mod1"}')
 
 
-def test_force_reserve_makes_its_own_room(own_host):
+def test_force_reserve_makes_room_in_a_full_table(own_host):
     with Client(own_host) as client:
         ids = [client.open_session() for _ in range(LIMIT - 1)]
         ids.append(client.open_session('{"devices":"Mod1"}'))
@@ -365,7 +365,7 @@ def test_a_wait_for_a_device_ends_with_its_timeout(client):
 
 
 @pytest.mark.parametrize("timeout", ["-1", "-0.5"])
-def test_a_negative_reservation_timeout_is_the_driver_s_to_refuse(client, timeout):
+def test_a_negative_reservation_timeout_is_refused_by_the_driver(client, timeout):
     params = f'{{"devices":"Mod1","reservation_timeout":{timeout}}}'
     assert client.ask(call("initializeSession", params)) == INVALID_TIMEOUT
 

@@ -1,4 +1,4 @@
-"""What the simulated chassis remembers from one run of the host to the next."""
+"""What the simulated chassis keeps from one run of the host to the next."""
 
 import signal
 import subprocess
@@ -17,7 +17,7 @@ ONE_CHASSIS = """{"devices": [
      "commands": {"Note": {"sets": {"Dev.Comment": "noted"}}},
      "nvmem_areas": [{"name": "user", "size": 4}]}]}"""
 
-# Each method that changes what lasts, with its parameters.
+# Each method that changes persistent state, with its parameters.
 LASTING_CHANGES = {
     "renameDevice": {"device": "A", "new_device_name": "B"},
     "setProperty": {"property": "Dev.Comment", "value": "x", "devices": "A"},
@@ -55,7 +55,7 @@ class Bench:
 
 
 def run(folder, use, options=()):
-    """Runs a host on the folder, lets use(Bench) act, and ends it as a service manager does."""
+    """Runs a host on the folder, calls use(Bench), and ends the host as a service manager does."""
     with clean_host(options=("--state", folder, *options)) as host, Client(host) as client:
         with client.session() as session_id:
             use(Bench(client, session_id))
@@ -70,7 +70,7 @@ def data(*values):
     return result_response(f'{{"data":[{listed}],"next_address":1}}')
 
 
-def test_committed_bytes_are_there_after_a_restart(folder):
+def test_committed_bytes_survive_a_restart(folder):
     def commit(bench):
         bench.write("Mod1/user", [1, 2, 255])
         assert bench.ask("commitNvmemAreas", {"nvmem_areas": ["Mod1/user"]}) == NOTHING
@@ -79,7 +79,7 @@ def test_committed_bytes_are_there_after_a_restart(folder):
     run(folder, lambda bench: expect(bench.read("Mod1/user", 4), data(1, 2, 255, 0)))
 
 
-def test_bytes_without_a_commit_are_the_old_ones_after_a_restart(folder):
+def test_uncommitted_bytes_are_lost_at_a_restart(folder):
     def write(bench):
         bench.write("Mod1/user", [7])
         expect(bench.read("Mod1/user", 1), data(7))
@@ -88,7 +88,7 @@ def test_bytes_without_a_commit_are_the_old_ones_after_a_restart(folder):
     run(folder, lambda bench: expect(bench.read("Mod1/user", 1), data(0)))
 
 
-def test_new_names_are_there_after_a_restart(folder):
+def test_new_names_survive_a_restart(folder):
     names = result_response('{"data_type":"StringArray","value":'
                             '["Lab","Lab-Mod1","Lab-Mod2","Lab-Mod4","Lab-Mod5"]}')
 
@@ -114,7 +114,7 @@ def test_a_commit_that_cannot_be_written_fails_and_stays_pending(folder):
     run(folder, lambda bench: expect(bench.read("Mod1/user", 1), data(9)))
 
 
-def test_each_change_of_what_lasts_fails_when_it_cannot_be_written(folder, tmp_path):
+def test_each_change_of_persistent_state_fails_when_it_cannot_be_written(folder, tmp_path):
     (tmp_path / "chassis.json").write_text(ONE_CHASSIS)
 
     def change(bench):
@@ -128,7 +128,7 @@ def test_each_change_of_what_lasts_fails_when_it_cannot_be_written(folder, tmp_p
     run(folder, change, ("--chassis", tmp_path / "chassis.json"))
 
 
-def test_a_host_that_was_killed_leaves_the_folder_to_the_next(folder):
+def test_a_killed_host_leaves_the_folder_usable(folder):
     with Host(options=("--state", folder)) as host:
         result = subprocess.run(
             [BUILD_DIR / "bin" / "qitrmc-host", "--listen", "127.0.0.1:0", "--state", folder],

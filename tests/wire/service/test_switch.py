@@ -1,4 +1,4 @@
-"""The switch in the configuration that turns the service on."""
+"""The configuration setting that enables the service."""
 
 import pytest
 
@@ -98,7 +98,7 @@ def host_with(configuration):
 
 
 @pytest.mark.parametrize("configuration", ON, ids=lambda text: ascii(text)[:60])
-def test_the_service_is_on(configuration):
+def test_the_service_is_enabled(configuration):
     with host_with(configuration) as host:
         status, headers, body = host.post(call("x"))
     assert (status, headers["Content-Type"]) == (200, "application/json; charset=utf-8")
@@ -106,13 +106,13 @@ def test_the_service_is_on(configuration):
 
 
 @pytest.mark.parametrize("configuration", OFF, ids=lambda text: ascii(text)[:60])
-def test_the_service_is_off(configuration):
+def test_the_service_is_disabled(configuration):
     with host_with(configuration) as host:
         status, _, body = host.post(call("x"))
     assert (status, body) == (404, DISABLED)
 
 
-def test_a_service_that_is_off_says_so_whatever_is_asked():
+def test_a_disabled_service_gives_the_same_response_to_every_request():
     with host_with(None) as host:
         for method, path in (("GET", "/qitrmc/Call"), ("PUT", "/qitrmc/Call"),
                              ("POST", "/qitrmc/Other")):
@@ -120,7 +120,7 @@ def test_a_service_that_is_off_says_so_whatever_is_asked():
             assert (status, body) == (404, DISABLED)
 
 
-def test_the_switch_is_read_once_at_the_start():
+def test_the_setting_is_read_once_at_the_start():
     with host_with(b"[WebService]\nEnable=1\n") as host:
         (host.directory / CONFIGURATION).unlink()
         assert host.post(call("x"))[0] == 200

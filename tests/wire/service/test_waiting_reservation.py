@@ -1,7 +1,7 @@
-"""What the holder of a device can do while another session waits for it: nothing.
+"""The holder of a device cannot release it while another session waits for it.
 
-Its requests are held up until the one that waits has failed. So a long reservation_timeout cannot
-get a device, and asking again without one can.
+The holder's requests are blocked until the waiting request has failed. So a long
+reservation_timeout cannot get a device, whereas repeated requests without one can.
 """
 
 import pytest
@@ -18,13 +18,13 @@ DEVICES = {"devices": "Mod1"}
 # Seconds that the waiting request waits.
 WAIT = 0.5
 
-# How often a holder may be faster than the request that is to wait for its device.
+# How often the holder may be faster than the request that should wait for its device.
 ATTEMPTS = 20
 
 
 @pytest.fixture
 def traced():
-    """A host that notes each call of the driver when it ends."""
+    """A host that traces each driver call when it ends."""
     with clean_host(("--trace", TRACE)) as running:
         yield running
 
@@ -42,8 +42,8 @@ def waiter(traced):
 
 
 def calls_of(host, function, session):
-    """The calls of a driver function by a session so far, as numbers of lines. The handle of a
-    session is the number in its id."""
+    """The calls of a driver function by a session so far, as line numbers. The handle of a session
+    is the number in its id."""
     begin = f" {function}(session={session.removeprefix('_session')}"
     lines = (host.directory / TRACE).read_text(encoding="utf-8").splitlines()
     return [number for number, line in enumerate(lines)
@@ -51,8 +51,8 @@ def calls_of(host, function, session):
 
 
 def start_waiting(host, waiter, session):
-    """Sends a request that waits for the device. Returns when it has looked its name up, which is
-    the last thing it does before it waits."""
+    """Sends a request that waits for the device. Returns once it has looked up the device's
+    name, the last step before it waits."""
     waiter.send(call("reserveDevices",
                      {"session_id": session, **DEVICES, "reservation_timeout": WAIT}))
     while not calls_of(host, "getSystemPropertyStringArray", session):
@@ -61,7 +61,7 @@ def start_waiting(host, waiter, session):
 
 def was_held_up(host, holder, waiter, method):
     """Whether the holder's request was carried out only after the wait. It is not when the holder
-    is faster than the request that is to wait: that one succeeds then."""
+    is faster than the request that should wait, which then succeeds."""
     holding, waiting = holder.open_session(DEVICES), waiter.open_session()
     start_waiting(host, waiter, waiting)
     assert holder.ask(call(method, {"session_id": holding})) == result_response()
@@ -75,11 +75,11 @@ def was_held_up(host, holder, waiter, method):
 
 
 @pytest.mark.parametrize("method", ["closeSession", "unreserveDevices"])
-def test_a_holder_gives_a_device_up_only_after_the_wait_for_it(traced, holder, waiter, method):
+def test_a_holder_can_release_a_device_only_after_the_wait_for_it(traced, holder, waiter, method):
     assert any(was_held_up(traced, holder, waiter, method) for _ in range(ATTEMPTS))
 
 
-def test_asking_again_without_a_wait_gets_the_device(holder, waiter):
+def test_repeated_requests_without_a_wait_get_the_device(holder, waiter):
     holding, asking = holder.open_session(DEVICES), waiter.open_session()
     request = call("reserveDevices", {"session_id": asking, **DEVICES, "reservation_timeout": 0})
     assert waiter.ask(request) == RESERVED

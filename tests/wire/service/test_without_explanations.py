@@ -1,4 +1,4 @@
-"""What is left of the service where the explanation files are not installed."""
+"""How the service behaves without installed explanation files."""
 
 import pytest
 
@@ -42,7 +42,7 @@ def test_failures_with_a_code_of_their_own_and_details_keep_their_details(bare_h
     call("initializeSession", {"devices": "None"}),
     b"[" + call("x") + b"," + call("y") + b"]",
 ])
-def test_failures_that_need_a_text_without_details_are_served_with_a_bare_500(bare_host, body):
+def test_failures_without_details_that_need_a_text_are_an_empty_500(bare_host, body):
     assert bare_host.post(body)[::2] == (500, b"")
 
 
