@@ -53,7 +53,7 @@ class Opened {
 
 using AttributeTest = BenchTest;
 
-TEST_F(AttributeTest, APropertyOfAModuleTellsAboutItself) {
+TEST_F(AttributeTest, APropertyOfAModuleHasItsAttributes) {
     const Opened range(session, "Mod1", "DMM.Range");
     EXPECT_EQ(range.number("Prop.DataType"), 2);
     EXPECT_EQ(range.number("Prop.Access"), 3);
@@ -66,7 +66,7 @@ TEST_F(AttributeTest, APropertyOfAModuleTellsAboutItself) {
     EXPECT_FALSE(range.flag("Prop.PendingChanges"));
 }
 
-TEST_F(AttributeTest, TextsThatThereAreNoneOfAreEmpty) {
+TEST_F(AttributeTest, MissingTextsAreEmpty) {
     const Opened slot(session, "Dev.SlotNum");
     EXPECT_EQ(slot.number("Prop.DataType"), 6);
     EXPECT_EQ(slot.number("Prop.Access"), 1);
@@ -106,7 +106,7 @@ TEST_F(AttributeTest, AnEnumerationIsListedInItsOrder) {
     EXPECT_EQ(status.code, 0) << status.text();
 }
 
-TEST_F(AttributeTest, PendingChangesAreSeenUntilTheCommit) {
+TEST_F(AttributeTest, ChangesArePendingUntilTheCommit) {
     const Opened limit(session, "Mod2/ch0", "PSU.CurrentLimit");
     const Opened other(session, "Mod2/ch1", "PSU.CurrentLimit");
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.CurrentLimit", 1.0).code, 0);
@@ -134,7 +134,7 @@ TEST_F(AttributeTest, AnUnknownAttributeIsRefused) {
     EXPECT_EQ(text, nullptr);
 }
 
-TEST_F(AttributeTest, PropertiesThatThereAreNotCannotBeOpened) {
+TEST_F(AttributeTest, UnknownPropertiesCannotBeOpened) {
     Status unknown;
     nQITRMCAPI100_Property handle = 5;
     nQITRMCAPI100_openDriverDefinedProperty(session, "DMM.Range", &handle, &unknown);

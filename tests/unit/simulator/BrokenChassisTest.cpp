@@ -15,7 +15,7 @@ TEST(BrokenChassisTest, AnEmptyPathMeansTheBuiltInChassis) {
     EXPECT_EQ(openWith("").output, "0\n\n1 2 3\n");
 }
 
-TEST(BrokenChassisTest, AMissingFileIsToldOnce) {
+TEST(BrokenChassisTest, AMissingFileIsReportedOnce) {
     const Probe probe = openWith("/nonexistent/chassis.json");
     EXPECT_EQ(probe.output.substr(0, 8), "-250952\n");
     EXPECT_EQ(probe.errors,
@@ -23,13 +23,13 @@ TEST(BrokenChassisTest, AMissingFileIsToldOnce) {
               "QITRMC_SIM_CHASSIS must name a readable file\n");
 }
 
-TEST(BrokenChassisTest, AFolderIsNoFile) {
+TEST(BrokenChassisTest, AFolderIsNotAFile) {
     EXPECT_EQ(openWith("/tmp").errors,
               "qitrmcapi: /tmp: cannot be read: Is a directory; "
               "QITRMC_SIM_CHASSIS must name a readable file\n");
 }
 
-TEST(BrokenChassisTest, AFileWithoutEndIsGivenUp) {
+TEST(BrokenChassisTest, AnEndlessFileIsRefused) {
     EXPECT_EQ(openWith("/dev/zero").errors,
               "qitrmcapi: /dev/zero: is larger than 16 MiB; "
               "QITRMC_SIM_CHASSIS must name a readable file\n");
@@ -41,7 +41,7 @@ TEST(BrokenChassisTest, AnEmptyFileIsNotJson) {
                 "a chassis description is one JSON object");
 }
 
-TEST(BrokenChassisTest, TextThatIsNotJsonIsToldWithItsLine) {
+TEST(BrokenChassisTest, TextThatIsNotJsonIsReportedWithItsLine) {
     expectFault("{\n  \"devices\": [,]\n}", "",
                 "is not JSON at line 2, column 15: Invalid value; "
                 "a chassis description is one JSON object");
@@ -95,12 +95,12 @@ TEST(BrokenChassisTest, AMistypedMemberIsNamedWithTheOnesThatExist) {
                 "system_values, session_values");
 }
 
-TEST(BrokenChassisTest, AMemberThatStandsTwiceIsRefused) {
+TEST(BrokenChassisTest, ARepeatedMemberIsRefused) {
     expectFault("{\"devices\":[],\"devices\":[]}", "/devices",
                 "stands there twice; each member may be given once");
 }
 
-TEST(BrokenChassisTest, ACommandThatStandsTwiceIsRefused) {
+TEST(BrokenChassisTest, ARepeatedCommandIsRefused) {
     expectFault(device(",\"commands\":{\"C\":{},\"C\":{}}"), "/devices/0/commands/C",
                 "stands there twice; each member may be given once");
 }
@@ -129,7 +129,7 @@ TEST(BrokenChassisTest, ALongTextIsCutBetweenCharactersAndNotInsideOne) {
             "is the text \"" + shown + "...\", which is not a name; a name has at most 64 bytes");
     };
     const std::string rest(30, 'y');
-    // Characters of two, three and four bytes: across byte 40, and up to it.
+    // Characters of two, three and four bytes, once crossing byte 40 and once ending there.
     for (const std::string character : {"\xC3\xA9", "\xE2\x82\xAC", "\xF0\x9F\x98\x80"}) {
         for (size_t inside = 1; inside < character.size(); ++inside) {
             expectShown(std::string(40 - inside, 'x'), character + rest);
@@ -160,7 +160,7 @@ TEST(BrokenChassisTest, ModulesHaveNoModules) {
                 "only a device of category 1 outside of a slot has modules");
 }
 
-TEST(BrokenChassisTest, AnAreaMustNotBeCalledLikeAChannel) {
+TEST(BrokenChassisTest, AnAreaMustNotHaveTheNameOfAChannel) {
     expectFault(
         device(",\"channels\":{\"prefix\":\"ch\",\"count\":2},"
                "\"nvmem_areas\":[{\"name\":\"CH1\"}]"),
@@ -176,7 +176,7 @@ TEST(BrokenChassisTest, APartThatARangeCannotNameIsRefused) {
         "or a range could not name it");
 }
 
-TEST(BrokenChassisTest, DeepNestingIsReadWithoutHarm) {
+TEST(BrokenChassisTest, DeepNestingIsReadSafely) {
     const std::string deep(200000, '[');
     const ChassisFile file("{\"devices\":" + deep + std::string(200000, ']') + "}");
     EXPECT_EQ(openWith(file.path).output.substr(0, 8), "-250952\n");
@@ -188,7 +188,7 @@ void expectPropertyFault(const std::string& members, const std::string& place,
                 "/devices/0/properties/P" + place, words);
 }
 
-TEST(BrokenChassisTest, PropertiesThatMakeNoSenseAreRefused) {
+TEST(BrokenChassisTest, InconsistentPropertiesAreRefused) {
     expectPropertyFault("\"type\":\"Float\"", "/type",
                         "is the text \"Float\"; must be Bool, Double, Int32, Int64, String, "
                         "UInt32 or UInt64, or one of these with Array behind it");
@@ -251,7 +251,7 @@ TEST(BrokenChassisTest, DriverPropertiesKeepTheirMeaning) {
         "can never last; sessions end, and their properties with them");
 }
 
-TEST(BrokenChassisTest, CommandsActOnWhatIsThere) {
+TEST(BrokenChassisTest, CommandsActOnExistingProperties) {
     expectFault(device(",\"commands\":{\"C\":{\"sets\":{\"P\":1}}}"),
                 "/devices/0/commands/C/sets/P",
                 "is not a stored property of the resource; "

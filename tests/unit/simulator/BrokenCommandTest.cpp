@@ -50,7 +50,7 @@ TEST(BrokenCommandTest, AFailureHasAStatus) {
                        "probability");
 }
 
-TEST(BrokenCommandTest, AFailureLooksAtAPropertyOfItsResource) {
+TEST(BrokenCommandTest, AFailureDependsOnAPropertyOfItsResource) {
     const std::string status = "\"status\":{\"code\":-1},";
     expectFailureFault(status + "\"when\":{\"property\":\"Q\",\"is\":1}", "/when/property",
                        "is not a stored property of the resource; "
@@ -63,7 +63,7 @@ TEST(BrokenCommandTest, AFailureLooksAtAPropertyOfItsResource) {
                        "is missing; must be the name of a property of the resource");
 }
 
-TEST(BrokenCommandTest, AProbabilityIsAShare) {
+TEST(BrokenCommandTest, AProbabilityIsBetweenZeroAndOne) {
     const std::pair<const char*, std::string> numbers[] = {
         {"-0.01", "-0.01"}, {"1.01", "1.01"}, {"\"1\"", "the text \"1\""}, {"true", "true"}};
     for (const auto& [number, shown] : numbers) {

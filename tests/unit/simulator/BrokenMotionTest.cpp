@@ -4,7 +4,7 @@ using namespace drivertest;
 
 namespace {
 
-// A device whose property X of this type moves as told.
+// A device whose property X of this type has this motion.
 std::string moving(const std::string& type, const std::string& value, const std::string& motion) {
     return device(
         ",\"properties\":{\"X\":{\"type\":\"" + type + "\",\"value\":" + value +
@@ -17,7 +17,7 @@ void expectMotionFault(const std::string& motion, const std::string& pointer,
     expectFault(moving("Double", "0", motion), "/devices/0/live/X" + pointer, words);
 }
 
-TEST(BrokenMotionTest, OnlyStoredPropertiesMove) {
+TEST(BrokenMotionTest, OnlyStoredPropertiesCanMove) {
     const char* const words =
         "is not a stored property of the resource; only properties that the resource has and that "
         "hold a value can move";
@@ -27,7 +27,7 @@ TEST(BrokenMotionTest, OnlyStoredPropertiesMove) {
     expectFault(device(",\"live\":[]"), "/devices/0/live", "is an array; must be an object");
 }
 
-TEST(BrokenMotionTest, AMotionMoves) {
+TEST(BrokenMotionTest, AMotionMustHaveAnEffect) {
     expectMotionFault("{}", "",
                       "does not move; must hold follows, drift, noise, counts or waveform");
     expectMotionFault("{\"jumps\":1}", "/jumps",
@@ -49,7 +49,7 @@ TEST(BrokenMotionTest, NumbersOutOfRangeAreRefused) {
                       "/follows/time_constant", "is 86401; must be a number from 0 to 86400");
 }
 
-TEST(BrokenMotionTest, TheMotionSuitsTheType) {
+TEST(BrokenMotionTest, TheMotionMustFitTheType) {
     expectFault(moving("String", "\"\"", "{\"noise\":1}"), "/devices/0/live/X",
                 "does not suit a property of type String; only a single number moves like this");
     expectFault(moving("DoubleArray", "[]", "{\"drift\":{\"amplitude\":1,\"period\":1}}"),
@@ -68,7 +68,7 @@ TEST(BrokenMotionTest, TheMotionSuitsTheType) {
         "/devices/0/live/X", "moves an enumeration; only numbers that stand for themselves move");
 }
 
-TEST(BrokenMotionTest, CountsAndWaveformsKeepToThemselves) {
+TEST(BrokenMotionTest, CountsAndWaveformsAreNotCombinedWithOtherMotions) {
     expectMotionFault("{\"counts\":{\"per_second\":1},\"noise\":1}", "",
                       "counts and moves otherwise too; counts stands alone");
     expectMotionFault("{\"waveform\":{},\"drift\":{}}", "",
@@ -80,7 +80,7 @@ TEST(BrokenMotionTest, CountsAndWaveformsKeepToThemselves) {
                 "counts in a property that can be written; the access must be ReadOnly");
 }
 
-TEST(BrokenMotionTest, WhatIsFollowedMustBeThere) {
+TEST(BrokenMotionTest, AFollowedPropertyMustExist) {
     expectMotionFault("{\"follows\":{}}", "/follows/property",
                       "is missing; must be the name of a property");
     expectMotionFault("{\"follows\":{\"property\":\"Y\"}}", "/follows/property",
@@ -96,7 +96,7 @@ TEST(BrokenMotionTest, WhatIsFollowedMustBeThere) {
                       "does not suit a property of type Double; must be a Bool");
 }
 
-TEST(BrokenMotionTest, TheNumberOfTheChannelIsPutIn) {
+TEST(BrokenMotionTest, TheNumberOfTheChannelIsInserted) {
     expectFault(
         "{\"devices\":[{\"name\":\"A\",\"category\":1,\"channels\":{\"prefix\":\"x\","
         "\"count\":3,\"properties\":{\"X\":{\"type\":\"Double\",\"value\":0}},\"live\":"
@@ -122,7 +122,7 @@ std::string following(int who, int whom, const std::string& more = "") {
            std::to_string(whom) + "\"" + more + "}}";
 }
 
-TEST(BrokenMotionTest, NothingFollowsItself) {
+TEST(BrokenMotionTest, APropertyCannotFollowItself) {
     expectMotionFault("{\"follows\":{\"property\":\"X\"}}", "/follows",
                       "follows itself; must not go round in a circle");
     expectFault(device(",\"properties\":{" + numbers(3) + "},\"live\":{" + following(0, 1) + "," +
@@ -130,7 +130,7 @@ TEST(BrokenMotionTest, NothingFollowsItself) {
                 "/devices/0/live/P0/follows", "follows itself; must not go round in a circle");
 }
 
-TEST(BrokenMotionTest, ChainsAreNotTooLong) {
+TEST(BrokenMotionTest, ChainsHaveALimitedLength) {
     std::string live;
     for (int i = 0; i < 16; ++i) {
         live += (i == 0 ? "" : ",") + following(i, i + 1);
@@ -144,7 +144,7 @@ TEST(BrokenMotionTest, ChainsAreNotTooLong) {
                 "follows over more than 16 properties; must be a shorter chain, and no circle");
 }
 
-TEST(BrokenMotionTest, ALagIsForWhatKeepsStill) {
+TEST(BrokenMotionTest, ALagNeedsATargetWithoutMotion) {
     expectFault(device(",\"properties\":{" + numbers(3) + "},\"live\":{" +
                        following(0, 1, ",\"time_constant\":1") + "," + following(1, 2) + "}"),
                 "/devices/0/live/P0/follows",
@@ -158,7 +158,7 @@ void expectWaveformFault(const std::string& members, const std::string& pointer,
                 "/devices/0/live/X/waveform" + pointer, words);
 }
 
-TEST(BrokenMotionTest, WaveformsAreComplete) {
+TEST(BrokenMotionTest, WaveformsMustBeComplete) {
     expectWaveformFault("\"samples\":1,\"sample_rate\":1", "/shape",
                         "is missing; must be the name of a shape");
     expectWaveformFault("\"shape\":\"round\",\"samples\":1,\"sample_rate\":1", "/shape",

@@ -18,7 +18,7 @@ void expectBlockFault(const std::string& members, const std::string& place,
                 "/devices/0/registers/0" + place, words);
 }
 
-TEST(BrokenRegisterTest, TheMembersOfABlockAreTold) {
+TEST(BrokenRegisterTest, UnknownMembersOfABlockAreReportedWithTheKnownOnes) {
     expectBlockFault("\"size\":4,\"show\":\"I\"", "/show",
                      "is not a known member; perhaps \"shows\" is meant; the members here are "
                      "name, description, address, size, bytes, access, "
@@ -40,7 +40,7 @@ TEST(BrokenRegisterTest, AWidthIsThatOfARegister) {
     expectBlockFault("\"size\":3,\"width\":16", "/width", divides);
 }
 
-TEST(BrokenRegisterTest, SideEffectsAreNamedByTheirWord) {
+TEST(BrokenRegisterTest, SideEffectsHaveOneOfTheKnownNames) {
     expectBlockFault("\"size\":4,\"on_read\":\"ones_clear\"", "/on_read",
                      "is the text \"ones_clear\"; must be clear");
     expectBlockFault("\"size\":4,\"on_write\":\"clear\"", "/on_write",
@@ -48,7 +48,7 @@ TEST(BrokenRegisterTest, SideEffectsAreNamedByTheirWord) {
     expectBlockFault("\"size\":4,\"on_read\":true", "/on_read", "is true; must be a text");
 }
 
-TEST(BrokenRegisterTest, WhatNeverHappensIsRefused) {
+TEST(BrokenRegisterTest, SideEffectsThatCannotHappenAreRefused) {
     expectBlockFault("\"size\":4,\"access\":\"WriteOnly\",\"on_read\":\"clear\"", "/on_read",
                      "never happens; the registers cannot be read");
     expectBlockFault("\"size\":4,\"access\":\"ReadOnly\",\"on_write\":\"ones_clear\"", "/on_write",
@@ -57,12 +57,12 @@ TEST(BrokenRegisterTest, WhatNeverHappensIsRefused) {
                      "never happens; the registers cannot be written");
 }
 
-TEST(BrokenRegisterTest, AWriteRunsACommandOfTheDevice) {
+TEST(BrokenRegisterTest, ACommandOfARegisterMustBelongToTheDevice) {
     expectBlockFault("\"size\":4,\"runs\":\"Other\"", "/runs",
                      "is not a command of the device; a write carries out such a command");
 }
 
-TEST(BrokenRegisterTest, AShownPropertyIsThere) {
+TEST(BrokenRegisterTest, AShownPropertyMustExist) {
     expectBlockFault("\"size\":4,\"shows\":\"Other\"", "/shows",
                      "is not a stored property of the resource; "
                      "a register shows a property that is there");
@@ -83,7 +83,7 @@ TEST(BrokenRegisterTest, AShownPropertyIsThere) {
                      "must be a text, or an object with property and resource");
 }
 
-TEST(BrokenRegisterTest, AShownPropertyIsOneNumberOfTheRightSize) {
+TEST(BrokenRegisterTest, AShownPropertyMustBeOneNumberOfTheRightSize) {
     expectBlockFault("\"size\":4,\"shows\":\"T\"", "/shows",
                      "cannot be shown; only single numbers and Booleans can");
     expectBlockFault("\"size\":4,\"shows\":\"A\"", "/shows",
@@ -96,7 +96,7 @@ TEST(BrokenRegisterTest, AShownPropertyIsOneNumberOfTheRightSize) {
                      "can only be written; the access of the registers must be WriteOnly");
 }
 
-TEST(BrokenRegisterTest, AShownPropertyStandsAlone) {
+TEST(BrokenRegisterTest, ABlockShowsOnlyOneProperty) {
     const std::string words = "contradicts shows; registers that show a property do nothing else";
     for (const std::string member : {"\"bytes\":\"00\"", "\"on_read\":\"clear\"",
                                      "\"on_write\":\"ones_clear\"", "\"runs\":\"C\""}) {
@@ -105,7 +105,7 @@ TEST(BrokenRegisterTest, AShownPropertyStandsAlone) {
     }
 }
 
-TEST(BrokenRegisterTest, BlocksMayStandInAnyOrderButNotOverlap) {
+TEST(BrokenRegisterTest, BlocksMayBeInAnyOrderButMustNotOverlap) {
     const std::string far =
         ",\"registers\":[{\"address\":64,\"size\":8},{\"address\":0,\"size\":8},"
         "{\"address\":8,\"size\":8}";

@@ -1,5 +1,5 @@
-// Executes a command 256 times, and prints a digit for each time: 1 where it fails.
-// A further command is executed in between.
+// Executes a command 256 times, and prints a digit for each time: 1 where it fails. Another command
+// is executed in between.
 
 #include <cstdio>
 

@@ -8,7 +8,7 @@
 
 namespace drivertest {
 
-// A chassis description in a temporary file, which goes with this object.
+// A chassis description in a temporary file, which is removed with this object.
 class ChassisFile {
   public:
     explicit ChassisFile(const std::string& text) {

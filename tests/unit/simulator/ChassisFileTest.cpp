@@ -60,12 +60,12 @@ TEST(ChassisFileTest, TheDevicesAreThoseOfTheFile) {
     EXPECT_EQ(channels.back(), "Größe/Kanal11");
 }
 
-TEST(ChassisFileTest, LetterCaseIsFoldedAsUnicodeSays) {
+TEST(ChassisFileTest, LetterCaseIsFoldedByTheRulesOfUnicode) {
     Session session("GRÖSSE");
     EXPECT_EQ(session.list("Session.ReservedDevices"), Names{"Größe"});
 }
 
-TEST(ChassisFileTest, RangesNameAreasToo) {
+TEST(ChassisFileTest, RangesMayNameAreasToo) {
     Status status;
     Session session;
     session.close();
@@ -91,7 +91,7 @@ TEST(ChassisFileTest, TheFileAddsPropertiesOfTheDriver) {
     EXPECT_EQ(get(getUInt64, session, "Größe/cal1", "NVMEMArea.Wear"), uint64_t{3});
 }
 
-TEST(ChassisFileTest, TheFileGivesValues) {
+TEST(ChassisFileTest, TheFileSetsValues) {
     Session session;
     Status status;
     uint8_t simulated = 1;
@@ -114,7 +114,7 @@ TEST(ChassisFileTest, AddedNumbersWrapAround) {
     EXPECT_EQ(get(getDouble, session, "Counter", "Count.Real"), -0.25);
 }
 
-TEST(ChassisFileTest, ConnectingTakesItsTime) {
+TEST(ChassisFileTest, ConnectingTakesTheDescribedTime) {
     Session session;
     EXPECT_EQ(connectTo(session, "Slow", -1.0).code, 0);
     EXPECT_EQ(session.list("Session.ConnectedDevices"), Names{"Slow"});
@@ -122,7 +122,7 @@ TEST(ChassisFileTest, ConnectingTakesItsTime) {
     EXPECT_EQ(connectTo(session, "Slow", 0.0).code, 0);
 }
 
-TEST(ChassisFileTest, ConnectingIsGivenUpAtTheEndOfItsTime) {
+TEST(ChassisFileTest, ConnectingEndsAtItsTimeout) {
     Session session;
     const Outcome outcome = connectTo(session, "Slow", 0.01);
     EXPECT_EQ(outcome.code, -250987);
@@ -146,7 +146,7 @@ std::string unreachable(const std::string& entries, const std::string& causes) {
     return text + ",\"nested_error\":" + causes + "}";
 }
 
-TEST(ChassisFileTest, ADeviceThatDoesNotAnswerIsTheCause) {
+TEST(ChassisFileTest, AnUnreachableDeviceIsReportedAsTheCause) {
     Session session;
     const Outcome outcome = connectTo(session, "Slow,Dead", 2.0);
     EXPECT_EQ(outcome.code, -250988);
@@ -154,7 +154,7 @@ TEST(ChassisFileTest, ADeviceThatDoesNotAnswerIsTheCause) {
     EXPECT_EQ(session.list("Session.ConnectedDevices"), Names());
 }
 
-TEST(ChassisFileTest, EachDeviceThatDoesNotAnswerIsACause) {
+TEST(ChassisFileTest, EachUnreachableDeviceIsReportedAsACause) {
     Session session;
     const Outcome outcome = connectTo(session, "Lost,Dead", 2.0);
     EXPECT_EQ(outcome.code, -250988);

@@ -3,7 +3,7 @@
 #include "ChassisFile.h"
 #include "Driver.h"
 
-// What a new process makes of a chassis file. OPEN_PROBE names the program.
+// The result of loading a chassis file in a new process. OPEN_PROBE names the program.
 namespace drivertest {
 
 struct Probe {
@@ -16,8 +16,8 @@ inline std::string contentOf(const std::string& path) {
     return std::string(std::istreambuf_iterator<char>(file), {});
 }
 
-// Opens a session in a new process that uses this chassis file, and further variables of the
-// environment, as a shell takes them.
+// Opens a session in a new process that uses this chassis file and further variables of the
+// environment, in the syntax of a shell.
 inline Probe openWith(const std::string& path, const std::string& variables = "") {
     const ChassisFile output("");
     const ChassisFile errors("");
@@ -27,7 +27,7 @@ inline Probe openWith(const std::string& path, const std::string& variables = ""
     return {contentOf(output.path), contentOf(errors.path)};
 }
 
-// A text as it stands inside of a JSON text.
+// A text as it is written inside a JSON text.
 inline std::string escaped(const std::string& text) {
     std::string inside;
     for (const char c : text) {

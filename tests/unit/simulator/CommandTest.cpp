@@ -28,7 +28,7 @@ TEST_F(CommandTest, ACommandActsOnEachResourceOnce) {
               (std::vector<uint8_t>{1, 1}));
 }
 
-TEST_F(CommandTest, ACommandMayPutSettingsBack) {
+TEST_F(CommandTest, ACommandMayResetSettings) {
     EXPECT_EQ(set(setDouble, session, "Mod1", "DMM.Range", 1.0).code, 0);
     EXPECT_EQ(execute(session, "Mod1", "DMM.Defaults", 0.0).code, 0);
     EXPECT_EQ(get(getDouble, session, "Mod1", "DMM.Range"), 10.0);
@@ -39,7 +39,7 @@ TEST_F(CommandTest, ACommandThatTakesTimeActsAtItsEnd) {
     EXPECT_EQ(getText(session, "Mod1", "Dev.Comment"), std::string("self test passed"));
 }
 
-TEST_F(CommandTest, ACommandThatTakesTooLongIsGivenUp) {
+TEST_F(CommandTest, ACommandThatTakesTooLongEndsAtItsTimeout) {
     const Outcome outcome = execute(session, "Mod1", "DMM.SelfTest", 0.0);
     EXPECT_EQ(outcome.code, -250976);
     EXPECT_EQ(outcome.text, detailsOf("commandTimedOut", usage("CommandName", "\"DMM.SelfTest\"") +
@@ -71,14 +71,14 @@ TEST_F(CommandTest, ACommandNeedsAResourceAndATime) {
     EXPECT_EQ(execute(session, "Mod1", nullptr, 1.0).code, -250954);
 }
 
-TEST_F(CommandTest, ACommandNeedsADeviceThatMayBeWritten) {
+TEST_F(CommandTest, ACommandNeedsWriteAccessToTheDevice) {
     Session other;
     EXPECT_EQ(execute(other, "Mod1", "DMM.Trigger", 1.0).code, -250811);
     session.reserve("Mod1", 1);
     EXPECT_EQ(execute(session, "Mod1", "DMM.Trigger", 1.0).code, -250972);
 }
 
-TEST_F(CommandTest, AnOpenCommandTellsAboutItself) {
+TEST_F(CommandTest, AnOpenCommandHasItsAttributes) {
     Status status;
     nQITRMCAPI100_Command handle = 0;
     nQITRMCAPI100_openGenericCommand(session, "Mod1", "DMM.Trigger", &handle, &status);

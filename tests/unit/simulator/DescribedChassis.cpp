@@ -1,4 +1,4 @@
-// The chassis of the tests of described registers, commands and statuses.
+// The chassis for the tests of described registers, commands and statuses.
 
 #include <gtest/gtest.h>
 

@@ -8,7 +8,7 @@ using namespace drivertest;
 
 namespace {
 
-// Leaves the device as it is after power-on.
+// Restores the device to its state after power-on.
 class DescribedCommandTest : public testing::Test {
   protected:
     ~DescribedCommandTest() override { EXPECT_EQ(resetDevices(session, "Unit"), 0); }
@@ -22,27 +22,27 @@ class DescribedCommandTest : public testing::Test {
     Session session{"Unit"};
 };
 
-TEST_F(DescribedCommandTest, WhatIsAddedStaysWithinTheLimits) {
+TEST_F(DescribedCommandTest, AnAddedValueStaysWithinTheLimits) {
     EXPECT_EQ(run("Raise"), 0);
     EXPECT_EQ(get(getUInt32, session, "Unit", "Steps"), 10u);
 }
 
-TEST_F(DescribedCommandTest, WhatIsAddedStaysFinite) {
+TEST_F(DescribedCommandTest, AnAddedValueStaysFinite) {
     EXPECT_EQ(run("Grow"), 0);
     EXPECT_EQ(get(getDouble, session, "Unit", "Big"), std::numeric_limits<double>::max());
 }
 
-TEST_F(DescribedCommandTest, AFailureLeavesNoEffect) {
+TEST_F(DescribedCommandTest, AFailedCommandHasNoEffect) {
     EXPECT_EQ(run("Always"), -1);
     EXPECT_EQ(runs(), 0u);
 }
 
-TEST_F(DescribedCommandTest, AFailureComesAfterTheTimeOfTheCommand) {
+TEST_F(DescribedCommandTest, AFailureIsReportedAfterTheDurationOfTheCommand) {
     const auto start = std::chrono::steady_clock::now();
     EXPECT_EQ(run("Short"), -7);
     EXPECT_GE(std::chrono::steady_clock::now() - start, std::chrono::milliseconds(50));
     EXPECT_EQ(runs(), 0u);
-    // There is no time to find out.
+    // The timeout ends first.
     EXPECT_EQ(execute(session, "Unit", "Short", 0.0).code, -250976);
 }
 
@@ -70,7 +70,7 @@ TEST_F(DescribedCommandTest, EachThirdExecutionFails) {
     EXPECT_EQ(runs(), 4u);
 }
 
-TEST_F(DescribedCommandTest, OnlyCommandsThatComeToTheirEndCount) {
+TEST_F(DescribedCommandTest, OnlyCompletedCommandsAreCounted) {
     Session other;
     EXPECT_EQ(execute(other, "Unit", "Second", 1.0).code, -250811);
     EXPECT_EQ(execute(session, "Unit", "Second", 0.0).code, -250976);
@@ -79,21 +79,21 @@ TEST_F(DescribedCommandTest, OnlyCommandsThatComeToTheirEndCount) {
     EXPECT_EQ(run("Second"), -8);
 }
 
-TEST_F(DescribedCommandTest, AResetDoesNotStartTheCountAgain) {
+TEST_F(DescribedCommandTest, AResetDoesNotRestartTheCount) {
     EXPECT_EQ(run("Third"), 0);
     EXPECT_EQ(resetDevices(session, "Unit"), 0);
     EXPECT_EQ(run("Third"), 0);
     EXPECT_EQ(run("Third"), -3);
 }
 
-TEST_F(DescribedCommandTest, TheEndsOfProbabilityAreCertain) {
+TEST_F(DescribedCommandTest, Probabilities0And1AreExact) {
     for (int i = 0; i < 1000; ++i) {
         ASSERT_EQ(run("Never"), 0);
         ASSERT_EQ(run("Surely"), -4);
     }
 }
 
-TEST_F(DescribedCommandTest, FailuresAreAsFrequentAsTheirProbability) {
+TEST_F(DescribedCommandTest, FailuresOccurAsOftenAsTheirProbability) {
     const auto failuresOf = [&](const char* command) {
         int failures = 0;
         for (int i = 0; i < 10000; ++i) {
@@ -101,7 +101,7 @@ TEST_F(DescribedCommandTest, FailuresAreAsFrequentAsTheirProbability) {
         }
         return failures;
     };
-    // Six standard deviations to both sides.
+    // Six standard deviations on both sides.
     EXPECT_NEAR(failuresOf("Perhaps"), 5000, 300);
     EXPECT_NEAR(failuresOf("Rarely"), 1000, 180);
 }
@@ -115,7 +115,7 @@ TEST_F(DescribedCommandTest, AWarningComesWithTheEffect) {
     EXPECT_EQ(runs(), 1u);
 }
 
-TEST_F(DescribedCommandTest, WithoutRoomForItsTextAWarningStillHasItsEffect) {
+TEST_F(DescribedCommandTest, ACommandHasItsEffectEvenIfTheTextOfItsWarningDoesNotFit) {
     Status status;
     status.starve();
     nQITRMCAPI100_executeGenericCommand(session, "Unit", "Warns", 0.0, &status);
@@ -152,7 +152,7 @@ TEST_F(DescribedCommandTest, AResetComesBeforeTheOtherEffects) {
     EXPECT_EQ(get(getUInt32, session, "Unit", "Held"), 1u);
 }
 
-// What chance decides in a new process: a digit for each execution.
+// The random outcomes in a new process: a digit for each execution.
 std::string decisions(const std::string& arguments) {
     const ChassisFile output("");
     EXPECT_EQ(std::system((std::string(CHANCE_PROBE) + arguments + " >" + output.path).c_str()), 0);
@@ -160,7 +160,7 @@ std::string decisions(const std::string& arguments) {
     return std::string(std::istreambuf_iterator<char>(file), {});
 }
 
-TEST(ChanceTest, EveryProcessMeetsTheSameFailures) {
+TEST(ChanceTest, EveryProcessHasTheSameRandomFailures) {
     const std::string first = decisions(" Unit Perhaps");
     EXPECT_EQ(first.size(), 256u);
     EXPECT_EQ(first.find_first_not_of("01"), std::string::npos);

@@ -7,7 +7,7 @@ using namespace drivertest;
 
 namespace {
 
-// Leaves the device as it is after power-on.
+// Restores the device to its state after power-on.
 class DescribedRegisterTest : public testing::Test {
   protected:
     ~DescribedRegisterTest() override { EXPECT_EQ(resetDevices(session, "Unit"), 0); }
@@ -44,7 +44,7 @@ std::string aboutProperty(const char* name, const std::string& more = "") {
            usage("ResourceName", "\"Unit\"") + (more.empty() ? "" : ",") + more;
 }
 
-TEST_F(DescribedRegisterTest, BytesAreClearedWhenTheyHaveBeenRead) {
+TEST_F(DescribedRegisterTest, BytesAreClearedAfterTheyAreRead) {
     EXPECT_EQ(at(2, 16), 0x0403u);
     EXPECT_EQ(at(0, 64), 0x0807060500000201u);
     EXPECT_EQ(at(0, 64), 0u);
@@ -56,16 +56,16 @@ TEST_F(DescribedRegisterTest, BytesAreClearedWhenTheyHaveBeenRead) {
     EXPECT_EQ(at(0, 32), 0u);
 }
 
-TEST_F(DescribedRegisterTest, BytesThatAreNotWrittenKeepNoNoise) {
+TEST_F(DescribedRegisterTest, APartialWriteDoesNotStoreTheNoiseOfTheOtherBytes) {
     for (int i = 0; i < 20; ++i) {
         EXPECT_EQ(write(write32, session, "Unit", 640, uint32_t{0x100}), 0);
         EXPECT_EQ(write(write8, session, "Unit", 640, uint8_t{0x50}), 0);
-        // What is read has noise with a deviation of 6, at most six times that.
+        // The value read has noise with a standard deviation of 6, limited to six times that.
         EXPECT_NEAR(static_cast<double>(at(640, 32)), 0x150, 36.0);
     }
 }
 
-TEST_F(DescribedRegisterTest, OnesThatAreWrittenClearTheirBits) {
+TEST_F(DescribedRegisterTest, WritingOnesClearsTheirBits) {
     EXPECT_EQ(write(write8, session, "Unit", 16, uint8_t{0x0f}), 0);
     EXPECT_EQ(write(write16, session, "Unit", 18, uint16_t{0x8001}), 0);
     EXPECT_EQ(at(16, 64), 0xffffffff7ffefff0u);
@@ -77,7 +77,7 @@ TEST_F(DescribedRegisterTest, OnesThatAreWrittenClearTheirBits) {
     EXPECT_EQ(at(16, 64), ~uint64_t{0});
 }
 
-TEST_F(DescribedRegisterTest, ARegisterThatCanOnlyBeWrittenIsNotRead) {
+TEST_F(DescribedRegisterTest, AWriteOnlyRegisterIsNotRead) {
     EXPECT_EQ(write(write64, session, "Unit", 24, uint64_t{1}), 0);
     const auto answer = read(read16, session, "Unit", 26);
     EXPECT_EQ(answer.code, -250935);
@@ -104,11 +104,11 @@ TEST_F(DescribedRegisterTest, GapsBetweenBlocksAreNotMapped) {
     EXPECT_EQ(read(read8, session, "Unit", 33).code, -250978);
     EXPECT_EQ(read(read8, session, "Unit", 127).code, -250978);
     EXPECT_EQ(read(read8, session, "Unit", 520).code, -250978);
-    // An access lies in one block.
+    // An access must be within one block.
     EXPECT_EQ(read(read64, session, "Unit", 136).code, -250978);
 }
 
-TEST_F(DescribedRegisterTest, ValuesAreShownLowestByteFirst) {
+TEST_F(DescribedRegisterTest, ValuesAreStoredLowestByteFirst) {
     // Wide is 0x0102030405060708, and Count 0xffeeddcc.
     EXPECT_EQ(at(128, 64), 0x0102030405060708u);
     EXPECT_EQ(at(128, 32), 0x05060708u);
@@ -179,7 +179,7 @@ TEST_F(DescribedRegisterTest, ARegisterShowsAPropertyOfAChannel) {
     EXPECT_EQ(at(512, 64), 0u);
 }
 
-TEST_F(DescribedRegisterTest, APropertyTakesWhatItsRulesAllow) {
+TEST_F(DescribedRegisterTest, AWriteFollowsTheRulesOfTheProperty) {
     const Outcome range = put(160, 0x42c80001);
     EXPECT_EQ(range.code, -250971);
     EXPECT_EQ(range.text,
@@ -204,13 +204,13 @@ TEST_F(DescribedRegisterTest, APropertyTakesWhatItsRulesAllow) {
     EXPECT_EQ(get(getDouble, session, "Unit", "Gain"), 1.5);
 }
 
-TEST_F(DescribedRegisterTest, TheAccessOfTheBlockComesFirst) {
+TEST_F(DescribedRegisterTest, TheAccessOfTheBlockIsCheckedFirst) {
     EXPECT_EQ(put(176, 5).code, -250980);
     EXPECT_EQ(put(172, 5).code, 0);
     EXPECT_EQ(read(read32, session, "Unit", 172).code, -250935);
 }
 
-TEST_F(DescribedRegisterTest, AValueThatWaitsForACommitIsShownAfterIt) {
+TEST_F(DescribedRegisterTest, APendingValueIsShownAfterItsCommit) {
     EXPECT_EQ(write(write8, session, "Unit", 168, uint8_t{0x11}), 0);
     EXPECT_EQ(write(write8, session, "Unit", 169, uint8_t{0x22}), 0);
     EXPECT_EQ(at(168, 32), 1u);
@@ -221,7 +221,7 @@ TEST_F(DescribedRegisterTest, AValueThatWaitsForACommitIsShownAfterIt) {
     EXPECT_EQ(at(176, 32), 0x2211u);
 }
 
-TEST_F(DescribedRegisterTest, OnlyWhoMayWriteTheDeviceWritesItsProperties) {
+TEST_F(DescribedRegisterTest, WritingAPropertyNeedsWriteAccessToTheDevice) {
     Session other;
     EXPECT_EQ(write(write32, other, "Unit", 140, uint32_t{1}), -250811);
     EXPECT_EQ(write(write32, other, "Unit", 48, uint32_t{1}), -250811);
@@ -229,7 +229,7 @@ TEST_F(DescribedRegisterTest, OnlyWhoMayWriteTheDeviceWritesItsProperties) {
     EXPECT_EQ(runs(), 0u);
 }
 
-TEST_F(DescribedRegisterTest, AWriteCarriesOutACommand) {
+TEST_F(DescribedRegisterTest, AWriteRunsACommand) {
     EXPECT_EQ(put(48, 0x01020304).code, 0);
     EXPECT_EQ(runs(), 1u);
     EXPECT_EQ(at(48, 32), 0x01020304u);
@@ -239,7 +239,7 @@ TEST_F(DescribedRegisterTest, AWriteCarriesOutACommand) {
     EXPECT_EQ(runs(), 2u);
 }
 
-TEST_F(DescribedRegisterTest, TheTimeOfACommandDoesNotHoldUpTheWrite) {
+TEST_F(DescribedRegisterTest, AWriteDoesNotWaitForTheDurationOfItsCommand) {
     EXPECT_EQ(put(52, 1).code, 0);
     EXPECT_EQ(runs(), 1u);
 }

@@ -38,7 +38,7 @@ TEST(DescribedStatusTest, CausesAreNestedAndNeedNoConstant) {
                   ",\"nested_error\":[{\"code\":-3," + plain + "},{\"code\":4," + plain + "}]}}");
 }
 
-TEST(DescribedStatusTest, ATextOfItsOwnIsGivenAsItStands) {
+TEST(DescribedStatusTest, ATextOfItsOwnIsReturnedUnchanged) {
     const Outcome outcome = failureOf("Malformed");
     EXPECT_EQ(outcome.code, -9);
     EXPECT_EQ(outcome.text, "{\"translator\": [tr");

@@ -1,4 +1,4 @@
-// Devices that are pulled out of their slots or lose their connection.
+// Devices that are removed from their slots or lose their connection.
 
 #include <algorithm>
 #include <functional>
@@ -72,7 +72,7 @@ class DeviceEventTest : public BenchTest {
     }
 };
 
-TEST_F(DeviceEventTest, OperationsOnAPulledModuleFail) {
+TEST_F(DeviceEventTest, OperationsOnARemovedModuleFail) {
     const FaultsInForce faults(pulled);
     EXPECT_EQ(codesOfOperations(), std::vector<int32_t>(16, deviceRemoved));
     EXPECT_EQ(connect("Mod2"), deviceRemoved);
@@ -89,18 +89,18 @@ TEST_F(DeviceEventTest, OperationsOnALostDeviceFail) {
     EXPECT_EQ(readTemperature("Mod1"), 0);
 }
 
-TEST_F(DeviceEventTest, WhatFollowsAPulledModuleIsNothing) {
+TEST_F(DeviceEventTest, APropertyThatFollowsARemovedModuleIsZero) {
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 20.0).code, 0);
     EXPECT_EQ(execute(session, "Mod2/ch0", "PSU.On", 1.0).code, 0);
     const auto measured = [&] { return get(getDouble, session, "Mod1/ch0", "DMM.Voltage").value; };
     while (measured() < 19.0) {
     }
     const FaultsInForce faults(pulled);
-    // But for the noise of the multimeter, at most six deviations.
+    // Except for the noise of the multimeter, at most six standard deviations.
     EXPECT_NEAR(measured(), 0.0, 6 * 0.00005);
 }
 
-TEST_F(DeviceEventTest, APulledModuleIsInNoListOfTheSystem) {
+TEST_F(DeviceEventTest, ARemovedModuleIsInNoListOfTheSystem) {
     const FaultsInForce faults(pulled);
     EXPECT_EQ(session.systemList("Sys.Devices"), (Names{"Bench", "Mod1", "Mod4", "Mod5"}));
     EXPECT_EQ(session.deviceList("Bench", "Dev.Modules"), (Names{"Mod1", "Mod4", "Mod5"}));
@@ -112,7 +112,7 @@ TEST_F(DeviceEventTest, ALostDeviceStaysInTheListsOfTheSystem) {
     EXPECT_EQ(session.deviceList("Bench", "Dev.Modules"), (Names{"Mod1", "Mod2", "Mod4", "Mod5"}));
 }
 
-TEST_F(DeviceEventTest, TokensThatStandForIt) {
+TEST_F(DeviceEventTest, DefaultAndReservedTokensStillNameAMissingDevice) {
     ASSERT_EQ(connect("Mod1,Mod2"), 0);
     for (const auto& [plan, code] : {std::pair(pulled, deviceRemoved), {lost, connectionLost}}) {
         const FaultsInForce faults(plan);
@@ -122,7 +122,7 @@ TEST_F(DeviceEventTest, TokensThatStandForIt) {
     }
 }
 
-TEST_F(DeviceEventTest, ReservationsStay) {
+TEST_F(DeviceEventTest, ReservationsAreKept) {
     {
         const FaultsInForce faults(pulled);
         EXPECT_EQ(session.list("Session.ReservedDevices"), (Names{"Mod1", "Mod2", "Mod4", "Mod5"}));
@@ -169,7 +169,7 @@ TEST_F(DeviceEventTest, ALostDeviceKeepsItsStateAndAnswersAfterwards) {
     EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.CurrentLimit"), 2.0);
 }
 
-TEST_F(DeviceEventTest, AModuleComesBackAsAfterPowerOn) {
+TEST_F(DeviceEventTest, AnInsertedModuleIsInItsStateAfterPowerOn) {
     ASSERT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 5.0).code, 0);
     ASSERT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.CurrentLimit", 2.0).code, 0);
     Status writing;
@@ -199,14 +199,14 @@ TEST_F(DeviceEventTest, AModuleComesBackAsAfterPowerOn) {
     EXPECT_EQ(reading.code, 0) << reading.text();
 }
 
-TEST_F(DeviceEventTest, TheNameOfAPulledModuleStaysTaken) {
+TEST_F(DeviceEventTest, TheNameOfARemovedModuleStaysReserved) {
     const FaultsInForce faults(pulled);
     Status status;
     nQITRMCAPI100_renameDevice(session, "Mod1", "MOD2", &status);
     EXPECT_EQ(status.code, -250986);
 }
 
-TEST_F(DeviceEventTest, PullingAndReturningChangeTheConfiguration) {
+TEST_F(DeviceEventTest, RemovingAndInsertingChangeTheConfiguration) {
     const uint64_t before = changeCount();
     {
         const FaultsInForce faults(pulled);
@@ -217,7 +217,7 @@ TEST_F(DeviceEventTest, PullingAndReturningChangeTheConfiguration) {
     EXPECT_EQ(changeCount(), before + 2);
 }
 
-TEST_F(DeviceEventTest, AnEventOfBothPlansGoesOn) {
+TEST_F(DeviceEventTest, AnEventInTheOldAndTheNewPlanContinues) {
     FaultsInForce faults(pulled);
     const uint64_t before = changeCount();
     faults.replace(pulled);
@@ -227,7 +227,7 @@ TEST_F(DeviceEventTest, AnEventOfBothPlansGoesOn) {
     EXPECT_EQ(readTemperature("Mod2"), connectionLost);
 }
 
-TEST_F(DeviceEventTest, APulledModuleIsNotMerelyLost) {
+TEST_F(DeviceEventTest, ARemovedModuleIsReportedAsRemovedAndNotAsLost) {
     const FaultsInForce faults(
         "{\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"},"
         "{\"device\":\"Mod2\",\"event\":\"connection_lost\"}]}");
@@ -241,7 +241,7 @@ TEST_F(DeviceEventTest, ALostChassisKeepsItsModules) {
     EXPECT_EQ(getText(session, "Bench", "Dev.ProductName").code, connectionLost);
 }
 
-TEST_F(DeviceEventTest, EventsBeginAndEndInTheirTime) {
+TEST_F(DeviceEventTest, EventsBeginAndEndAtTheirTimes) {
     const FaultsInForce faults(
         "{\"events\":[{\"device\":\"Mod2\",\"event\":\"connection_lost\",\"after\":0.02,"
         "\"lasts\":0.02},{\"device\":\"Mod2\",\"event\":\"pulled\",\"after\":0.06,"
@@ -256,13 +256,13 @@ TEST_F(DeviceEventTest, EventsBeginAndEndInTheirTime) {
     EXPECT_EQ(codes, (std::vector<int32_t>{0, connectionLost, 0, deviceRemoved, 0}));
 }
 
-TEST_F(DeviceEventTest, AnEventMayLastNoTimeAtAll) {
+TEST_F(DeviceEventTest, AnEventMayHaveNoDuration) {
     const FaultsInForce faults(
         "{\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\",\"lasts\":0}]}");
     EXPECT_EQ(readTemperature("Mod2"), 0);
 }
 
-TEST_F(DeviceEventTest, FaultsAndEventsGoTogether) {
+TEST_F(DeviceEventTest, FaultsAndEventsCanBeCombined) {
     const FaultsInForce faults(
         "{\"faults\":[{\"resource\":\"Mod2\",\"calls\":{\"count\":1},\"status\":{\"code\":-77}}],"
         "\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"}]}");

@@ -51,7 +51,7 @@ TEST_F(DeviceTest, ConnectionsNeedDevices) {
     EXPECT_EQ(disconnectFrom(other, "Mod1/ch0").code, -250956);
 }
 
-TEST_F(DeviceTest, AResetPutsPropertiesOfAllPartsBack) {
+TEST_F(DeviceTest, AResetRestoresThePropertiesOfAllParts) {
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 5.0).code, 0);
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.CurrentLimit", 1.0).code, 0);
     EXPECT_EQ(set(setDouble, session, "Mod1", "DMM.Range", 1.0).code, 0);
@@ -63,7 +63,7 @@ TEST_F(DeviceTest, AResetPutsPropertiesOfAllPartsBack) {
     EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.CurrentLimit"), 0.1);
 }
 
-TEST_F(DeviceTest, AResetLeavesTheTextsOfTheOwner) {
+TEST_F(DeviceTest, AResetKeepsTheTextsOfTheUser) {
     EXPECT_EQ(set(setText, session, "Mod2", "Dev.Comment", "lent").code, 0);
     EXPECT_EQ(set(setText, session, "Mod2/ch0", "PhysChan.Comment", "worn").code, 0);
     EXPECT_EQ(resetDevices(session, "Mod2"), 0);
@@ -72,7 +72,7 @@ TEST_F(DeviceTest, AResetLeavesTheTextsOfTheOwner) {
     EXPECT_EQ(set(setText, session, "Mod2/ch0", "PhysChan.Comment", "").code, 0);
 }
 
-TEST_F(DeviceTest, AResetNeedsDevicesThatMayBeWritten) {
+TEST_F(DeviceTest, AResetNeedsWriteAccessToTheDevices) {
     EXPECT_EQ(set(setText, session, "Mod1", "Dev.Comment", "kept").code, 0);
     session.unreserve("Mod1");
     Session other;
@@ -81,7 +81,7 @@ TEST_F(DeviceTest, AResetNeedsDevicesThatMayBeWritten) {
     EXPECT_EQ(resetDevices(other, "Mod1"), 0);
 }
 
-TEST_F(DeviceTest, ANewNameIsSeenEverywhere) {
+TEST_F(DeviceTest, ANewNameIsUsedEverywhere) {
     Status status;
     Session onChannel;
     onChannel.close();
@@ -107,7 +107,7 @@ TEST_F(DeviceTest, ANameMayChangeInLetterCaseAlone) {
     EXPECT_EQ(rename(session, "MOD1", "Mod1").code, 0);
 }
 
-TEST_F(DeviceTest, NamesChangePlaces) {
+TEST_F(DeviceTest, TwoDevicesCanSwapTheirNames) {
     EXPECT_EQ(rename(session, "Mod1", "x").code, 0);
     EXPECT_EQ(rename(session, "Mod2", "Mod1").code, 0);
     EXPECT_EQ(rename(session, "x", "Mod2").code, 0);
@@ -153,7 +153,7 @@ TEST_F(DeviceTest, ANameThatCannotBeWrittenIsRefused) {
     EXPECT_EQ(rename(session, "Mod1", std::string(65, 'x').c_str()).code, -250985);
 }
 
-TEST_F(DeviceTest, OneKnownDeviceIsRenamed) {
+TEST_F(DeviceTest, ExactlyOneKnownDeviceCanBeRenamed) {
     EXPECT_EQ(rename(session, "Mod3", "A").code, -250956);
     EXPECT_EQ(rename(session, "Mod1,Mod2", "A").code, -250966);
     EXPECT_EQ(rename(session, "Mod1/ch0", "A").code, -250956);

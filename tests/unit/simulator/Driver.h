@@ -11,7 +11,7 @@
 
 namespace drivertest {
 
-// A status record of the caller's. It checks that the text in it keeps to the buffer format.
+// A status record of the caller. It checks that its text follows the buffer format.
 class Status : public qierr_Status {
   public:
     Status() : qierr_Status{0, 0, &Status::grow, nullptr} {}

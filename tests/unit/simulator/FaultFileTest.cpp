@@ -1,4 +1,4 @@
-// The file of faults, named by the environment before the library is used, in its changes.
+// The faults file, named by the environment before the library is used, while it changes.
 
 #include <sys/stat.h>
 
@@ -12,7 +12,7 @@ using namespace drivertest;
 
 namespace {
 
-// In a folder of its own, where nothing is at first.
+// In a folder of its own. At first the file does not exist.
 class FaultFile {
   public:
     FaultFile() {
@@ -44,7 +44,7 @@ std::string failingWith(int code) {
                     "}");
 }
 
-// What is written to standard error in its scope.
+// Captures what is written to standard error in its scope.
 class Errors {
   public:
     Errors() { testing::internal::CaptureStderr(); }
@@ -57,11 +57,11 @@ class FaultFileTest : public testing::Test {
     Session session;
 };
 
-TEST_F(FaultFileTest, AFileThatIsMissingHasNoFaults) {
+TEST_F(FaultFileTest, AMissingFileMeansNoFaults) {
     EXPECT_EQ(session.abort(), 0);
 }
 
-TEST_F(FaultFileTest, AFileMayComeChangeAndGo) {
+TEST_F(FaultFileTest, AFileMayBeCreatedChangedAndRemoved) {
     file.replace(failingWith(-71));
     EXPECT_EQ(session.abort(), -71);
     file.replace(failingWith(-72));
@@ -74,14 +74,14 @@ TEST_F(FaultFileTest, AFileMayComeChangeAndGo) {
     EXPECT_EQ(session.abort(), -74);
 }
 
-TEST_F(FaultFileTest, AFileOfTheSameSizeIsAnotherFile) {
+TEST_F(FaultFileTest, AChangedFileOfTheSameSizeIsReadAgain) {
     file.replace(failingWith(-71));
     EXPECT_EQ(session.abort(), -71);
     file.replace(failingWith(-72));
     EXPECT_EQ(session.abort(), -72);
 }
 
-TEST_F(FaultFileTest, AFileThatStaysAsItIsIsNotReadAgain) {
+TEST_F(FaultFileTest, AnUnchangedFileIsNotReadAgain) {
     file.replace(
         oneFault("\"function\":\"abortSession\",\"calls\":{\"first\":2,\"count\":1},"
                  "\"status\":{\"code\":-71}"));
@@ -90,7 +90,7 @@ TEST_F(FaultFileTest, AFileThatStaysAsItIsIsNotReadAgain) {
     EXPECT_EQ(session.abort(), 0);
 }
 
-TEST_F(FaultFileTest, ABrokenFileLeavesTheFormerFaultsAndIsToldOnce) {
+TEST_F(FaultFileTest, ABrokenFileKeepsThePreviousFaultsAndIsReportedOnce) {
     file.replace(failingWith(-71));
     EXPECT_EQ(session.abort(), -71);
     Errors errors;
@@ -108,7 +108,7 @@ TEST_F(FaultFileTest, ABrokenFileLeavesTheFormerFaultsAndIsToldOnce) {
     EXPECT_EQ(session.abort(), 0);
 }
 
-TEST_F(FaultFileTest, AFolderIsNoFile) {
+TEST_F(FaultFileTest, AFolderIsNotAFile) {
     Errors errors;
     std::filesystem::create_directory(file.path);
     EXPECT_EQ(session.abort(), 0);
@@ -117,7 +117,7 @@ TEST_F(FaultFileTest, AFolderIsNoFile) {
                                  "readable file; the former faults stay\n");
 }
 
-TEST_F(FaultFileTest, APipeIsNotWaitedFor) {
+TEST_F(FaultFileTest, APipeDoesNotBlock) {
     file.replace(failingWith(-71));
     EXPECT_EQ(session.abort(), -71);
     Errors errors;
@@ -129,7 +129,7 @@ TEST_F(FaultFileTest, APipeIsNotWaitedFor) {
                                  "a file on a disk; the former faults stay\n");
 }
 
-TEST_F(FaultFileTest, AFileThatCannotBeLookedAtLeavesTheFormerFaults) {
+TEST_F(FaultFileTest, AnInaccessibleFileKeepsThePreviousFaults) {
     file.replace(failingWith(-71));
     EXPECT_EQ(session.abort(), -71);
     Errors errors;
@@ -150,7 +150,7 @@ TEST_F(FaultFileTest, FaultsThatTheProgramSetsLastUntilTheFileChanges) {
     EXPECT_EQ(session.abort(), -72);
 }
 
-TEST_F(FaultFileTest, EventsOfTheFileComeWithIt) {
+TEST_F(FaultFileTest, EventsOfTheFileAreUsedToo) {
     file.replace("{\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"}]}");
     EXPECT_EQ(session.systemList("Sys.Devices"), (Names{"Bench", "Mod1", "Mod4", "Mod5"}));
     file.remove();

@@ -15,7 +15,7 @@ void expectRefused(const std::string& json, const std::string& reason) {
     EXPECT_EQ(setting.reason, reason) << json;
 }
 
-// A fault that would be in order, with further members.
+// A valid fault, with further members.
 void expectMemberRefused(const std::string& members, const std::string& reason) {
     expectRefused(oneFault("\"delay\":0," + members), "/faults/0/" + reason);
 }
@@ -30,14 +30,14 @@ TEST(FaultReaderTest, WhatIsNotJsonIsRefused) {
                   "a description of faults is one JSON object");
 }
 
-TEST(FaultReaderTest, WhatIsNoObjectIsRefused) {
+TEST(FaultReaderTest, WhatIsNotAnObjectIsRefused) {
     expectRefused("[]", "is an array; must be an object");
     expectRefused("{\"faults\":{}}", "/faults is an object; must be an array");
     expectRefused("{\"events\":7}", "/events is 7; must be an array");
     expectRefused("{\"faults\":[7]}", "/faults/0 is 7; must be an object");
 }
 
-TEST(FaultReaderTest, MembersThatAreNotKnownAreRefused) {
+TEST(FaultReaderTest, UnknownMembersAreRefused) {
     expectRefused("{\"fault\":[]}",
                   "/fault is not a known member; perhaps \"faults\" is meant; the members here are "
                   "$schema, seed, faults, events");
@@ -122,7 +122,7 @@ TEST(FaultReaderTest, AMethodStandsForItsFunctions) {
     EXPECT_EQ(session.list("Session.DefaultDevices"), Names{"Mod1"});
 }
 
-TEST(FaultReaderTest, AResourceMustBeThere) {
+TEST(FaultReaderTest, AResourceMustExist) {
     for (const char* name :
          {"Mod3", "", "Mod1/ch4", "Mod1,Mod2", "Mod1/ch0:1", "$DefaultDevices"}) {
         expectMemberRefused("\"resource\":\"" + std::string(name) + "\"",
@@ -154,7 +154,7 @@ TEST(FaultReaderTest, ADelayIsATime) {
                   "to a day");
 }
 
-TEST(FaultReaderTest, AStatusMustBeOne) {
+TEST(FaultReaderTest, AStatusMustBeValid) {
     expectRefused(oneFault("\"status\":{}"),
                   "/faults/0/status/code is missing; must be the number of the status");
     expectRefused(oneFault("\"status\":{\"code\":0}"),
@@ -162,7 +162,7 @@ TEST(FaultReaderTest, AStatusMustBeOne) {
                   "0, which means success");
 }
 
-TEST(FaultReaderTest, AMomentIsOneOfTwoAndBelongsToAFailure) {
+TEST(FaultReaderTest, AMomentIsBeforeOrAfterAndNeedsAFailure) {
     expectMemberRefused("\"status\":{\"code\":-1},\"moment\":\"later\"",
                         "moment is the text \"later\"; must be before or after");
     for (const char* status : {"", "\"status\":{\"code\":1},"}) {
@@ -224,25 +224,25 @@ TEST(FaultReaderTest, AnEventNeedsADeviceAndAKind) {
                   "to a day");
 }
 
-TEST(FaultReaderTest, OnlyModulesArePulled) {
+TEST(FaultReaderTest, OnlyModulesCanBeRemoved) {
     expectRefused(event("\"device\":\"Bench\",\"event\":\"pulled\""),
                   "/events/0/event befalls a device that is no module; only what stands in a slot "
                   "can be pulled");
 }
 
-TEST(FaultReaderTest, ABrokenTextLeavesTheFormerFaults) {
+TEST(FaultReaderTest, ABrokenTextKeepsThePreviousFaults) {
     Session session;
     const FaultsInForce faults(oneFault("\"function\":\"abortSession\",\"status\":{\"code\":-77}"));
     EXPECT_EQ(setFaults("{").code, invalidFaults);
     EXPECT_EQ(session.abort(), -77);
 }
 
-TEST(FaultReaderTest, NobodyNeedsToAskForTheReason) {
+TEST(FaultReaderTest, TheReasonMayBeOmitted) {
     EXPECT_EQ(qitrmcsim_setFaults("{", nullptr), invalidFaults);
     EXPECT_EQ(qitrmcsim_setFaults("{}", nullptr), 0);
 }
 
-TEST(FaultReaderTest, ATextMustBeGiven) {
+TEST(FaultReaderTest, ANullTextIsRefused) {
     char* reason = nullptr;
     EXPECT_EQ(qitrmcsim_setFaults(nullptr, &reason), -250954);
     EXPECT_EQ(reason, detailsOf("missingArgument", usage("ArgumentName", "\"json\"")));

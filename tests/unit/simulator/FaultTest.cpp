@@ -1,4 +1,4 @@
-// Which calls a fault strikes, and how they end.
+// Which calls a fault applies to, and how they end.
 
 #include "FaultsInForce.h"
 #include "Values.h"
@@ -31,7 +31,7 @@ TEST_F(FaultTest, WithoutFaultsEverythingWorks) {
     EXPECT_EQ(readTemperature(), 0);
 }
 
-TEST_F(FaultTest, AFaultOfAFunctionStrikesThatFunctionAlone) {
+TEST_F(FaultTest, AFaultOfAFunctionAppliesToThatFunctionOnly) {
     const FaultsInForce faults(oneFault("\"function\":\"getGenericPropertyDouble\"," + failing));
     EXPECT_EQ(readTemperature(), failure);
     EXPECT_EQ(getText(session, "Mod1", "Dev.ProductName").code, 0);
@@ -63,7 +63,7 @@ TEST_F(FaultTest, AStarStandsForAnyEnding) {
     EXPECT_EQ(getText(session, "Mod1", "Dev.ProductName").code, 0);
 }
 
-TEST_F(FaultTest, WithoutAFunctionEveryCallIsStruck) {
+TEST_F(FaultTest, AFaultWithoutAFunctionAppliesToEveryCall) {
     const FaultsInForce faults(oneFault(failing));
     EXPECT_EQ(readTemperature(), failure);
     EXPECT_EQ(session.abort(), failure);
@@ -74,7 +74,7 @@ TEST_F(FaultTest, WithoutAFunctionEveryCallIsStruck) {
     EXPECT_EQ(handle, 0u);
 }
 
-TEST_F(FaultTest, TheFirstFaultInOrderStrikes) {
+TEST_F(FaultTest, TheFirstMatchingFaultApplies) {
     const FaultsInForce faults(
         "{\"faults\":[{\"status\":{\"code\":-1},\"calls\":{\"count\":1}},{\"status\":{\"code\":-2}}"
         "]"
@@ -82,7 +82,7 @@ TEST_F(FaultTest, TheFirstFaultInOrderStrikes) {
     EXPECT_EQ(codesOfReads(3), (Codes{-1, -2, -2}));
 }
 
-TEST_F(FaultTest, EveryFaultCountsTheCallsThatMatchIt) {
+TEST_F(FaultTest, EveryFaultCountsItsMatchingCalls) {
     const FaultsInForce faults(
         "{\"faults\":[{\"status\":{\"code\":-1},\"calls\":{\"count\":2}},"
         "{\"status\":{\"code\":-2},\"calls\":{\"first\":2,\"count\":2}}]}");
@@ -130,7 +130,7 @@ TEST_F(FaultTest, AChannelIsFoundInRangesAndAmongOthers) {
     EXPECT_EQ(readTemperature("Mod2"), 0);
 }
 
-TEST_F(FaultTest, NamesThatAreNotThereDoNotHideThoseThatAre) {
+TEST_F(FaultTest, UnknownNamesDoNotHideKnownOnes) {
     const FaultsInForce faults(oneFault("\"resource\":\"Mod2\"," + failing));
     EXPECT_EQ(readTemperature("Nothing,Mod2"), failure);
     EXPECT_EQ(readTemperature("Nothing"), -250956);
@@ -146,7 +146,7 @@ TEST_F(FaultTest, TheTokensStandForTheSessionsLists) {
     EXPECT_EQ(get(getDouble, other, "$ConnectedDevices", "Dev.Temperature").code, -250959);
 }
 
-TEST_F(FaultTest, TheDeviceThatIsLeftOutIsTheDefaultOne) {
+TEST_F(FaultTest, AnOmittedDeviceIsTheDefaultOne) {
     Session other;
     Status opening;
     Handle handle = 0;
@@ -161,12 +161,12 @@ TEST_F(FaultTest, TheDeviceThatIsLeftOutIsTheDefaultOne) {
     EXPECT_EQ(closing.code, 0);
 }
 
-TEST_F(FaultTest, ACallWithoutResourcesIsAboutNone) {
+TEST_F(FaultTest, ACallWithoutResourcesMatchesNoResource) {
     const FaultsInForce faults(oneFault("\"resource\":\"Mod1\"," + failing));
     EXPECT_EQ(session.systemList("Sys.Devices").size(), 5u);
 }
 
-TEST_F(FaultTest, OpeningOnADeviceIsAboutIt) {
+TEST_F(FaultTest, OpeningASessionOnADeviceMatchesTheDevice) {
     const FaultsInForce faults(oneFault("\"resource\":\"Bench\"," + failing));
     Handle handle = 0;
     Status status;
@@ -185,7 +185,7 @@ TEST_F(FaultTest, ARenamedDeviceKeepsItsFaults) {
     EXPECT_EQ(back.code, 0);
 }
 
-TEST_F(FaultTest, ProbabilityIsRepeatedByTheSeed) {
+TEST_F(FaultTest, ProbabilityIsReproducibleByTheSeed) {
     const auto strikes = [&](const std::string& seed) {
         const FaultsInForce faults(
             "{\"seed\":" + seed +
@@ -199,7 +199,7 @@ TEST_F(FaultTest, ProbabilityIsRepeatedByTheSeed) {
     EXPECT_NEAR(std::count(first.begin(), first.end(), failure), 100, 52);
 }
 
-TEST_F(FaultTest, FaultsOfOnePlanDrawForThemselves) {
+TEST_F(FaultTest, FaultsOfOnePlanAreRandomIndependently) {
     const FaultsInForce faults(
         "{\"faults\":[{\"probability\":0.5,\"status\":{\"code\":-1}},"
         "{\"probability\":0.5,\"status\":{\"code\":-2}}]}");
@@ -215,19 +215,19 @@ TEST_F(FaultTest, ProbabilitiesOf0And1AreExact) {
     EXPECT_EQ(codesOfReads(50), Codes(50, failure));
 }
 
-TEST_F(FaultTest, AFailureBeforeLeavesTheCallUndone) {
+TEST_F(FaultTest, AFailureBeforeTheCallPreventsIt) {
     const FaultsInForce faults(oneFault("\"function\":\"set*\"," + failing));
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 5.0).code, failure);
     EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.Voltage"), 0.0);
 }
 
-TEST_F(FaultTest, AFailureAfterwardsLeavesTheCallDone) {
+TEST_F(FaultTest, AFailureAfterTheCallKeepsItsEffect) {
     const FaultsInForce faults(oneFault("\"function\":\"set*\",\"moment\":\"after\"," + failing));
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 5.0).code, failure);
     EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.Voltage"), 5.0);
 }
 
-TEST_F(FaultTest, AFailureOfTheCallItselfStands) {
+TEST_F(FaultTest, AFailureOfTheCallItselfIsKept) {
     FaultsInForce faults(oneFault("\"moment\":\"after\"," + failing));
     EXPECT_EQ(readTemperature("Nothing"), -250956);
     faults.replace(oneFault("\"status\":{\"code\":77}"));
@@ -236,7 +236,7 @@ TEST_F(FaultTest, AFailureOfTheCallItselfStands) {
     EXPECT_EQ(readTemperature("Nothing"), -250956);
 }
 
-TEST_F(FaultTest, AFailureAfterwardsTakesBackWhatWasLent) {
+TEST_F(FaultTest, AFailureAfterTheCallFreesItsOutputs) {
     const FaultsInForce faults(oneFault("\"moment\":\"after\"," + failing));
     Status status;
     char** names = nullptr;
@@ -255,7 +255,7 @@ TEST_F(FaultTest, AFailureAfterwardsTakesBackWhatWasLent) {
     EXPECT_EQ(std::vector<int>(bytes, bytes + 4), (std::vector<int>{0, 0, 0, 9}));
 }
 
-TEST_F(FaultTest, AnOpeningThatFailsAfterwardsLeavesNothingOpen) {
+TEST_F(FaultTest, AFailureAfterAnOpeningLeavesNothingOpen) {
     Handle opened = 7;
     {
         const FaultsInForce faults(oneFault("\"moment\":\"after\"," + failing));
@@ -267,9 +267,9 @@ TEST_F(FaultTest, AnOpeningThatFailsAfterwardsLeavesNothingOpen) {
     Session next("Bench");
 }
 
-TEST_F(FaultTest, PropertiesAndCommandsThatFailAfterwardsAreClosedAgain) {
-    // The numbers of handles that are given back are not used again soon, so the next one tells how
-    // many there were. Each of them is tried.
+TEST_F(FaultTest, AFailureAfterOpeningAPropertyOrCommandClosesItAgain) {
+    // The numbers of closed handles are not reused soon, so the next handle shows how many there
+    // were. Each of them is tried.
     const auto open = [&](auto function, const char* name) {
         uint32_t handle = 0;
         Status status;
@@ -296,7 +296,7 @@ TEST_F(FaultTest, PropertiesAndCommandsThatFailAfterwardsAreClosedAgain) {
     EXPECT_EQ(closing.code, 0);
 }
 
-TEST_F(FaultTest, AWarningLetsTheCallBeCarriedOut) {
+TEST_F(FaultTest, AWarningDoesNotPreventTheCall) {
     const FaultsInForce faults(oneFault("\"status\":{\"code\":77,\"json\":\"{}\"}"));
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.Voltage", 5.0).code, 77);
     const auto voltage = get(getDouble, session, "Mod2/ch0", "PSU.Voltage");
@@ -305,14 +305,14 @@ TEST_F(FaultTest, AWarningLetsTheCallBeCarriedOut) {
     EXPECT_EQ(getText(session, "Mod1", "Dev.ProductName").value, "Multimeter");
 }
 
-TEST_F(FaultTest, AWarningOfTheCallItselfGivesWay) {
+TEST_F(FaultTest, AWarningOfTheCallItselfIsReplaced) {
     FaultsInForce faults(oneFault("\"status\":{\"code\":77}"));
     EXPECT_EQ(session.unreserve("Bench"), 77);
     faults.replace(oneFault("\"moment\":\"after\"," + failing));
     EXPECT_EQ(session.unreserve("Bench"), failure);
 }
 
-TEST_F(FaultTest, DetailsOfEveryKindArrive) {
+TEST_F(FaultTest, DetailsOfEveryKindAreReported) {
     const FaultsInForce faults(
         oneFault("\"status\":{\"code\":-5,\"constant\":\"kOwn\",\"details\":["
                  "{\"usage\":\"kUsageTypeDevice\",\"value\":\"Mod1\"},{\"elaboration\":\"kA\"},"
@@ -332,13 +332,13 @@ TEST_F(FaultTest, DetailsOfEveryKindArrive) {
                   info + "]},\"nested_error\":{\"code\":-7," + info + "]}}}}");
 }
 
-TEST_F(FaultTest, ATextThatIsNotJsonArrivesAsItStands) {
+TEST_F(FaultTest, ATextThatIsNotJsonIsReportedUnchanged) {
     const FaultsInForce faults(
         oneFault("\"status\":{\"code\":-5,\"json\":\"{\\\"a\\\":[1,\\\" \\\\\"}"));
     EXPECT_EQ(get(getDouble, session, "Mod1", "Dev.Temperature").text, "{\"a\":[1,\" \\");
 }
 
-TEST_F(FaultTest, AStatusThatIsNegativeAlreadyIsNoCall) {
+TEST_F(FaultTest, ACallWithANegativeStatusIsNotCounted) {
     const FaultsInForce faults(oneFault("\"calls\":{\"first\":2}," + failing));
     Status dead;
     dead.code = -1;

@@ -28,7 +28,7 @@ bool isReady(const Result& result) {
     return result.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
 }
 
-// Acts again and again until the call that it is meant for has come back.
+// Calls `act` repeatedly until the call that it is meant for has returned.
 int32_t resultAfter(Result& result, const std::function<void()>& act) {
     while (!isReady(result)) {
         act();
@@ -53,7 +53,7 @@ std::string event(const char* device, const std::string& members) {
 
 const std::string longDelay = oneFault("\"function\":\"getGeneric*\",\"delay\":3600");
 
-TEST(FaultWaitTest, ADelayLetsItsTimePass) {
+TEST(FaultWaitTest, ADelayTakesItsTime) {
     Session session;
     const FaultsInForce faults(oneFault("\"function\":\"getGeneric*\",\"delay\":0.05"));
     const auto start = std::chrono::steady_clock::now();
@@ -77,7 +77,7 @@ TEST(FaultWaitTest, AnAbortEndsADelay) {
     EXPECT_EQ(resultAfter(reading, [&] { EXPECT_EQ(session.abort(), 0); }), aborted);
 }
 
-TEST(FaultWaitTest, AClosingEndsADelay) {
+TEST(FaultWaitTest, ClosingTheSessionEndsADelay) {
     Session session;
     const Handle handle = session;
     const FaultsInForce faults(longDelay);
@@ -107,7 +107,7 @@ TEST(FaultWaitTest, OtherFaultsEndADelay) {
     EXPECT_EQ(resultAfter(opening, [&] { faults.replace("{}"); }), 0);
 }
 
-TEST(FaultWaitTest, ACallOnADeadSessionIsNotDelayed) {
+TEST(FaultWaitTest, ACallOnAClosedSessionIsNotDelayed) {
     Session session;
     const Handle handle = session;
     ASSERT_EQ(session.close(), 0);
@@ -115,7 +115,7 @@ TEST(FaultWaitTest, ACallOnADeadSessionIsNotDelayed) {
     EXPECT_EQ(readTemperature(handle, "Mod1"), unknownSession);
 }
 
-TEST(FaultWaitTest, OthersAreNotHeldUpByADelay) {
+TEST(FaultWaitTest, ADelayDoesNotBlockOtherCalls) {
     Session session;
     Session other;
     const FaultsInForce faults(
@@ -125,7 +125,7 @@ TEST(FaultWaitTest, OthersAreNotHeldUpByADelay) {
     EXPECT_EQ(resultAfter(reading, [&] { session.abort(); }), aborted);
 }
 
-TEST(FaultWaitTest, AFaultThatIsReplacedDuringItsDelayStillStrikes) {
+TEST(FaultWaitTest, AFaultThatIsReplacedDuringItsDelayStillApplies) {
     Session session;
     FaultsInForce faults(
         oneFault("\"function\":\"getGeneric*\",\"delay\":0.05,\"status\":{\"code\":-77}"));
@@ -135,14 +135,14 @@ TEST(FaultWaitTest, AFaultThatIsReplacedDuringItsDelayStillStrikes) {
         isThrough = true;
         return code;
     });
-    // It may not have begun yet: then it meets a plan of the same kind.
+    // The call may not have begun yet: then an equal fault of the new plan applies to it.
     while (!isThrough) {
         faults.replace(oneFault("\"function\":\"getGeneric*\",\"status\":{\"code\":-77}"));
     }
     EXPECT_EQ(reading.get(), -77);
 }
 
-TEST(FaultWaitTest, ACommandEndsWhenItsModuleIsPulled) {
+TEST(FaultWaitTest, ACommandEndsWhenItsModuleIsRemoved) {
     Session session("Mod1");
     Result command = later([&] { return execute(session, "Mod1", "DMM.Calibrate"); });
     FaultsInForce faults("{}");
@@ -153,13 +153,13 @@ TEST(FaultWaitTest, ACommandEndsWhenItsModuleIsPulled) {
     EXPECT_EQ(resetDevices(session, "Mod1"), 0);
 }
 
-TEST(FaultWaitTest, ACommandEndsByItselfWhenTheTimeOfAnEventHasCome) {
+TEST(FaultWaitTest, ACommandEndsAtTheTimeOfAnEvent) {
     Session session("Mod1");
     const FaultsInForce faults(event("Mod1", "\"pulled\",\"after\":0.05"));
     EXPECT_EQ(execute(session, "Mod1", "DMM.Calibrate"), deviceRemoved);
 }
 
-TEST(FaultWaitTest, ACommandGoesOnWhenAnotherModuleIsPulled) {
+TEST(FaultWaitTest, ACommandContinuesWhenAnotherModuleIsRemoved) {
     Session session("Mod1");
     const FaultsInForce faults(event("Mod2", "\"pulled\",\"after\":0.01"));
     EXPECT_EQ(execute(session, "Mod1", "DMM.SelfTest"), 0);
@@ -183,8 +183,8 @@ TEST(FaultWaitTest, AnEventThatIsSetDuringAWaitEndsIt) {
     EXPECT_EQ(waiting.get(), deviceRemoved);
 }
 
-// Many clients of all kinds while the faults change: nothing may be lost, nothing may be read that
-// was never there. Run it with the thread sanitizer.
+// Many clients of all kinds while the faults change: nothing may leak, and nothing may be read that
+// was never set. To be run with the thread sanitizer.
 TEST(FaultWaitTest, FaultsMayChangeWhileManyThreadsCall) {
     const std::string plans[] = {
         "{}",
@@ -212,7 +212,7 @@ TEST(FaultWaitTest, FaultsMayChangeWhileManyThreadsCall) {
                 }
                 session.abort();
             }
-            // The faults may keep the session from being closed by its own end.
+            // A fault may prevent the session from being closed by its destructor.
             FaultsInForce("{}");
         });
     }

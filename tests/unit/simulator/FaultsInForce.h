@@ -5,7 +5,7 @@
 
 namespace drivertest {
 
-// What qitrmcsim_setFaults came to: the code, and the words about it.
+// The result of qitrmcsim_setFaults: the code, and the message.
 struct Setting {
     int32_t code;
     std::string reason;
@@ -23,7 +23,7 @@ inline Setting setFaults(const std::string& json) {
     return setting;
 }
 
-// Faults that end with their scope.
+// Faults that are removed at the end of the scope.
 class FaultsInForce {
   public:
     explicit FaultsInForce(const std::string& json) { replace(json); }

@@ -1,4 +1,4 @@
-// What calls give out under faults.
+// The outputs of calls under faults.
 
 #include "FaultsInForce.h"
 #include "Values.h"
@@ -102,7 +102,7 @@ TEST_F(FaultyOutputTest, TextsBecomeLong) {
     EXPECT_EQ(labels(), Names(4, ""));
 }
 
-TEST_F(FaultyOutputTest, ArraysOfAllTypesGetTheirCount) {
+TEST_F(FaultyOutputTest, ArraysOfAllTypesGetTheCountOfTheFault) {
     const FaultsInForce faults(output("\"count\":6"));
     EXPECT_EQ(getArray(getBools, session, "Mod1", "DMM.InputsInUse"),
               (std::vector<uint8_t>{1, 1, 0, 0, 1, 1}));

@@ -21,7 +21,7 @@ char* lentText(const Session& session) {
     return text;
 }
 
-TEST(Outstanding, CountsEachTextUntilItComesBack) {
+TEST(Outstanding, CountsEachTextUntilItIsFreed) {
     const Session session;
     const uint32_t before = outstanding().texts;
     char* first = lentText(session);
@@ -91,7 +91,7 @@ TEST(Outstanding, AFailedCallLendsNothing) {
     EXPECT_EQ(outstanding().texts, before);
 }
 
-TEST(GivingBack, ATextTwiceIsSaidAndDoesNoHarm) {
+TEST(GivingBack, FreeingATextTwiceIsReportedAndHarmless) {
     const Session session;
     char* text = lentText(session);
     nQITRMCAPI100_freeString(text);
@@ -102,7 +102,7 @@ TEST(GivingBack, ATextTwiceIsSaidAndDoesNoHarm) {
               "was left alone. Give each thing back once, through the function of its kind.\n");
 }
 
-TEST(GivingBack, AThingThroughTheFunctionOfAnotherKindIsSaidAndStaysLent) {
+TEST(GivingBack, FreeingThroughTheWrongFunctionIsReportedAndHasNoEffect) {
     const Session session;
     char* text = lentText(session);
     const auto before = outstanding();
@@ -118,7 +118,7 @@ TEST(GivingBack, AThingThroughTheFunctionOfAnotherKindIsSaidAndStaysLent) {
     EXPECT_EQ(outstanding().texts, before.texts - 1);
 }
 
-TEST(Start, GivesASummaryOfTheChassisAndTakesNoSessionNumber) {
+TEST(Start, WritesASummaryOfTheChassisAndUsesNoSessionNumber) {
     Handle first = 0;
     {
         const Session session;

@@ -108,7 +108,7 @@ constexpr const char* description = R"({
     ]
 })";
 
-// The library reads these when it is first used. Time goes by calls: a millisecond each.
+// The library reads these when it is first used. Time advances by calls: a millisecond each.
 class UseDescription : public testing::Environment {
   public:
     void SetUp() override {
@@ -147,7 +147,7 @@ class LiveTest : public testing::Test {
     Session session{"Mover,Source,Scope"};
 };
 
-TEST_F(LiveTest, TimeGoesByCallsAndByWhatTakesTime) {
+TEST_F(LiveTest, TimeAdvancesByCallsAndByDurations) {
     EXPECT_EQ(resetDevices(session, "Mover"), 0);
     EXPECT_EQ(time(), 1u);
     EXPECT_EQ(time(), 2u);
@@ -157,7 +157,7 @@ TEST_F(LiveTest, TimeGoesByCallsAndByWhatTakesTime) {
     EXPECT_EQ(time(), 86400056u);
 }
 
-TEST_F(LiveTest, ACommandThatIsGivenUpTakesItsTimeout) {
+TEST_F(LiveTest, ACommandThatTimesOutTakesItsTimeout) {
     EXPECT_EQ(resetDevices(session, "Mover"), 0);
     Status status;
     nQITRMCAPI100_executeGenericCommand(session, "Mover", "Pass.Day", 2.0, &status);
@@ -167,7 +167,7 @@ TEST_F(LiveTest, ACommandThatIsGivenUpTakesItsTimeout) {
 
 TEST_F(LiveTest, CountersCountExactlyAndWrap) {
     EXPECT_EQ(resetDevices(session, "Mover"), 0);
-    // The first call behind the reset is 1 ms later, the second 2.
+    // The first call after the reset is 1 ms later, the second 2 ms.
     EXPECT_EQ(get(getInt32, session, "Mover", "Count.Signed"), 2147483001);
     EXPECT_EQ(get(getUInt32, session, "Mover", "Count.Unsigned"), 4294967002u);
     for (int i = 0; i < 20; ++i) {
@@ -181,14 +181,14 @@ TEST_F(LiveTest, CountersCountExactlyAndWrap) {
     EXPECT_EQ(get(getUInt32, session, "Mover", "Count.Limited"), 250u);
 }
 
-TEST_F(LiveTest, ACounterWithABrokenRateCountsWholeEvents) {
+TEST_F(LiveTest, ACounterWithAFractionalRateCountsWholeEvents) {
     EXPECT_EQ(resetDevices(session, "Mover"), 0);
     command("Pass.Day");
     // 86400.002 s at 2.5 a second are 216000.005.
     EXPECT_EQ(get(getUInt32, session, "Mover", "Count.Slow"), 216005u);
 }
 
-TEST_F(LiveTest, ACommandThatResetsBeginsCountingAgain) {
+TEST_F(LiveTest, ACommandThatResetsRestartsTheCounter) {
     command("Pass.Day");
     command("Reset");
     EXPECT_EQ(time(), 1u);
@@ -199,7 +199,7 @@ TEST_F(LiveTest, WhatIsSwitchedOffIsZero) {
     EXPECT_EQ(real("Direct"), 0.0);
 }
 
-TEST_F(LiveTest, FollowingWithALagKeepsToTheFormula) {
+TEST_F(LiveTest, FollowingWithALagMatchesTheFormula) {
     write("Set", 10.0);
     command("SwitchOn");
     EXPECT_NEAR(real("Lagging"), 21.0 * (1.0 - std::exp(-0.001 / 0.05)), 1e-12);
@@ -207,7 +207,7 @@ TEST_F(LiveTest, FollowingWithALagKeepsToTheFormula) {
     command("Pass.50ms");
     const double reached = 21.0 * (1.0 - std::exp(-0.054 / 0.05));
     EXPECT_NEAR(real("Lagging"), reached, 1e-12);
-    // A new target is approached from where the value is at the change.
+    // A new target is approached from the value at the time of the change.
     write("Set", 1.0);
     const double start = 21.0 * (1.0 - std::exp(-0.055 / 0.05));
     EXPECT_NEAR(real("Lagging"), 3.0 + (start - 3.0) * std::exp(-0.001 / 0.05), 1e-12);
@@ -255,7 +255,7 @@ TEST_F(LiveTest, NumbersBeyondTheTypeStopAtItsEnds) {
     EXPECT_EQ(get(getUInt64, session, "Mover", "Large"), uint64_t{0});
 }
 
-TEST_F(LiveTest, NoNumberIsEverInfiniteOrNone) {
+TEST_F(LiveTest, NumbersAreAlwaysFinite) {
     for (const double wild : {HUGE_VAL, -HUGE_VAL, std::nan(""), 1.7e308, -1.7e308}) {
         write("Set", wild);
         command("SwitchOn");
@@ -265,7 +265,7 @@ TEST_F(LiveTest, NoNumberIsEverInfiniteOrNone) {
     }
 }
 
-TEST_F(LiveTest, ChannelsFollowTheirCounterparts) {
+TEST_F(LiveTest, ChannelsFollowTheChannelOfTheSameNumber) {
     const std::vector<double> still{0.0, 0.0, 0.5};
     EXPECT_EQ(record("Meter/in0:2", "Level"), still);
     EXPECT_EQ(set(setDouble, session, "Source/out1", "Output", 2.5).code, 0);
@@ -278,7 +278,8 @@ TEST_F(LiveTest, ChannelsFollowTheirCounterparts) {
 }
 
 TEST_F(LiveTest, DriftStaysWithinItsAmplitudeAndIsSmooth) {
-    // The steepest slope is 1.5 times the way between two directions, twice the amplitude at most.
+    // The steepest slope is 1.5 times the distance between two directions, at most twice the
+    // amplitude.
     const double steepest = 1.5 * 2.0 * 0.5 / 2.0;
     double lowest = 11.0;
     double highest = 9.0;
@@ -293,7 +294,7 @@ TEST_F(LiveTest, DriftStaysWithinItsAmplitudeAndIsSmooth) {
         highest = std::max(highest, present);
         previous = present;
     }
-    // 102 directions: nothing near either end would have a chance below 1e-4.
+    // 102 directions: the probability that none is near an end is below 1e-4.
     EXPECT_LT(lowest, 9.6);
     EXPECT_GT(highest, 10.4);
 }
@@ -445,7 +446,7 @@ TEST_F(LiveTest, AFaultStrikesAndCountsTheCallsOfItsTime) {
               (Codes{0, 0, 0, -77, 0}));
 }
 
-TEST_F(LiveTest, ManyMayReadAndWriteAtOnce) {
+TEST_F(LiveTest, ManyThreadsMayReadAndWriteAtOnce) {
     std::vector<std::thread> threads;
     for (int i = 0; i < 4; ++i) {
         threads.emplace_back([this, i] {

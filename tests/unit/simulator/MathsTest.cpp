@@ -8,12 +8,12 @@ namespace {
 
 using Limits = std::numeric_limits<double>;
 
-TEST(MathsTest, WhatIsNoNumberIsTamedToZero) {
+TEST(MathsTest, NanBecomesZero) {
     EXPECT_EQ(simulator::tame(Limits::quiet_NaN()), 0.0);
     EXPECT_EQ(simulator::tame(-Limits::quiet_NaN()), 0.0);
 }
 
-TEST(MathsTest, HugeNumbersAreTamedAndOthersLeftAlone) {
+TEST(MathsTest, HugeNumbersAreLimitedAndOthersUnchanged) {
     EXPECT_EQ(simulator::tame(Limits::infinity()), 1e300);
     EXPECT_EQ(simulator::tame(-Limits::infinity()), -1e300);
     EXPECT_EQ(simulator::tame(Limits::max()), 1e300);

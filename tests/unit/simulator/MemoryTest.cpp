@@ -5,7 +5,7 @@ using namespace drivertest;
 
 namespace {
 
-// For functions that return their code, so that starve() finds what it finds elsewhere.
+// Adds the text that starve() expects, for functions that return only their code.
 void putNoDetails(qierr_Status* status) {
     if (status->code != 0) {
         status->reallocJson(status, 4);
@@ -53,7 +53,7 @@ TEST(MemoryTest, ReadingATextOfSeveralDevices) {
               0);
 }
 
-TEST(MemoryTest, ListsOfManyDevicesDoNotPileUpBeforeTheyAreRefused) {
+TEST(MemoryTest, ListsOfManyDevicesDoNotAccumulateBeforeTheyAreRefused) {
     Session session;
     std::string devices = "Mod1";
     for (int i = 1; i < 1000; ++i) {
@@ -116,7 +116,7 @@ TEST(MemoryTest, ReadingWhatFollowsIsFollowedFurther) {
                                                                 &voltage, status);
                      }),
               0);
-    // A read that failed has moved nothing: the output is off.
+    // A failed read must not have changed the state: the output is off.
     EXPECT_NEAR(get(getDouble, session, "Mod2/ch0", "PSU.MeasuredVoltage").value, 0.0, 6 * 0.0005);
 }
 
@@ -139,7 +139,7 @@ TEST(MemoryTest, SwitchingOnWhatIsFollowed) {
     EXPECT_EQ(resetDevices(session, "Mod2"), 0);
 }
 
-// Reads a property of a bench's own with all the memory it wants.
+// Reads a property of a Bench of its own without any failing allocation.
 template <typename Number>
 Number valueOf(Getter<Number> getter, Handle session, const char* resource, const char* property) {
     allowed = -1;
@@ -258,7 +258,7 @@ TEST(MemoryTest, WritingNvmem) {
     EXPECT_EQ(resetDevices(session, "Mod5"), 0);
 }
 
-// The faults that are asked for replace the former ones, or these stay in force.
+// Either the requested faults replace the previous ones, or these stay in effect.
 TEST(MemoryTest, SettingFaults) {
     Session session;
     const std::string json =

@@ -11,7 +11,7 @@
 
 using namespace drivertest;
 
-// Many clients at once, on a chassis that lasts, moves, is traced, and fails.
+// Many clients at once, on a chassis that keeps state, moves, is traced, and fails.
 namespace {
 
 constexpr int clients = 6;
@@ -38,7 +38,7 @@ const std::array<const char*, 7> faultPlans{
                    {"device": "Mod4", "event": "connection_lost", "after": 0.5}]})",
     "{}"};
 
-// What the clients have in common.
+// The state that the clients share.
 struct Bench {
     // Sessions that any client may use, abort and close; 0 for none.
     std::array<std::atomic<Handle>, 8> sessions{};
@@ -48,7 +48,7 @@ struct Bench {
         return std::all_of(countedKinds.begin(), countedKinds.end(),
                            [&](size_t kind) { return successes[kind] > 0; });
     }
-    // How many have each module for themselves.
+    // How many clients have exclusive access to each module.
     std::array<std::atomic<int>, 4> owners{};
 };
 
@@ -80,7 +80,7 @@ class Client {
     std::atomic<Handle>& anyShared() { return bench.sessions[below(bench.sessions.size())]; }
     const char* anyModule() { return modules[below(modules.size())]; }
 
-    // Every code must be one that the driver has words for, or that a fault has given.
+    // Every code must be one that the driver defines, or that a fault has set.
     static void expectSound(const Status& status) {
         const bool isKnown = status.code >= -250990 && status.code <= -250811;
         const bool isWarning = status.code == 250990 || status.code == 250991;
@@ -166,7 +166,7 @@ class Client {
         bench.successes[operation] += status.code == 0 ? 1 : 0;
     }
 
-    // To and fro, whatever the name is now.
+    // Back and forth, whatever the name is now.
     void rename(Handle session, Status& status) {
         const bool there = below(2) == 0;
         nQITRMCAPI100_renameDevice(session, there ? "Mod5" : "Switch", there ? "Switch" : "Mod5",
@@ -215,7 +215,7 @@ class Client {
                   std::vector<uint8_t>(areaBytes, bytes[0]));
     }
 
-    // On a session that no other client knows.
+    // On a session that no other client uses.
     void useExclusively() {
         Status opening;
         Handle session = 0;
@@ -251,7 +251,7 @@ class Client {
     std::mt19937 random;
 };
 
-// Changes the faults for as long as clients are at work.
+// Changes the faults while clients are at work.
 void changeFaults(const std::atomic<int>& atWork) {
     for (size_t i = 0; atWork > 0; ++i) {
         EXPECT_EQ(qitrmcsim_setFaults(faultPlans[i % faultPlans.size()], nullptr), 0);
@@ -285,7 +285,7 @@ void expectNothingOutstanding() {
     EXPECT_EQ(counts.sessions, 0u);
 }
 
-TEST(MixedClientsTest, LeaveNothingBehindAndNeverMeetWhereOneIsAlone) {
+TEST(MixedClientsTest, LeaveNothingOpenAndNeverShareAnExclusiveDevice) {
     const TemporaryFolder folder;
     setenv("QITRMC_SIM_STATE", (folder.path + "/state").c_str(), 1);
     setenv("QITRMC_SIM_TRACE", (folder.path + "/trace").c_str(), 1);

@@ -80,7 +80,7 @@ TEST(NameListTest, TheFivePropertyListsNameTheirCategories) {
     EXPECT_FALSE(session.systemList("Sys.NVMEMAreaProperties").empty());
 }
 
-TEST(NameListTest, ThePropertyListsHoldTheInternalNamesToo) {
+TEST(NameListTest, ThePropertyListsContainTheInternalNamesToo) {
     Session session;
     Names all;
     for (const char* list : {"Sys.SystemProperties", "Sys.SessionProperties",
@@ -126,7 +126,7 @@ TEST(NameListTest, ARangeBeyondTheChannelsNamesTheFirstUnknownOne) {
     EXPECT_EQ(text, detailsOf("unknownPhysChan", usage("RequestedValue", "\"Mod1/ch4\"")));
 }
 
-TEST(NameListTest, RangesThatAreNoneAreRefused) {
+TEST(NameListTest, MalformedRangesAreRefused) {
     for (const char* range :
          {"Mod1/ch3:1", "Mod1/ch1:", "Mod1/ch:1", "Mod1/:", "Mod1/ch0:x", "Mod1/ch0:1:2",
           "Mod1/ch0:4294967296", "Mod1/ch4294967296:4294967297", "Mod1/ch1:1025"}) {
@@ -135,7 +135,7 @@ TEST(NameListTest, RangesThatAreNoneAreRefused) {
     EXPECT_EQ(codeOfOpening("Mod1/ch0:1023"), -250957);
 }
 
-TEST(NameListTest, AColonWithoutASlashIsNoRange) {
+TEST(NameListTest, AColonWithoutASlashIsNotARange) {
     Session session;
     EXPECT_EQ(session.reserve("Mod1:2"), -250956);
 }
@@ -156,7 +156,7 @@ TEST(NameListTest, UnknownNamesAreRefusedByTheirKind) {
     EXPECT_EQ(session.reserve("$Mod1"), -250956);
 }
 
-TEST(NameListTest, ATextThatIsNotUtf8IsMendedInTheDetails) {
+TEST(NameListTest, ATextThatIsNotUtf8IsRepairedInTheDetails) {
     Session session;
     Status status;
     nQITRMCAPI100_reserveDevices(session, "M\xC3\"\x01\xFF", 3, "", 0.0, &status);

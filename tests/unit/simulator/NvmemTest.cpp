@@ -32,7 +32,7 @@ int32_t commit(Handle session, const char* resources) {
     return status.code;
 }
 
-// Leaves the content of the user area of Mod1 all zero.
+// Fills the user area of Mod1 with zeros at the end.
 class NvmemTest : public BenchTest {
   protected:
     ~NvmemTest() override {
@@ -48,7 +48,7 @@ TEST_F(NvmemTest, AnAreaIsReadInAnyPart) {
     EXPECT_EQ(read(session, "Mod1/user", 255, 1), Bytes{0});
 }
 
-TEST_F(NvmemTest, NothingCanBeReadAnywhereInTheArea) {
+TEST_F(NvmemTest, ZeroBytesCanBeReadAnywhereInTheArea) {
     EXPECT_EQ(read(session, "Mod1/user", 0, 0), Bytes());
     EXPECT_EQ(read(session, "Mod1/user", 256, 0), Bytes());
     EXPECT_EQ(read(session, "Mod1/user", 257, 0).code, -250981);
@@ -77,7 +77,7 @@ TEST_F(NvmemTest, WrittenBytesAreReadBackAtOnce) {
     EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.PendingChanges"), uint8_t{1});
 }
 
-TEST_F(NvmemTest, OnlyCommittedBytesOutlastAReset) {
+TEST_F(NvmemTest, OnlyCommittedBytesSurviveAReset) {
     EXPECT_EQ(write(session, "Mod1/user", 0, {1, 2}).code, 0);
     EXPECT_EQ(commit(session, "Mod1/user"), 0);
     EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.PendingChanges"), uint8_t{0});
@@ -93,7 +93,7 @@ TEST_F(NvmemTest, CommittingADeviceCommitsAllItsAreas) {
     EXPECT_EQ(read(session, "Mod1/user", 0, 1), Bytes{5});
 }
 
-TEST_F(NvmemTest, ClosingASessionDropsWhatItDidNotCommit) {
+TEST_F(NvmemTest, ClosingASessionDropsItsUncommittedBytes) {
     session.unreserve("Mod1");
     Session writer("Mod1");
     EXPECT_EQ(write(writer, "Mod1/user", 0, {5}).code, 0);
@@ -101,7 +101,7 @@ TEST_F(NvmemTest, ClosingASessionDropsWhatItDidNotCommit) {
     EXPECT_EQ(read(session, "Mod1/user", 0, 1), Bytes{0});
 }
 
-TEST_F(NvmemTest, AGuardedAreaAsksForSerialNumberAndPassword) {
+TEST_F(NvmemTest, AProtectedAreaNeedsSerialNumberAndPassword) {
     const Outcome outcome = write(session, "Mod1/calibration", 0, {1}, "12345", "calibrate");
     EXPECT_EQ(outcome.code, -250983);
     EXPECT_EQ(outcome.text, detailsOf("wrongSerialNumber", usage("RequestedValue", "\"12345\"")));
@@ -118,7 +118,7 @@ TEST_F(NvmemTest, AReadOnlyAreaIsNotWritten) {
     EXPECT_EQ(write(session, "Mod5/calibration", 0, {1}).code, -250982);
 }
 
-TEST_F(NvmemTest, OneAreaIsNamed) {
+TEST_F(NvmemTest, ExactlyOneAreaMustBeNamed) {
     EXPECT_EQ(read(session, "Mod1/user,Mod1/calibration", 0, 1).code, -250966);
     EXPECT_EQ(read(session, "Mod1", 0, 1).code, -250958);
     EXPECT_EQ(read(session, "", 0, 1).code, -250959);
@@ -138,7 +138,7 @@ TEST_F(NvmemTest, NullBuffersAreRefusedUnlessNothingIsMoved) {
     EXPECT_EQ(nothing.code, 0);
 }
 
-TEST_F(NvmemTest, WritingNeedsADeviceThatMayBeWritten) {
+TEST_F(NvmemTest, WritingNeedsWriteAccessToTheDevice) {
     Session other;
     EXPECT_EQ(write(other, "Mod1/user", 0, {1}).code, -250811);
     EXPECT_EQ(commit(other, "Mod1/user"), -250811);

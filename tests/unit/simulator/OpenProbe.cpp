@@ -1,5 +1,5 @@
-// Opens three sessions, and prints a line each for the code and the text of the status and the
-// handles.
+// Opens three sessions, and prints for each a line with the code and the text of the status, and
+// the handle.
 
 #include <cstdio>
 #include <cstdlib>

@@ -82,7 +82,7 @@ TEST_F(PropertyTest, TokensStandForSeveralResources) {
               (std::vector<uint32_t>{1, 2, 4, 5}));
 }
 
-TEST_F(PropertyTest, SeveralResourcesAskForOneElementEach) {
+TEST_F(PropertyTest, SeveralResourcesNeedOneElementEach) {
     const Outcome outcome =
         setArray(setDoubles, session, "Mod2/ch0:1", "PSU.Voltage", {1.0, 2.0, 3.0});
     EXPECT_EQ(outcome.code, -250967);
@@ -92,7 +92,7 @@ TEST_F(PropertyTest, SeveralResourcesAskForOneElementEach) {
                                           "\"value\":3,\"value_type\":\"uint32_t\"}"));
 }
 
-TEST_F(PropertyTest, OneBadElementKeepsAllFromBeingWritten) {
+TEST_F(PropertyTest, OneBadElementPreventsTheWholeWrite) {
     EXPECT_EQ(setArray(setDoubles, session, "Mod2/ch0:1", "PSU.Voltage", {1.0, 31.0}).code,
               -250971);
     EXPECT_EQ(getArray(getDoubles, session, "Mod2/ch0:1", "PSU.Voltage"),
@@ -177,7 +177,7 @@ TEST_F(PropertyTest, AWriteOnlyPropertyIsNotRead) {
     EXPECT_EQ(answer.value, "");
 }
 
-TEST_F(PropertyTest, AValueThatIsNoItemIsRefusedAsOne) {
+TEST_F(PropertyTest, AValueOutsideItsEnumerationIsRefused) {
     EXPECT_EQ(set(setInt32, session, "Mod1", "DMM.Function", 10).code, 0);
     const Outcome outcome = set(setInt32, session, "Mod1", "DMM.Function", 3);
     EXPECT_EQ(outcome.code, -250970);
@@ -220,7 +220,7 @@ TEST_F(PropertyTest, ANullArrayIsRefusedUnlessItIsEmpty) {
     EXPECT_EQ(text.code, -250954);
 }
 
-TEST_F(PropertyTest, WhatNeedsACommitWaitsForIt) {
+TEST_F(PropertyTest, APropertyThatNeedsACommitChangesAtTheCommit) {
     EXPECT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.CurrentLimit", 2.5).code, 0);
     EXPECT_EQ(get(getDouble, session, "Mod2/ch0", "PSU.CurrentLimit"), 0.1);
     Status status;
@@ -238,7 +238,7 @@ TEST_F(PropertyTest, CommittingADeviceCommitsItsChannels) {
     EXPECT_EQ(get(getDouble, session, "Mod2/ch1", "PSU.CurrentLimit"), 1.5);
 }
 
-TEST_F(PropertyTest, ClosingASessionDropsWhatItDidNotCommit) {
+TEST_F(PropertyTest, ClosingASessionDropsItsUncommittedChanges) {
     session.unreserve("Mod1");
     Session writer("Mod1");
     EXPECT_EQ(set(setDouble, writer, "Mod1", "DMM.ApertureTime", 1.0).code, 0);
@@ -259,7 +259,7 @@ TEST_F(PropertyTest, AnotherSessionsDeviceIsReadAndNotWritten) {
     EXPECT_EQ(status.code, -250811);
 }
 
-TEST_F(PropertyTest, AReadOnlyReservationKeepsFromWriting) {
+TEST_F(PropertyTest, AReadOnlyReservationDoesNotAllowWriting) {
     EXPECT_EQ(session.reserve("Mod1", 1), 0);
     const Outcome outcome = set(setDouble, session, "Mod1", "DMM.Range", 1.0);
     EXPECT_EQ(outcome.code, -250972);
@@ -269,7 +269,7 @@ TEST_F(PropertyTest, AReadOnlyReservationKeepsFromWriting) {
                             usage("Device", "\"Mod1\"")));
 }
 
-TEST_F(PropertyTest, ADeviceThatNobodyHoldsMayBeWritten) {
+TEST_F(PropertyTest, AnUnreservedDeviceMayBeWritten) {
     session.unreserve("Mod1");
     Session other;
     EXPECT_EQ(set(setDouble, other, "Mod1", "DMM.Range", 1.0).code, 0);
@@ -292,7 +292,7 @@ TEST_F(PropertyTest, SystemPropertiesOfEachTypeAreReadAndWritten) {
     EXPECT_EQ(status.code, 0) << status.text();
 }
 
-TEST_F(PropertyTest, SystemPropertiesRefuseAsOthersDo) {
+TEST_F(PropertyTest, SystemPropertiesAreRefusedLikeOthers) {
     Status unknown;
     uint8_t flag = 7;
     nQITRMCAPI100_getSystemPropertyBool(session, "Sys.Nothing", &flag, &unknown);
@@ -374,7 +374,7 @@ TEST_F(PropertyTest, TheChassisKnowsItsModulesAndItsAddress) {
     EXPECT_EQ(getText(session, "Mod1", "Dev.TCPIP.Hostname").code, -250964);
 }
 
-TEST_F(PropertyTest, AreasTellAboutThemselves) {
+TEST_F(PropertyTest, AreasHavePropertiesThatDescribeThem) {
     EXPECT_EQ(get(getUInt32, session, "Mod1/calibration", "NVMEMArea.Size"), 1024u);
     EXPECT_EQ(get(getBool, session, "Mod1/calibration", "NVMEMArea.PasswordWanted"), uint8_t{1});
     EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.SerialNumWanted"), uint8_t{0});
@@ -412,7 +412,7 @@ TEST_F(PropertyTest, ANullDeviceIsTheSessionsDefault) {
     EXPECT_EQ(missing.code, -250959);
 }
 
-TEST_F(PropertyTest, AnArrayOfTheCallersMayBeGivenBackToo) {
+TEST_F(PropertyTest, AnArrayOfTheCallerMayBeFreedToo) {
     nQITRMCAPI100_freeArray(std::malloc(8));
     nQITRMCAPI100_freeArray(nullptr);
     nQITRMCAPI100_freeString(nullptr);

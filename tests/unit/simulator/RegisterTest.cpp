@@ -56,7 +56,7 @@ TEST_F(RegisterTest, AReadOnlyRegisterIsNotWritten) {
     EXPECT_EQ(read(read8, session, "Mod1", 0), uint8_t{0x4d});
 }
 
-TEST_F(RegisterTest, OneDeviceIsNamed) {
+TEST_F(RegisterTest, ExactlyOneDeviceMustBeNamed) {
     EXPECT_EQ(read(read8, session, "Mod1,Mod2", 0).code, -250966);
     EXPECT_EQ(read(read8, session, "", 0).code, -250959);
     EXPECT_EQ(read(read8, session, "Mod1/ch0", 0).code, -250956);
@@ -65,13 +65,13 @@ TEST_F(RegisterTest, OneDeviceIsNamed) {
     EXPECT_EQ(read(read8, one, "$DefaultDevices", 0).code, -250978);
 }
 
-TEST_F(RegisterTest, WritingNeedsADeviceThatMayBeWritten) {
+TEST_F(RegisterTest, WritingNeedsWriteAccessToTheDevice) {
     Session other;
     EXPECT_EQ(write(write8, other, "Mod1", 256, uint8_t{1}), -250811);
     EXPECT_EQ(read(read8, other, "Mod1", 256), uint8_t{0});
 }
 
-TEST_F(RegisterTest, AResetPutsRegistersBack) {
+TEST_F(RegisterTest, AResetRestoresRegisters) {
     EXPECT_EQ(write(write8, session, "Mod1", 256, uint8_t{1}), 0);
     EXPECT_EQ(resetDevices(session, "Mod1"), 0);
     EXPECT_EQ(read(read8, session, "Mod1", 256), uint8_t{0});

@@ -39,7 +39,7 @@ constexpr auto write16 = nQITRMCAPI100_writeRegisterUInt16;
 constexpr auto write32 = nQITRMCAPI100_writeRegisterUInt32;
 constexpr auto write64 = nQITRMCAPI100_writeRegisterUInt64;
 
-// How the details name a register.
+// The details of a status about a register.
 inline std::string atRegister(uint32_t address) {
     return "{\"type\":\"usage\",\"usage\":\"kUsageTypeRegisterAddress\",\"value\":" +
            std::to_string(address) + ",\"value_type\":\"uint32_t\"}";

@@ -16,7 +16,7 @@ TEST(ReservationTest, ReadWriteIsExclusive) {
     EXPECT_EQ(other.list("Session.ReservedDevices"), Names());
 }
 
-TEST(ReservationTest, ReadOnlyIsSharedWithReadersAlone) {
+TEST(ReservationTest, ReadOnlyIsSharedOnlyWithReaders) {
     Session holder("Mod1", 1);
     Session other;
     EXPECT_EQ(other.reserve("Mod1", 3), taken);
@@ -40,7 +40,7 @@ TEST(ReservationTest, TwoSessionsWithoutAGroupDoNotShare) {
     EXPECT_EQ(second.reserve("Mod1", 3, ""), taken);
 }
 
-TEST(ReservationTest, TheDetailsNameTheDeviceThatIsTaken) {
+TEST(ReservationTest, TheDetailsNameTheReservedDevice) {
     Session holder("Mod2");
     Status status;
     Session other;
@@ -49,7 +49,7 @@ TEST(ReservationTest, TheDetailsNameTheDeviceThatIsTaken) {
     EXPECT_EQ(status.text(), detailsOf("deviceReserved", usage("Device", "\"Mod2\"")));
 }
 
-TEST(ReservationTest, TheDetailsNameAllDevicesThatAreTaken) {
+TEST(ReservationTest, TheDetailsNameAllReservedDevices) {
     Session holder("Mod1,Mod2");
     Status status;
     Session other;
@@ -103,7 +103,7 @@ TEST(ReservationTest, UnreservingWhatIsNotHeldWarns) {
     EXPECT_EQ(holder.list("Session.ReservedDevices"), Names{"Mod2"});
 }
 
-TEST(ReservationTest, ClosingGivesUpReservations) {
+TEST(ReservationTest, ClosingReleasesReservations) {
     Session holder("Mod1,Mod2");
     holder.close();
     Session other("Mod1,Mod2");
@@ -136,7 +136,7 @@ TEST(ReservationTest, OtherAccessesAreRefused) {
     }
 }
 
-TEST(ReservationTest, TimeoutsThatAreNoTimesAreRefused) {
+TEST(ReservationTest, InvalidTimeoutsAreRefused) {
     Session session;
     EXPECT_EQ(session.reserve("Mod1", 3, "", -1.0), -250962);
     EXPECT_EQ(session.reserve("Mod1", 3, "", std::numeric_limits<double>::quiet_NaN()), -250962);
@@ -152,7 +152,7 @@ TEST(ReservationTest, ANullTextIsRefusedByName) {
               detailsOf("missingArgument", usage("ArgumentName", "\"reservationGroup\"")));
 }
 
-TEST(ReservationTest, ANegativeStatusKeepsTheDriverFromActing) {
+TEST(ReservationTest, NothingIsDoneWhenTheStatusIsNegative) {
     Session session;
     Status status;
     status.code = -1;
@@ -162,7 +162,7 @@ TEST(ReservationTest, ANegativeStatusKeepsTheDriverFromActing) {
     EXPECT_EQ(session.list("Session.ReservedDevices"), Names());
 }
 
-TEST(ReservationTest, AWaitThatIsOverLeavesTheDeviceToItsHolder) {
+TEST(ReservationTest, AWaitThatTimesOutDoesNotTakeTheDevice) {
     Session holder("Mod1");
     Session other;
     EXPECT_EQ(other.reserve("Mod1", 3, "", 0.01), taken);

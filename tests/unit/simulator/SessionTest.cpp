@@ -76,7 +76,7 @@ TEST(SessionTest, AClosedHandleIsRefusedByNumber) {
     EXPECT_EQ(zero.code, -250955);
 }
 
-TEST(SessionTest, AHandleIsNotUsedAgainAtOnce) {
+TEST(SessionTest, AHandleIsNotReusedImmediately) {
     Session session;
     const Handle dead = session.handle;
     session.close();

@@ -14,11 +14,11 @@ namespace drivertest {
 
 namespace {
 
-// How many allocations with new still succeed; below 0 all do.
+// How many allocations with new still succeed; all do when it is negative.
 std::atomic<long> allowed{-1};
-// Whether one was denied.
+// Whether an allocation has failed.
 std::atomic<bool> denied{false};
-// How many allocations are there, and the most since this was last set.
+// The number of live allocations, and the maximum since this was last set.
 std::atomic<long> liveAllocations{0};
 std::atomic<long> mostAllocations{0};
 
@@ -73,8 +73,8 @@ namespace {
 
 constexpr int32_t outOfMemory = -250950;
 
-// Lets each allocation of a call fail in turn. Every one must end in outOfMemory, or in the code
-// that the call has with all the memory it wants. Returns how many allocations the call makes.
+// Makes each allocation of a call fail in turn. Every attempt must end in outOfMemory, or in the
+// code that the call has when memory suffices. Returns how many allocations the call makes.
 long starve(int32_t usual, const std::function<void(qierr_Status*)>& call) {
     for (long count = 0;; ++count) {
         Status status;

@@ -1,4 +1,4 @@
-// What becomes of a state folder that others use, that is damaged, or that cannot be written.
+// The behaviour for a state folder that others use, that is damaged, or that cannot be written.
 
 #include <fcntl.h>
 #include <signal.h>
@@ -16,7 +16,7 @@ constexpr const char* lockedRemedy =
 constexpr const char* fileRemedy =
     "; put a copy of the file back, or remove it to lose the values in it";
 
-// The text that stands for a number of so many bytes in a file.
+// The bytes in a file for a number of this size.
 std::string number(uint64_t value, size_t bytes) {
     std::string text;
     for (size_t i = 0; i < bytes; ++i) {
@@ -49,7 +49,7 @@ std::string fileOf(uint64_t change, const std::string& entries) {
 
 class StateFaultTest : public testing::Test {
   protected:
-    // Expects that the driver refuses the folder with these words about a file or the folder.
+    // Expects that the driver refuses the folder with this message about a file or the folder.
     void expectRefusal(const std::string& path, const std::string& words) const {
         const std::string errors = state.run([&] {
             const Outcome outcome = openSession();
@@ -64,7 +64,7 @@ class StateFaultTest : public testing::Test {
     void expectBroken(const std::string& name, const std::string& wrong) const {
         expectRefusal(state.file(name), wrong + fileRemedy);
     }
-    // Expects that the driver starts with one complaint, and what body expects.
+    // Expects that the driver starts with one message on standard error, and what body expects.
     void expectComplaint(const std::string& about, const std::string& reason,
                          const std::function<void()>& body) const {
         EXPECT_EQ(state.run(body), "qitrmcapi: " + state.path + ": what is kept of " + about +
@@ -90,7 +90,7 @@ class StateFaultTest : public testing::Test {
     StateFolder state;
 };
 
-// A process that has the folder until it is killed.
+// A process that holds the folder until it is killed.
 class Holder {
   public:
     explicit Holder(const StateFolder& state) {
@@ -116,7 +116,7 @@ class Holder {
     pid_t id;
 };
 
-TEST_F(StateFaultTest, OneProcessHasTheFolderAtATime) {
+TEST_F(StateFaultTest, OnlyOneProcessMayUseTheFolderAtATime) {
     {
         const Holder holder(state);
         expectRefusal(state.path,
@@ -150,7 +150,7 @@ TEST_F(StateFaultTest, AForkedProcessDoesNotWriteForItsParent) {
               "");
 }
 
-TEST_F(StateFaultTest, WhatIsNoFolderIsRefused) {
+TEST_F(StateFaultTest, WhatIsNotAFolderIsRefused) {
     const std::string path = state.path;
     state.path = "/dev/null";
     expectRefusal("/dev/null",
@@ -176,7 +176,7 @@ TEST_F(StateFaultTest, AFolderThatMayNotBeWrittenIsRefused) {
                           "folder that can be written\n");
 }
 
-TEST_F(StateFaultTest, AFileIsReadAsItIsDescribedHere) {
+TEST_F(StateFaultTest, AFileIsReadInItsDocumentedFormat) {
     state.put(
         "change-7",
         fileOf(7, entry("Mod1", "Dev.Comment", 5, 1, text("by hand")) +
@@ -198,7 +198,7 @@ TEST_F(StateFaultTest, AFileIsReadAsItIsDescribedHere) {
               "");
 }
 
-TEST_F(StateFaultTest, AFileIsWrittenAsItIsReadHere) {
+TEST_F(StateFaultTest, AFileIsWrittenInItsDocumentedFormat) {
     EXPECT_EQ(state.run([] {
         Session session("Mod1");
         EXPECT_EQ(set(setText, session, "Mod1", "Dev.Comment", "é").code, 0);
@@ -210,7 +210,7 @@ TEST_F(StateFaultTest, AFileIsWrittenAsItIsReadHere) {
               fileOf(0, entry("", "Sys.NextSession", 6, 1, number(101, 4))));
 }
 
-TEST_F(StateFaultTest, AFileCutOffAnywhereIsRefused) {
+TEST_F(StateFaultTest, AFileTruncatedAnywhereIsRefused) {
     commitByte(1);
     const std::string whole = contentOf(state.file("change-1"));
     for (size_t size = 0; size < whole.size(); ++size) {
@@ -236,7 +236,7 @@ TEST_F(StateFaultTest, AFileWithAnyByteChangedIsRefused) {
     EXPECT_EQ(contentOf(state.file("change-1")).size(), whole.size());
 }
 
-TEST_F(StateFaultTest, ABrokenFileIsToldWithWhatIsWrong) {
+TEST_F(StateFaultTest, ABrokenFileIsReportedWithWhatIsWrong) {
     const std::string good = fileOf(3, entry("Mod1", "Dev.Comment", 5, 1, text("x")));
     state.put("change-3", "");
     expectBroken("change-3", "is no state file of this version");
@@ -258,7 +258,7 @@ TEST_F(StateFaultTest, ABrokenFileIsToldWithWhatIsWrong) {
     expectBroken("change-3", "was made as the file of change 2");
 }
 
-TEST_F(StateFaultTest, AFileOfAnotherMakeIsReadWithCare) {
+TEST_F(StateFaultTest, AFileWithInvalidContentIsReadSafely) {
     state.put("change-1", fileOf(1, "\x03"));
     expectBroken("change-1", "breaks off within a value");
     state.put("change-1", fileOf(1, entry("Mod1", "Dev.Comment", 5, 1, number(4294967295u, 4))));
@@ -285,7 +285,7 @@ TEST_F(StateFaultTest, AFolderInPlaceOfAFileIsRefused) {
                   "cannot be read: Is a directory; must be a readable file");
 }
 
-TEST_F(StateFaultTest, OtherFilesAreLeftAlone) {
+TEST_F(StateFaultTest, OtherFilesAreNotChanged) {
     for (const char* name : {"change-", "change-01", "change-1.old", "change-0", "notes"}) {
         state.put(name, "mine");
     }
@@ -294,7 +294,7 @@ TEST_F(StateFaultTest, OtherFilesAreLeftAlone) {
     EXPECT_EQ(contentOf(state.file("notes")), "mine");
 }
 
-TEST_F(StateFaultTest, WhatDoesNotFitIsToldAndNotUsed) {
+TEST_F(StateFaultTest, ContentThatDoesNotFitIsReportedAndNotUsed) {
     const auto expectDefaults = [] {
         Session session("Mod1");
         EXPECT_EQ(getText(session, "Mod1", "Dev.Comment"), std::string(""));
@@ -326,7 +326,7 @@ TEST_F(StateFaultTest, WhatDoesNotFitIsToldAndNotUsed) {
                  "another device has this name");
 }
 
-TEST_F(StateFaultTest, NamesThatCannotAllBeGivenAreGivenUpUntilTheyCan) {
+TEST_F(StateFaultTest, NamesThatConflictAreNotUsedUntilTheyNoLongerConflict) {
     state.put("change-1", fileOf(1, entry("Mod1", "Dev.Name", 5, 1, text("Bench")) +
                                         entry("Mod2", "Dev.Name", 5, 1, text("Mod1")) +
                                         entry("Mod4", "Dev.Name", 5, 1, text("Mod2"))));
@@ -353,7 +353,7 @@ void limitFileSize(rlim_t bytes) {
     EXPECT_EQ(setrlimit(RLIMIT_FSIZE, &limit), 0);
 }
 
-TEST_F(StateFaultTest, ADiskThatIsFullAtAnyByteLeavesTheOldContent) {
+TEST_F(StateFaultTest, AFullDiskAtAnyByteKeepsTheOldContent) {
     commitByte(1);
     const auto before = state.files();
     const size_t size = before.at("change-1").size();
@@ -414,7 +414,7 @@ TEST_F(StateFaultTest, WhatCannotBeWrittenChangesNothing) {
               "");
 }
 
-TEST_F(StateFaultTest, AFileThatCannotGetItsNameChangesNothing) {
+TEST_F(StateFaultTest, AFileThatCannotBeRenamedChangesNothing) {
     EXPECT_EQ(state.run([&] {
         Session session("Mod1");
         std::filesystem::create_directory(state.file("change-1"));
@@ -427,7 +427,7 @@ TEST_F(StateFaultTest, AFileThatCannotGetItsNameChangesNothing) {
     EXPECT_EQ(state.files().size(), 0u);
 }
 
-TEST_F(StateFaultTest, AFolderThatMayNotBeWrittenAnyMoreChangesNothing) {
+TEST_F(StateFaultTest, AFolderThatIsNoLongerWritableChangesNothing) {
     EXPECT_EQ(state.run([&] {
         Session session("Mod1");
         EXPECT_EQ(chmod(state.path.c_str(), 0555), 0);
@@ -440,7 +440,7 @@ TEST_F(StateFaultTest, AFolderThatMayNotBeWrittenAnyMoreChangesNothing) {
               "");
 }
 
-TEST_F(StateFaultTest, AFolderThatIsGoneChangesNothing) {
+TEST_F(StateFaultTest, ARemovedFolderChangesNothing) {
     EXPECT_EQ(state.run([&] {
         Session session("Mod1");
         std::filesystem::remove_all(state.path);

@@ -17,8 +17,8 @@ inline std::string contentOf(const std::string& path) {
     return std::string(std::istreambuf_iterator<char>(file), {});
 }
 
-// A folder for the state of a chassis, which goes with this object. The test itself never uses the
-// driver: each use is a process of its own, which is what a restart is.
+// A folder for the state of a chassis, removed with this object. The test itself never uses the
+// driver: each use is a process of its own, which is equivalent to a restart.
 class StateFolder {
   public:
     StateFolder() {
@@ -61,7 +61,7 @@ class StateFolder {
         return child;
     }
 
-    // Runs body in a process of its own to its end. Returns what that wrote on standard error.
+    // Runs body in a process of its own to its end. Returns what it wrote to standard error.
     std::string run(const std::function<void()>& body) const {
         const ChassisFile errors("");
         const pid_t child = start([&] {
@@ -122,7 +122,7 @@ inline uint64_t changeCount(Handle session) {
     return count;
 }
 
-// What opening a session comes to.
+// The result of opening a session.
 inline Outcome openSession() {
     Status status;
     Handle handle = 0;

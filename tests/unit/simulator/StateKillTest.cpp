@@ -1,5 +1,5 @@
-// Kills processes at random moments while they commit. The environment variable QITRMC_KILLS says
-// how often; 50 times when it is not set.
+// Kills processes at random moments while they commit. The environment variable QITRMC_KILLS sets
+// how often; the default is 50 times.
 
 #include <signal.h>
 
@@ -21,7 +21,7 @@ constexpr const char* description = R"({"devices": [
     {"name": "B", "category": 2, "nvmem_areas": [{"name": "user", "size": 65536}]}
 ]})";
 
-// The content of an area in a round: the number of the round all over.
+// The content of an area in a round: the number of the round, repeated.
 Bytes contentOfRound(uint32_t round) {
     Bytes bytes;
     for (uint32_t i = 0; i < areaSize / 4; ++i) {
@@ -36,13 +36,13 @@ uint32_t roundOf(const Bytes& bytes) {
     return bytes[0] | uint32_t{bytes[1]} << 8 | uint32_t{bytes[2]} << 16 | uint32_t{bytes[3]} << 24;
 }
 
-// Commits one round after the other to both areas at once, and tells the number of each through
-// the pipe: first the one that it finds, then each that was committed.
+// Commits one round after the other to both areas at once, and writes the number of each to the
+// pipe: first the one that it finds, then each that was committed.
 void commitForEver(int pipe) {
     Session session("A,B");
     const Bytes found = readArea(session, "A/user", areaSize);
     uint32_t round = roundOf(found);
-    // A torn or mixed content is told as a round that never is.
+    // A torn or mixed content is reported as an impossible round.
     if (found != contentOfRound(round) || readArea(session, "B/user", areaSize) != found) {
         round = UINT32_MAX;
     }
@@ -57,7 +57,7 @@ void commitForEver(int pipe) {
     }
 }
 
-// What a process told before it was killed.
+// What a process reported before it was killed.
 struct Report {
     uint32_t found = UINT32_MAX;
     uint32_t committed = UINT32_MAX;
@@ -78,7 +78,7 @@ Report killSoon(const StateFolder& state, bool mayCommit, std::chrono::microseco
     if (mayCommit) {
         EXPECT_GT(::read(ends[0], &report.committed, sizeof report.committed), 0);
     }
-    // Nothing is waited for here: this is the moment of the blow.
+    // No condition is awaited here: the delay determines the moment of the kill.
     std::this_thread::sleep_for(delay);
     kill(child, SIGKILL);
     while (::read(ends[0], &report.committed, sizeof report.committed) > 0) {
@@ -90,7 +90,7 @@ Report killSoon(const StateFolder& state, bool mayCommit, std::chrono::microseco
     return report;
 }
 
-TEST(StateKillTest, AKilledProcessLeavesAWholeContentThatIsNoOlderThanItsLastCommit) {
+TEST(StateKillTest, AKilledProcessLeavesACompleteContentNotOlderThanItsLastCommit) {
     const char* wanted = std::getenv("QITRMC_KILLS");
     const int kills = wanted != nullptr ? std::atoi(wanted) : 50;
     const ChassisFile file(description);

@@ -17,8 +17,8 @@ class StateMemoryTest : public testing::Test {
   protected:
     StateMemoryTest() { state.chassis = file.path; }
 
-    // Expects that a call that fails for want of memory leaves the files as they are, and that one
-    // that succeeds writes one.
+    // Expects that a call that runs out of memory leaves the files unchanged, and that one that
+    // succeeds writes one.
     void starveWriting(const std::function<void(Session&, qierr_Status*)>& call) const {
         state.run([&] {
             Session session("A");
@@ -80,7 +80,7 @@ TEST_F(StateMemoryTest, CommittingProperties) {
     });
 }
 
-TEST_F(StateMemoryTest, WritingALastingProperty) {
+TEST_F(StateMemoryTest, WritingAPersistentProperty) {
     starveWriting([](Session& session, qierr_Status* status) {
         nQITRMCAPI100_setGenericPropertyString(session, "A", "Dev.Comment",
                                                "a text that is longer than a short one", status);
@@ -89,7 +89,7 @@ TEST_F(StateMemoryTest, WritingALastingProperty) {
     });
 }
 
-TEST_F(StateMemoryTest, ACommandThatChangesALastingProperty) {
+TEST_F(StateMemoryTest, ACommandThatChangesAPersistentProperty) {
     starveWriting([](Session& session, qierr_Status* status) {
         nQITRMCAPI100_executeGenericCommand(session, "A", "Note", 1.0, status);
         allowed = -1;

@@ -53,7 +53,7 @@ Outcome execute(Handle session, const char* command) {
     return {status.code, status.text()};
 }
 
-TEST_F(StateTest, CommittedBytesLast) {
+TEST_F(StateTest, CommittedBytesSurviveARestart) {
     run([](Session& session) {
         EXPECT_EQ(writeArea(session, "Größe/user", {0, 1, 255}).code, 0);
         EXPECT_EQ(writeArea(session, "Second/user", {9}).code, 0);
@@ -74,7 +74,7 @@ mode_t modeOf(const std::string& path) {
     return facts.st_mode & 07777;
 }
 
-TEST_F(StateTest, TheMaskOfTheProcessDecidesWhoMayReadAndWrite) {
+TEST_F(StateTest, TheUmaskDeterminesTheFilePermissions) {
     for (const mode_t mask : {0000, 0027}) {
         const std::string parent = state.file("parent" + std::to_string(mask));
         const std::string folder = parent + "/folder";
@@ -103,7 +103,7 @@ TEST_F(StateTest, BytesThatWereNotCommittedAreLost) {
     });
 }
 
-TEST_F(StateTest, FilesThatMatterNoMoreAreRemoved) {
+TEST_F(StateTest, ObsoleteFilesAreRemoved) {
     run([](Session& session) {
         for (uint8_t i = 0; i < 5; ++i) {
             EXPECT_EQ(writeArea(session, "Größe/user", {i}).code, 0);
@@ -126,7 +126,7 @@ TEST_F(StateTest, FilesThatMatterNoMoreAreRemoved) {
     EXPECT_EQ(state.files().count("change-6"), 1u);
 }
 
-TEST_F(StateTest, FilesThatMatteredNoMoreWhenAProcessEndedAreRemovedLater) {
+TEST_F(StateTest, ObsoleteFilesOfAnEarlierProcessAreRemoved) {
     run([](Session& session) { EXPECT_EQ(execute(session, "Name").code, 0); });
     const std::string old = contentOf(state.file("change-1"));
     run([](Session& session) { EXPECT_EQ(execute(session, "Name").code, 0); });
@@ -138,7 +138,7 @@ TEST_F(StateTest, FilesThatMatteredNoMoreWhenAProcessEndedAreRemovedLater) {
     EXPECT_FALSE(std::filesystem::exists(state.file("unfinished")));
 }
 
-TEST_F(StateTest, NamesAndTheirChangesLast) {
+TEST_F(StateTest, NamesAndTheirChangesSurviveARestart) {
     run([](Session& session) {
         EXPECT_EQ(renameDevice(session, "Größe", "x").code, 0);
         EXPECT_EQ(renameDevice(session, "Second", "Größe").code, 0);
@@ -162,7 +162,7 @@ TEST_F(StateTest, NamesAndTheirChangesLast) {
               "");
 }
 
-TEST_F(StateTest, LastingPropertiesLastAndOthersDoNot) {
+TEST_F(StateTest, OnlyPersistentPropertiesSurviveARestart) {
     run([](Session& session) {
         EXPECT_EQ(set(setText, session, "Größe", "Dev.Comment", "für später").code, 0);
         EXPECT_EQ(setArray(setTexts, session, "Größe/ch0:1", "PhysChan.Comment", {"a", ""}).code,
@@ -193,7 +193,7 @@ TEST_F(StateTest, LastingPropertiesLastAndOthersDoNot) {
     });
 }
 
-TEST_F(StateTest, APropertyThatNeedsACommitLastsAsCommitted) {
+TEST_F(StateTest, APropertyThatNeedsACommitIsPersistentAsCommitted) {
     run([](Session& session) {
         EXPECT_EQ(set(setInt32, session, "Größe", "P.Committed", 2).code, 0);
         EXPECT_EQ(commitProperties(session, "Größe").code, 0);
@@ -202,7 +202,7 @@ TEST_F(StateTest, APropertyThatNeedsACommitLastsAsCommitted) {
     run([](Session& session) { EXPECT_EQ(get(getInt32, session, "Größe", "P.Committed"), 2); });
 }
 
-TEST_F(StateTest, WhatCommandsDoToLastingPropertiesLasts) {
+TEST_F(StateTest, ChangesOfPersistentPropertiesByCommandsSurviveARestart) {
     run([](Session& session) {
         EXPECT_EQ(execute(session, "Work").code, 0);
         EXPECT_EQ(execute(session, "Work").code, 0);
@@ -215,7 +215,7 @@ TEST_F(StateTest, WhatCommandsDoToLastingPropertiesLasts) {
     });
 }
 
-TEST_F(StateTest, AResetLeavesWhatLasts) {
+TEST_F(StateTest, AResetKeepsPersistentState) {
     run([](Session& session) {
         EXPECT_EQ(set(setDouble, session, "Größe", "P.Real", 2.0).code, 0);
         EXPECT_EQ(set(setInt32, session, "Größe", "P.Committed", 2).code, 0);
@@ -232,7 +232,7 @@ TEST_F(StateTest, AResetLeavesWhatLasts) {
     run([](Session& session) { EXPECT_EQ(get(getDouble, session, "Größe", "P.Real"), 2.0); });
 }
 
-TEST_F(StateTest, WhatAnotherChassisDoesNotHaveIsKeptForTheOneThatHasIt) {
+TEST_F(StateTest, StateOfDevicesThatAnotherChassisLacksIsKept) {
     run([](Session& session) {
         EXPECT_EQ(writeArea(session, "Größe/user", {1}).code, 0);
         EXPECT_EQ(commitNvmem(session, "Größe/user").code, 0);
@@ -255,7 +255,7 @@ TEST_F(StateTest, WhatAnotherChassisDoesNotHaveIsKeptForTheOneThatHasIt) {
               "");
 }
 
-TEST_F(StateTest, MissingFoldersAreMade) {
+TEST_F(StateTest, MissingFoldersAreCreated) {
     state.path += "/a/b";
     run([](Session& session) { EXPECT_EQ(execute(session, "Name").code, 0); });
     EXPECT_EQ(state.files().size(), 1u);
@@ -275,7 +275,7 @@ TEST_F(StateTest, WithoutAFolderNothingIsWritten) {
     EXPECT_TRUE(std::filesystem::is_empty(path));
 }
 
-TEST_F(StateTest, AFolderNamedFromTheWorkingFolderStaysTheSame) {
+TEST_F(StateTest, ARelativeFolderIsNotAffectedByChangingTheWorkingDirectory) {
     const std::string path = state.path;
     state.path = "kept";
     run([&](Session&) {});

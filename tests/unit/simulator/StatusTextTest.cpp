@@ -20,7 +20,7 @@ TEST(StatusTextTest, SuccessNeedsNoText) {
     nQITRMCAPI100_closeSession(handle, &status);
 }
 
-TEST(StatusTextTest, TheTextIsFramedAsTheFormatDemands) {
+TEST(StatusTextTest, TheTextFollowsTheBufferFormat) {
     Status status;
     refuse(status);
     EXPECT_EQ(status.code, -250956);
@@ -29,7 +29,7 @@ TEST(StatusTextTest, TheTextIsFramedAsTheFormatDemands) {
     EXPECT_GE(status.capacity, refusal.size() + 2);
 }
 
-TEST(StatusTextTest, RoomThatIsThereIsUsedAsItIs) {
+TEST(StatusTextTest, ExistingRoomIsUsed) {
     Status status;
     status.reallocJson(&status, 4096);
     std::memset(status.json, 'x', 4095);
@@ -49,7 +49,7 @@ TEST(StatusTextTest, RoomThatJustFitsIsEnough) {
     EXPECT_EQ(status.text(), refusal);
 }
 
-TEST(StatusTextTest, RoomThatIsOneShortGrows) {
+TEST(StatusTextTest, RoomThatIsOneByteShortGrows) {
     Status status;
     status.reallocJson(&status, static_cast<uint32_t>(refusal.size() + 1));
     refuse(status);
@@ -57,7 +57,7 @@ TEST(StatusTextTest, RoomThatIsOneShortGrows) {
     EXPECT_EQ(status.text(), refusal);
 }
 
-TEST(StatusTextTest, WithoutRoomTheCodeAloneArrives) {
+TEST(StatusTextTest, WithoutRoomOnlyTheCodeIsReported) {
     Status status;
     status.starve();
     refuse(status);
@@ -66,7 +66,7 @@ TEST(StatusTextTest, WithoutRoomTheCodeAloneArrives) {
     EXPECT_EQ(status.capacity, 0u);
 }
 
-TEST(StatusTextTest, WithoutRoomTheDetailsOfAWarningAreNotLeftBehind) {
+TEST(StatusTextTest, WithoutRoomTheDetailsOfAnEarlierWarningAreRemoved) {
     Status status;
     status.reallocJson(&status, 16);
     std::strcpy(status.json, "{\"old\":1}");

@@ -52,7 +52,7 @@ std::string handleText(const Session& session) {
     return std::to_string(session.handle);
 }
 
-TEST_F(TraceTest, ACallStandsWithItsArgumentsAndWhatItGave) {
+TEST_F(TraceTest, ACallIsTracedWithItsArgumentsAndOutputs) {
     const Session session("Mod1", 3, "group");
     Status status;
     double value = 0.0;
@@ -66,7 +66,7 @@ TEST_F(TraceTest, ACallStandsWithItsArgumentsAndWhatItGave) {
                          ", resources=\"Mod1\", property=\"DMM.Range\") -> 0 value=10"}));
 }
 
-TEST_F(TraceTest, AFailureStandsWithItsDetailsAndWithoutOutputs) {
+TEST_F(TraceTest, AFailureIsTracedWithItsDetailsAndWithoutOutputs) {
     const Session session;
     Status status;
     char* text = nullptr;
@@ -76,7 +76,7 @@ TEST_F(TraceTest, AFailureStandsWithItsDetailsAndWithoutOutputs) {
                                   detailsOf("unknownDevice", usage("RequestedValue", "\"Mod9\"")));
 }
 
-TEST_F(TraceTest, ACallThatDoesNothingStandsThereNot) {
+TEST_F(TraceTest, ACallWithANegativeStatusIsNotTraced) {
     Status status;
     status.code = -1;
     nQITRMCAPI100_closeSession(1, &status);
@@ -97,7 +97,7 @@ TEST_F(TraceTest, ArraysAndBytesAreListed) {
                               ", nvmemArea=\"Mod1/calibration\", address=2) -> 0 buffer=[2,3]");
 }
 
-TEST_F(TraceTest, LongValuesAreCutAndNullsAreNamed) {
+TEST_F(TraceTest, LongValuesAreTruncatedAndNullsAreNamed) {
     const Session session;
     Status status;
     const std::string longText(300, 'x');
@@ -114,14 +114,14 @@ TEST_F(TraceTest, LongValuesAreCutAndNullsAreNamed) {
               std::string::npos);
 }
 
-TEST_F(TraceTest, WhatIsNoLineOfTextIsEscaped) {
+TEST_F(TraceTest, LineBreaksAndControlCharactersAreEscaped) {
     const Session session;
     Status status;
     nQITRMCAPI100_setGenericPropertyString(session, "Mod1", "DMM.Note", "a\n\"b\"", &status);
     EXPECT_NE(lines().back().find(R"(value="a\u000a\"b\"")"), std::string::npos);
 }
 
-TEST_F(TraceTest, LinesOfThreadsDoNotMix) {
+TEST_F(TraceTest, LinesOfDifferentThreadsDoNotInterleave) {
     constexpr int calls = 200;
     const auto work = [] {
         const Session session;
@@ -135,7 +135,7 @@ TEST_F(TraceTest, LinesOfThreadsDoNotMix) {
     std::thread second(work);
     first.join();
     second.join();
-    // Each opens and closes a session besides.
+    // Each also opens and closes a session.
     EXPECT_EQ(lines().size(), 2u * (calls + 2));
 }
 

@@ -4,7 +4,7 @@
 
 namespace drivertest {
 
-// What a call gave: its code, the details if it failed, and the value.
+// The result of a call: its code, the details if it failed, and the value.
 template <typename Value>
 struct Answer {
     int32_t code = 0;
@@ -83,7 +83,7 @@ inline Answer<Names> getTexts(Handle session, const char* resources, const char*
     return answer;
 }
 
-// What a write came to: the code and the details.
+// The result of a write: the code and the details.
 struct Outcome {
     int32_t code;
     std::string text;
@@ -143,7 +143,7 @@ inline Outcome execute(Handle session, const char* resources, const char* comman
     return {status.code, status.text()};
 }
 
-// Puts devices back to their state after power-on.
+// Restores devices to their state after power-on.
 inline int32_t resetDevices(Handle session, const char* devices) {
     Status status;
     nQITRMCAPI100_resetDevices(session, devices, &status);

@@ -25,7 +25,7 @@ bool isReady(const std::future<int32_t>& result) {
     return result.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
 }
 
-// Acts again and again until the call that it is meant for has come back.
+// Calls `act` repeatedly until the call that it is meant for has returned.
 int32_t resultAfter(std::future<int32_t>& result, const std::function<void()>& act) {
     while (!isReady(result)) {
         act();
@@ -35,7 +35,7 @@ int32_t resultAfter(std::future<int32_t>& result, const std::function<void()>& a
 }
 
 // Returns when a call waits to write to a device that another session reads: from then on a
-// reader that is ready to wait has to stand behind it.
+// reader that is ready to wait has to queue after it.
 void awaitWriterInQueue(const char* device) {
     constexpr double patience = 0.05;
     Session reader;
@@ -88,7 +88,7 @@ TEST(WaitTest, AReservationWaitsForAllItsDevices) {
     EXPECT_EQ(result.get(), 0);
 }
 
-TEST(WaitTest, GivingUpWriteAccessLetsWaitingReadersIn) {
+TEST(WaitTest, ReleasingWriteAccessAdmitsWaitingReaders) {
     Session holder("Mod1", 3);
     Session other;
     auto result = reserveLater(other, "Mod1", 1);
@@ -133,7 +133,7 @@ TEST(WaitTest, ClosingEndsTheWaitsOfTheSession) {
 
 TEST(WaitTest, WaitsAreServedInTheOrderOfArrival) {
     Session holder("Mod1,Mod2,Mod4,Mod5", 1);
-    // Each wants the same device, and one more by which its arrival is seen.
+    // Each wants the same device, and one more that shows its arrival.
     const std::array<const char*, 3> wanted{"Mod1,Mod2", "Mod1,Mod4", "Mod1,Mod5"};
     const std::array<const char*, 3> signs{"Mod2", "Mod4", "Mod5"};
     std::mutex mutex;
@@ -157,7 +157,7 @@ TEST(WaitTest, WaitsAreServedInTheOrderOfArrival) {
 }
 
 // A session that wants two devices is not passed by those that want one of them.
-TEST(WaitTest, WhoeverWaitsForTwoDevicesIsNotOvertaken) {
+TEST(WaitTest, ASessionThatWaitsForTwoDevicesIsNotOvertaken) {
     Session early("Mod1,Mod4", 1);
     Session late("Mod2");
     std::mutex mutex;
@@ -182,7 +182,7 @@ TEST(WaitTest, WhoeverWaitsForTwoDevicesIsNotOvertaken) {
     EXPECT_EQ(order, (std::vector<int>{1, 2}));
 }
 
-TEST(WaitTest, WhoeverGivesUpWaitingDoesNotHoldUpThoseBehind) {
+TEST(WaitTest, AWaitThatTimesOutDoesNotBlockLaterOnes) {
     Session holder("Mod1", 1);
     Session marker("Mod4", 1);
     Session first;
@@ -197,7 +197,7 @@ TEST(WaitTest, WhoeverGivesUpWaitingDoesNotHoldUpThoseBehind) {
     EXPECT_EQ(goesOn.get(), 0);
 }
 
-TEST(WaitTest, OtherSessionsGoOnWhileOneWaits) {
+TEST(WaitTest, OtherSessionsWorkWhileOneWaits) {
     Session holder("Mod1", 1);
     Session waiting;
     auto result = reserveLater(waiting, "Mod1");
@@ -269,7 +269,7 @@ TEST(WaitTest, AbortEndsACommandWithoutItsEffect) {
     EXPECT_EQ(execute(session, "Mod1", "DMM.Trigger", 0.0), 0);
 }
 
-TEST(WaitTest, AResourceCarriesOutOneCommandAtATime) {
+TEST(WaitTest, AResourceRunsOneCommandAtATime) {
     Session session("Mod1,Mod4");
     auto result = std::async(std::launch::async,
                              [&] { return execute(session, "Mod1", "DMM.Calibrate", longTime); });
@@ -300,8 +300,8 @@ TEST(WaitTest, ClosingEndsACommand) {
     EXPECT_EQ(execute(next, "Mod1", "DMM.Trigger", 0.0), 0);
 }
 
-// Sessions read, write, rename and come and go at the same time.
-TEST(WaitTest, SessionsOfAllKindsWorkSideBySide) {
+// Sessions read, write, rename, open and close at the same time.
+TEST(WaitTest, SessionsOfAllKindsWorkConcurrently) {
     constexpr int rounds = 40;
     std::vector<std::future<int>> workers;
     const auto start = [&](const std::function<int32_t(Session&)>& act) {

@@ -1,4 +1,4 @@
-"""The loader of chassis descriptions as a process that is asked again and again."""
+"""The loader of chassis descriptions as a process that answers many queries."""
 
 import json
 import os
@@ -11,7 +11,7 @@ BUILD = Path(os.environ.get("QITRMC_BUILD_DIR", REPOSITORY / "build" / "dev"))
 CHASSIS = REPOSITORY / "simulator" / "chassis"
 
 
-# Far more than a description takes: it only ends a loader that would never end.
+# Far more time than a description takes: it only ends a loader that hangs.
 PATIENCE_SECONDS = 30
 
 FAULTS = (BUILD / "bin" / "simulator_load_probe", "faults")
@@ -32,7 +32,7 @@ class LoadProbe:
             assert probe.load('{"devices": []}') is None
             assert probe.load("{}") == ("/devices", "is missing; must be an array of devices")
 
-    A loader that does not come to an end is killed, and its description fails the test.
+    A loader that hangs is killed, and its description fails the test.
     """
 
     def __init__(self, command=(BUILD / "bin" / "simulator_load_probe",),

@@ -1,6 +1,6 @@
-"""What the loader says of the mistakes that people make when they write a chassis file by hand.
+"""What the loader reports for mistakes that people make when they write a chassis file by hand.
 
-Each row is a mistake, the description, the place that must be named, and two pieces of the words:
+Each row is a mistake, the description, the place that must be named, and two parts of the message:
 what is wrong, and what would be right.
 """
 
@@ -100,7 +100,7 @@ SYNTAX = [
 
 @pytest.mark.parametrize("text, wrong, right", [row[1:] for row in SYNTAX],
                          ids=[row[0] for row in SYNTAX])
-def test_a_mistake_in_the_syntax_is_told_with_its_line(probe, text, wrong, right):
+def test_a_mistake_in_the_syntax_is_reported_with_its_line(probe, text, wrong, right):
     pointer, words = probe.load(text)
     assert pointer == ""
     assert wrong in words and right in words.split("; ", 1)[1], words
@@ -243,17 +243,17 @@ CONTENT = [
 
 @pytest.mark.parametrize("text, place, wrong, right", [row[1:] for row in CONTENT],
                          ids=[row[0] for row in CONTENT])
-def test_a_mistake_in_the_content_is_told_with_its_place(probe, text, place, wrong, right):
+def test_a_mistake_in_the_content_is_reported_with_its_place(probe, text, place, wrong, right):
     pointer, words = probe.load(text)
     assert pointer == place
     assert wrong in words.split("; ", 1)[0] and right in words.split("; ", 1)[1], words
 
 
-def test_a_byte_order_mark_does_no_harm(probe):
+def test_a_byte_order_mark_is_skipped(probe):
     assert probe.load('{"devices": []}'.encode("utf-8-sig")) is None
 
 
-def test_a_message_stays_in_one_line(probe):
+def test_a_message_is_one_line(probe):
     pointer, words = probe.load('{"devices": [], "a\\nb": 1}')
     assert pointer == "/a?b"
     pointer, words = probe.load('{"devices": [{"name": "a\\nb", "category": 1}]}')

@@ -84,7 +84,7 @@ def members_described(node, path="schema"):
                 yield from members_described(child, f"{path}/{name}")
 
 
-def test_the_schema_is_one_and_tells_of_every_member():
+def test_the_schema_is_valid_and_describes_every_member():
     jsonschema.Draft7Validator.check_schema(SCHEMA)
     told = dict(members_described({name: value for name, value in SCHEMA.items()}))
     assert len(told) > 40
@@ -183,7 +183,7 @@ SOUND = [
 
 
 @pytest.mark.parametrize("description", SOUND, ids=json.dumps)
-def test_both_take_what_is_sound(probe, description):
+def test_both_accept_valid_descriptions(probe, description):
     assert probe.load(description) is None
     assert follows_schema(description)
 
@@ -282,7 +282,7 @@ BROKEN = [
 
 
 @pytest.mark.parametrize("description", BROKEN, ids=json.dumps)
-def test_both_refuse_what_is_broken(probe, description):
+def test_both_refuse_invalid_descriptions(probe, description):
     assert probe.load(description) is not None
     assert not follows_schema(description)
 
@@ -322,7 +322,7 @@ def test_some_rules_are_left_to_the_loader(probe, rule):
 
 @settings(SETTINGS, max_examples=40)
 @given(description=descriptions(moving=True))
-def test_any_sound_description_loads(probe, description):
+def test_any_valid_description_loads(probe, description):
     assert probe.load(description) is None
     VALIDATOR.validate(description)
 
