@@ -22,8 +22,8 @@ INSTANTIATE_TEST_SUITE_P(Faults, EachExtent,
 
 enum class Outcome { done, refused, outOfMemory };
 
-// Runs `action` with a fault at its first allocation, its second and so on, until there is none
-// left. `check` gets each outcome.
+// Runs `action` with a fault at its first allocation, then at its second and so on, until all its
+// allocations have failed once. `check` gets each outcome.
 template <typename Action, typename Check>
 void withFaultAtEachAllocation(AllocationFault::Extent extent, Action action, Check check) {
     constexpr int limit = 20000;
@@ -58,7 +58,7 @@ class ValidationUnderFaults : public EachExtent {
             GetParam(), [&] { validator.validate(*request); },
             [&](Outcome outcome, bool struck) {
                 EXPECT_TRUE(outcome == expected || (struck && outcome == Outcome::outOfMemory));
-                EXPECT_EQ(undisturbed, refusalOf([&] { validator.validate(*request); }));
+                EXPECT_EQ(refusalOf([&] { validator.validate(*request); }), undisturbed);
             });
     }
 };
@@ -89,7 +89,7 @@ TEST_P(ValidationUnderFaults, ARequestIsRefusedOrRunsOutOfMemory) {
                         Outcome::refused);
 }
 
-TEST_P(EachExtent, ASingleRequestIsTakenOrLeftWhole) {
+TEST_P(EachExtent, ASingleRequestIsTakenOverCompletelyOrNotAtAll) {
     JsonDocument document;
     document.Parse(R"({"jsonrpc":"2.0","id":1,"method":"aMethodWithANameBeyondAShortString"})");
     withFaultAtEachAllocation(
@@ -118,8 +118,8 @@ TEST_P(EachExtent, JsonTextsAreParsedCopiedAndWrittenOrRunOutOfMemory) {
         });
 }
 
-// The JSON library loses what it has compiled so far when the memory for the rest is missing. That
-// can only happen at the start of the service, which then fails.
+// The JSON library leaks what it has compiled so far when memory for the rest runs out. That can
+// only happen at the start of the service, which then fails.
 TEST_P(EachExtent, AValidatorIsBuiltOrRunsOutOfMemory) {
 #if defined(__SANITIZE_ADDRESS__)
     __lsan::ScopedDisabler expected;

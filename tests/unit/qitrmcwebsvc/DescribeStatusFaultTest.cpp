@@ -21,7 +21,7 @@ constexpr const char* details =
     "\"usage\":\"kUsageTypeName\",\"value\":[\"a name\",\"b\"],\"value_type\":\"string\"}]},"
     "\"nested_error\":[{\"code\":-1,\"translator\":\"mxlator_qitrmc\"},{\"code\":-1}]}";
 
-// What there is to read when no search of a file and no module fails, and when some do.
+// The text when no search of a file and no module fails, and the texts when some do.
 const char* const wholeText =
     "A text beyond a short string.  Name: a name, b     A text beyond a short string.     A text "
     "beyond a short string.";
@@ -30,8 +30,8 @@ const std::regex anyText(
     "a name, b     (A text beyond a short string\\.|Error description not found)     A text beyond "
     "a short string\\.");
 
-// Lets each allocation of a description fail, those of its files and directories too: of C++, of
-// the statuses, of the interpreter and of the C library.
+// Makes each allocation of a description fail in turn: those of C++, of the statuses, of the
+// interpreter, and of the C library for files and directories.
 class DescribeStatusFaultTest : public testing::TestWithParam<std::uint64_t> {
   protected:
     DescribeStatusFaultTest() {
@@ -44,8 +44,7 @@ class DescribeStatusFaultTest : public testing::TestWithParam<std::uint64_t> {
     }
     ~DescribeStatusFaultTest() override { FaultyAllocator::succeed(); }
 
-    // Describes once with a fault at the request `number` and the ones behind it. Returns whether
-    // there is such a request.
+    // Describes once with faults from request `number` on. Returns whether there is such a request.
     bool describe(std::uint64_t number, std::uint64_t count) {
         std::string text;
         std::int32_t failure = 0;
@@ -82,17 +81,17 @@ INSTANTIATE_TEST_SUITE_P(Extents, DescribeStatusFaultTest,
                              return extent.param == 1 ? "One" : "AllFromThere";
                          });
 
-TEST_P(DescribeStatusFaultTest, EachFaultGivesATextOrAnException) {
+TEST_P(DescribeStatusFaultTest, EachFaultResultsInATextOrAnException) {
     const std::int64_t blocks = FaultyAllocator::liveBlocks();
     std::uint64_t requests = 0;
     while (describe(requests, GetParam()) && !HasFailure()) {
-        EXPECT_EQ(blocks, FaultyAllocator::liveBlocks()) << "request " << requests;
+        EXPECT_EQ(FaultyAllocator::liveBlocks(), blocks) << "request " << requests;
         ++requests;
     }
     EXPECT_LT(100u, requests);
-    // Of C++, of the sessions and texts, of the interpreter, and of the files of the default
+    // Those of C++, of the sessions and texts, of the interpreter, and for the files of the default
     // translator.
-    EXPECT_EQ((std::set<std::int32_t>{badAlloc, -52000, -52003, -52006, 0}), failures);
+    EXPECT_EQ(failures, (std::set<std::int32_t>{badAlloc, -52000, -52003, -52006, 0}));
 }
 
 }  // namespace

@@ -15,7 +15,7 @@ namespace {
 
 using nQITRMCWEBSVC100::describeStatus;
 
-// What a client reads, made by the translators of the service.
+// The texts for clients, made by the translators of the service.
 class DescribeStatusTest : public testing::Test {
   protected:
     ~DescribeStatusTest() override { FaultyAllocator::succeed(); }
@@ -39,40 +39,40 @@ class DescribeStatusTest : public testing::Test {
 };
 
 TEST_F(DescribeStatusTest, ASuccessHasNoText) {
-    EXPECT_EQ("", describe(0));
+    EXPECT_EQ(describe(0), "");
 }
 
 TEST_F(DescribeStatusTest, EachLineFeedBecomesABlank) {
     explain("One.\n\nTwo.");
-    EXPECT_EQ("One.  Two.", describe(-1));
-    EXPECT_EQ("One.  Two.     One.        Two.",
-              describe(-1, "{\"nested_error\":{\"code\":-1,\"nested_error\":[]}}"));
+    EXPECT_EQ(describe(-1), "One.  Two.");
+    EXPECT_EQ(describe(-1, "{\"nested_error\":{\"code\":-1,\"nested_error\":[]}}"),
+              "One.  Two.     One.        Two.");
 }
 
 TEST_F(DescribeStatusTest, DetailsAndNestedErrorsAreShownAndTheDebugSectionIsNot) {
     explain("Text.");
-    EXPECT_EQ("Text.  Name: a, b     Text.        Line Number: 7",
-              describe(-1,
+    EXPECT_EQ(describe(-1,
                        "{\"file\":\"secret.cpp\",\"line\":12,\"translator\":\"mxlator_qitrmc\","
                        "\"translator_info\":{\"ordered_data\":[{\"type\":\"usage\",\"usage\":"
                        "\"kUsageTypeName\",\"value\":[\"a\",\"b\"],\"value_type\":\"string\"}]},"
                        "\"nested_error\":[{\"code\":-1,\"translator\":\"mxlator_qitrmc\","
                        "\"translator_info\":{\"ordered_data\":[{\"type\":\"usage\",\"usage\":"
-                       "\"kUsageTypeLineNumber\",\"value\":7,\"value_type\":\"uint32_t\"}]}}]}"));
+                       "\"kUsageTypeLineNumber\",\"value\":7,\"value_type\":\"uint32_t\"}]}}]}"),
+              "Text.  Name: a, b     Text.        Line Number: 7");
 }
 
 TEST_F(DescribeStatusTest, EveryTranslatorGetsEnglishAndTheSecondEnvironment) {
     TestXlator xlator("watched");
     xlator.descriptions[-1] = "Watched text.";
-    EXPECT_EQ("Watched text.", describe(-1, "{\"translator\":\"watched\"}"));
+    EXPECT_EQ(describe(-1, "{\"translator\":\"watched\"}"), "Watched text.");
     EXPECT_THAT(xlator.calls, testing::Contains("static -1 512"));
 }
 
-TEST_F(DescribeStatusTest, EachByteThatIsNoUtf8BecomesTheReplacementCharacter) {
+TEST_F(DescribeStatusTest, EachByteThatIsNotUtf8BecomesTheReplacementCharacter) {
     explain("a\xFF\xC3(\xE2\x82 \xED\xA0\x80 caf\xC3\xA9");
     const std::string bad = "\xEF\xBF\xBD";
-    EXPECT_EQ("a" + bad + bad + "(" + bad + bad + " " + bad + bad + bad + " caf\xC3\xA9",
-              describe(-1));
+    EXPECT_EQ(describe(-1),
+              "a" + bad + bad + "(" + bad + bad + " " + bad + bad + bad + " caf\xC3\xA9");
 }
 
 TEST_F(DescribeStatusTest, AFailedTranslationIsThrownWithItsStatus) {
@@ -80,18 +80,18 @@ TEST_F(DescribeStatusTest, AFailedTranslationIsThrownWithItsStatus) {
         describe(-1);
         FAIL() << "there are no explanation files";
     } catch (const qierr::Exception& error) {
-        EXPECT_EQ(-52006, error.status()->code);
+        EXPECT_EQ(error.status()->code, -52006);
         EXPECT_NE(std::string::npos, std::string(error.what()).find("open dir failed"));
     }
 }
 
-TEST_F(DescribeStatusTest, ASessionThatCannotBeMadeIsThrown) {
+TEST_F(DescribeStatusTest, AFailureToCreateASessionIsThrown) {
     FaultyAllocator::failAt(0);
     try {
         describe(-1);
         FAIL() << "there is no session";
     } catch (const qierr::Exception& error) {
-        EXPECT_EQ(-52000, error.status()->code);
+        EXPECT_EQ(error.status()->code, -52000);
     }
 }
 
@@ -113,21 +113,21 @@ std::string describeInFlight(const qierr_Status& status) {
     return text;
 }
 
-TEST_F(DescribeStatusTest, WhileAnExceptionIsInFlightAFailureIsDroppedAndTheTextStaysAsItIs) {
+TEST_F(DescribeStatusTest, WhileAnExceptionIsInFlightAFailureIsDroppedAndTheTextIsUnchanged) {
     qierr::Status status;
     qierr_Status_setCode(&status, -1);
-    EXPECT_EQ("", describeInFlight(status));
+    EXPECT_EQ(describeInFlight(status), "");
     explain("Text.");
     qierr_Status_setJson(&status, "{\"nested_error\":5}");
-    EXPECT_EQ("Text.", describeInFlight(status));
+    EXPECT_EQ(describeInFlight(status), "Text.");
 }
 
-TEST_F(DescribeStatusTest, WantOfASessionWhileAnExceptionIsInFlightIsNoCrash) {
+TEST_F(DescribeStatusTest, WhileAnExceptionIsInFlightAFailureToCreateASessionIsDropped) {
     explain("Text.");
     qierr::Status status;
     qierr_Status_setCode(&status, -1);
     FaultyAllocator::failAt(0);
-    EXPECT_EQ("", describeInFlight(status));
+    EXPECT_EQ(describeInFlight(status), "");
 }
 
 }  // namespace

@@ -20,7 +20,7 @@ TEST(ExponentGuard, LeavesATextWithoutLongExponentsUntouched) {
     EXPECT_FALSE(withSafeExponents("e-"));
 }
 
-TEST(ExponentGuard, LowersAnExponentOfTenDigitsOrMoreAtItsOldLength) {
+TEST(ExponentGuard, LowersAnExponentOfTenDigitsOrMoreAndKeepsItsLength) {
     EXPECT_EQ(guarded("0.0000000001e-2147483639"), "0.0000000001e-0999999999");
     EXPECT_EQ(guarded("[1E-99999999999999,2]"), "[1E-00000999999999,2]");
 }
@@ -34,12 +34,12 @@ TEST(ExponentGuard, KeepsNineDigits) {
     EXPECT_FALSE(withSafeExponents("1e-123456789"));
 }
 
-TEST(ExponentGuard, LeavesStringsAloneWithTheirEscapes) {
+TEST(ExponentGuard, DoesNotChangeStringsWithEscapes) {
     const std::string text = R"({"e-9999999999":"\"e-9999999999\\","n":1e-9999999999})";
     EXPECT_EQ(guarded(text), R"({"e-9999999999":"\"e-9999999999\\","n":1e-0999999999})");
 }
 
-TEST(ExponentGuard, EndsAtAnUnfinishedString) {
+TEST(ExponentGuard, StopsAtAnUnfinishedString) {
     EXPECT_EQ(guarded("1e-9999999999 \"e-9999999999\\"), "1e-0999999999 \"e-9999999999\\");
 }
 

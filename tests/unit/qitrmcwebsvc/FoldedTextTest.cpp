@@ -13,7 +13,7 @@ TEST(EqualFolded, ComparesLettersWithoutCase) {
     EXPECT_FALSE(equalFolded("Mod1", "Mod2"));
 }
 
-TEST(EqualFolded, LetsOneLetterStandForSeveral) {
+TEST(EqualFolded, AcceptsOneLetterForSeveral) {
     EXPECT_TRUE(equalFolded("Stra\u00dfe", "STRASSE"));
     EXPECT_TRUE(equalFolded("\ufb03", "ffi"));
     EXPECT_TRUE(equalFolded("\u0390", "\u03b9\u0308\u0301"));
@@ -21,7 +21,7 @@ TEST(EqualFolded, LetsOneLetterStandForSeveral) {
     EXPECT_FALSE(equalFolded("ff", "\ufb03"));
 }
 
-TEST(EqualFolded, GoesOnAfterAsciiThatOnlyOneOfTheTextsHas) {
+TEST(EqualFolded, ComparesAsciiLettersWithOthersThatFoldToThem) {
     EXPECT_TRUE(equalFolded("10 \u212a", "10 k"));  // the sign of kelvins folds to k
     EXPECT_TRUE(equalFolded("MA\ufb03x", "maFFIX"));
     EXPECT_FALSE(equalFolded("MA\ufb03x", "maFFIY"));
@@ -35,13 +35,13 @@ TEST(EqualFolded, DoesNotFoldAccentsOrWidths) {
     EXPECT_FALSE(equalFolded("\u00e9", "e\u0301"));
 }
 
-TEST(EqualFolded, TellsAPrefixFromTheWhole) {
+TEST(EqualFolded, DistinguishesAPrefixFromTheWholeText) {
     EXPECT_FALSE(equalFolded("Mod1", "Mod"));
     EXPECT_FALSE(equalFolded("", "M"));
     EXPECT_TRUE(equalFolded("", ""));
 }
 
-TEST(EqualFolded, TakesBytesThatAreNoUtf8AsThemselves) {
+TEST(EqualFolded, ComparesBytesThatAreNotUtf8Unchanged) {
     EXPECT_TRUE(equalFolded("a\xff", "A\xff"));
     EXPECT_FALSE(equalFolded("a\xff", "A\xfe"));
     EXPECT_FALSE(equalFolded("\xc3", "\u00c3"));

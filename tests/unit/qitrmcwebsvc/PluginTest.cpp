@@ -66,7 +66,7 @@ TEST_F(PluginTest, IsDisabledBeforeItIsInitialised) {
     EXPECT_EQ(run(), disabled);
 }
 
-TEST_F(PluginTest, IsDisabledWithoutAPositiveSwitch) {
+TEST_F(PluginTest, IsDisabledWithoutAPositiveSetting) {
     for (const char* configuration :
          {"", "[WebService]\n", "[WebService]\nEnable=\n", "[WebService]\nEnable=0\n",
           "[WebService]\nEnable=True\n", "[WebService]\nEnable=-1\n", "[Other]\nEnable=1\n",
@@ -79,7 +79,7 @@ TEST_F(PluginTest, IsDisabledWithoutAPositiveSwitch) {
     EXPECT_FALSE(isServed());
 }
 
-TEST_F(PluginTest, IsEnabledByAnyPositiveSwitch) {
+TEST_F(PluginTest, IsEnabledByAnyPositiveSetting) {
     for (const char* configuration :
          {"[WebService]\nEnable=1\n", "[WebService]\nEnable = 7 \n", "[webservice]\nENABLE=1",
           "[WebService]\nEnable=\"1\"\n", "\xef\xbb\xbf[WebService]\r\nEnable=1\r\n",
@@ -96,7 +96,7 @@ TEST_F(PluginTest, ServesARequest) {
                             "\"_session1\"}}"));
 }
 
-TEST_F(PluginTest, GoesOnServingWhilePaused) {
+TEST_F(PluginTest, KeepsServingWhilePaused) {
     initialiseEnabled();
     request.body = "1";
     qitrmcPause();
@@ -144,7 +144,7 @@ TEST_F(PluginTest, CutsABodyAtItsFirstNul) {
     EXPECT_EQ(run(), served(refusedRoot));
 }
 
-TEST_F(PluginTest, RefusesOtherTransportsBeforeItLooksAtTheMethod) {
+TEST_F(PluginTest, RefusesOtherTransportsBeforeItChecksTheMethod) {
     initialiseEnabled();
     const Lines refused = {"code 404", "write Only HTTP protocol is supported."};
     request.variables["REQUEST_METHOD"] = "GET";
@@ -156,7 +156,7 @@ TEST_F(PluginTest, RefusesOtherTransportsBeforeItLooksAtTheMethod) {
     EXPECT_EQ(run(), refused);
 }
 
-TEST_F(PluginTest, RefusesOtherMethodsBeforeItLooksAtTheEntry) {
+TEST_F(PluginTest, RefusesOtherMethodsBeforeItChecksTheEntry) {
     initialiseEnabled();
     const Lines refused = {"code 404", "write Only HTTP POST request is supported."};
     entry.name = U"Other";
@@ -184,7 +184,7 @@ TEST_F(PluginTest, ServesTheEntryInAnyCaseAndNoOther) {
     }
 }
 
-TEST_F(PluginTest, AnswersAnUnreadableBodyWithABareCode) {
+TEST_F(PluginTest, AnswersAnUnreadableBodyWithAStatusCodeOnly) {
     initialiseEnabled();
     request.bodyReadable = false;
     EXPECT_EQ(run(), Lines{"code 400"});
@@ -195,7 +195,7 @@ TEST_F(PluginTest, AnswersAnUnreadableBodyWithABareCode) {
     EXPECT_EQ(run(), Lines{"code 400"});
 }
 
-TEST_F(PluginTest, AnswersAnErrorThatCannotBePutIntoWordsWithABareCode) {
+TEST_F(PluginTest, AnswersAnErrorThatCannotBeDescribedWithAStatusCodeOnly) {
     initialiseEnabled();
     request.body = "1";
     plainDescriptions::failNext(1);
@@ -203,7 +203,7 @@ TEST_F(PluginTest, AnswersAnErrorThatCannotBePutIntoWordsWithABareCode) {
     EXPECT_EQ(run(), served(refusedRoot));
 }
 
-TEST_F(PluginTest, LetsAnExceptionThatIsNoStdExceptionReachTheServer) {
+TEST_F(PluginTest, LetsAnExceptionThatIsNotAStdExceptionReachTheServer) {
     constexpr ws_EntryOperations throwing = {nullptr, nullptr, nullptr,
                                              [](const ws_Entry*) -> ws_WideString { throw 5; }};
     initialiseEnabled();
@@ -212,7 +212,7 @@ TEST_F(PluginTest, LetsAnExceptionThatIsNoStdExceptionReachTheServer) {
     EXPECT_EQ(request.done, Lines{});
 }
 
-TEST_F(PluginTest, AnswersWithABareCodeWhenItHasNoHandlerAlthoughItIsSwitchedOn) {
+TEST_F(PluginTest, AnswersWithAStatusCodeOnlyWhenItIsEnabledButHasNoHandler) {
     initialiseEnabled();
     qitrmcFinalize();
     EXPECT_EQ(run(), Lines{"code 500"});
@@ -227,7 +227,7 @@ TEST_F(PluginTest, ReplacesItsHandlerAndAllSessionsWhenInitialisedAgain) {
     EXPECT_EQ(driver.takeCalls(), Calls{"closeSession(1)"});
 }
 
-TEST_F(PluginTest, KeepsItsHandlerAliveWhenSwitchedOffUntilFinalised) {
+TEST_F(PluginTest, KeepsItsHandlerWhenDisabledUntilFinalised) {
     initialiseEnabled();
     request.body = "{\"jsonrpc\":\"2.0\",\"id\":1,\"method\":\"initializeSession\"}";
     run();

@@ -10,7 +10,7 @@ namespace {
 using Names = std::set<std::string>;
 using PropertyNamesTest = ProcedureFixture;
 
-TEST_F(PropertyNamesTest, AreSortedAndLeaveTheHiddenOnesOut) {
+TEST_F(PropertyNamesTest, AreSortedWithoutTheHiddenOnes) {
     EXPECT_EQ(propertyNames(7, PropertyCategory::System),
               (Names{"Sys.Delay", "Sys.Devices", "Sys.Simulated", "Sys.Ticks"}));
     EXPECT_EQ(propertyNames(7, PropertyCategory::Session),
@@ -28,7 +28,7 @@ TEST_F(PropertyNamesTest, AreSortedAndLeaveTheHiddenOnesOut) {
                "freeStringArray(1)"}));
 }
 
-TEST_F(PropertyNamesTest, HideTwelveNamesInEveryList) {
+TEST_F(PropertyNamesTest, OmitTwelveNamesFromEveryList) {
     const Texts hidden = {"Dev.AddedToLocalConfig",
                           "Dev.Events",
                           "Dev.TCPIP.LastConnectedEthernetIP",
@@ -52,13 +52,13 @@ TEST_F(PropertyNamesTest, HideTwelveNamesInEveryList) {
     EXPECT_FALSE(isPropertyName(7, PropertyCategory::NvmemArea, "Dev.TCPIP.Hostname"));
 }
 
-TEST_F(PropertyNamesTest, AreReadAnewEachTime) {
+TEST_F(PropertyNamesTest, AreReadAgainEachTime) {
     EXPECT_FALSE(isPropertyName(7, PropertyCategory::PhysChan, "PhysChan.New"));
     give("getSystemPropertyStringArray(7, \"Sys.PhysChanProperties\")", Texts{"PhysChan.New"});
     EXPECT_TRUE(isPropertyName(7, PropertyCategory::PhysChan, "PhysChan.New"));
 }
 
-TEST_F(PropertyNamesTest, FailAsTheDriverRefusesAndGiveTheListBack) {
+TEST_F(PropertyNamesTest, FailWithTheDriversErrorAndFreeTheList) {
     RecordingDriver::Reply refusal;
     refusal.value = Texts{"Sys.Delay"};
     refusal.code = -250844;
@@ -67,7 +67,7 @@ TEST_F(PropertyNamesTest, FailAsTheDriverRefusesAndGiveTheListBack) {
     EXPECT_EQ(driver.calls().back(), "freeStringArray(1)");
 }
 
-TEST_F(PropertyNamesTest, OfANumberThatIsNoCategoryAreAnInternalError) {
+TEST_F(PropertyNamesTest, OfAnUnknownCategoryAreAnInternalError) {
     for (const std::int32_t number : {0, 6, -1}) {
         try {
             propertyNames(7, static_cast<PropertyCategory>(number));

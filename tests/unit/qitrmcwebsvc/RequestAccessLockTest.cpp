@@ -17,8 +17,8 @@ using nQITRMCWEBSVC100::ExclusiveAccess;
 using nQITRMCWEBSVC100::RequestAccessLock;
 using nQITRMCWEBSVC100::SharedAccess;
 
-// How many of the next waits end at once, without a notification, as any wait may. This program is
-// linked with --wrap for std::condition_variable::wait.
+// How many of the next waits end at once without a notification, which the standard allows. This
+// program is linked with --wrap for std::condition_variable::wait.
 static std::atomic<int> spuriousWakeUps{0};
 
 extern "C" {
@@ -38,7 +38,7 @@ void __wrap__ZNSt18condition_variable4waitERSt11unique_lockISt5mutexE(
 
 namespace {
 
-// Callers that take the lock on threads of their own and hold it until they are told to leave.
+// Callers that take the lock on threads of their own and hold it until released by the test.
 class Caller {
   public:
     enum Mode { Shared, Exclusive };
@@ -57,7 +57,7 @@ class Caller {
         while (!entered)
             ::sched_yield();
     }
-    // Holding the lock is waiting too.
+    // A caller that holds the lock is blocked in a wait too.
     bool waitUntilBlocked() const { return thread.waitUntilBlocked(); }
     void leave() {
         if (!leaving)
@@ -92,7 +92,7 @@ TEST(RequestAccessLock, MakesAnExclusiveCallerWaitForASharedHolder) {
     batch.waitUntilIn();
 }
 
-TEST(RequestAccessLock, HoldsOffSharedCallersThatComeAfterAWaitingExclusiveOne) {
+TEST(RequestAccessLock, DelaysSharedCallersThatComeAfterAWaitingExclusiveOne) {
     RequestAccessLock lock;
     Caller holder(lock, Caller::Shared);
     holder.waitUntilIn();
@@ -109,7 +109,7 @@ TEST(RequestAccessLock, HoldsOffSharedCallersThatComeAfterAWaitingExclusiveOne) 
     late.waitUntilIn();
 }
 
-TEST(RequestAccessLock, LetsAnExclusiveCallerInAtTheFirstSharedReleaseBesideTheSecondHolder) {
+TEST(RequestAccessLock, AdmitsAnExclusiveCallerAtTheFirstSharedReleaseBesideTheSecondHolder) {
     RequestAccessLock lock;
     Caller first(lock, Caller::Shared);
     first.waitUntilIn();
@@ -121,7 +121,7 @@ TEST(RequestAccessLock, LetsAnExclusiveCallerInAtTheFirstSharedReleaseBesideTheS
     batch.waitUntilIn();  // the second holder has not left
 }
 
-TEST(RequestAccessLock, LetsASecondBatchInWhenASharedHolderLeavesBesideTheRunningOne) {
+TEST(RequestAccessLock, AdmitsASecondBatchBesideTheRunningOneWhenASharedHolderLeaves) {
     RequestAccessLock lock;
     auto first = std::make_unique<Caller>(lock, Caller::Shared);
     first->waitUntilIn();
@@ -148,7 +148,7 @@ TEST(RequestAccessLock, KeepsTwoBatchesApartWhenNoSharedHolderLeaves) {
     second.waitUntilIn();
 }
 
-TEST(RequestAccessLock, TestsAgainAfterASharedCallerWokeWithoutBeingNotified) {
+TEST(RequestAccessLock, ASharedCallerChecksAgainAfterASpuriousWakeup) {
     RequestAccessLock lock;
     Caller batch(lock, Caller::Exclusive);
     batch.waitUntilIn();

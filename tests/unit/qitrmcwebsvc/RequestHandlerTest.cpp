@@ -26,7 +26,7 @@ class RequestHandlerTest : public DriverTest {
 
     std::string answer(const std::string& body) { return handler->handleRequest(body); }
 
-    // A response with a standing code, whose text shows code and details.
+    // A response with a JSON-RPC error code, whose text shows code and details.
     static std::string refusal(const std::string& id, const std::string& code,
                                const std::string& details) {
         return "{\"jsonrpc\":\"2.0\",\"id\":" + id + ",\"error\":{\"code\":" + code +
@@ -64,12 +64,12 @@ TEST_F(RequestHandlerTest, ReportsABodyThatIsNotJson) {
                           std::to_string(open.size())));
 }
 
-TEST_F(RequestHandlerTest, RefusesRootsThatAreNoRequest) {
+TEST_F(RequestHandlerTest, RefusesRootsThatAreNotRequests) {
     for (const char* root : {"1", "\"text\"", "true", "null", "[]"})
         EXPECT_EQ(answer(root), refusal("null", "-32600", "")) << root;
 }
 
-TEST_F(RequestHandlerTest, ComplainsAboutTheIdFirst) {
+TEST_F(RequestHandlerTest, ChecksTheIdFirst) {
     EXPECT_EQ(answer("{}"), invalid("null", "id"));
     EXPECT_EQ(answer("{\"jsonrpc\":1,\"method\":2,\"params\":3}"), invalid("null", "id"));
 }
@@ -103,13 +103,13 @@ TEST_F(RequestHandlerTest, FindsMethodsByTheirExactNameOnly) {
                   refusal("1", "-32601", std::string(" kUsageTypeMethod=") + method));
 }
 
-TEST_F(RequestHandlerTest, RefusesParamsThatAreNoObject) {
+TEST_F(RequestHandlerTest, RefusesParamsThatAreNotAnObject) {
     EXPECT_EQ(
         answer("{\"jsonrpc\":\"2.0\",\"id\":1,\"method\":\"initializeSession\",\"params\":[]}"),
         invalid("1", "params"));
 }
 
-TEST_F(RequestHandlerTest, GivesAMissingParamsToTheProcedureAsAnEmptyObject) {
+TEST_F(RequestHandlerTest, PassesMissingParamsToTheProcedureAsAnEmptyObject) {
     EXPECT_EQ(answer("{\"jsonrpc\":\"2.0\",\"id\":1,\"method\":\"closeSession\"}"),
               refusal("1", "-32602",
                       " kUsageTypeParameter=#/params kUsageTypeDetails=The following parameter(s)"
@@ -143,7 +143,7 @@ TEST_F(RequestHandlerTest, StopsABatchAtAnEnvelopeFaultToo) {
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 
-TEST_F(RequestHandlerTest, MakesTheWordsForAllSkippedElementsOnce) {
+TEST_F(RequestHandlerTest, DescribesAllSkippedElementsOnce) {
     std::string body = "[{}";
     std::string expected = "[" + invalid("null", "id");
     for (int id = 0; id < 50; ++id) {
@@ -175,19 +175,19 @@ TEST_F(RequestHandlerTest, ServesTheNextRequestAfterAFailure) {
     EXPECT_EQ(answer(open), opened("1", "_session1"));
 }
 
-TEST_F(RequestHandlerTest, AnswersOnceForAllWhenAFailureCannotBePutIntoWords) {
+TEST_F(RequestHandlerTest, AnswersOnceForAllWhenAFailureCannotBeDescribed) {
     plainDescriptions::failNext(1);
     EXPECT_EQ(answer("[" + open + ",{},{}]"), wrapped("null", "-52006", ""));
     EXPECT_EQ(answer(open), opened("1", "_session1"));
 }
 
-TEST_F(RequestHandlerTest, ThrowsWhenNotEvenThatCanBePutIntoWords) {
+TEST_F(RequestHandlerTest, ThrowsWhenThatFailureCannotBeDescribedEither) {
     plainDescriptions::failNext(2);
     EXPECT_THROW(answer("{}"), std::exception);
     EXPECT_EQ(answer(open), opened("1", "_session1"));
 }
 
-TEST_F(RequestHandlerTest, PrintsWhatIsNoNumberToJsonAsNull) {
+TEST_F(RequestHandlerTest, PrintsNumbersThatJsonCannotRepresentAsNull) {
     answer(open);
     driver.give("getSystemPropertyStringArray(1, \"Sys.Devices\")", Calls{"A"});
     driver.give("openGenericProperty", std::uint64_t{8});

@@ -77,7 +77,7 @@ TEST_F(RequestResourceTest, RefusesABadRangeWithItsText) {
               unknown + "Mod1/ch4:1");
 }
 
-TEST_F(RequestResourceTest, LosesNoNamesBehindANul) {
+TEST_F(RequestResourceTest, KeepsNamesAfterANul) {
     EXPECT_EQ(failureOf([] { read("{\"devices\":\"Mod1\\u0000,Mod2\"}"); }), unknown + "Mod1");
     EXPECT_EQ(failureOf([] { read("{\"devices\":[\"Mod2\",\"\\u0000\",\"Mod1\"]}"); }), unknown);
     EXPECT_EQ(failureOf([] { check("{\"device\":\"Mod1\\u0000\"}"); }), unknown + "Mod1");
@@ -100,7 +100,7 @@ TEST_F(RequestResourceTest, ReadsAListForEachChannelAndArea) {
                      "freeStringArray(1)"}));
 }
 
-TEST_F(RequestResourceTest, TakesTheDeviceFromBeforeTheFirstSlash) {
+TEST_F(RequestResourceTest, UsesTheTextBeforeTheFirstSlashAsTheDevice) {
     driver.give("getGenericPropertyStringArray(7, \"Mod1\", \"Dev.PhysChans\")",
                 Calls{"Mod1/a/b0"});
     EXPECT_EQ(check("{\"physical_channel\":\"Mod1/a/b0\"}").names(), Calls{"Mod1/a/b0"});
@@ -124,7 +124,7 @@ TEST_F(RequestResourceTest, ReportsAnUnreadableListAsAnUnknownName) {
     EXPECT_EQ(failureOf([] { check("{\"device\":\"Mod1\"}"); }), unknown + "Mod1");
 }
 
-TEST_F(RequestResourceTest, PassesTokensOverEvenWhenTheListIsUnreadable) {
+TEST_F(RequestResourceTest, AcceptsTokensEvenWhenTheListIsUnreadable) {
     driver.fail("getSystemPropertyStringArray(7, \"Sys.Devices\")", -12);
     for (const char* token : {"$ConnectedDevices", "$DefaultDevices", "$DefaultNVMEMAreas",
                               "$DefaultPhysChans", "$ReservedDevices"})
@@ -133,7 +133,7 @@ TEST_F(RequestResourceTest, PassesTokensOverEvenWhenTheListIsUnreadable) {
               unknown + "$reserveddevices");
 }
 
-TEST_F(RequestResourceTest, LooksUpNoTokenAmongChannels) {
+TEST_F(RequestResourceTest, DoesNotLookUpTokensAmongChannels) {
     check("{\"physical_channels\":\"$DefaultPhysChans\"}");
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
@@ -143,7 +143,7 @@ TEST_F(RequestResourceTest, IgnoresCaseAndPassesTheNameOnAsRequested) {
     EXPECT_EQ(check("{\"physical_channels\":\"Mod1/CH0:1\"}").joinedNames(), "Mod1/CH0:1");
 }
 
-TEST_F(RequestResourceTest, TakesTheSessionsDefaultsWithoutAskingTheDriver) {
+TEST_F(RequestResourceTest, UsesTheSessionsDefaultsWithoutCallingTheDriver) {
     const std::pair<ResourceKind, Calls> defaults[] = {
         {ResourceKind::None, {}},
         {ResourceKind::Device, {"$DefaultDevices"}},
@@ -164,7 +164,7 @@ TEST_F(RequestResourceTest, AppliesNoDefaultToAnEmptyArray) {
     EXPECT_EQ(resource.joinedNames(), "");
 }
 
-TEST_F(RequestResourceTest, LimitsHowManyNamesRangesMayMake) {
+TEST_F(RequestResourceTest, LimitsHowManyNamesRangesExpandTo) {
     std::string parts = "Mod1/ch0:1023";
     for (int i = 0; i < 100; ++i)
         parts += ",Mod1/ch0:1023";

@@ -40,7 +40,7 @@ std::string nested(const std::string& open, int depth, const std::string& close)
     return text;
 }
 
-TEST(RequestText, TellsWhatIsWrongAndWhere) {
+TEST(RequestText, ReportsWhatIsWrongAndWhere) {
     EXPECT_EQ(failureOf(""), failure("The document is empty.", 0));
     EXPECT_EQ(failureOf("  \n"), failure("The document is empty.", 3));
     EXPECT_EQ(failureOf("{} x"),
@@ -76,7 +76,7 @@ TEST(RequestText, RefusesNumbersTooBigForADoubleInEveryForm) {
     EXPECT_EQ(failureOf("[1e308]"), "parsed");
 }
 
-TEST(RequestText, TakesAnExponentFarBelowZeroAsZero) {
+TEST(RequestText, ReadsANumberWithAnExponentFarBelowZeroAsZero) {
     JsonDocument document;
     parseRequestText("[0.0000000001e-2147483639,-1e-99999999999]", document);
     EXPECT_EQ(document[0].GetDouble(), 0.0);
@@ -164,7 +164,7 @@ TEST(RequestText, RefusesNestingBeyondTheLimit) {
               failure("Terminate parsing due to Handler error.", 5 + maxNesting));
 }
 
-TEST(RequestText, CountsNestingAndNotContainers) {
+TEST(RequestText, CountsLevelsOfNestingAndNotContainers) {
     std::string manyFlatOnes = "[";
     for (int i = 0; i < 2 * maxNesting; ++i)
         manyFlatOnes += "[{}],";

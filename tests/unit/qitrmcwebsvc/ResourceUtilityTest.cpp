@@ -9,7 +9,8 @@ namespace {
 
 class ResourceUtilityTest : public ProcedureFixture {
   protected:
-    // What the check says of these resources: "true", "false", or the failure's code and details.
+    // The result of the check for these resources: "true", "false", or the failure's code and
+    // details.
     std::string isChassis(const std::string& params) {
         JsonDocument document;
         document.Parse(params.c_str());

@@ -10,9 +10,9 @@
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-// That the blocks left behind are freed is for the leak checker to see.
+// The leak checker verifies that the remaining blocks are freed.
 
-TEST(RunMemory, FreesWhatIsLeftBehindAndWhatIsGivenBack) {
+TEST(RunMemory, FreesRemainingAndReturnedBlocks) {
     RunMemory memory;
     void* const first = memory.Malloc(10);
     void* const second = memory.Malloc(20);
@@ -21,7 +21,7 @@ TEST(RunMemory, FreesWhatIsLeftBehindAndWhatIsGivenBack) {
     std::memset(third, 3, 30);
     RunMemory::Free(second);
     RunMemory::Free(nullptr);
-    EXPECT_EQ(3, static_cast<char*>(third)[29]);
+    EXPECT_EQ(static_cast<char*>(third)[29], 3);
 }
 
 TEST(RunMemory, KeepsTheContentOfABlockThatGrows) {
@@ -31,22 +31,22 @@ TEST(RunMemory, KeepsTheContentOfABlockThatGrows) {
     std::memcpy(block, "12345678", 8);
     memory.Malloc(8);
     block = memory.Realloc(block, 8, 100000);
-    EXPECT_EQ(0, std::memcmp(block, "12345678", 8));
+    EXPECT_EQ(std::memcmp(block, "12345678", 8), 0);
     block = memory.Realloc(block, 100000, 4);
-    EXPECT_EQ(0, std::memcmp(block, "1234", 4));
+    EXPECT_EQ(std::memcmp(block, "1234", 4), 0);
 }
 
-TEST(RunMemory, GivesNullForNoBytes) {
+TEST(RunMemory, ReturnsNullForNoBytes) {
     RunMemory memory;
-    EXPECT_EQ(nullptr, memory.Malloc(0));
-    EXPECT_EQ(nullptr, memory.Realloc(memory.Malloc(5), 5, 0));
+    EXPECT_EQ(memory.Malloc(0), nullptr);
+    EXPECT_EQ(memory.Realloc(memory.Malloc(5), 5, 0), nullptr);
 }
 
 TEST(RunMemory, AlignsBlocksForAnyType) {
     RunMemory memory;
     for (std::size_t size : {1, 3, 17})
-        EXPECT_EQ(
-            0u, reinterpret_cast<std::uintptr_t>(memory.Malloc(size)) % alignof(std::max_align_t));
+        EXPECT_EQ(reinterpret_cast<std::uintptr_t>(memory.Malloc(size)) % alignof(std::max_align_t),
+                  0u);
 }
 
 TEST(RunMemory, RefusesASizeBeyondTheAddressSpace) {

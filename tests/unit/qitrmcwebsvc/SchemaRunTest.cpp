@@ -44,7 +44,7 @@ std::string fragment(const JsonPointer& pointer) {
     return buffer.GetString();
 }
 
-// The outcome when the validator is shown the whole request by the JSON library itself.
+// The outcome when the JSON library itself passes the whole request to the validator.
 std::string outcomeOfFullWalk(const Schema& schema, const JsonValue& request) {
     rapidjson::GenericSchemaValidator<JsonSchemaDocument> validator(*schema);
     if (request.Accept(validator))
@@ -62,7 +62,7 @@ std::string outcomeOfRun(const Schema& schema, const JsonValue& request) {
     return failure.documentPointer + " " + failure.schemaPointer + " " + failure.keyword;
 }
 
-// Makes requests of which many get past the first checks, with containers at all depths.
+// Makes requests of which many pass the first checks, with containers at all depths.
 class RequestMaker {
   public:
     explicit RequestMaker(std::vector<std::string> names) : names(std::move(names)) {}
@@ -110,8 +110,8 @@ class RequestMaker {
 
 class SchemaRunOf : public testing::TestWithParam<const char*> {};
 
-// The run shows deep containers as null: that must never change what comes out.
-TEST_P(SchemaRunOf, ComesOutAsAFullWalkWould) {
+// The run replaces deep containers by null, which must never change the outcome.
+TEST_P(SchemaRunOf, HasTheOutcomeOfAFullWalk) {
     const Schema schema(GetParam());
     RequestMaker maker(schema.parameterNames());
     std::set<std::string> outcomes;
@@ -124,7 +124,7 @@ TEST_P(SchemaRunOf, ComesOutAsAFullWalkWould) {
         ASSERT_EQ(outcomeOfFullWalk(schema, request), outcome) << text;
         outcomes.insert(outcome);
     }
-    // More outcomes than parameters, or the requests would prove little.
+    // There must be more outcomes than parameters, or the requests would prove little.
     EXPECT_GT(outcomes.size(), schema.parameterNames().size());
 }
 
@@ -135,8 +135,8 @@ INSTANTIATE_TEST_SUITE_P(Schemas, SchemaRunOf,
                                          "procedure_read_register.json",
                                          "procedure_initialize_session.json"));
 
-// A value that is nested a million times costs hours where each level costs a look at all others,
-// and overflows the call stack where each level is a call.
+// A value that is nested a million times would take hours if each level cost a look at all others,
+// and would overflow the call stack if each level were a call.
 JsonValue nested(int levels, JsonPool& pool) {
     JsonValue value(rapidjson::kArrayType);
     for (int i = 0; i < levels; ++i) {
@@ -148,7 +148,7 @@ JsonValue nested(int levels, JsonPool& pool) {
     return value;
 }
 
-TEST(SchemaRun, IsQuickOnDeeplyNestedValues) {
+TEST(SchemaRun, IsFastOnDeeplyNestedValues) {
     constexpr int levels = 1000000;
     const Schema schema("procedure_set_property.json");
     JsonDocument request;
@@ -156,10 +156,10 @@ TEST(SchemaRun, IsQuickOnDeeplyNestedValues) {
     JsonPool& pool = request.GetAllocator();
 
     request.AddMember("unknown", nested(levels, pool), pool);
-    EXPECT_EQ("#/params #/properties/params required", outcomeOfRun(schema, request));
+    EXPECT_EQ(outcomeOfRun(schema, request), "#/params #/properties/params required");
 
     request["params"].AddMember("value", nested(levels, pool), pool);
-    EXPECT_EQ("#/params/value #/definitions/property_value oneOf", outcomeOfRun(schema, request));
+    EXPECT_EQ(outcomeOfRun(schema, request), "#/params/value #/definitions/property_value oneOf");
 }
 
 TEST(SchemaRun, AcceptsAMemberOfTheRootThatIsDeeplyNested) {
@@ -167,7 +167,7 @@ TEST(SchemaRun, AcceptsAMemberOfTheRootThatIsDeeplyNested) {
     JsonDocument request;
     request.Parse(R"({"params":{}})");
     request.AddMember("unknown", nested(1000000, request.GetAllocator()), request.GetAllocator());
-    EXPECT_EQ("accepted", outcomeOfRun(schema, request));
+    EXPECT_EQ(outcomeOfRun(schema, request), "accepted");
 }
 
 }  // namespace

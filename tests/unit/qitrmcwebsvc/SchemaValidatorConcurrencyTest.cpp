@@ -33,7 +33,7 @@ const std::vector<Case>& cases() {
     return all;
 }
 
-TEST(SchemaValidator, AnswersSeveralThreadsAtOnceAsItAnswersOne) {
+TEST(SchemaValidator, HasTheSameResultsOnSeveralThreadsAsOnOne) {
     constexpr int threadCount = 4;
     constexpr int rounds = 500;
     SchemaValidator validator(embeddedText("procedure_read_register.json"));
@@ -60,10 +60,10 @@ TEST(SchemaValidator, AnswersSeveralThreadsAtOnceAsItAnswersOne) {
         threads.emplace_back(work, i);
     for (std::thread& thread : threads)
         thread.join();
-    EXPECT_EQ(0, wrong);
+    EXPECT_EQ(wrong, 0);
 }
 
-TEST(SchemaValidator, OfSeveralMethodsWorkSideBySide) {
+TEST(SchemaValidator, OfSeveralMethodsWorkConcurrently) {
     SchemaValidator first(embeddedText("procedure_close_session.json"));
     SchemaValidator second(embeddedText("procedure_abort_session.json"));
     std::atomic<int> wrong{0};
@@ -78,7 +78,7 @@ TEST(SchemaValidator, OfSeveralMethodsWorkSideBySide) {
     std::thread other(work, std::ref(first), "closeSession");
     work(second, "abortSession");
     other.join();
-    EXPECT_EQ(0, wrong);
+    EXPECT_EQ(wrong, 0);
 }
 
 }  // namespace

@@ -9,7 +9,7 @@ namespace {
 
 class SessionManagerMemoryTest : public DriverTest {};
 
-TEST_F(SessionManagerMemoryTest, RemembersTheAccessOfAReservationWhenMemoryIsGoneBehindIt) {
+TEST_F(SessionManagerMemoryTest, RemembersTheAccessOfAReservationWhenMemoryRunsOutAfterIt) {
     SessionManager manager;
     driver.give("initializeSessionWithoutResources", std::uint64_t{1});
     manager.createSession();

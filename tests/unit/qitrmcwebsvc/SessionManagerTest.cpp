@@ -16,7 +16,8 @@ namespace {
 
 class SessionManagerTest : public DriverTest {
   protected:
-    // Ends the manager, which closes what is open, before the driver is asked what it lent.
+    // Destroys the manager, which closes the open sessions, before the driver's lent memory is
+    // checked.
     void TearDown() override {
         manager.reset();
         DriverTest::TearDown();
@@ -54,7 +55,7 @@ TEST_F(SessionManagerTest, OpensASessionWithoutResources) {
     EXPECT_EQ(context->driverSession, 1u);
 }
 
-TEST_F(SessionManagerTest, WidensAHandleWithItsSign) {
+TEST_F(SessionManagerTest, SignExtendsAHandle) {
     EXPECT_EQ(openBare(2147483649u), "_session18446744071562067969");
     EXPECT_EQ(openBare(2147483647u), "_session2147483647");
 }
@@ -93,7 +94,7 @@ TEST_F(SessionManagerTest, RefusesAHandleOfZero) {
               "BasicError: -250833 kUsageTypeSessionId=_session0");
 }
 
-TEST_F(SessionManagerTest, PassesADriverRefusalOnAndListsNothing) {
+TEST_F(SessionManagerTest, PassesADriverErrorOnAndAddsNoSession) {
     driver.reply("initializeSessionWithDevices", {std::uint64_t{5}, -7, "{\"line\":1}"});
     EXPECT_EQ(
         failureOf([&] { manager->createSession(ResourceKind::Device, {"Mod1"}, 3, "", 0, false); }),
@@ -126,7 +127,7 @@ TEST_F(SessionManagerTest, KeepsASessionThatTheDriverDoesNotClose) {
     EXPECT_EQ(manager->getSessionContext("_session4")->driverSession, 4u);
 }
 
-TEST_F(SessionManagerTest, LeavesTheRecordToThoseWhoStillUseIt) {
+TEST_F(SessionManagerTest, KeepsTheRecordOfAClosedSessionWhileItIsUsed) {
     openBare(4);
     const auto context = manager->getSessionContext("_session4");
     manager->closeSession("_session4");
@@ -140,7 +141,7 @@ TEST_F(SessionManagerTest, LimitsSessionsWithResourcesOnly) {
     EXPECT_EQ(openBare(102), "_session102");
 }
 
-TEST_F(SessionManagerTest, MakesRoomByForceBeforeItCounts) {
+TEST_F(SessionManagerTest, DisplacesSessionsByForceBeforeItChecksTheLimit) {
     for (std::uint64_t handle = 1; handle <= 100; ++handle)
         openOnDevices(handle, {"Mod" + std::to_string(handle)});
     holds(7, {"Mod7"});
@@ -152,7 +153,7 @@ TEST_F(SessionManagerTest, MakesRoomByForceBeforeItCounts) {
     EXPECT_EQ(failureOf([&] { openOnDevices(102, {"Mod102"}); }), "BasicError: -250901");
 }
 
-TEST_F(SessionManagerTest, NamesTheWritersThatHoldATakenDeviceInKeyOrder) {
+TEST_F(SessionManagerTest, NamesTheWritersThatHoldAReservedDeviceInKeyOrder) {
     for (std::uint64_t handle : {9, 10, 11, 12}) {
         openOnDevices(handle, {"Mod1"}, handle == 11 ? 1 : 3);
         holds(handle, {"Mod0", "Mod1"});
@@ -170,7 +171,7 @@ TEST_F(SessionManagerTest, NamesTheWritersThatHoldATakenDeviceInKeyOrder) {
                      reservedDevicesOf(9), "freeStringArray(2)"}));
 }
 
-TEST_F(SessionManagerTest, AddsItsReportBehindTheDriversOwnDetails) {
+TEST_F(SessionManagerTest, AddsItsReportAfterTheDriversOwnDetails) {
     openOnDevices(1, {"Mod1"});
     holds(1, {"Mod1"});
     driver.fail("initializeSessionWithDevices", -250811,
@@ -206,7 +207,7 @@ TEST_F(SessionManagerTest, ListsHoldersByTheirLatestAccess) {
         "Exception: -250811 kUsageTypeReservedBySessions=[\"_session1\"]");
 }
 
-TEST_F(SessionManagerTest, AsksNoSessionWhatItHoldsWhenNoDeviceIsNamed) {
+TEST_F(SessionManagerTest, ReadsNoReservationsWhenNoDeviceIsNamed) {
     openOnDevices(1, {"Mod1"});
     driver.takeCalls();
     EXPECT_EQ(openOnDevices(2, {}, 3, true), "_session2");
@@ -217,7 +218,7 @@ TEST_F(SessionManagerTest, AsksNoSessionWhatItHoldsWhenNoDeviceIsNamed) {
                                          "reserveDevices(1, \"\", 3, \"\", 0)"}));
 }
 
-TEST_F(SessionManagerTest, CountsASessionThatCannotAnswerAsHoldingNothing) {
+TEST_F(SessionManagerTest, TreatsASessionWithUnreadableReservationsAsHoldingNothing) {
     openOnDevices(1, {"Mod1"});
     driver.reply(reservedDevicesOf(1), {Calls{"Mod1"}, -3});
     driver.fail("initializeSessionWithDevices", -250811);
@@ -242,7 +243,7 @@ TEST_F(SessionManagerTest, DisplacesReadersAndWritersByForce) {
                "initializeSessionWithDevices(\"Mod1\", 60, 3, \"\", 0)"}));
 }
 
-TEST_F(SessionManagerTest, StopsDisplacingAtTheFirstRefusalAndKeepsTheRest) {
+TEST_F(SessionManagerTest, StopsDisplacingAtTheFirstErrorAndKeepsTheRest) {
     for (std::uint64_t handle : {1, 2, 3}) {
         openOnDevices(handle, {"Mod1"});
         holds(handle, {"Mod1"});
@@ -268,7 +269,7 @@ TEST_F(SessionManagerTest, ComparesChannelsAndAreasByTheirDevice) {
     manager->createSession(ResourceKind::NvmemArea, {"Mod1"}, 3, "", 0, true);
 }
 
-TEST_F(SessionManagerTest, ComparesNamesOfDevicesWhole) {
+TEST_F(SessionManagerTest, ComparesCompleteNamesOfDevices) {
     openOnDevices(1, {"Rack"});
     holds(1, {"Rack"});
     openOnDevices(2, {"Rack/Mod1"});
@@ -309,7 +310,7 @@ TEST_F(SessionManagerTest, ReservesDevicesAndRemembersTheAccess) {
     EXPECT_EQ(manager->getSessionContext("_session1")->defaultResourceKind, ResourceKind::None);
 }
 
-TEST_F(SessionManagerTest, ReportsConflictsOfAReservationByWholeNamesTheAskerIncluded) {
+TEST_F(SessionManagerTest, ReportsConflictsOfAReservationByCompleteNamesIncludingItsOwnSession) {
     openOnDevices(1, {"Mod1"});
     openOnDevices(2, {"Mod2"});
     holds(1, {"Mod1"});
@@ -353,7 +354,7 @@ TEST_F(SessionManagerTest, RefusesReservationsForUnknownSessions) {
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 
-TEST_F(SessionManagerTest, ClosesWhatIsLeftInKeyOrderAtItsEndAndIgnoresRefusals) {
+TEST_F(SessionManagerTest, ClosesTheRemainingSessionsInKeyOrderAtItsEndAndIgnoresErrors) {
     for (std::uint64_t handle : {9, 10, 11})
         openBare(handle);
     driver.fail("closeSession(10)", -1);
@@ -381,7 +382,7 @@ class SessionTableTest : public SessionManagerTest {
         openOnDevices(2, {"Mod2"});
     }
 
-    // Whether a look-up of another session waits while `work` is inside this driver call.
+    // Whether looking up another session blocks while `work` is inside this driver call.
     bool holdsLookUpsUp(const std::string& driverCall, const Work& work) {
         std::promise<void> inside, leave;
         driver.reply(driverCall, {std::uint64_t{3}, 0, {}, [&] {

@@ -11,7 +11,7 @@ const std::string readNames = "getSystemPropertyStringArray(7, \"Sys.";
 
 class SessionPropertyTest : public ProcedureFixture {
   protected:
-    // The resources that params of this text name.
+    // The resources in params with this text.
     static RequestResource resources(const std::string& params) {
         JsonDocument document;
         document.Parse(params.c_str());
@@ -22,7 +22,7 @@ class SessionPropertyTest : public ProcedureFixture {
         return SessionProperty(session, name, resources(params));
     }
 
-    // What keeps the property from being opened: code and details, as ProcedureFixture words them.
+    // The failure to open the property: code and details, in the form of ProcedureFixture.
     std::string refusal(const std::string& name, const std::string& params = "{}") {
         return refusalOf([&] { open(name, params); });
     }
@@ -47,7 +47,7 @@ void expectHolds(const std::string& text, const std::string& part) {
 
 // ---- Category and opening -----------------------------------------------------------------------
 
-TEST_F(SessionPropertyTest, ASessionPropertyIgnoresTheDeviceThatComesWithIt) {
+TEST_F(SessionPropertyTest, ASessionPropertyIgnoresADeviceInTheRequest) {
     giveDataType(12);
     const SessionProperty property = open("Session.ReservedDevices", R"({"devices":"Mod1"})");
     EXPECT_EQ(property.category(), PropertyCategory::Session);
@@ -59,12 +59,12 @@ TEST_F(SessionPropertyTest, ASessionPropertyIgnoresTheDeviceThatComesWithIt) {
                      "getPropertyPropertyInt32(21, \"Prop.DataType\")"}));
 }
 
-TEST_F(SessionPropertyTest, SessionNamesWinOverSystemNames) {
+TEST_F(SessionPropertyTest, SessionNamesTakePrecedenceOverSystemNames) {
     give(readNames + "SystemProperties\")", Texts{"Session.Timeout"});
     EXPECT_EQ(open("Session.Timeout").category(), PropertyCategory::Session);
 }
 
-TEST_F(SessionPropertyTest, SystemNamesWinOverResources) {
+TEST_F(SessionPropertyTest, SystemNamesTakePrecedenceOverResources) {
     const SessionProperty property = open("Sys.Delay", R"({"devices":"Mod1"})");
     EXPECT_EQ(property.category(), PropertyCategory::System);
     EXPECT_TRUE(property.isDriverDefined());
@@ -91,7 +91,7 @@ TEST_F(SessionPropertyTest, APropertyInNoListIsOpenedOnTheFirstResource) {
     EXPECT_EQ(driver.calls()[6], "openGenericProperty(7, \"Mod2\", \"Dev.Own\")");
 }
 
-TEST_F(SessionPropertyTest, TheKindOfTheResourcesDecidesAboutOtherNames) {
+TEST_F(SessionPropertyTest, TheKindOfTheResourcesDeterminesTheCategoryOfOtherNames) {
     EXPECT_EQ(open("PhysChan.Range", R"({"physical_channels":"Mod1/ch0"})").category(),
               PropertyCategory::PhysChan);
     EXPECT_EQ(open("NVMEM.Size", R"({"nvmem_areas":"Mod1/user"})").category(),
@@ -100,7 +100,7 @@ TEST_F(SessionPropertyTest, TheKindOfTheResourcesDecidesAboutOtherNames) {
     EXPECT_FALSE(open("Dev.Name", R"({"physical_channel":"Mod1/ch0"})").isDriverDefined());
 }
 
-TEST_F(SessionPropertyTest, AHiddenNameIsFoundInNoListAndSoNeedsResources) {
+TEST_F(SessionPropertyTest, AHiddenNameIsInNoListAndSoNeedsResources) {
     const std::string text = refusal("Session.Language");
     expectHolds(text, "-32602 ");
     expectHolds(text,
@@ -119,13 +119,13 @@ TEST_F(SessionPropertyTest, NamesAreComparedByteForByte) {
     expectHolds(refusal("session.timeout"), "-32602 ");
 }
 
-TEST_F(SessionPropertyTest, AnUnknownNameWithADeviceFailsAsTheDriverRefusesIt) {
+TEST_F(SessionPropertyTest, AnUnknownNameWithADeviceFailsWithTheDriversError) {
     fail("openGenericProperty", -250820, R"({"from":"driver"})");
     EXPECT_EQ(refusal("Dev.Nothing", R"({"devices":"Mod1"})"), R"(-250820 {"from":"driver"})");
     EXPECT_EQ(driver.calls().back(), "openGenericProperty(7, \"Mod1\", \"Dev.Nothing\")");
 }
 
-TEST_F(SessionPropertyTest, TheHandleIsClosedAtTheEndAndWhatThatReportsIsDropped) {
+TEST_F(SessionPropertyTest, TheHandleIsClosedAtTheEndAndItsStatusIsDropped) {
     fail("closeProperty", -250999);
     open("Dev.Name", R"({"devices":"Mod1"})");
     EXPECT_EQ(driver.calls().back(), "closeProperty(21)");
@@ -178,7 +178,7 @@ INSTANTIATE_TEST_SUITE_P(AllTokens, SessionPropertyTokenTest,
                                          TokenCase{"$DefaultPhysChans", "Session.DefaultPhysChans"},
                                          TokenCase{"$ReservedDevices", "Session.ReservedDevices"}));
 
-TEST_F(SessionPropertyTest, ATokenThatStandsForNothingLeavesAnEmptyListAndOneResourcesRules) {
+TEST_F(SessionPropertyTest, ATokenForNoResourcesLeavesAnEmptyListWithTheRulesOfOneResource) {
     give("getSessionPropertyStringArray(7, \"Session.ReservedDevices\")", Texts{});
     giveDataType(3);
     const SessionProperty property = open("Dev.Own", R"({"devices":"$ReservedDevices"})");
@@ -196,7 +196,7 @@ TEST_F(SessionPropertyTest, EmptyNamesAreDropped) {
     EXPECT_EQ(driver.calls()[6], "openGenericProperty(7, \"Mod2\", \"Dev.Own\")");
 }
 
-TEST_F(SessionPropertyTest, TokensOfASessionPropertyAreLeftAlone) {
+TEST_F(SessionPropertyTest, TokensOfASessionPropertyAreNotReplaced) {
     open("Session.Timeout", R"({"devices":"$ReservedDevices"})");
     for (const std::string& call : driver.calls())
         EXPECT_EQ(call.find("getSessionPropertyStringArray"), std::string::npos) << call;
@@ -236,7 +236,7 @@ TEST_F(SessionPropertyTest, EachArrayTypeOnTwoDevicesIsRefusedWithTheirNames) {
     }
 }
 
-TEST_F(SessionPropertyTest, ATypeThatIsNoneIsNeitherScalarNorArrayAndStaysAsItIs) {
+TEST_F(SessionPropertyTest, AnUnknownTypeIsNeitherScalarNorArrayAndIsUnchanged) {
     for (const std::int32_t number : {-1, 0, 15, 100}) {
         giveDataType(number);
         const SessionProperty property = open("Dev.Own", R"({"devices":"Mod1,Mod2"})");
@@ -251,7 +251,7 @@ TEST_F(SessionPropertyTest, ASessionPropertyIsNotSpreadOverDevices) {
     EXPECT_EQ(open("Session.ReservedDevices", R"({"devices":"Mod1,Mod2"})").dataType(), 12);
 }
 
-TEST_F(SessionPropertyTest, ChannelsGoToTheDriverInTheirShortForm) {
+TEST_F(SessionPropertyTest, ChannelsArePassedToTheDriverInTheirShortForm) {
     giveDataType(2);
     const SessionProperty property =
         open("PhysChan.Range", R"({"physical_channels":["Mod1/ch0:1","Mod1/ch2"]})");

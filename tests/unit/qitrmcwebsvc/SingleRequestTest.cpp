@@ -16,7 +16,7 @@ std::string textOf(const JsonValue& value) {
     return {buffer.GetString(), buffer.GetSize()};
 }
 
-// Also expects a refused value to stay as it was, and an accepted one to be taken.
+// Also expects a refused value to be unchanged, and an accepted one to be taken over.
 std::optional<Refusal> refusalOfText(const std::string& text) {
     JsonDocument document;
     document.Parse(text.data(), text.size());
@@ -27,7 +27,7 @@ std::optional<Refusal> refusalOfText(const std::string& text) {
     return refusal;
 }
 
-TEST(SingleRequest, TakesASoundRequestOver) {
+TEST(SingleRequest, TakesAValidRequestOver) {
     const std::string text =
         R"({"jsonrpc":"2.0","id":7,"method":"closeSession","params":{"session_id":"_session1"}})";
     JsonDocument document;
@@ -35,68 +35,68 @@ TEST(SingleRequest, TakesASoundRequestOver) {
     const SingleRequest request(document);
 
     EXPECT_TRUE(document.IsNull());
-    EXPECT_EQ("closeSession", request.getMethod());
-    EXPECT_EQ(R"({"session_id":"_session1"})", textOf(request.getParams()));
+    EXPECT_EQ(request.getMethod(), "closeSession");
+    EXPECT_EQ(textOf(request.getParams()), R"({"session_id":"_session1"})");
     EXPECT_EQ(text, textOf(request.getRequest()));
 }
 
 TEST(SingleRequest, RefusesWhatIsNotAnObjectOrIsEmptyWithoutDetails) {
     for (const char* text : {"null", "true", "1", "\"text\"", "[]", "[1]", "{}"})
-        EXPECT_EQ((Refusal{-32600, ""}), refusalOfText(text)) << text;
+        EXPECT_EQ(refusalOfText(text), (Refusal{-32600, ""})) << text;
 }
 
-TEST(SingleRequest, RefusesAnAbsentOrUnfitId) {
-    EXPECT_EQ(invalidMember("id"), refusalOfText(R"({"params":{}})"));
+TEST(SingleRequest, RefusesAMissingOrInvalidId) {
+    EXPECT_EQ(refusalOfText(R"({"params":{}})"), invalidMember("id"));
     for (const char* id : {"null", "true", "1.5", "1.0", "1e0", "2147483648", "-2147483649",
                            "99999999999999999999", "[]", "{}"}) {
-        EXPECT_EQ(invalidMember("id"),
-                  refusalOfText(std::string(R"({"jsonrpc":"2.0","method":"m","id":)") + id + "}"))
+        EXPECT_EQ(refusalOfText(std::string(R"({"jsonrpc":"2.0","method":"m","id":)") + id + "}"),
+                  invalidMember("id"))
             << id;
     }
 }
 
 TEST(SingleRequest, AcceptsIntegersOf32BitsAndStringsAsIds) {
     for (const char* id : {"0", "-0", "2147483647", "-2147483648", "\"\"", "\"a\\u0000b\""}) {
-        EXPECT_EQ(std::nullopt,
-                  refusalOfText(std::string(R"({"jsonrpc":"2.0","method":"m","id":)") + id + "}"))
+        EXPECT_EQ(refusalOfText(std::string(R"({"jsonrpc":"2.0","method":"m","id":)") + id + "}"),
+                  std::nullopt)
             << id;
     }
 }
 
 TEST(SingleRequest, RefusesAnotherVersionThan20) {
-    EXPECT_EQ(invalidMember("jsonrpc"), refusalOfText(R"({"id":1,"method":"m"})"));
+    EXPECT_EQ(refusalOfText(R"({"id":1,"method":"m"})"), invalidMember("jsonrpc"));
     for (const char* version :
          {"2.0", "2", "null", "\"1.0\"", "\"2\"", "\"2.00\"", "\"\"", "\" 2.0\""}) {
-        EXPECT_EQ(invalidMember("jsonrpc"),
-                  refusalOfText(std::string(R"({"id":1,"method":"m","jsonrpc":)") + version + "}"))
+        EXPECT_EQ(refusalOfText(std::string(R"({"id":1,"method":"m","jsonrpc":)") + version + "}"),
+                  invalidMember("jsonrpc"))
             << version;
     }
 }
 
 TEST(SingleRequest, ReadsTheVersionUpToItsFirstNul) {
-    EXPECT_EQ(std::nullopt, refusalOfText(R"({"id":1,"method":"m","jsonrpc":"2.0\u0000x"})"));
+    EXPECT_EQ(refusalOfText(R"({"id":1,"method":"m","jsonrpc":"2.0\u0000x"})"), std::nullopt);
 }
 
-TEST(SingleRequest, RefusesAnAbsentOrUnfitMethod) {
-    EXPECT_EQ(invalidMember("method"), refusalOfText(R"({"id":1,"jsonrpc":"2.0"})"));
+TEST(SingleRequest, RefusesAMissingOrInvalidMethod) {
+    EXPECT_EQ(refusalOfText(R"({"id":1,"jsonrpc":"2.0"})"), invalidMember("method"));
     for (const char* method : {"null", "1", "[\"m\"]", "{}"}) {
-        EXPECT_EQ(invalidMember("method"),
-                  refusalOfText(std::string(R"({"id":1,"jsonrpc":"2.0","method":)") + method + "}"))
+        EXPECT_EQ(refusalOfText(std::string(R"({"id":1,"jsonrpc":"2.0","method":)") + method + "}"),
+                  invalidMember("method"))
             << method;
     }
 }
 
-TEST(SingleRequest, ComplainsOfIdThenVersionThenMethod) {
-    EXPECT_EQ(invalidMember("id"), refusalOfText(R"({"method":1,"jsonrpc":1,"id":null})"));
-    EXPECT_EQ(invalidMember("jsonrpc"), refusalOfText(R"({"method":1,"jsonrpc":1,"id":1})"));
+TEST(SingleRequest, ChecksIdThenVersionThenMethod) {
+    EXPECT_EQ(refusalOfText(R"({"method":1,"jsonrpc":1,"id":null})"), invalidMember("id"));
+    EXPECT_EQ(refusalOfText(R"({"method":1,"jsonrpc":1,"id":1})"), invalidMember("jsonrpc"));
 }
 
 TEST(SingleRequest, ComparesMemberNamesExactly) {
-    EXPECT_EQ(invalidMember("id"), refusalOfText(R"({"ID":1,"jsonrpc":"2.0","method":"m"})"));
-    EXPECT_EQ(invalidMember("id"), refusalOfText(R"({"id\u0000":1,"jsonrpc":"2.0","method":"m"})"));
+    EXPECT_EQ(refusalOfText(R"({"ID":1,"jsonrpc":"2.0","method":"m"})"), invalidMember("id"));
+    EXPECT_EQ(refusalOfText(R"({"id\u0000":1,"jsonrpc":"2.0","method":"m"})"), invalidMember("id"));
 }
 
-TEST(SingleRequest, SaysWhereItRefused) {
+TEST(SingleRequest, ReportsTheSourcePositionOfARefusal) {
     JsonDocument document;
     document.Parse("[]");
     try {
@@ -109,14 +109,14 @@ TEST(SingleRequest, SaysWhereItRefused) {
     }
 }
 
-TEST(SingleRequest, GivesTheMethodUpToItsFirstNul) {
+TEST(SingleRequest, ReturnsTheMethodUpToItsFirstNul) {
     const ParsedRequest request(R"({"jsonrpc":"2.0","id":1,"method":"ab\u0000c"})");
-    EXPECT_EQ("ab", (*request).getMethod());
+    EXPECT_EQ((*request).getMethod(), "ab");
     const ParsedRequest unnamed(R"({"jsonrpc":"2.0","id":1,"method":""})");
-    EXPECT_EQ("", (*unnamed).getMethod());
+    EXPECT_EQ((*unnamed).getMethod(), "");
 }
 
-TEST(SingleRequest, GivesParamsOfAnyTypeAndNullForNone) {
+TEST(SingleRequest, ReturnsParamsOfAnyTypeAndNullForMissingOnes) {
     for (const char* params : {"null", "5", "[1,2]", "{\"a\":1}"}) {
         const ParsedRequest request(requestText("m", params));
         EXPECT_EQ(params, textOf((*request).getParams()));

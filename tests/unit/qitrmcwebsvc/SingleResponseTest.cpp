@@ -58,13 +58,13 @@ TEST_F(SingleResponseTest, TakesAResult) {
     EXPECT_EQ(textOf(response.getValue()), "{\"jsonrpc\":\"2.0\",\"id\":null,\"result\":\"done\"}");
 }
 
-TEST_F(SingleResponseTest, MakesAnEmptyResultAnObject) {
+TEST_F(SingleResponseTest, TurnsAnEmptyResultIntoAnObject) {
     SingleResponse response(&pool);
     response.setEmptyResult();
     EXPECT_EQ(textOf(response.getValue()), "{\"jsonrpc\":\"2.0\",\"id\":null,\"result\":{}}");
 }
 
-TEST_F(SingleResponseTest, ShowsStandingCodesBare) {
+TEST_F(SingleResponseTest, ReportsJsonRpcCodesWithoutData) {
     for (const char* code : {"-32700", "-32603", "-32602", "-32601", "-32600", "-32000"})
         EXPECT_EQ(errorOf(std::stoi(code)),
                   std::string("{\"jsonrpc\":\"2.0\",\"id\":null,\"error\":{\"code\":") + code +
@@ -79,7 +79,7 @@ TEST_F(SingleResponseTest, WrapsEveryOtherCodePositiveOnesIncluded) {
                       code + ",\"qitrmc_message\":\"" + code + "\"}}}");
 }
 
-TEST_F(SingleResponseTest, AddsNothingWhenTheTextCannotBeMade) {
+TEST_F(SingleResponseTest, AddsNothingWhenTheStatusCannotBeDescribed) {
     for (int failing : {0, 1}) {
         SingleResponse response(&pool);
         qierr::Status status;

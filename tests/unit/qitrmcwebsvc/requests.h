@@ -11,7 +11,7 @@
 
 namespace nQITRMCWEBSVC100 {
 
-// What a throw site put into a status.
+// The code and details that a refusal put into a status.
 struct Refusal {
     std::int32_t code;
     std::string orderedData;  // the array's JSON text, "" when there is none
@@ -25,7 +25,7 @@ inline std::ostream& operator<<(std::ostream& stream, const Refusal& refusal) {
     return stream << refusal.code << " " << refusal.orderedData;
 }
 
-// The bytes of the details in a status text, which end it.
+// The bytes of the details in a status text, which are at its end.
 inline std::string orderedDataOf(const qierr_Status& status) {
     const std::string text = status.json ? status.json : "";
     const std::string opening = "\"translator_info\":{\"ordered_data\":";
@@ -36,7 +36,7 @@ inline std::string orderedDataOf(const qierr_Status& status) {
     return text.substr(first, text.size() - 2 - first);
 }
 
-// The refusal that `action` ends in, or nothing when it returns.
+// The refusal with which `action` ends, or nothing when it returns.
 template <typename Action>
 std::optional<Refusal> refusalOf(Action action) {
     try {
@@ -65,7 +65,7 @@ inline Refusal internalFault(const std::string& comment) {
     return {-250800, R"([{"type":"comment","comment":")" + comment + R"("}])"};
 }
 
-// A request and the document that holds it.
+// A request, with the document that owns it.
 class ParsedRequest {
   public:
     explicit ParsedRequest(const std::string& text) {

@@ -1,4 +1,4 @@
-"""What the plug-in is to the program that loads it: its exports and the libraries that it needs."""
+"""What the plug-in offers and needs as a library: its exports, and the libraries that it links."""
 
 import os
 import pathlib
@@ -14,7 +14,7 @@ def output(*command):
     return subprocess.run(command, check=True, capture_output=True, text=True).stdout
 
 
-def test_it_exports_its_entry_points_and_nothing_else():
+def test_the_library_exports_its_entry_points_and_nothing_else():
     listing = output("nm", "-D", "--defined-only", "--format=posix", PLUGIN)
     assert {line.split()[0] for line in listing.splitlines()} == {
         "qitrmcInit",
@@ -26,6 +26,6 @@ def test_it_exports_its_entry_points_and_nothing_else():
     }
 
 
-def test_it_needs_the_driver_and_the_web_runtime_by_name():
+def test_the_library_needs_the_driver_and_the_web_runtime_by_name():
     needed = re.findall(r"\(NEEDED\).*\[(.*)\]", output("readelf", "-d", PLUGIN))
     assert {"libqitrmcapi.so.1", "libws_runtime.so.13"} <= set(needed)

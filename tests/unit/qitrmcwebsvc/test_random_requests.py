@@ -1,4 +1,4 @@
-"""Holds the validators of all methods against the model of the parameters, on random requests."""
+"""Compares the validators of all methods with the model of the parameters, on random requests."""
 
 import json
 import os
@@ -23,7 +23,7 @@ VALUES = [
     [True, False], [0, 255], [0, 256], [-1], [None], [[]], [["a"]], {"a": 1}, {"a": {"b": []}},
 ]  # fmt: skip
 
-# A value that fits, by the name of the member.
+# A valid value, by the name of the member.
 FITTING = {
     "session_id": "_session12", "access": "ReadOnly", "force_reserve": True, "size": 16,
     "reservation_timeout": 2.5, "timeout": 0, "address": 4096, "slot_number": 1, "value": [1, 2],
@@ -78,7 +78,7 @@ def texts() -> dict:
 
 
 @pytest.mark.parametrize("method", METHODS, ids=lambda method: method.name)
-def test_validator_of_method_answers_as_the_model(method, texts):
+def test_validator_of_method_agrees_with_the_model(method, texts):
     source = random.Random(method.name)
     requests = [random_params(method, source) for _ in range(1500)]
     lines = [f"{method.file}\t{request_text(method, params)}\n" for params in requests]
@@ -90,6 +90,6 @@ def test_validator_of_method_answers_as_the_model(method, texts):
     assert len(answers) == len(expected)
     for line, want, got in zip(lines, expected, answers):
         assert got == want, line
-    # A good share of either kind, or the requests would prove little.
+    # There must be enough requests of either kind, or they would prove little.
     accepted = expected.count("accepted")
     assert 100 < accepted < len(expected) - 100

@@ -27,7 +27,7 @@ class ChassisTest : public ProcedureFixture {
         give("getGenericPropertyStringArray(7, \"Bench\", \"Dev.Modules\")", Texts{"Mod2", "Mod1"});
     }
 
-    // The calls that read one property of one device which the driver does not define.
+    // The calls that read one property, not defined by the driver, of one device.
     static Calls reading(const std::string& device, const std::string& property,
                          const Calls& read) {
         Calls calls = {"getSystemPropertyStringArray(7, \"Sys.SessionProperties\")",
@@ -94,7 +94,7 @@ TEST_F(ChassisTest, StopsAtTheFirstModuleInTheSlot) {
                       readingSlot("Mod2")}));
 }
 
-TEST_F(ChassisTest, AnEmptySlotIsNoError) {
+TEST_F(ChassisTest, AnEmptySlotIsNotAnError) {
     EXPECT_EQ(ask("getModuleName", R"("device":"Bench","slot_number":4294967295)"),
               R"({"present":false})");
 }
@@ -115,7 +115,7 @@ TEST_F(ChassisTest, AModuleWhoseSlotCannotBeReadFailsTheSearch) {
     EXPECT_EQ(driver.calls().back(), "closeProperty(22)");
 }
 
-TEST_F(ChassisTest, AModuleThatTheDriverDoesNotKnowFailsTheSearch) {
+TEST_F(ChassisTest, AModuleUnknownToTheDriverFailsTheSearch) {
     give("getGenericPropertyStringArray(7, \"Bench\", \"Dev.Modules\")", Texts{"Ghost"});
     EXPECT_EQ(ask("getModuleName", R"("device":"Bench","slot_number":1)"),
               failure(-250828, "kUsageTypeRequestedValue", "Ghost"));
@@ -129,7 +129,8 @@ TEST_F(ChassisTest, SlotsAreCountedFromOne) {
         R"("value":"The number must be greater than or equal to 1","value_type":"string"}])");
 }
 
-// ---- What all three want ------------------------------------------------------------------------
+// ---- Rules of all three methods
+// ------------------------------------------------------------------
 
 struct Question {
     const char* method;
@@ -189,7 +190,7 @@ TEST_F(ChassisTest, ASessionWithoutADefaultDeviceMustNameOne) {
 
 const std::string benchToB = R"("old_chassis_name":"Bench","new_chassis_name":"B")";
 
-TEST_F(ChassisTest, RenamesEachModuleBeforeTheNextIsAskedAndTheChassisLast) {
+TEST_F(ChassisTest, RenamesEachModuleBeforeTheNextIsReadAndTheChassisLast) {
     EXPECT_EQ(ask("renameChassisAndAllConnectedModules", benchToB),
               R"({"new_module_names":["B-Mod4","B-Mod1"],"new_chassis_name":"B"})");
     EXPECT_EQ(driver.takeCalls(),
@@ -242,7 +243,7 @@ TEST_F(ChassisTest, ANewNameEndsAtItsFirstNul) {
 
 // ---- Network identity ---------------------------------------------------------------------------
 
-TEST_F(ChassisTest, TellsTheAddressAndThenTheHostname) {
+TEST_F(ChassisTest, ReturnsTheAddressAndThenTheHostname) {
     give("getDevicePropertyString(7, \"Bench\", \"Dev.TCPIP.EthernetIP\")",
          std::string("192.0.2.7"));
     give("getDevicePropertyString(7, \"Bench\", \"Dev.TCPIP.Hostname\")", std::string("bench"));
@@ -256,7 +257,7 @@ TEST_F(ChassisTest, TellsTheAddressAndThenTheHostname) {
                             "freeString()"}}));
 }
 
-TEST_F(ChassisTest, TheDefaultDeviceGoesToTheDriverAsNoName) {
+TEST_F(ChassisTest, TheDefaultDeviceIsPassedToTheDriverAsNull) {
     openSessionOn({"Bench"});
     give("getDevicePropertyString(7, null, \"Dev.TCPIP.EthernetIP\")", std::string("192.0.2.7"));
     give("getDevicePropertyString(7, null, \"Dev.TCPIP.Hostname\")", std::string("bench"));
@@ -264,7 +265,7 @@ TEST_F(ChassisTest, TheDefaultDeviceGoesToTheDriverAsNoName) {
               R"({"chassis_ip":"192.0.2.7","chassis_hostname":"bench"})");
 }
 
-TEST_F(ChassisTest, TheDeviceGoesToTheDriverAsTheClientWroteIt) {
+TEST_F(ChassisTest, TheDeviceIsPassedToTheDriverAsTheClientWroteIt) {
     give("getGenericPropertyInt32(7, \"bench\", \"Dev.ProductCategory\")", std::int64_t{1});
     EXPECT_EQ(ask("GetChassisIpOrHostname", R"("device":"bench")"),
               R"({"chassis_ip":"","chassis_hostname":""})");
@@ -272,7 +273,7 @@ TEST_F(ChassisTest, TheDeviceGoesToTheDriverAsTheClientWroteIt) {
               "getDevicePropertyString(7, \"bench\", \"Dev.TCPIP.Hostname\")");
 }
 
-// A path name loses the zeros in front of its number where the driver takes a list of names.
+// Where the driver takes a list of names, leading zeros of the number in a path name are removed.
 class ChassisWithAPathTest : public ChassisTest {
   protected:
     void SetUp() override {
@@ -283,7 +284,7 @@ class ChassisWithAPathTest : public ChassisTest {
     }
 };
 
-TEST_F(ChassisWithAPathTest, TheDeviceGoesToTheDriverWithTheZerosThatTheClientWrote) {
+TEST_F(ChassisWithAPathTest, TheDeviceIsPassedToTheDriverWithItsLeadingZeros) {
     give("getDevicePropertyString(7, \"Rack/Bench03\", \"Dev.TCPIP.EthernetIP\")",
          std::string("192.0.2.7"));
     give("getDevicePropertyString(7, \"Rack/Bench03\", \"Dev.TCPIP.Hostname\")",

@@ -32,7 +32,7 @@ TEST_F(CommandsTest, ListsAChannelsCommands) {
               R"({"commands":["Trim"]})");
 }
 
-TEST_F(CommandsTest, ListsTheCommandsOfTheSessionsOwnResources) {
+TEST_F(CommandsTest, ListsTheCommandsOfTheDefaultResources) {
     openSession(R"("devices":"Mod1")");
     give("getGenericPropertyStringArray(7, \"$DefaultDevices\", \"Dev.Commands\")", Texts{});
     EXPECT_EQ(ask("getCommandList"), R"({"commands":[]})");
@@ -57,7 +57,7 @@ TEST_F(CommandsTest, ASessionWithoutResourcesMustNameOne) {
     EXPECT_EQ(ask("getCommandList"), needsResource);
 }
 
-TEST_F(CommandsTest, ListTakesADeviceOrAChannelAndNotBoth) {
+TEST_F(CommandsTest, ListAcceptsADeviceOrAChannelButNotBoth) {
     EXPECT_EQ(ask("getCommandList", R"("device":"Mod1","physical_channel":"Mod1/ch0")"),
               R"(-32602 [{"type":"usage","usage":"kUsageTypeParameter","value":"#/params",)"
               R"("value_type":"string"},{"type":"usage","usage":"kUsageTypeDetails",)"
@@ -67,7 +67,7 @@ TEST_F(CommandsTest, ListTakesADeviceOrAChannelAndNotBoth) {
 
 // ---- Execution ----------------------------------------------------------------------------------
 
-TEST_F(CommandsTest, ExecutionWaitsTenByDefault) {
+TEST_F(CommandsTest, ExecutionHasATimeoutOfTenSecondsByDefault) {
     EXPECT_EQ(ask("executeCommand", R"("command":"Zero","devices":["Mod1","Mod2"])"), "{}");
     EXPECT_EQ(driver.takeCalls(), (Calls{readDevices, "freeStringArray(4)",
                                          "executeGenericCommand(7, \"Mod1,Mod2\", \"Zero\", 10)"}));
@@ -83,14 +83,14 @@ TEST_F(CommandsTest, ExecutionPassesAnyTimeoutOnUnchanged) {
     }
 }
 
-TEST_F(CommandsTest, ExecutionWithoutAnyResourceIsTheDriversToDecide) {
+TEST_F(CommandsTest, ExecutionWithoutAnyResourceIsLeftToTheDriver) {
     EXPECT_EQ(ask("executeCommand", R"("command":"Zero")"), "{}");
     EXPECT_EQ(driver.takeCalls(), Calls{"executeGenericCommand(7, \"\", \"Zero\", 10)"});
     fail("executeGenericCommand", -250999);
     EXPECT_EQ(ask("executeCommand", R"("command":"Zero")"), "-250999");
 }
 
-TEST_F(CommandsTest, ExecutionOnTheSessionsOwnAreasIsTheDriversToDecide) {
+TEST_F(CommandsTest, ExecutionOnTheDefaultAreasIsLeftToTheDriver) {
     openSession(R"("nvmem_areas":"Mod1/user")");
     EXPECT_EQ(ask("executeCommand", R"("command":"Zero")"), "{}");
     EXPECT_EQ(driver.takeCalls(),
@@ -127,7 +127,7 @@ TEST_F(CommandsTest, AFailingAttributeStillClosesTheCommand) {
     EXPECT_EQ(driver.calls().back(), "closeCommand(31)");
 }
 
-TEST_F(CommandsTest, AFailingCloseIsNotToldToTheClient) {
+TEST_F(CommandsTest, AFailingCloseIsNotReportedToTheClient) {
     give("getCommandPropertyString", std::string("d"));
     fail("closeCommand", -250998);
     EXPECT_EQ(ask("getCommandInformation", R"("command":"Zero","device":"Mod1")"),

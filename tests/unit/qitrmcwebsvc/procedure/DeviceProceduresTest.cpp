@@ -23,12 +23,12 @@ struct DevicesCase {
 
 class DevicesTest : public DeviceProceduresTest, public testing::WithParamInterface<DevicesCase> {};
 
-TEST_P(DevicesTest, WithoutDevicesActsOnTheSessionsOwn) {
+TEST_P(DevicesTest, WithoutDevicesUsesTheDefaultDevices) {
     EXPECT_EQ(ask(GetParam().method), "{}");
     EXPECT_EQ(driver.takeCalls(), Calls{GetParam().onDefault});
 }
 
-TEST_P(DevicesTest, TakesATextAnArrayOfOneTextAndAnArrayOfSeveral) {
+TEST_P(DevicesTest, AcceptsATextAnArrayOfOneTextAndAnArrayOfSeveral) {
     const Calls expected = {readDevices, freeDevices, GetParam().onTwo};
     EXPECT_EQ(ask(GetParam().method, R"("devices":"Mod1,Mod2")"), "{}");
     EXPECT_EQ(driver.takeCalls(), expected);
@@ -50,7 +50,7 @@ TEST_P(DevicesTest, RefusesAnUnknownSession) {
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 
-TEST_P(DevicesTest, PassesTheDriversRefusalOn) {
+TEST_P(DevicesTest, PassesTheDriversErrorOn) {
     const std::string call = GetParam().onDefault;
     fail(call, -250999, R"({"from":"driver"})");
     EXPECT_EQ(ask(GetParam().method), "-250999");
@@ -87,7 +87,7 @@ TEST_F(DeviceProceduresTest, DevicesAreTheDefaultEvenInASessionOnChannels) {
     EXPECT_EQ(driver.takeCalls(), Calls{"resetDevices(7, \"$DefaultDevices\")"});
 }
 
-TEST_F(DeviceProceduresTest, TokensGoToTheDriverAsTheyAre) {
+TEST_F(DeviceProceduresTest, TokensArePassedToTheDriverUnchanged) {
     EXPECT_EQ(ask("connectToDevices", R"("devices":"$ReservedDevices")"), "{}");
     EXPECT_EQ(driver.takeCalls(),
               (Calls{readDevices, freeDevices, "connectToDevices(7, \"$ReservedDevices\", -1)"}));
@@ -95,7 +95,7 @@ TEST_F(DeviceProceduresTest, TokensGoToTheDriverAsTheyAre) {
 
 // ---- Reservation --------------------------------------------------------------------------------
 
-TEST_F(DeviceProceduresTest, ReservationTakesAccessGroupAndTimeout) {
+TEST_F(DeviceProceduresTest, ReservationPassesAccessGroupAndTimeoutOn) {
     EXPECT_EQ(ask("reserveDevices", R"("devices":"Mod1","access":1,"reservation_group":"g",)"
                                     R"("reservation_timeout":2)"),
               "{}");
@@ -105,7 +105,7 @@ TEST_F(DeviceProceduresTest, ReservationTakesAccessGroupAndTimeout) {
     EXPECT_EQ(driver.takeCalls(), Calls{"reserveDevices(7, \"$DefaultDevices\", 3, \"\", -0.5)"});
 }
 
-TEST_F(DeviceProceduresTest, ReservationAsksTheDriverForTheNumberOfAnAccessWord) {
+TEST_F(DeviceProceduresTest, ReservationGetsTheNumberOfAnAccessWordFromTheDriver) {
     give("translateStaticEnumStringToValue(\"ReservationAccess\", \"ReadOnly\")", std::int64_t{1});
     EXPECT_EQ(ask("reserveDevices", R"("devices":"Mod1","access":"ReadOnly")"), "{}");
     EXPECT_EQ(driver.takeCalls(),
@@ -114,7 +114,7 @@ TEST_F(DeviceProceduresTest, ReservationAsksTheDriverForTheNumberOfAnAccessWord)
                      "reserveDevices(7, \"Mod1\", 1, \"\", 0)"}));
 }
 
-TEST_F(DeviceProceduresTest, ReservationKnowsNoForce) {
+TEST_F(DeviceProceduresTest, ReservationDoesNotAcceptForce) {
     EXPECT_EQ(ask("reserveDevices", R"("force_reserve":true)"),
               R"(-32602 [{"type":"usage","usage":"kUsageTypeParameter",)"
               R"("value":"#/params/force_reserve","value_type":"string"},)"
@@ -123,7 +123,7 @@ TEST_F(DeviceProceduresTest, ReservationKnowsNoForce) {
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 
-TEST_F(DeviceProceduresTest, ATakenDeviceIsReportedWithTheSessionsThatHoldIt) {
+TEST_F(DeviceProceduresTest, AReservedDeviceIsReportedWithTheSessionsThatHoldIt) {
     EXPECT_EQ(ask("reserveDevices", R"("devices":"Mod1")"), "{}");
     give("getSessionPropertyStringArray(7, \"Session.ReservedDevices\")", Texts{"Mod1"});
     fail("reserveDevices", -250811);
@@ -134,12 +134,12 @@ TEST_F(DeviceProceduresTest, ATakenDeviceIsReportedWithTheSessionsThatHoldIt) {
 
 // ---- Renaming -----------------------------------------------------------------------------------
 
-TEST_F(DeviceProceduresTest, RenamingPassesBothNamesStraightOn) {
+TEST_F(DeviceProceduresTest, RenamingPassesBothNamesOnUnchanged) {
     EXPECT_EQ(ask("renameDevice", R"("device":"$x,Mod1/ch03:4","new_device_name":"Näme")"), "{}");
     EXPECT_EQ(driver.takeCalls(), Calls{"renameDevice(7, \"$x,Mod1/ch03:4\", \"Näme\")"});
 }
 
-TEST_F(DeviceProceduresTest, RenamingAnUnknownDeviceIsTheDriversToRefuse) {
+TEST_F(DeviceProceduresTest, RenamingAnUnknownDeviceIsRefusedByTheDriver) {
     fail("renameDevice", -250807);
     EXPECT_EQ(ask("renameDevice", R"("device":"Mod9","new_device_name":"M")"), "-250807");
     EXPECT_EQ(driver.takeCalls(), Calls{"renameDevice(7, \"Mod9\", \"M\")"});

@@ -1,5 +1,5 @@
-// Every call of every procedure fails once: the code reaches the client, nothing more is asked of
-// the driver, and everything that it lent goes back.
+// Every driver call of every procedure fails once: the client gets the code, the driver is not
+// called further, and everything that it lent is freed.
 
 #include <algorithm>
 #include <set>
@@ -82,7 +82,7 @@ class FailingDriverTest : public ProcedureFixture, public testing::WithParamInte
 
     std::string walk() { return ask(GetParam().method, GetParam().members); }
 
-    // What the client is told when this call fails.
+    // The expected failure for the client when this call fails.
     std::string expected(const std::string& call, const std::string& undisturbed) {
         if (startsWith(call, "close"))
             return undisturbed;
@@ -93,7 +93,7 @@ class FailingDriverTest : public ProcedureFixture, public testing::WithParamInte
         return std::to_string(refusalCode);
     }
 
-    // The properties and commands that these calls have opened are closed by them as well.
+    // The properties and commands that these calls open must also be closed by them.
     static void expectNoneOpen(const Calls& calls, bool lastOneFailed) {
         const auto counted = [&](const std::string& start) {
             return std::count_if(calls.begin(), calls.end(),
@@ -103,7 +103,7 @@ class FailingDriverTest : public ProcedureFixture, public testing::WithParamInte
     }
 };
 
-TEST_P(FailingDriverTest, TellsTheClientAndGivesEverythingBack) {
+TEST_P(FailingDriverTest, ReportsTheErrorAndFreesEverything) {
     const std::string undisturbed = walk();
     ASSERT_EQ(undisturbed.front(), '{') << undisturbed;
     const Calls road = driver.takeCalls();

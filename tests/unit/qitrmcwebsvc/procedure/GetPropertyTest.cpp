@@ -24,7 +24,7 @@ struct ValueCase {
 class GetPropertyValueTest : public GetPropertyTest,
                              public testing::WithParamInterface<ValueCase> {};
 
-TEST_P(GetPropertyValueTest, GivesTheTypeAndThenTheValue) {
+TEST_P(GetPropertyValueTest, ReturnsTheTypeAndThenTheValue) {
     giveDataType(GetParam().dataType);
     give(GetParam().read, GetParam().value);
     EXPECT_EQ(ask("getProperty", R"("property":"Dev.Own","devices":"Mod1")"), GetParam().result);
@@ -84,7 +84,8 @@ TEST_P(GetPropertyEmptyArrayTest, AnEmptyArrayOfTheDriverIsAnEmptyArray) {
 
 INSTANTIATE_TEST_SUITE_P(ArrayTypes, GetPropertyEmptyArrayTest, testing::Range(8, 15));
 
-// ---- The road -----------------------------------------------------------------------------------
+// ---- The sequence of calls
+// -----------------------------------------------------------------------
 
 TEST_F(GetPropertyTest, CallsTheDriverInThisOrder) {
     giveDataType(12);
@@ -125,21 +126,21 @@ TEST_F(GetPropertyTest, ASystemPropertyNeedsNoResources) {
               R"({"data_type":"UInt64","value":18446744073709551615})");
 }
 
-TEST_F(GetPropertyTest, ASessionTextCannotBeReadAsOne) {
+TEST_F(GetPropertyTest, ASessionPropertyOfTypeStringCannotBeRead) {
     giveDataType(5);
     EXPECT_EQ(ask("getProperty", R"("property":"Session.Name")"),
               internalError("Unsupported property category."));
     EXPECT_EQ(driver.calls().back(), "closeProperty(21)");
 }
 
-TEST_F(GetPropertyTest, ANameThatIsNoneOfTheSystemsNeedsResources) {
+TEST_F(GetPropertyTest, ANameThatIsNotASystemPropertyNeedsResources) {
     EXPECT_EQ(ask("getProperty", R"("property":"Dev.Own")"),
               failure(-32602, "kUsageTypeDetails",
                       "You must specify at least one of the following parameters: devices, "
                       "physical_channels, nvmem_areas."));
 }
 
-TEST_F(GetPropertyTest, TheSessionsOwnResourcesAreTheDefault) {
+TEST_F(GetPropertyTest, TheDefaultResourcesOfTheSessionAreUsed) {
     openSession(R"("nvmem_areas":"Mod1/user")");
     giveDataType(6);
     give("getSessionPropertyStringArray(7, \"Session.DefaultNVMEMAreas\")", Texts{"Mod1/user"});
@@ -148,7 +149,7 @@ TEST_F(GetPropertyTest, TheSessionsOwnResourcesAreTheDefault) {
               R"({"data_type":"UInt32","value":64})");
 }
 
-TEST_F(GetPropertyTest, ANumberThatIsNoDataTypeIsAnInternalError) {
+TEST_F(GetPropertyTest, AnUnknownDataTypeIsAnInternalError) {
     for (const int number : {0, 15, -1}) {
         giveDataType(number);
         EXPECT_EQ(ask("getProperty", R"("property":"Dev.Own","devices":"Mod1")"),

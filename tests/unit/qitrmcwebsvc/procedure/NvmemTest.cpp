@@ -16,7 +16,7 @@ class NvmemTest : public ProcedureFixture {
 
 // ---- Reading ------------------------------------------------------------------------------------
 
-TEST_F(NvmemTest, ReadingGivesTheBytesBeforeTheNextAddress) {
+TEST_F(NvmemTest, ReadingReturnsTheBytesBeforeTheNextAddress) {
     give("getNvmemBytes", Bytes{0, 1, 127, 128, 255});
     EXPECT_EQ(ask("getNvmemBytes", R"("nvmem_area":"Mod1/user","address":100,"size":5)"),
               R"({"data":[0,1,127,128,255],"next_address":101})");
@@ -31,7 +31,7 @@ TEST_F(NvmemTest, ReadingSixteenBytesStepsTheAddressByOne) {
     EXPECT_EQ(driver.takeCalls(), Calls{"getNvmemBytes(7, \"$DefaultNVMEMAreas\", 100, 16)"});
 }
 
-TEST_F(NvmemTest, ReadingNoBytesStillAsksTheDriver) {
+TEST_F(NvmemTest, ReadingNoBytesStillCallsTheDriver) {
     EXPECT_EQ(ask("getNvmemBytes", R"("address":3,"size":0)"), R"({"data":[],"next_address":4})");
     EXPECT_EQ(driver.takeCalls(), Calls{"getNvmemBytes(7, \"$DefaultNVMEMAreas\", 3, null, 0)"});
 }
@@ -42,21 +42,21 @@ TEST_F(NvmemTest, TheNextAddressWrapsAround) {
     EXPECT_EQ(ask("setNvmemBytes", R"("address":4294967295,"data":[1])"), R"({"next_address":0})");
 }
 
-TEST_F(NvmemTest, ReadingFailsAsTheDriverRefuses) {
+TEST_F(NvmemTest, ReadingFailsWithTheDriversError) {
     fail("getNvmemBytes", -250999, R"({"from":"driver"})");
     EXPECT_EQ(ask("getNvmemBytes", R"("address":0,"size":8)"), "-250999");
     EXPECT_EQ(statusText, R"({"from":"driver"})");
 }
 
 #if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
-TEST_F(NvmemTest, ARequestForMoreThanAnAreaHoldsTakesNoMemoryBeforeTheDriverRefusesIt) {
+TEST_F(NvmemTest, ARequestForTooManyBytesUsesNoMemoryBeforeTheDriverRefusesIt) {
     fail("getNvmemBytes", -250999);
     rusage before{};
     getrusage(RUSAGE_SELF, &before);
     const std::string refused = ask("getNvmemBytes", R"("address":0,"size":4294967295)");
     rusage after{};
     getrusage(RUSAGE_SELF, &after);
-    // A system that does not give so much address space refuses by itself.
+    // A system with less address space refuses by itself.
     EXPECT_TRUE(refused == "-250999" || refused == "-250801") << refused;
     EXPECT_LT(after.ru_maxrss - before.ru_maxrss, 16 * 1024) << "KiB";
 }
@@ -71,7 +71,7 @@ TEST_F(NvmemTest, SizesAboveTheRangeAreRefusedByTheSchema) {
 
 // ---- Writing ------------------------------------------------------------------------------------
 
-TEST_F(NvmemTest, WritingWithoutGuardPassesTwoEmptyTexts) {
+TEST_F(NvmemTest, WritingWithoutSerialNumberAndPasswordPassesTwoEmptyTexts) {
     EXPECT_EQ(ask("setNvmemBytes", R"("nvmem_area":"Mod1/user","address":100,"data":[0,255,7])"),
               R"({"next_address":101})");
     EXPECT_EQ(driver.takeCalls(),
@@ -95,26 +95,26 @@ TEST_F(NvmemTest, WritingNothingIsRefusedByTheSchema) {
               R"("value":"The parameter must not be empty array.","value_type":"string"}])");
 }
 
-TEST_F(NvmemTest, WritingWhatIsNoByteIsRefusedByTheSchema) {
+TEST_F(NvmemTest, WritingWhatIsNotAByteIsRefusedByTheSchema) {
     for (const char* data : {"[256]", "[-1]", "[1.0]", "[\"1\"]"})
         EXPECT_EQ(ask("setNvmemBytes", R"("address":0,"data":)" + std::string(data)).substr(0, 6),
                   "-32602");
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 
-TEST_F(NvmemTest, WritingFailsAsTheDriverRefuses) {
+TEST_F(NvmemTest, WritingFailsWithTheDriversError) {
     fail("setNvmemBytes", -250999);
     EXPECT_EQ(ask("setNvmemBytes", R"("address":0,"data":[1])"), "-250999");
 }
 
-TEST_F(NvmemTest, WritingMakesNoCommit) {
+TEST_F(NvmemTest, WritingDoesNotCommit) {
     EXPECT_EQ(ask("setNvmemBytes", R"("address":0,"data":[1])"), R"({"next_address":1})");
     EXPECT_EQ(driver.takeCalls().size(), 1u);
 }
 
 // ---- Commit -------------------------------------------------------------------------------------
 
-TEST_F(NvmemTest, CommitTakesAreasOrDevicesOrTheSessionsOwn) {
+TEST_F(NvmemTest, CommitUsesAreasOrDevicesOrTheDefaultResources) {
     EXPECT_EQ(ask("commitNvmemAreas", R"("nvmem_areas":["Mod1/user"])"), "{}");
     EXPECT_EQ(driver.calls().back(), "commitNvmemGeneric(7, \"Mod1/user\")");
     EXPECT_EQ(ask("commitNvmemAreas", R"("devices":"Mod1,Mod2")"), "{}");
@@ -123,12 +123,12 @@ TEST_F(NvmemTest, CommitTakesAreasOrDevicesOrTheSessionsOwn) {
     EXPECT_EQ(driver.calls().back(), "commitNvmemGeneric(7, \"$DefaultNVMEMAreas\")");
 }
 
-TEST_F(NvmemTest, CommitFailsAsTheDriverRefuses) {
+TEST_F(NvmemTest, CommitFailsWithTheDriversError) {
     fail("commitNvmemGeneric", -250999);
     EXPECT_EQ(ask("commitNvmemAreas"), "-250999");
 }
 
-TEST_F(NvmemTest, CommitTakesAreasOrDevicesAndNotBoth) {
+TEST_F(NvmemTest, CommitAcceptsAreasOrDevicesButNotBoth) {
     EXPECT_EQ(ask("commitNvmemAreas", R"("nvmem_areas":"Mod1/user","devices":"Mod1")"),
               R"(-32602 [{"type":"usage","usage":"kUsageTypeParameter","value":"#/params",)"
               R"("value_type":"string"},{"type":"usage","usage":"kUsageTypeDetails",)"

@@ -30,7 +30,7 @@ class PropertyInformationTest : public ProcedureFixture {
     }
 };
 
-TEST_F(PropertyInformationTest, APropertyWithoutTextsHasOnlyTheFourMembersThatAlwaysStand) {
+TEST_F(PropertyInformationTest, APropertyWithoutTextsHasOnlyTheFourRequiredMembers) {
     for (const char* name :
          {"Prop.Descr", "Prop.Doc", "Prop.MaxValue", "Prop.MinValue", "Prop.Unit"})
         giveText(name, "");
@@ -39,7 +39,7 @@ TEST_F(PropertyInformationTest, APropertyWithoutTextsHasOnlyTheFourMembersThatAl
               R"("pending_changes":false})");
 }
 
-TEST_F(PropertyInformationTest, TextsStandFirstInTheOrderOfTheirKeysAndLimitsAreTexts) {
+TEST_F(PropertyInformationTest, TextsComeFirstInTheOrderOfTheirKeysAndLimitsAreTexts) {
     giveText("Prop.Descr", "Gain");
     giveText("Prop.Doc", "The gain.");
     giveText("Prop.MaxValue", "10");
@@ -52,7 +52,7 @@ TEST_F(PropertyInformationTest, TextsStandFirstInTheOrderOfTheirKeysAndLimitsAre
               R"("driver_defined":false,"pending_changes":true})");
 }
 
-TEST_F(PropertyInformationTest, ATextThatTheDriverDoesNotGiveIsLeftOut) {
+TEST_F(PropertyInformationTest, ATextThatTheDriverDoesNotReturnIsLeftOut) {
     giveText("Prop.Unit", "dB");
     EXPECT_EQ(ask("getPropertyInformation", question),
               R"({"unit":"dB","data_type":"Int32","access":"ReadWrite","driver_defined":false,)"
@@ -74,7 +74,7 @@ TEST_F(PropertyInformationTest, AnEnumeratedPropertyWithoutItemsHasAnEmptyObject
               R"("pending_changes":false,"enum":{"name":"Mode","values":{}}})");
 }
 
-TEST_F(PropertyInformationTest, ItemsThatTheDriverLeavesWithoutNameOrNumberDoNoHarm) {
+TEST_F(PropertyInformationTest, ItemsWithoutNameOrNumberAreHandled) {
     giveEnum({"Slow"}, {2, 1});
     EXPECT_EQ(ask("getPropertyInformation", question),
               R"({"data_type":"Int32","access":"ReadWrite","driver_defined":false,)"
@@ -85,7 +85,7 @@ TEST_F(PropertyInformationTest, ItemsThatTheDriverLeavesWithoutNameOrNumberDoNoH
               R"("pending_changes":false,"enum":{"name":"Mode","values":{"Slow":2}}})");
 }
 
-TEST_F(PropertyInformationTest, TellsThatTheDriverDefinesAProperty) {
+TEST_F(PropertyInformationTest, ReportsThatTheDriverDefinesAProperty) {
     give("getPropertyPropertyInt32(21, \"Prop.Access\")", std::int64_t{3});
     EXPECT_EQ(ask("getPropertyInformation", R"("property":"Sys.Delay")"),
               R"({"data_type":"Int32","access":"ReadWrite","driver_defined":true,)"
@@ -132,13 +132,13 @@ TEST_F(PropertyInformationTest, CallsTheDriverInThisOrder) {
                      "closeProperty(22)"}));
 }
 
-TEST_F(PropertyInformationTest, TellsTheTypeOfOneResourceEvenWhenSeveralAreNamed) {
+TEST_F(PropertyInformationTest, ReportsTheTypeForOneResourceEvenWhenSeveralAreNamed) {
     EXPECT_EQ(ask("getPropertyInformation", R"("property":"Dev.Own","device":"Mod1,Mod2")"),
               R"({"data_type":"Int32","access":"ReadWrite","driver_defined":false,)"
               R"("pending_changes":false})");
 }
 
-TEST_F(PropertyInformationTest, ARefusedDescriptionIsNotAnEmptyOne) {
+TEST_F(PropertyInformationTest, AFailureToReadADescriptionIsNotAnEmptyDescription) {
     fail(attribute("String", "Prop.Descr"), -250999);
     EXPECT_EQ(ask("getPropertyInformation", question), "-250999");
     EXPECT_EQ(driver.calls().back(), "closeProperty(22)");

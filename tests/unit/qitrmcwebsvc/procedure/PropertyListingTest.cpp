@@ -16,7 +16,7 @@ class PropertyListingTest : public ProcedureFixture {
     }
 };
 
-TEST_F(PropertyListingTest, SessionPropertiesStandBeforeSystemProperties) {
+TEST_F(PropertyListingTest, SessionPropertiesComeBeforeSystemProperties) {
     EXPECT_EQ(ask("getSessionPropertyList"),
               R"({"properties":["Session.Name","Session.ReservedDevices","Session.Timeout",)"
               R"("Sys.Delay","Sys.Devices","Sys.Simulated","Sys.Ticks"]})");
@@ -24,13 +24,13 @@ TEST_F(PropertyListingTest, SessionPropertiesStandBeforeSystemProperties) {
                                          readNames + "SystemProperties\")", "freeStringArray(5)"}));
 }
 
-TEST_F(PropertyListingTest, EachHalfIsSortedOnItsOwnAndANameInBothAppearsTwice) {
+TEST_F(PropertyListingTest, EachPartIsSortedSeparatelyAndANameInBothAppearsTwice) {
     give(readNames + "SessionProperties\")", Texts{"z", "b"});
     give(readNames + "SystemProperties\")", Texts{"b", "a", "a"});
     EXPECT_EQ(ask("getSessionPropertyList"), R"({"properties":["b","z","a","b"]})");
 }
 
-TEST_F(PropertyListingTest, EmptyListsGiveAnEmptyArray) {
+TEST_F(PropertyListingTest, EmptyListsResultInAnEmptyArray) {
     give(readNames + "SessionProperties\")", Texts{});
     give(readNames + "SystemProperties\")", Texts{});
     EXPECT_EQ(ask("getSessionPropertyList"), R"({"properties":[]})");
@@ -57,7 +57,7 @@ TEST_F(PropertyListingTest, APhysicalChannelHasItsOwnLists) {
               R"("dynamic_properties":["PhysChan.Extra"]})");
 }
 
-TEST_F(PropertyListingTest, AnNvmemAreaHasNoDynamicPropertiesAndTheDriverIsNotAsked) {
+TEST_F(PropertyListingTest, AnNvmemAreaHasNoDynamicPropertiesAndTheDriverIsNotCalled) {
     EXPECT_EQ(ask("getDevicePropertyList", R"("nvmem_area":"Mod1/user")"),
               R"({"static_properties":["NVMEM.Size"]})");
     EXPECT_EQ(
@@ -72,7 +72,7 @@ TEST_F(PropertyListingTest, AnEmptyDynamicListIsAnEmptyArray) {
               R"({"static_properties":["Dev.Name","Dev.Temperature"],"dynamic_properties":[]})");
 }
 
-TEST_F(PropertyListingTest, AFailedDynamicListLeavesTheStaticListAlone) {
+TEST_F(PropertyListingTest, AFailedDynamicListDoesNotAffectTheStaticList) {
     RecordingDriver::Reply refusal;
     refusal.value = Texts{"Dev.Zeta"};
     refusal.code = -250999;

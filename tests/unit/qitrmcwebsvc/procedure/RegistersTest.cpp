@@ -32,7 +32,7 @@ TEST_P(RegisterWidthTest, IsReadWithoutSignExtension) {
                                          "freeStringArray(4)", call}));
 }
 
-TEST_P(RegisterWidthTest, TakesItsLargestValue) {
+TEST_P(RegisterWidthTest, AcceptsItsLargestValue) {
     EXPECT_EQ(ask("writeRegister",
                   R"("device":"Mod1","address":100,"size":)" + size + R"(,"data":)" + largest),
               R"({"next_address":101})");
@@ -52,7 +52,7 @@ TEST_P(RegisterWidthTest, MayBeWrittenWithAFraction) {
     EXPECT_EQ(driver.calls().back(), "writeRegisterUInt" + size + "(7, \"$DefaultDevices\", 0, 5)");
 }
 
-TEST_P(RegisterWidthTest, FailsAsTheDriverRefuses) {
+TEST_P(RegisterWidthTest, FailsWithTheDriversError) {
     fail("readRegisterUInt" + size, -250999);
     EXPECT_EQ(ask("readRegister", R"("address":0,"size":)" + size), "-250999");
     fail("writeRegisterUInt" + size, -250998);
@@ -63,10 +63,10 @@ INSTANTIATE_TEST_SUITE_P(Widths, RegisterWidthTest,
                          testing::Values(Width{8, 255}, Width{16, 65535}, Width{32, 4294967295},
                                          Width{64, std::numeric_limits<std::uint64_t>::max()}));
 
-// No number that JSON holds as an integer is too large for the widest one.
+// JSON holds no integer that is too large for the widest register.
 class NarrowRegisterTest : public RegisterWidthTest {};
 
-TEST_P(NarrowRegisterTest, TakesNoneAboveItsLargestValue) {
+TEST_P(NarrowRegisterTest, RefusesValuesAboveItsLargestValue) {
     const std::string tooLarge = std::to_string(GetParam().largest + 1);
     EXPECT_EQ(ask("writeRegister", R"("address":0,"size":)" + size + R"(,"data":)" + tooLarge),
               "-250860");

@@ -27,7 +27,7 @@ class SessionProceduresTest : public DriverTest {
         DriverTest::TearDown();
     }
 
-    // The part of the response behind the envelope.
+    // The part of the response after the envelope.
     std::string answer(const std::string& method, const std::string& params) {
         const std::string response =
             handler->handleRequest("{\"jsonrpc\":\"2.0\",\"id\":0,\"method\":\"" + method +
@@ -95,7 +95,7 @@ TEST_F(SessionProceduresTest, ReadsTheAccessAsNumberOrWord) {
                      "initializeSessionWithDevices(\"A\", 60, 3, \"\", 0)"}));
 }
 
-TEST_F(SessionProceduresTest, TakesAWholeAccessWithAFractionForAFaultOfTheProgram) {
+TEST_F(SessionProceduresTest, ReportsAnAccessWithAFractionAsAnInternalError) {
     EXPECT_EQ(answer("initializeSession", "{\"devices\":\"A\",\"access\":1.0}"),
               wrapped("-250800", " comment=Fail to parse enum type."));
 }
@@ -122,7 +122,7 @@ TEST_F(SessionProceduresTest, ClosesASession) {
               wrapped("-250833", " kUsageTypeSessionId=_session1"));
 }
 
-TEST_F(SessionProceduresTest, KnowsASessionAfterItsAbort) {
+TEST_F(SessionProceduresTest, KeepsASessionOpenAfterItsAbort) {
     answer("initializeSession", "{}");
     driver.takeCalls();
     EXPECT_EQ(answer("abortSession", "{\"session_id\":\"_session1\"}"), done);
@@ -133,13 +133,13 @@ TEST_F(SessionProceduresTest, KnowsASessionAfterItsAbort) {
               wrapped("-250833", " kUsageTypeSessionId=_session1"));
 }
 
-TEST_F(SessionProceduresTest, PassesTheDriversRefusalOn) {
+TEST_F(SessionProceduresTest, PassesTheDriversErrorOn) {
     answer("initializeSession", "{}");
     driver.fail("abortSession", -41);
     EXPECT_EQ(answer("abortSession", "{\"session_id\":\"_session1\"}"), wrapped("-41", ""));
 }
 
-TEST_F(SessionProceduresTest, DoesNotTakeAnIdThatIsCutByANulForTheSession) {
+TEST_F(SessionProceduresTest, DoesNotAcceptAnIdFollowedByANul) {
     answer("initializeSession", "{}");
     EXPECT_EQ(answer("closeSession", "{\"session_id\":\"_session1\\u0000x\"}"),
               wrapped("-250833", " kUsageTypeSessionId=_session1"));

@@ -9,14 +9,14 @@ class SetPropertyTest : public ProcedureFixture {
         openSession();
     }
 
-    // Writes Dev.Own of Mod1, whose data type is this.
+    // Writes Dev.Own of Mod1, which has this data type.
     std::string set(int dataType, const std::string& value) {
         giveDataType(dataType);
         driver.takeCalls();
         return ask("setProperty", R"("property":"Dev.Own","devices":"Mod1","value":)" + value);
     }
 
-    // The write among the latest calls; empty without one.
+    // The write among the latest calls; empty if there is none.
     std::string write() {
         for (const std::string& call : driver.calls())
             if (call.rfind("set", 0) == 0)
@@ -41,7 +41,7 @@ struct Accepted {
 class SetPropertyAcceptsTest : public SetPropertyTest,
                                public testing::WithParamInterface<Accepted> {};
 
-TEST_P(SetPropertyAcceptsTest, TheValueAndAnswersWithTheType) {
+TEST_P(SetPropertyAcceptsTest, TheValueAndReturnsTheType) {
     if (GetParam().dataType == 8)
         expectOwnArray();
     EXPECT_EQ(set(GetParam().dataType, GetParam().value), GetParam().result);
@@ -98,7 +98,7 @@ struct Refused {
 class SetPropertyRefusesTest : public SetPropertyTest,
                                public testing::WithParamInterface<Refused> {};
 
-TEST_P(SetPropertyRefusesTest, ValuesOfOtherTypesAndTellsItsOwn) {
+TEST_P(SetPropertyRefusesTest, ValuesOfOtherTypesAndNamesItsOwn) {
     for (const char* value : GetParam().values) {
         SCOPED_TRACE(value);
         EXPECT_EQ(set(GetParam().dataType, value), wrongType(GetParam().name));
@@ -139,7 +139,8 @@ TEST_F(SetPropertyTest, TheSchemaRefusesAnEmptyArrayAndMixedElements) {
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 
-// ---- The road -----------------------------------------------------------------------------------
+// ---- The sequence of calls
+// -----------------------------------------------------------------------
 
 TEST_F(SetPropertyTest, CallsTheDriverInThisOrder) {
     giveDataType(2);
@@ -153,7 +154,7 @@ TEST_F(SetPropertyTest, CallsTheDriverInThisOrder) {
                      "translateStaticEnumValueToString(\"DataType\", 2)", "closeProperty(21)"}));
 }
 
-TEST_F(SetPropertyTest, TheTypeIsCheckedBeforeTheDriverIsAskedToWrite) {
+TEST_F(SetPropertyTest, TheTypeIsCheckedBeforeTheDriverWrites) {
     giveDataType(5);
     EXPECT_EQ(ask("setProperty", R"("property":"Sys.Delay","value":1)"), wrongType("String"));
     EXPECT_EQ(ask("setProperty", R"("property":"Sys.Delay","value":"a")"),
@@ -166,14 +167,14 @@ TEST_F(SetPropertyTest, ASystemListCannotBeWritten) {
               internalError("Unsupported property category."));
 }
 
-TEST_F(SetPropertyTest, ASessionTextIsWrittenThroughTheFunctionForResources) {
+TEST_F(SetPropertyTest, ASessionPropertyOfTypeStringIsWrittenThroughTheFunctionForResources) {
     giveDataType(5);
     EXPECT_EQ(ask("setProperty", R"("property":"Session.Name","devices":"Mod1","value":"n")"),
               R"({"data_type":"String"})");
     EXPECT_EQ(write(), "setGenericPropertyString(7, \"Mod1\", \"Session.Name\", \"n\")");
 }
 
-TEST_F(SetPropertyTest, AScalarOnTwoDevicesTakesOneElementForEach) {
+TEST_F(SetPropertyTest, AScalarOnTwoDevicesNeedsOneElementForEach) {
     giveDataType(3);
     EXPECT_EQ(ask("setProperty", R"("property":"Dev.Own","devices":"Mod1,Mod2","value":[5,6])"),
               R"({"data_type":"Int32Array"})");
@@ -191,13 +192,13 @@ TEST_F(SetPropertyTest, AFailingWriteStillClosesTheProperty) {
               (Calls{"setGenericPropertyInt32(7, \"Mod1\", \"Dev.Own\", 5)", "closeProperty(22)"}));
 }
 
-TEST_F(SetPropertyTest, ANumberThatIsNoDataTypeFailsWithoutDetails) {
+TEST_F(SetPropertyTest, AnUnknownDataTypeFailsWithoutDetails) {
     for (const int number : {0, 15, -1})
         EXPECT_EQ(set(number, "5"), "-250800");
     EXPECT_EQ(afterOpening(driver.takeCalls()), Calls{"closeProperty(22)"});
 }
 
-TEST_F(SetPropertyTest, NvmemAreasAreNoParameter) {
+TEST_F(SetPropertyTest, NvmemAreasAreNotAParameter) {
     EXPECT_EQ(
         ask("setProperty", R"("property":"NVMEM.Size","nvmem_areas":"Mod1/user","value":1)"),
         R"(-32602 [{"type":"usage","usage":"kUsageTypeParameter","value":"#/params/nvmem_areas",)"
@@ -207,7 +208,7 @@ TEST_F(SetPropertyTest, NvmemAreasAreNoParameter) {
 
 // ---- Commit -------------------------------------------------------------------------------------
 
-TEST_F(SetPropertyTest, CommitTakesTheResourcesOrTheSessionsOwn) {
+TEST_F(SetPropertyTest, CommitUsesTheResourcesOrTheDefaultOnes) {
     EXPECT_EQ(ask("commitProperties", R"("physical_channels":"Mod1/ch0:1")"), "{}");
     EXPECT_EQ(driver.calls().back(), "commitPropertiesGeneric(7, \"Mod1/ch0:1\")");
     EXPECT_EQ(ask("commitProperties"), "{}");
@@ -217,12 +218,12 @@ TEST_F(SetPropertyTest, CommitTakesTheResourcesOrTheSessionsOwn) {
     EXPECT_EQ(driver.takeCalls(), Calls{"commitPropertiesGeneric(7, \"$DefaultDevices\")"});
 }
 
-TEST_F(SetPropertyTest, CommitPassesTheDriversRefusalOn) {
+TEST_F(SetPropertyTest, CommitPassesTheDriversErrorOn) {
     fail("commitPropertiesGeneric", -250999);
     EXPECT_EQ(ask("commitProperties", R"("devices":"Mod1")"), "-250999");
 }
 
-TEST_F(SetPropertyTest, CommitTakesDevicesOrChannelsAndNotBoth) {
+TEST_F(SetPropertyTest, CommitAcceptsDevicesOrChannelsButNotBoth) {
     EXPECT_EQ(ask("commitProperties", R"("devices":"Mod1","physical_channels":"Mod1/ch0")"),
               R"(-32602 [{"type":"usage","usage":"kUsageTypeParameter","value":"#/params",)"
               R"("value_type":"string"},{"type":"usage","usage":"kUsageTypeDetails",)"
