@@ -2,8 +2,8 @@
 
 #include <cstddef>
 
-// Puts a switch in front of an allocation function of C in this test program, which is linked with
-// --wrap=<function>: while a FailingAllocation lives, every call fails.
+// Replaces an allocation function of C in this test program, which is linked with
+// --wrap=<function>: while a FailingAllocation exists, every call fails.
 class FailingAllocation {
   public:
     FailingAllocation() { active = true; }

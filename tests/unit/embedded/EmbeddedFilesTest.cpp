@@ -13,7 +13,7 @@
 
 namespace {
 
-// Byte order of the method names, but those in lower case first.
+// In byte order of the method names, except that names in lower case come first.
 bool comesBefore(const std::string& one, const std::string& other) {
     const bool oneIsLower = std::islower(static_cast<unsigned char>(one.front())) != 0;
     const bool otherIsLower = std::islower(static_cast<unsigned char>(other.front())) != 0;
@@ -49,16 +49,16 @@ TEST(EmbeddedFiles, BeginWithTheSchemasInTableOrder) {
     const std::vector<std::string> expected = schemaNames();
     ASSERT_GE(names.size(), expected.size());
     names.resize(expected.size());
-    EXPECT_EQ(expected, names);
+    EXPECT_EQ(names, expected);
 }
 
-TEST(EmbeddedFiles, HoldEachSchemaAsItsSourceFileStands) {
+TEST(EmbeddedFiles, HoldEachSchemaExactlyAsInItsSourceFile) {
     for (const EmbeddedFile& file : embeddedFiles()) {
         if (!isJson(file.name))
             continue;
         const std::string source = contentOf(EMBEDDED_SOURCES "/schemas/" + std::string(file.name));
         ASSERT_FALSE(source.empty()) << file.name;
-        EXPECT_EQ(source, std::string(file.data, file.size)) << file.name;
+        EXPECT_EQ(std::string(file.data, file.size), source) << file.name;
     }
 }
 

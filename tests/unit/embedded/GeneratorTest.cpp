@@ -11,7 +11,7 @@ const EmbeddedFile& fileAt(int index) {
 }
 
 TEST(EmbeddingGenerator, KeepsEveryByteOfAFile) {
-    // The fixture, written out: among others a NUL before a digit and a would-be trigraph.
+    // The content of the fixture; it includes a NUL before a digit and what looks like a trigraph.
     const char expected[] =
         "quote \" backslash \\ trigraph ?\?= percent %s\r\n"
         "nul \0"
@@ -20,26 +20,26 @@ TEST(EmbeddingGenerator, KeepsEveryByteOfAFile) {
         "\xe3\x81\x82\xff\x7f\n"
         "\rlast line without an end";
     const EmbeddedFile& file = fileAt(0);
-    EXPECT_EQ(std::string(expected, sizeof(expected) - 1), std::string(file.data, file.size));
+    EXPECT_EQ(std::string(file.data, file.size), std::string(expected, sizeof(expected) - 1));
 }
 
 TEST(EmbeddingGenerator, NamesAFileWithoutItsFolder) {
-    EXPECT_STREQ("awkward.bin", fileAt(0).name);
-    EXPECT_STREQ("empty.txt", fileAt(1).name);
+    EXPECT_STREQ(fileAt(0).name, "awkward.bin");
+    EXPECT_STREQ(fileAt(1).name, "empty.txt");
 }
 
 TEST(EmbeddingGenerator, KeepsTheOrderGiven) {
-    EXPECT_EQ(2, embeddedFiles().end() - embeddedFiles().begin());
+    EXPECT_EQ(embeddedFiles().end() - embeddedFiles().begin(), 2);
 }
 
 TEST(EmbeddingGenerator, EmbedsAnEmptyFile) {
-    EXPECT_EQ(0u, fileAt(1).size);
-    EXPECT_STREQ("", fileAt(1).data);
+    EXPECT_EQ(fileAt(1).size, 0u);
+    EXPECT_STREQ(fileAt(1).data, "");
 }
 
-TEST(EmbeddingGenerator, PutsANulBehindEachFile) {
+TEST(EmbeddingGenerator, PutsANulAfterEachFile) {
     for (const EmbeddedFile& file : embeddedFiles())
-        EXPECT_EQ('\0', file.data[file.size]) << file.name;
+        EXPECT_EQ(file.data[file.size], '\0') << file.name;
 }
 
 }  // namespace

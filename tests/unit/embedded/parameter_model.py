@@ -1,7 +1,7 @@
-"""What each method takes, written by hand and without a look at the schemas.
+"""What each method takes, written by hand independently of the schemas.
 
-The tests hold the schemas against this table, and a random stream of requests against the outcomes
-that `first_failure` works out from it.
+The tests compare the schemas with this table, and the outcomes of random requests with those that
+`first_failure` derives from it.
 """
 
 from dataclasses import dataclass
@@ -80,7 +80,7 @@ DEFINITIONS = {
     "new_chassis_name": Text(),
 }
 
-# Members that stand in the method's own schema.
+# Members that are defined in the method's own schema.
 INLINE = {
     "access": Choice((1, 3, "ReadOnly", "ReadWrite")),
     "force_reserve": Flag(),
@@ -228,7 +228,7 @@ METHODS = [
 ]
 
 
-# ---- What becomes of a request -------------------------------------------------------------------
+# ---- The expected outcome of a request -----------------------------------------------------------
 
 
 def is_number(value) -> bool:
@@ -291,7 +291,7 @@ def is_among(value, items) -> bool:
 
 
 def value_failure(shape, value, pointer: str, texts: dict) -> tuple[str, str] | None:
-    """The pointer to what is wrong with a value, and the sentence that says what is."""
+    """The pointer to what is wrong with a value, and the sentence that describes it."""
     fault = None
     match shape:
         case Text():
@@ -322,7 +322,7 @@ def bytes_failure(value, pointer: str) -> tuple[str, str] | None:
 
 
 def first_failure(method: Method, params: list, texts: dict) -> tuple[str, str] | None:
-    """`params` are pairs in the order of the request; `texts` the sentences by their names."""
+    """`params` are pairs in the order of the request; `texts` the sentences by name."""
     for name, value in params:
         pointer = f"#/params/{name}"
         if name not in method.members:

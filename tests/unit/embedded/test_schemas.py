@@ -1,4 +1,4 @@
-"""Holds the schema files against the model of the parameters."""
+"""Compares the schema files with the model of the parameters."""
 
 import json
 import re
@@ -137,11 +137,11 @@ def test_there_is_one_schema_for_each_method_and_no_other_file():
 
 
 @pytest.mark.parametrize("method", METHODS, ids=lambda method: method.name)
-def test_schema_of_method_is_as_the_model_says_in_all_its_orders(method):
+def test_schema_of_method_equals_the_model_in_content_and_order(method):
     assert in_order(load(method.file)) == in_order(expected_schema(method))
 
 
-def test_definitions_are_as_the_model_says_in_all_their_orders():
+def test_definitions_equal_the_model_in_content_and_order():
     expected = {name: expected_definition(shape) for name, shape in DEFINITIONS.items()}
     definitions = load("definitions.json")
     assert list(definitions) == ["$schema", "definitions"]
@@ -149,7 +149,7 @@ def test_definitions_are_as_the_model_says_in_all_their_orders():
     assert in_order(definitions["definitions"]) == in_order(expected)
 
 
-# A reference to nothing, and a pattern that cannot be read, would accept any value without a word.
+# A reference to nothing, or a pattern that cannot be parsed, would silently accept any value.
 
 
 @pytest.mark.parametrize("name", ALL_FILES)
@@ -161,7 +161,7 @@ def test_every_reference_resolves(name):
 
 
 @pytest.mark.parametrize("name", ALL_FILES)
-def test_every_pattern_keeps_to_anchors_and_one_repeated_class(name):
+def test_every_pattern_consists_of_anchors_and_one_repeated_class(name):
     patterns = [
         schema["pattern"] for schema in schemas_within(load(name)) if "pattern" in schema
     ]

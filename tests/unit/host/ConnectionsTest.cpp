@@ -26,7 +26,7 @@ class Pair {
     }
     int host() const { return ends[0]; }
 
-    // Whether the client sees the end of the connection within a moment.
+    // Whether the client sees the end of the connection within kMoment.
     bool isShut() const {
         pollfd client = {ends[1], POLLIN, 0};
         return poll(&client, 1, static_cast<int>(kMoment.count())) == 1;
@@ -36,8 +36,8 @@ class Pair {
     int ends[2] = {-1, -1};
 };
 
-// Looks for overdue connections, as the host does all the time, until `condition` holds. Returns
-// how many seconds that took.
+// Closes overdue connections, as the host does all the time, until `condition` holds. Returns how
+// many seconds that took.
 double shutOverdueUntil(Connections& connections, const std::function<bool()>& condition) {
     using Clock = std::chrono::steady_clock;
     const Clock::time_point begin = Clock::now();
@@ -48,7 +48,7 @@ double shutOverdueUntil(Connections& connections, const std::function<bool()>& c
     return std::chrono::duration<double>(Clock::now() - begin).count();
 }
 
-TEST(Connections, ShutAConnectionThatWaitsLongerThanThePatience) {
+TEST(Connections, CloseAConnectionThatIsIdleLongerThanTheTimeout) {
     const Pair pair;
     Connections connections(10, 1);
     connections.add(pair.host());
@@ -58,7 +58,7 @@ TEST(Connections, ShutAConnectionThatWaitsLongerThanThePatience) {
     EXPECT_GE(seconds, 1.0);
 }
 
-TEST(Connections, LeaveAConnectionThatTheHostWorksForAlone) {
+TEST(Connections, DoNotCloseAConnectionWhoseRequestIsBeingProcessed) {
     const Pair working;
     const Pair waiting;
     Connections connections(10, 1);
@@ -68,7 +68,7 @@ TEST(Connections, LeaveAConnectionThatTheHostWorksForAlone) {
     EXPECT_FALSE(working.isShut());
 }
 
-TEST(Connections, CountThePatienceFromTheLastStep) {
+TEST(Connections, MeasureTheTimeoutFromTheLastActivity) {
     const Pair first;
     const Pair second;
     Connections connections(10, 1);
@@ -81,7 +81,7 @@ TEST(Connections, CountThePatienceFromTheLastStep) {
     EXPECT_FALSE(second.isShut());
 }
 
-TEST(Connections, ShutAWaitingConnectionSoonerWhenAllPlacesAreTaken) {
+TEST(Connections, CloseAnIdleConnectionSoonerWhenAllSlotsAreTaken) {
     const Pair first;
     const Pair second;
     Connections connections(2, 86400);
@@ -92,7 +92,7 @@ TEST(Connections, ShutAWaitingConnectionSoonerWhenAllPlacesAreTaken) {
     EXPECT_FALSE(second.isShut());
 }
 
-TEST(Connections, HaveAPlaceUntilAsManyAreOpenAsTheHostTakes) {
+TEST(Connections, HaveAFreeSlotUntilTheLimitIsReached) {
     const Pair first;
     const Pair second;
     Connections connections(2, 1);
@@ -106,7 +106,7 @@ TEST(Connections, HaveAPlaceUntilAsManyAreOpenAsTheHostTakes) {
     EXPECT_TRUE(place.get());
 }
 
-TEST(Connections, KeepAPlaceForTheClientThatIsOnItsWayIn) {
+TEST(Connections, KeepASlotForTheClientThatIsConnecting) {
     const Pair pair;
     Connections connections(10, 1);
     EXPECT_TRUE(connections.waitForPlace());
@@ -117,13 +117,13 @@ TEST(Connections, KeepAPlaceForTheClientThatIsOnItsWayIn) {
     EXPECT_TRUE(next.get());
 }
 
-TEST(Connections, GiveThePlaceOfAClientThatNeverComesToTheNext) {
+TEST(Connections, GiveTheSlotOfAClientThatNeverConnectsToTheNext) {
     Connections connections(1, 1);
     EXPECT_TRUE(connections.waitForPlace());
     EXPECT_TRUE(connections.waitForPlace());
 }
 
-TEST(Connections, EndTheWaitForAPlaceWhenTheyAreClosed) {
+TEST(Connections, EndTheWaitForASlotWhenTheyAreClosed) {
     const Pair pair;
     Connections connections(1, 1);
     connections.add(pair.host());

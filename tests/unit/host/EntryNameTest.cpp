@@ -37,7 +37,7 @@ TEST(EntryName, MayHoldASlashOrANulThatIsEscaped) {
     EXPECT_THAT(entryNameOfPath("/qitrmc/a%2Fb%00"), Optional(ElementsAre('a', '/', 'b', 0)));
 }
 
-TEST(EntryName, KeepsAPercentSignThatBeginsNoEscape) {
+TEST(EntryName, KeepsAPercentSignThatDoesNotBeginAnEscape) {
     EXPECT_THAT(entryNameOfPath("/qitrmc/%"), Optional(ElementsAre('%')));
     EXPECT_THAT(entryNameOfPath("/qitrmc/%4"), Optional(ElementsAre('%', '4')));
     EXPECT_THAT(entryNameOfPath("/qitrmc/%4G%+1"),
@@ -50,14 +50,14 @@ TEST(EntryName, DecodesUtf8ToOneNumberForEachCharacter) {
     EXPECT_THAT(entryNameOfPath("/qitrmc/\xC3\xA9"), Optional(ElementsAre(0xE9)));
 }
 
-TEST(EntryName, HasTheReplacementCharacterForEachByteThatIsNotUtf8) {
+TEST(EntryName, ContainsTheReplacementCharacterForEachByteThatIsNotUtf8) {
     EXPECT_THAT(entryNameOfPath("/qitrmc/a%FFb"), Optional(ElementsAre('a', 0xFFFD, 'b')));
     EXPECT_THAT(entryNameOfPath("/qitrmc/%C3"), Optional(ElementsAre(0xFFFD)));
     EXPECT_THAT(entryNameOfPath("/qitrmc/%ED%A0%80"),
                 Optional(ElementsAre(0xFFFD, 0xFFFD, 0xFFFD)));
 }
 
-TEST(Entry, GivesItsNameThroughTheFourthOperation) {
+TEST(Entry, ReturnsItsNameThroughTheFourthOperation) {
     const Name name = {'C', 0x1F600};
     const host::Entry entry(name);
     const auto fourth =

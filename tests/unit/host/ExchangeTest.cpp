@@ -10,7 +10,7 @@ using host::Gate;
 constexpr uint32_t kMaxBody = 10;
 constexpr std::size_t kMebibyte = 1024 * 1024;
 
-TEST(Exchange, IsInFlightAsLongAsItLives) {
+TEST(Exchange, IsInFlightUntilItIsDestroyed) {
     Gate gate;
     {
         const Exchange exchange(gate, kMaxBody);
@@ -41,7 +41,7 @@ TEST(Exchange, RefusesADeclaredLengthAboveTheLimit) {
     }
 }
 
-TEST(Exchange, RefusesABodyThatGrowsAboveTheLimitAndForgetsIt) {
+TEST(Exchange, RefusesABodyThatGrowsAboveTheLimitAndDiscardsIt) {
     Gate gate;
     Exchange exchange(gate, kMaxBody);
     exchange.begin("http", "POST", "/qitrmc/Call", nullptr);
@@ -72,7 +72,7 @@ TEST(Exchange, RefusesPathsOutsideTheService) {
               "There is nothing here. The service is at /qitrmc/Call.\n");
 }
 
-TEST(Exchange, RefusesWhatThePolicyRefusesWhereverItGoes) {
+TEST(Exchange, RefusesWhatThePolicyRefusesOnEveryPath) {
     Gate gate;
     for (const char* path : {"/qitrmc/Call", "/elsewhere"}) {
         Exchange exchange(gate, kMaxBody);
@@ -85,7 +85,7 @@ TEST(Exchange, RefusesWhatThePolicyRefusesWhereverItGoes) {
     }
 }
 
-TEST(Exchange, AnswersAPreflightWithNothingButHeaders) {
+TEST(Exchange, AnswersAPreflightWithHeadersOnly) {
     Gate gate;
     Exchange exchange(gate, kMaxBody);
     exchange.admit({"", true, {{"Vary", "Origin"}}});

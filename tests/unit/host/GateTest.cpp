@@ -20,7 +20,7 @@ TEST(Gate, IsEmptyUntilARequestEnters) {
     EXPECT_TRUE(gate.waitUntilEmpty(milliseconds(0)));
 }
 
-TEST(Gate, LetsNobodyInOnceItIsClosed) {
+TEST(Gate, RefusesRequestsOnceItIsClosed) {
     Gate gate;
     EXPECT_FALSE(gate.isClosed());
     EXPECT_TRUE(gate.enter());
@@ -31,7 +31,7 @@ TEST(Gate, LetsNobodyInOnceItIsClosed) {
     EXPECT_TRUE(gate.waitUntilEmpty(milliseconds(0)));
 }
 
-// What closes the gate and what enters it meet without a data race: the thread sanitizer sees one.
+// Closing and entering concurrently must not be a data race, which the thread sanitizer reports.
 TEST(Gate, ClosesWhileRequestsEnter) {
     Gate gate;
     std::atomic<bool> entered{false};

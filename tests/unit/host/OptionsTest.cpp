@@ -75,7 +75,7 @@ TEST(Options, AValueMayFollowAnEqualsSign) {
     EXPECT_EQ(parseOptions({"--plugin=a=b.so"}).plugin, "a=b.so");
 }
 
-TEST(Options, TheLastOptionOfANameHolds) {
+TEST(Options, ALaterOptionReplacesAnEarlierOneOfTheSameName) {
     EXPECT_EQ(parseOptions({"--threads", "3", "--threads=4"}).threads, 4u);
 }
 
@@ -102,7 +102,7 @@ TEST(Options, AHostNameWithAPortIsRefused) {
     }
 }
 
-TEST(Options, WhatNoPageIsOfIsNoOriginToAllow) {
+TEST(Options, AnAllowedOriginMustBeASchemeAndAHost) {
     for (const char* text : {"", "null", "*", "localhost:3000", "http://a/", "http://a/page",
                              "http://", "://a", "http://user@a", "http://a:65536"}) {
         EXPECT_EQ(usageErrorOf({"--allow-origin", text}),
@@ -112,7 +112,7 @@ TEST(Options, WhatNoPageIsOfIsNoOriginToAllow) {
     }
 }
 
-TEST(Options, HelpAndVersionWinOverWhatFollows) {
+TEST(Options, HelpAndVersionTakePrecedenceOverLaterArguments) {
     for (const char* option : {"--help", "-h"}) {
         for (const char* next : {"--nonsense", "--threads", "--threads=0"}) {
             EXPECT_THAT(parseOptions({option, next}).notice, StartsWith("Usage: qitrmc-host "))
@@ -145,7 +145,7 @@ TEST(Options, NumbersOutsideTheirRangeAreRefused) {
               "--timeout takes a number from 1 to 86400, not \"86401\".");
 }
 
-TEST(Options, TheLimitsOfTheRangesAreTaken) {
+TEST(Options, TheLimitsOfTheRangesAreAccepted) {
     EXPECT_EQ(parseOptions({"--threads", "1"}).threads, 1u);
     EXPECT_EQ(parseOptions({"--threads", "900"}).threads, 900u);
     EXPECT_EQ(parseOptions({"--max-body", "4294967295"}).maxBody, 4294967295u);
@@ -153,7 +153,7 @@ TEST(Options, TheLimitsOfTheRangesAreTaken) {
     EXPECT_EQ(parseOptions({"--listen", "host:65535"}).port, "65535");
 }
 
-TEST(Options, TextThatIsNoNumberIsRefused) {
+TEST(Options, TextThatIsNotANumberIsRefused) {
     for (const char* text : {"", "x", "1x", " 1", "+1", "-1", "0x1", "1.0"})
         EXPECT_THAT(usageErrorOf({"--threads", text}), HasSubstr("--threads takes")) << text;
 }
@@ -186,7 +186,7 @@ TEST(Options, AnEmptyPathIsRefused) {
                   std::string(option) + " takes a path, not an empty text.");
 }
 
-TEST(Options, AnEmptyTextBehindAnEqualsSignIsTheValueAndNotTheNextArgument) {
+TEST(Options, AnEmptyTextAfterAnEqualsSignIsTheValue) {
     EXPECT_EQ(usageErrorOf({"--plugin=", "--state", "s"}),
               "--plugin takes a path, not an empty text.");
     EXPECT_EQ(usageErrorOf({"--threads=", "3"}),

@@ -26,7 +26,7 @@ class OriginPolicyTest : public testing::Test {
     const OriginPolicy policy{"http", {"lab-pc", "::"}, {"https://app.example", "http://ui:3000"}};
 };
 
-TEST_F(OriginPolicyTest, ProgramsPassWithNothingAddedToTheirResponse) {
+TEST_F(OriginPolicyTest, ClientsWithoutAnOriginPassWithoutAddedHeaders) {
     for (const char* host : {"127.0.0.1:8080", "127.9.9.9", "localhost:1", "LocalHost",
                              "[::1]:8080", "[::ffff:127.0.0.1]", "192.0.2.7:8080",
                              "[::ffff:192.0.2.7]", "lab-pc:80", "LAB-PC", "[::]:8080"}) {
@@ -37,7 +37,7 @@ TEST_F(OriginPolicyTest, ProgramsPassWithNothingAddedToTheirResponse) {
     }
 }
 
-TEST_F(OriginPolicyTest, ANameThatIsNotOursIsRefusedWithTheOptionThatTakesIt) {
+TEST_F(OriginPolicyTest, AnUnknownHostNameIsRefusedWithTheOptionThatAllowsIt) {
     EXPECT_EQ(refusalOf(sourceOf({"Evil.example:8080"})),
               "Requests to the host name evil.example are not taken. Use an address of this "
               "machine, or start the host with --host-name evil.example.\n");
@@ -46,14 +46,14 @@ TEST_F(OriginPolicyTest, ANameThatIsNotOursIsRefusedWithTheOptionThatTakesIt) {
         EXPECT_THAT(refusalOf(sourceOf({host})), HasSubstr("--host-name")) << host;
 }
 
-TEST_F(OriginPolicyTest, AHostThatIsNoneIsRefused) {
+TEST_F(OriginPolicyTest, AMalformedHostIsRefused) {
     EXPECT_EQ(refusalOf(sourceOf({"a b"})),
               "The Host \"a b\" is not a name or address. Send the one that stands in the URL.\n");
     for (const char* host : {"", ":80", "[::1", "127.0.0.1@evil", "localhost/", "localhost:x"})
         EXPECT_THAT(refusalOf(sourceOf({host})), HasSubstr("not a name or address")) << host;
 }
 
-TEST_F(OriginPolicyTest, ARebindingSitesOwnPageIsRefusedForItsHost) {
+TEST_F(OriginPolicyTest, APageThatUsesDnsRebindingIsRefusedForItsHost) {
     EXPECT_THAT(refusalOf(sourceOf({"evil.example:8080"}, {"http://evil.example:8080"})),
                 HasSubstr("--host-name evil.example"));
 }
@@ -69,7 +69,7 @@ TEST_F(OriginPolicyTest, WithoutAHostOnlyRequestsWithoutAnOriginPass) {
     EXPECT_EQ(refusalOf(sourceOf({}, {"https://app.example"})), "");
 }
 
-TEST_F(OriginPolicyTest, ItsOwnOriginPassesWithNothingAddedToTheResponse) {
+TEST_F(OriginPolicyTest, ItsOwnOriginPassesWithoutAddedHeaders) {
     const struct {
         const char* host;
         const char* origin;
@@ -164,14 +164,14 @@ TEST_F(OriginPolicyTest, APreflightOfAForeignOriginIsRefused) {
     EXPECT_FALSE(policy.judge(source).isPreflight);
 }
 
-TEST(OriginPolicy, BehindTlsItsOwnOriginIsASecureOne) {
+TEST(OriginPolicy, BehindTlsItsOwnOriginIsAnHttpsOrigin) {
     const OriginPolicy policy("https", {}, {});
     EXPECT_EQ(policy.judge(sourceOf({"localhost"}, {"https://localhost:443"})).refusal, "");
     EXPECT_NE(policy.judge(sourceOf({"localhost"}, {"http://localhost:443"})).refusal, "");
     EXPECT_NE(policy.judge(sourceOf({"localhost:80"}, {"http://localhost"})).refusal, "");
 }
 
-TEST(Source, TakesTheHeadersItKnowsHoweverTheyAreSpelt) {
+TEST(Source, ReadsItsHeadersInAnyLetterCase) {
     Source source;
     source.takeHeader("HOST", "a");
     source.takeHeader("host", "b");

@@ -14,19 +14,19 @@ using host::localAddress;
 using host::parseAuthority;
 using host::parseOrigin;
 
-TEST(CanonicalHost, IsOneTextHoweverTheHostWasWritten) {
+TEST(CanonicalHost, IsTheSameForEverySpellingOfAHost) {
     EXPECT_EQ(canonicalHost("Lab-PC.Example"), "lab-pc.example");
     EXPECT_EQ(canonicalHost("192.0.2.7"), "192.0.2.7");
     EXPECT_EQ(canonicalHost("0:0:0:0:0:0:0:1"), "::1");
     EXPECT_EQ(canonicalHost("FE80::00A"), "fe80::a");
 }
 
-TEST(CanonicalHost, TakesTheIpv4AddressOutOfAnIpv6Address) {
+TEST(CanonicalHost, ExtractsTheIpv4AddressFromAnIpv6Address) {
     EXPECT_EQ(canonicalHost("::ffff:192.0.2.7"), "192.0.2.7");
     EXPECT_EQ(canonicalHost("::FFFF:7f00:1"), "127.0.0.1");
 }
 
-TEST(CanonicalHost, IsNothingForWhatIsNoHost) {
+TEST(CanonicalHost, IsAbsentForWhatIsNotAHost) {
     for (const char* text :
          {"", " ", "a b", "a/b", "a@b", "[::1]", "a:80", ":", "::g", "*", "a\n", "\xC3\xA4"})
         EXPECT_EQ(canonicalHost(text), std::nullopt) << text;
@@ -38,7 +38,7 @@ TEST(ParseAuthority, ReadsHostAndPort) {
     EXPECT_EQ(parseAuthority("127.0.0.1:65535", "http"), (Authority{"127.0.0.1", 65535}));
 }
 
-TEST(ParseAuthority, KnowsThePortThatIsLeftOut) {
+TEST(ParseAuthority, AddsTheDefaultPort) {
     for (const char* text : {"a", "a:"}) {
         EXPECT_EQ(parseAuthority(text, "http"), (Authority{"a", 80}));
         EXPECT_EQ(parseAuthority(text, "https"), (Authority{"a", 443}));
@@ -47,7 +47,7 @@ TEST(ParseAuthority, KnowsThePortThatIsLeftOut) {
     EXPECT_EQ(parseAuthority("[::1]", "http"), (Authority{"::1", 80}));
 }
 
-TEST(ParseAuthority, IsNothingForWhatIsNoAuthority) {
+TEST(ParseAuthority, IsAbsentForWhatIsNotAnAuthority) {
     for (const char* text :
          {"",        ":80",         "::1",   "::1:80",    "[::1",   "::1]:80", "[]:80",
           "[a]:80",  "[127.0.0.1]", "a:b",   "a:-1",      "a:+1",   "a:65536", "a:4294967376",
@@ -61,21 +61,21 @@ TEST(ParseOrigin, ComparesEqualForOneOriginInTwoForms) {
     EXPECT_EQ(parseOrigin("http://[0::1]:81"), parseOrigin("http://[::1]:81"));
 }
 
-TEST(ParseOrigin, TellsOriginsApart) {
+TEST(ParseOrigin, ComparesDifferentOriginsAsUnequal) {
     EXPECT_FALSE(parseOrigin("http://lab") == parseOrigin("https://lab"));
     EXPECT_FALSE(parseOrigin("http://lab:443") == parseOrigin("https://lab"));
     EXPECT_FALSE(parseOrigin("http://lab") == parseOrigin("http://lab:81"));
     EXPECT_FALSE(parseOrigin("http://lab") == parseOrigin("http://lab.example"));
 }
 
-TEST(ParseOrigin, IsNothingForWhatIsNoOrigin) {
+TEST(ParseOrigin, IsAbsentForWhatIsNotAnOrigin) {
     for (const char* text :
          {"", "null", "lab", "lab:80", "http:lab", "http://", "://lab", "http://lab/",
           "http://a http://b", "http://a,b", "ht tp://lab", "http://a@b"})
         EXPECT_FALSE(parseOrigin(text).has_value()) << text;
 }
 
-TEST(IsLoopback, KnowsAllAddressesOfTheMachineItself) {
+TEST(IsLoopback, RecognisesAllLoopbackAddresses) {
     for (const char* host : {"localhost", "::1", "127.0.0.1", "127.0.0.0", "127.255.255.255"})
         EXPECT_TRUE(isLoopback(host)) << host;
     for (const char* host : {"", "126.255.255.255", "128.0.0.1", "127.1", "127.0.0.1.example",
@@ -83,7 +83,7 @@ TEST(IsLoopback, KnowsAllAddressesOfTheMachineItself) {
         EXPECT_FALSE(isLoopback(host)) << host;
 }
 
-TEST(LocalAddress, IsTheAddressOfTheOwnEnd) {
+TEST(LocalAddress, IsTheAddressOfTheLocalEnd) {
     const int ipv4 = socket(AF_INET, SOCK_DGRAM, 0);
     sockaddr_in address = {};
     address.sin_family = AF_INET;
@@ -93,7 +93,7 @@ TEST(LocalAddress, IsTheAddressOfTheOwnEnd) {
     close(ipv4);
 }
 
-TEST(LocalAddress, IsEmptyWhenItCannotBeTold) {
+TEST(LocalAddress, IsEmptyWhenItIsUnknown) {
     EXPECT_EQ(localAddress(-1), "");
 }
 

@@ -8,7 +8,7 @@ namespace {
 
 class Runtime : public testing::Test {
   protected:
-    // The first `size` bytes of a buffer are the caller's; "#" shows what stays untouched.
+    // The first `size` bytes of a buffer belong to the caller; "#" shows what is not written.
     int readVariable(const char* name, uint32_t available) {
         buffer.assign(300, '#');
         size = available;
@@ -44,7 +44,7 @@ TEST_F(Runtime, FillsABufferOfExactlyTheVariablesSize) {
     EXPECT_EQ(start(6), std::string("POST\0#", 6));
 }
 
-TEST_F(Runtime, AsksForAVariablesLengthAndItsNul) {
+TEST_F(Runtime, RequiresRoomForAVariableAndItsNul) {
     request.method = "POST";
     EXPECT_NE(readVariable("REQUEST_METHOD", 4), 0);
     EXPECT_EQ(size, 5u);
@@ -53,7 +53,7 @@ TEST_F(Runtime, AsksForAVariablesLengthAndItsNul) {
     EXPECT_EQ(size, 5u);
 }
 
-TEST_F(Runtime, HasNoOtherVariable) {
+TEST_F(Runtime, KnowsNoOtherVariable) {
     for (const char* name : {"", "REQUEST_URI", "request_method", "REQUEST_METHOD "}) {
         EXPECT_NE(readVariable(name, 32), 0) << name;
         EXPECT_EQ(size, 0u) << name;
@@ -76,7 +76,7 @@ TEST_F(Runtime, FillsABufferOfExactlyTheBodysSizeWithoutANul) {
     EXPECT_EQ(size, 256u);
 }
 
-TEST_F(Runtime, AsksForExactlyTheBodysSize) {
+TEST_F(Runtime, RequiresRoomForExactlyTheBody) {
     request.body = std::string(257, 'b');
     EXPECT_NE(readBody(256), 0);
     EXPECT_EQ(size, 257u);
@@ -93,13 +93,13 @@ TEST_F(Runtime, ReadsAnEmptyBodyAsEmptyText) {
     EXPECT_EQ(size, 0u);
 }
 
-TEST_F(Runtime, ReadsABodyWithNulsWhole) {
+TEST_F(Runtime, ReadsABodyWithNulsCompletely) {
     request.body = std::string("a\0b", 3);
     EXPECT_EQ(readBody(256), 0);
     EXPECT_EQ(start(5), std::string("a\0b\0#", 5));
 }
 
-TEST_F(Runtime, RespondsWith200AndPlainTextUnlessToldOtherwise) {
+TEST_F(Runtime, RespondsWith200AndPlainTextByDefault) {
     EXPECT_EQ(request.code, 200);
     EXPECT_EQ(request.type, "text/plain");
     EXPECT_EQ(request.output, "");

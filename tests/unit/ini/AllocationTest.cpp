@@ -35,7 +35,7 @@ void operator delete(void* memory, std::size_t) noexcept {
 
 using namespace ini_test;
 
-TEST(IniAllocation, CreateGivesNullWithoutMemory) {
+TEST(IniAllocation, CreateReturnsNullWithoutMemory) {
     allocationsLeft = 0;
     IniFile* file = IniFile_create();
     allocationsLeft = -1;

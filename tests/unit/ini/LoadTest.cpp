@@ -31,7 +31,7 @@ TEST(IniLoad, UnreadableFileIsMinus5001) {
 TEST(IniLoad, FileThatDoesNotOpenIsMinus5001EvenForRoot) {
     const TemporaryFile place("");
     ASSERT_EQ(unlink(place.name()), 0);
-    // Nobody opens a socket as a file.
+    // A socket cannot be opened as a file, not even by root.
     ASSERT_EQ(mknod(place.name(), S_IFSOCK | 0600, 0), 0);
     EXPECT_EQ(IniFile_load(created().get(), place.name()), -5001);
 }
@@ -46,11 +46,11 @@ TEST(IniLoad, KeepsPathAndModificationTime) {
     EXPECT_EQ(file->modified, properties.st_mtime);
 }
 
-TEST(IniLoad, PassesTheMarkOfUtf8) {
+TEST(IniLoad, SkipsTheByteOrderMarkOfUtf8) {
     EXPECT_EQ(contents(*loaded("\xEF\xBB\xBF[a]\nb=1\n")), (Texts{"[a]", "b=1"}));
 }
 
-TEST(IniLoad, RefusesTheMarksOfWiderEncodings) {
+TEST(IniLoad, RefusesTheByteOrderMarksOfOtherEncodings) {
     const std::string marks[] = {"\xFF\xFE", "\xFE\xFF", std::string("\xFF\xFE\0\0", 4),
                                  std::string("\0\0\xFE\xFF", 4)};
     for (const std::string& mark : marks) {

@@ -24,7 +24,7 @@ TEST(IniLines, TwoDifferentEndsCountAsOne) {
     EXPECT_EQ(lineOfKey(std::string("\0\0", 2)), 3);
 }
 
-TEST(IniLines, EndMayLieAcrossTheReadBuffer) {
+TEST(IniLines, EndMayBeSplitByTheReadBuffer) {
     for (std::size_t length : {2082u, 2083u, 2084u, 2085u, 4167u, 4168u}) {
         SCOPED_TRACE(length);
         const File file = loaded(";" + std::string(length - 1, 'x') + "\r\n[a]\r\nb=1\r\n");
@@ -82,7 +82,7 @@ TEST(IniParse, AppendsRepeatedNamesWithoutMerging) {
     EXPECT_EQ(contents(*file), (Texts{"[a]", "k=1", "k=2", "[a]", "k=3"}));
 }
 
-TEST(IniParse, ToldToDistinguishesCase) {
+TEST(IniParse, DistinguishesCaseOnRequest) {
     const TemporaryFile source("[a]\nk=1\nK=2\n[A]\nk=3\n");
     const File file = created();
     file->ignoreCase = false;

@@ -32,12 +32,12 @@ TEST(IniSplitValues, RunNeedsANumberOneToBegin) {
     EXPECT_EQ(joined("T Line2=x\nT Line3=y\n"), (Texts{"[s]", "T Line2=x", "T Line3=y"}));
 }
 
-TEST(IniSplitValues, EndingIsTakenToTheLetter) {
+TEST(IniSplitValues, EndingMustMatchExactly) {
     EXPECT_EQ(joined("TLine1=x\nT Line=y\nT Line1x=z\nT Line 1=u\nLine1=v\n"),
               (Texts{"[s]", "TLine1=x", "T Line=y", "T Line1x=z", "T Line 1=u", "Line1=v"}));
 }
 
-TEST(IniSplitValues, SectionsAreJoinedOneByOne) {
+TEST(IniSplitValues, EachSectionIsJoinedSeparately) {
     EXPECT_EQ(contents(*loaded("[a]\nT Line1=x\n[b]\nT Line2=y\n")),
               (Texts{"[a]", "T=x", "[b]", "T Line2=y"}));
 }

@@ -16,7 +16,7 @@ std::string nested(std::size_t depth) {
 
 }  // namespace
 
-TEST(JsonzAllocation, OnlyDepthsBeyondAnyHonestTextNeedMemory) {
+TEST(JsonzAllocation, OnlyNestingDeeperThan4096LevelsNeedsMemory) {
     const std::string fits = nested(4096);
     const std::string tooDeep = nested(4097);
     const FailingAllocation failing;

@@ -17,7 +17,7 @@ std::string repeated(const std::string& part, std::size_t times) {
 
 }  // namespace
 
-TEST(JsonzContainer, ReadsArraysAndObjectsWhole) {
+TEST(JsonzContainer, ReadsCompleteArraysAndObjects) {
     const Reading array(" [1, \"a\" ,[ ] ,{ }, null] ,");
     EXPECT_EQ(array.value.type, 5);
     EXPECT_EQ(array.offset(array.value.text), 1);
@@ -30,7 +30,7 @@ TEST(JsonzContainer, ReadsArraysAndObjectsWhole) {
     EXPECT_EQ(Reading("{}").consumed, 2);
 }
 
-TEST(JsonzContainer, ArrayTellsItsFault) {
+TEST(JsonzContainer, FaultInAnArrayIsReported) {
     expectFault("[1,2,]", 5, 8);
     expectFault("[1,2, ]", 6, 8);
     expectFault("[1 2]", 3, 6);
@@ -42,20 +42,20 @@ TEST(JsonzContainer, ArrayTellsItsFault) {
     expectFault("[,]", 1, 2);
 }
 
-TEST(JsonzContainer, NestedArrayTellsItsFault) {
+TEST(JsonzContainer, FaultInANestedArrayIsReported) {
     expectFault("[[1,2,]]", 6, 8);
     expectFault("[[[1 2]]]", 5, 6);
     expectFault("[[1]", 4, 4);
 }
 
-TEST(JsonzContainer, ObjectTellsAFaultBehindAMember) {
+TEST(JsonzContainer, FaultAfterAMemberIsReported) {
     expectFault("{\"a\":1", 6, 3);
     expectFault("{\"a\":1,}", 7, 8);
     expectFault("{\"a\":1 \"b\":2}", 7, 6);
     expectFault("[{\"a\":1]", 7, 6);
 }
 
-TEST(JsonzContainer, ObjectDropsTheDetailsOfAFaultInAMember) {
+TEST(JsonzContainer, FaultInAMemberIsReportedWithoutDetails) {
     expectBareFault("{\"a\":x}");
     expectBareFault("{\"a\" 1}");
     expectBareFault("{a:1}");
@@ -67,7 +67,7 @@ TEST(JsonzContainer, ObjectDropsTheDetailsOfAFaultInAMember) {
     expectBareFault("{");
 }
 
-TEST(JsonzContainer, FaultBehindANestedObjectBelongsToTheArray) {
+TEST(JsonzContainer, FaultAfterANestedObjectIsReportedForTheArray) {
     expectFault("[{\"a\":1} 2]", 9, 6);
     expectFault("[{\"a\":[1]},]", 11, 8);
 }
@@ -80,8 +80,8 @@ TEST(JsonzContainer, ReadsAnyDepthWithoutOverflowingTheStack) {
     EXPECT_EQ(Reading(mixed.c_str()).consumed, static_cast<long>(mixed.size()));
 }
 
-TEST(JsonzContainer, KeepsTheKindsOfDeepContainersApart) {
-    // 4096 levels are held without memory of the heap; the faults lie on both sides of that.
+TEST(JsonzContainer, DistinguishesArraysAndObjectsAtAnyDepth) {
+    // 4096 levels are held without heap memory; the tested faults are below and above that.
     for (std::size_t depth : {4094u, 4095u, 4096u, 4097u, 70000u}) {
         SCOPED_TRACE(depth);
         const std::string open = repeated("[", depth);

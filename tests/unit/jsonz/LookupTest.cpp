@@ -38,7 +38,7 @@ TEST(JsonzFindMember, FindsTheFirstMatch) {
     EXPECT_EQ(memberOffset("{\"\":1}", ""), 4);
 }
 
-TEST(JsonzFindMember, LooksAtItsOwnLevelOnly) {
+TEST(JsonzFindMember, SearchesItsOwnLevelOnly) {
     EXPECT_EQ(memberOffset("{\"x\":{\"a\":1},\"y\":[{\"a\":2}],\"a\":3}", "a"), 31);
     EXPECT_EQ(memberOffset("{\"x\":{\"a\":1}}", "a"), -1);
     EXPECT_EQ(memberOffset("{\"x\":\"a\"}", "a"), -1);
@@ -61,7 +61,7 @@ TEST(JsonzFindMember, ResolvesEscapesInKeys) {
     EXPECT_EQ(memberOffset("{\"\\u0000\":1}", ""), -1);
 }
 
-TEST(JsonzFindMember, PassesKeysThatDecodeToNothing) {
+TEST(JsonzFindMember, SkipsKeysThatDecodeToNothing) {
     EXPECT_EQ(memberOffset("{\"\\ud83d\":1,\"a\":2}", "a"), 16);
 }
 
@@ -85,7 +85,7 @@ TEST(JsonzElements, WalksAnArray) {
     EXPECT_EQ(elements(" [ null ] , 5"), (Texts{"null"}));
 }
 
-TEST(JsonzElements, EmptyOrNoArrayHasNoFirstElement) {
+TEST(JsonzElements, WhatIsEmptyOrNotAnArrayHasNoFirstElement) {
     EXPECT_EQ(jsonz_firstElement("[]"), nullptr);
     EXPECT_EQ(jsonz_firstElement("[ \n]"), nullptr);
     EXPECT_EQ(jsonz_firstElement("["), nullptr);
@@ -102,7 +102,7 @@ TEST(JsonzElements, WalkEndsWhereNoCommaFollows) {
     EXPECT_EQ(jsonz_nextElement(nullptr), nullptr);
 }
 
-TEST(JsonzGetString, GivesTheTextOrTheDefault) {
+TEST(JsonzGetString, ReturnsTheTextOrTheDefault) {
     std::size_t length = 77;
     const char* end = nullptr;
     const char* text = " \"a\\nb\",";

@@ -15,7 +15,7 @@ TEST(JsonzGetInt, ReadsWholeNumbers) {
     EXPECT_EQ(jsonz_getInt("-2147483648", 7), lowest);
 }
 
-TEST(JsonzGetInt, CutsOffFractions) {
+TEST(JsonzGetInt, TruncatesFractions) {
     EXPECT_EQ(jsonz_getInt("1.9", 7), 1);
     EXPECT_EQ(jsonz_getInt("-1.9", 7), -1);
     EXPECT_EQ(jsonz_getInt("1.", 7), 1);
@@ -28,7 +28,7 @@ TEST(JsonzGetInt, ReadsALeadingZeroAsOctal) {
     EXPECT_EQ(jsonz_getInt("08", 7), 0);
 }
 
-TEST(JsonzGetInt, GivesTheDefaultForEverythingElse) {
+TEST(JsonzGetInt, ReturnsTheDefaultForEverythingElse) {
     for (const char* text : {"\"1\"", "true", "null", "[1]", "{}", "x", "", "-", "-.", "1e"}) {
         SCOPED_TRACE(text);
         EXPECT_EQ(jsonz_getInt(text, 7), 7);
@@ -44,7 +44,7 @@ TEST(JsonzGetInt, SaturatesOutOfRange) {
     EXPECT_EQ(jsonz_getInt("1e-999999999", 7), 0);
 }
 
-TEST(JsonzGetInt, TellsWhereTheValueEnds) {
+TEST(JsonzGetInt, ReturnsTheEndOfTheValue) {
     const char* end = nullptr;
     const char* text = " 12,";
     EXPECT_EQ(jsonz_getInt(text, 7, &end), 12);

@@ -3,8 +3,8 @@
 
 #include "Reading.h"
 
-// The straightforward recursive reader, as the yardstick for the one that does not recurse. It
-// tells whether a text is read and where the value ends.
+// A straightforward recursive reader, with which the reader that does not recurse is compared. It
+// returns whether a text is accepted and where the value ends.
 namespace {
 
 class Yardstick {
@@ -119,7 +119,7 @@ TEST(JsonzRandomText, StaysInsideAnyText) {
         for (char& c : text) {
             c = alphabet[random() % (sizeof alphabet - 1)];
         }
-        // A block of its own size, so that a sanitizer sees a read behind the NUL.
+        // A block of exactly its size, so that a sanitizer detects a read past the NUL.
         const std::unique_ptr<char[]> exact(new char[text.size() + 1]);
         text.copy(exact.get(), text.size());
         exact[text.size()] = '\0';

@@ -32,7 +32,7 @@ inline void expectFault(const char* text, long position, std::int32_t error) {
     EXPECT_EQ(reading.value.error, error);
 }
 
-// A failure of which no detail is told.
+// Expects a failure that is reported without details.
 inline void expectBareFault(const char* text) {
     expectFault(text, -1, 0);
 }

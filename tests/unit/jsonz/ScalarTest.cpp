@@ -32,7 +32,7 @@ TEST(JsonzScalar, ReadsKeywordsByTheirOwnLength) {
     expectFault("True", 0, 2);
 }
 
-TEST(JsonzScalar, SkipsWhiteSpaceInFront) {
+TEST(JsonzScalar, SkipsLeadingWhiteSpace) {
     EXPECT_EQ(Reading(" \t\r\n7").consumed, 5);
     expectFault("\v7", 0, 2);
     expectFault("  ", 2, 2);
@@ -48,7 +48,7 @@ TEST(JsonzScalar, ReadsStringsWithEscapesLeftInPlace) {
     EXPECT_EQ(Reading("\"\"").value.length, 0u);
 }
 
-TEST(JsonzScalar, TakesEachEscapeOfTheTable) {
+TEST(JsonzScalar, AcceptsEachKnownEscape) {
     EXPECT_EQ(Reading(R"("\"\/\\\b\f\n\r\t\u00fF")").value.type, 4);
 }
 

@@ -69,7 +69,7 @@ TEST(JsonzUnescape, StopsAtALoneSurrogate) {
     expectFaultAfter("ab\\ude00c", "ab");
 }
 
-TEST(JsonzUnescape, ALowSurrogateBeginsNoPair) {
+TEST(JsonzUnescape, ALowSurrogateDoesNotBeginAPair) {
     expectFaultAfter("ab\\ude00\\ude00", "ab");
     expectFaultAfter("ab\\udc00\\udc00", "ab");
     expectFaultAfter("ab\\udfff\\udc01c", "ab");

@@ -30,7 +30,7 @@ TEST(DscExceptions, CarryTheirTextsAndCodes) {
     expectThrown<DeserializationError>("Failed to deserialize", 0xFFFFFFFF);
 }
 
-TEST(DscExceptions, SecondClassesAreAsTheirBases) {
+TEST(DscExceptions, DerivedClassesCarryTheSameAsTheirBases) {
     expectThrown<OutOfRange2, OutOfRange>("Out of range", 0x8ABC7007);
     expectThrown<BoundExceeded2, BoundExceeded>("A request was made that would exceed the bounds",
                                                 0xFFFFFFFF);

@@ -21,7 +21,7 @@ bool equal(const std::vector<std::uint32_t>& characters, const char* text) {
     return result;
 }
 
-// An address range that is never read.
+// A range of addresses that is never read.
 WideString fromRange(std::uintptr_t begin, std::uintptr_t end) {
     return WideString(reinterpret_cast<const std::uint32_t*>(begin),
                       reinterpret_cast<const std::uint32_t*>(end));

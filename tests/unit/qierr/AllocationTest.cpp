@@ -11,8 +11,8 @@ extern "C" void* __wrap_calloc(std::size_t count, std::size_t size) {
 using qierr_test::MeteredStatus;
 using qierr_test::textOf;
 
-// Runs the same report with memory that ends at each growth in turn: the code always stands, the
-// buffer keeps its format and the text stays readable.
+// Runs the same report with memory that runs out at each growth in turn: the code is always set,
+// the buffer keeps its format and the text stays readable.
 TEST(Allocation, FailureAtAnyGrowthLosesDetailsOnly) {
     const std::string filler(700, 'f');
     const std::vector<std::string> many(200, "element of some length");

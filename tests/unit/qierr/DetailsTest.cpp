@@ -17,7 +17,7 @@ constexpr const char* entry = "{\"type\":\"comment\",\"comment\":\"c\"}";
 
 }  // namespace
 
-TEST(OrderedData, MakesWhatIsMissing) {
+TEST(OrderedData, CreatesWhatIsMissing) {
     qierr::Status status;
     qierr_orderedData("mxlator_qitrmc", &status);
     expectBuffer(status, 512,
@@ -27,7 +27,7 @@ TEST(OrderedData, MakesWhatIsMissing) {
     EXPECT_EQ(afterComment("{\"a\":1}"), made);
 }
 
-TEST(OrderedData, MakesTheParentsOfTheArrayToo) {
+TEST(OrderedData, CreatesTheParentsOfTheArrayToo) {
     const std::string made = std::string("{\"translator\":\"T\",\"b\":2,\"translator_info\":") +
                              "{\"ordered_data\":[" + entry + "]}}";
     EXPECT_EQ(afterComment("{\"translator\":\"T\",\"b\":2}"), made);
@@ -36,7 +36,7 @@ TEST(OrderedData, MakesTheParentsOfTheArrayToo) {
                   entry + "]},\"b\":2}");
 }
 
-TEST(OrderedData, SecondCallGoesOnInTheSameArray) {
+TEST(OrderedData, SecondCallAppendsToTheSameArray) {
     qierr::Status status;
     addUsageUInt32(qierr_orderedData("T", &status), "kUsageTypeOffset", 4294967295u);
     addUsageString(qierr_orderedData("T", &status), "kUsageTypeMethod", "say \"hi\"");
@@ -69,7 +69,7 @@ TEST(OrderedData, ComparesTheNameWithItsEscapesResolved) {
             entry + "]}}");
 }
 
-TEST(OrderedData, LeavesTextsOfAnotherShapeAlone) {
+TEST(OrderedData, DoesNotChangeTextsOfAnotherStructure) {
     for (const char* text :
          {"[]", "1", "{\"a\"", "{\"translator\":1}", "{\"translator\":\"TT\"}",
           "{\"translator\":\"T\",\"translator_info\":[]}",
@@ -104,7 +104,7 @@ TEST(Details, StringArrayIsOneEntry) {
 }
 
 TEST(Details, LargeStringArrayTakesLinearTime) {
-    // Twenty megabytes of text: far beyond any time limit if each element cost a walk.
+    // Twenty megabytes of text exceed any time limit if each element costs a walk over the text.
     qierr::Status status;
     const std::vector<std::string> values(2000000, "element");
     const qierr_Writer writer = addUsageStringArray(qierr_orderedData("T", &status), "tag", values);

@@ -26,7 +26,7 @@ TEST(Exception, WhatIsEmptyWithoutText) {
     EXPECT_STREQ(static_cast<const std::exception&>(error).what(), "");
 }
 
-TEST(Exception, CopyMovesTheText) {
+TEST(Exception, CopyTakesOverTheText) {
     qierr::Status status;
     qierr_Status_setCodeAt(&status, -7, somewhere);
     const qierr::Exception first(&status);
@@ -56,7 +56,7 @@ TEST(Exception, IsCaughtByEitherBase) {
     status.code = -7;
     EXPECT_THROW(throw qierr::Exception(&status), qierr::ExceptionBase);
     EXPECT_THROW(throw qierr::Exception(&status), std::exception);
-    // The order of the handlers decides.
+    // The first matching handler is used.
     try {
         throw qierr::Exception(&status);
     } catch (const std::exception& error) {

@@ -47,7 +47,7 @@ TEST(Insertion, CommaPrecedesAtTheEnd) {
     EXPECT_EQ(inserted("{\"a\":\"{\"}", 8, "n"), "{\"a\":\"{\",\"n\":1}");
 }
 
-TEST(Insertion, GoesOnBehindAMemberInsertedAtTheStart) {
+TEST(Insertion, ContinuesAfterAMemberInsertedAtTheStart) {
     qierr::Status status;
     qierr_Status_setJson(&status, "{\"z\":0}");
     qierr_Writer writer{status.json, qierr_Status_growJson, &status};

@@ -24,8 +24,8 @@ inline void expectBuffer(const qierr_Status& status, std::uint32_t capacity,
     EXPECT_EQ(std::string(status.json, capacity), expected);
 }
 
-// A record that can be told to refuse memory. Its buffers are those of the default, so it serves as
-// a record of another program too.
+// A record that can be set to refuse memory. Its buffers are those of the default allocation, so it
+// serves as a record of another program too.
 class MeteredStatus : public qierr_Status {
   public:
     explicit MeteredStatus(int growthsLeft = 1000)

@@ -102,7 +102,7 @@ TEST(SetCodeAt, SuccessAfterSuccessAllocatesNothing) {
     EXPECT_EQ(status.json, nullptr);
 }
 
-TEST(SetCodeAt, CodeStandsWhenTheTextCannotBeWritten) {
+TEST(SetCodeAt, CodeIsSetEvenIfTheTextCannotBeWritten) {
     MeteredStatus status(0);
     bool written = true;
     EXPECT_EQ(qierr_Status_setCodeAt(&status, -1, somewhere, &written), 1);
@@ -111,7 +111,7 @@ TEST(SetCodeAt, CodeStandsWhenTheTextCannotBeWritten) {
     EXPECT_EQ(status.json, nullptr);
 }
 
-TEST(SetCodeAt, FlagTellsOfALaterFailureToo) {
+TEST(SetCodeAt, FlagIsSetByALaterFailureToo) {
     MeteredStatus status(1);
     bool written = true;
     const std::string file(600, 'f');
@@ -134,7 +134,7 @@ TEST(SetCodeNamed, WritesTheNameFirst) {
     EXPECT_EQ(qierr_Status_setCodeNamed(&status, -52003, somewhere), 0);
 }
 
-TEST(Take, MovesTheTextBetweenLikeRecords) {
+TEST(Take, MovesTheTextBetweenRecordsWithTheSameAllocation) {
     qierr::Status source, target;
     qierr_Status_setCodeAt(&source, -7, somewhere);
     const char* buffer = source.json;
@@ -159,7 +159,7 @@ TEST(Take, FreesTheTextOfASupersededWarning) {
     EXPECT_EQ(target.capacity, 0u);
 }
 
-TEST(Take, LeavesBothAloneWhenTheFirstErrorStands) {
+TEST(Take, ChangesNeitherWhenTheFirstErrorIsKept) {
     qierr::Status source, target;
     qierr_Status_setCodeAt(&source, -7, somewhere);
     target.code = -1;
@@ -171,7 +171,7 @@ TEST(Take, LeavesBothAloneWhenTheFirstErrorStands) {
     EXPECT_EQ(textOf(source), somewhereText);
 }
 
-TEST(Take, CopiesTheTextOfAnUnlikeRecord) {
+TEST(Take, CopiesTheTextOfARecordWithAnotherAllocation) {
     MeteredStatus source;
     qierr::Status target;
     qierr_Status_setCodeAt(&source, -7, somewhere);
@@ -180,7 +180,7 @@ TEST(Take, CopiesTheTextOfAnUnlikeRecord) {
     EXPECT_EQ(textOf(source), somewhereText);
 }
 
-TEST(Take, TellsWhenTheCopyFails) {
+TEST(Take, ReportsAFailedCopy) {
     qierr::Status source;
     MeteredStatus target(0);
     qierr_Status_setCodeAt(&source, -7, somewhere);
@@ -199,7 +199,7 @@ TEST(Take, RecordTakenFromItselfIsUnchanged) {
     EXPECT_EQ(textOf(status), somewhereText);
 }
 
-TEST(Merge, CopiesBetweenLikeRecords) {
+TEST(Merge, CopiesBetweenRecordsWithTheSameAllocation) {
     qierr::Status source, target;
     qierr_Status_setCodeAt(&source, -7, somewhere);
     EXPECT_EQ(qierr_Status_merge(&target, &source), 1);
@@ -209,7 +209,7 @@ TEST(Merge, CopiesBetweenLikeRecords) {
     expectBuffer(source, 512, somewhereText);
 }
 
-TEST(Merge, SourceWithoutTextGivesNone) {
+TEST(Merge, SourceWithoutTextAddsNone) {
     qierr::Status source, target;
     source.code = -7;
     EXPECT_EQ(qierr_Status_merge(&target, &source), 1);
@@ -234,7 +234,7 @@ TEST(Merge, FollowsPrecedence) {
     EXPECT_EQ(target.json, nullptr);
 }
 
-TEST(Merge, TellsWhenTheCopyFails) {
+TEST(Merge, ReportsAFailedCopy) {
     qierr::Status source;
     MeteredStatus target(0);
     qierr_Status_setCodeAt(&source, -7, somewhere);

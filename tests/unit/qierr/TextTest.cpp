@@ -84,7 +84,7 @@ TEST(DefaultRealloc, KeepsTheText) {
     expectBuffer(status, 1024, "{\"a\":[1]}");
 }
 
-TEST(DefaultRealloc, DoesNothingWhenTheRoomIsThere) {
+TEST(DefaultRealloc, DoesNothingWhenThereIsRoom) {
     qierr::Status status;
     qierr_Status_setJson(&status, nullptr);
     const char* buffer = status.json;
@@ -137,7 +137,7 @@ TEST(SetJson, FailureKeepsTheText) {
     expectBuffer(status, 512, "[1]");
 }
 
-TEST(SetJson, FailsWhenTheRoomIsNotThereAfterAll) {
+TEST(SetJson, FailsWhenTheReallocFunctionMakesNoRoom) {
     qierr_Status status{0, 0, [](qierr_Status*, std::uint32_t) { return 1; }, nullptr};
     EXPECT_EQ(qierr_Status_setJson(&status, nullptr), nullptr);
     EXPECT_EQ(qierr_Status_jsonEnd(&status, 2), nullptr);
@@ -193,7 +193,7 @@ TEST(JsonEnd, RefusesHostileLengths) {
     expectBuffer(status, 512, "{}");
 }
 
-TEST(JsonEnd, RefusesTextsThatAreNoContainer) {
+TEST(JsonEnd, RefusesTextsThatAreNotAContainer) {
     qierr::Status status;
     for (const char* text : {"1", "\"{}\"", " {}", "{\"a\"", "[1,]"}) {
         SCOPED_TRACE(text);
@@ -248,13 +248,13 @@ TEST(GrowJson, EndsWhenABufferDoesNotGrow) {
     expectBuffer(status, 8, "{}");
 }
 
-TEST(GrowJson, RefusesABufferTooSmallForAnyText) {
+TEST(GrowJson, RefusesABufferThatIsTooSmallForAnyText) {
     char buffer[2] = {'{', '}'};
     qierr_Status status{-1, sizeof buffer, [](qierr_Status*, std::uint32_t) { return 1; }, buffer};
     EXPECT_EQ(qierr_Status_growJson(buffer, &status), nullptr);
 }
 
-TEST(AddPosition, WritesBehindWhatIsThere) {
+TEST(AddPosition, WritesAfterExistingMembers) {
     qierr::Status status;
     char* end = qierr_Status_setJson(&status, "{\"a\":1}");
     char* pos = qierr_Status_addPosition(&status, end, qierr_test::somewhere);

@@ -51,7 +51,7 @@ TEST(Writer, WritesMembersOfEachKind) {
     EXPECT_EQ(e.offset(), static_cast<long>(expected.size()) - 1);
 }
 
-TEST(Writer, StandsInsideWhatItBegins) {
+TEST(Writer, ContinuesInsideTheContainerItBegins) {
     Edited e;
     e.writer = qierr_Writer_beginObject(e.writer, "k");
     EXPECT_EQ(textOf(e.status), "{\"k\":{}}");
@@ -85,7 +85,7 @@ TEST(Writer, DoesNothingOnceItsPositionIsNull) {
     expectBuffer(e.status, 512, "{}");
 }
 
-TEST(Writer, EndsTheChainOnTheWrongBracket) {
+TEST(Writer, FailsOnTheWrongBracket) {
     Edited e;
     EXPECT_EQ(qierr_Writer_endArray(e.writer).pos, nullptr);
     const qierr_Writer outside = qierr_Writer_endObject(e.writer);
@@ -95,7 +95,7 @@ TEST(Writer, EndsTheChainOnTheWrongBracket) {
     EXPECT_EQ(textOf(e.status), "{}");
 }
 
-TEST(Writer, CarriesItsFieldsAlong) {
+TEST(Writer, CopiesItsFields) {
     Edited e;
     e.writer = qierr_Writer_addInt(e.writer, "k", 1);
     EXPECT_EQ(e.writer.grow, qierr_Status_growJson);
@@ -103,8 +103,8 @@ TEST(Writer, CarriesItsFieldsAlong) {
 }
 
 TEST(WriterGrowth, FillsTheBufferToTheLastByteBeforeGrowing) {
-    // Beside a member, the text has 512 - 9 bytes left before the NUL and the marker are reached;
-    // the comma, two quotes and four bytes of key and value overhead come out of these.
+    // Next to a member, the text has 512 - 9 bytes left before the NUL and the marker are reached;
+    // a comma, two quotes and four bytes of overhead for key and value are taken from these.
     Edited e("{\"a\":1}");
     const std::string fits(503 - 7, 'v');
     e.writer = qierr_Writer_addString(e.writer, "k", fits.c_str());
@@ -116,9 +116,9 @@ TEST(WriterGrowth, FillsTheBufferToTheLastByteBeforeGrowing) {
     EXPECT_EQ(e.offset(), 515);
 }
 
-TEST(WriterGrowth, ReckonsWithACommaEvenWhenItNeedsNone) {
-    // An empty object leaves 508 zero bytes. A member of 507 bytes and a comma that is not written
-    // fill them; one byte more makes the buffer grow.
+TEST(WriterGrowth, ReservesRoomForACommaEvenWhenItNeedsNone) {
+    // An empty object leaves 508 zero bytes. A member of 507 bytes and an unneeded comma fill them;
+    // one byte more makes the buffer grow.
     Edited fits;
     const std::string value(507 - 6, 'v');
     qierr_Writer_addString(fits.writer, "k", value.c_str());
@@ -142,7 +142,7 @@ TEST(WriterGrowth, GrowsAsOftenAsAMemberNeeds) {
     EXPECT_STREQ(e.writer.pos, "}");
 }
 
-TEST(WriterGrowth, StandsAtTheSamePlaceInTheNewBuffer) {
+TEST(WriterGrowth, ContinuesAtTheSameOffsetInTheNewBuffer) {
     Edited e("{\"list\":[],\"rest\":true}");
     e.writer.pos = e.status.json + 9;
     std::string elements;
@@ -153,7 +153,7 @@ TEST(WriterGrowth, StandsAtTheSamePlaceInTheNewBuffer) {
     expectBuffer(e.status, 4096, "{\"list\":[" + elements + "],\"rest\":true}");
 }
 
-TEST(WriterGrowth, FailureEndsTheChainAndKeepsWhatWasWritten) {
+TEST(WriterGrowth, FailureStopsWritingAndKeepsWhatWasWritten) {
     MeteredStatus status(1);
     status.code = -5;
     qierr_Writer writer = qierr_Status_writerAtEnd(&status);

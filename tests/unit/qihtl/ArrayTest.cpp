@@ -20,17 +20,17 @@ class ArrayTest : public testing::Test {
 TEST_F(ArrayTest, GrowsFromNothingToEight) {
     qihtl::Array<int> array;
     array.append(7, &status);
-    EXPECT_EQ(1u, array.length());
-    EXPECT_EQ(8u, array.capacity());
-    EXPECT_EQ(7, array[0]);
+    EXPECT_EQ(array.length(), 1u);
+    EXPECT_EQ(array.capacity(), 8u);
+    EXPECT_EQ(array[0], 7);
 }
 
-TEST_F(ArrayTest, ReservesExactlyWhatIsAsked) {
+TEST_F(ArrayTest, ReservesExactlyTheRequestedSize) {
     qihtl::Array<int> array;
     array.reserve(4, &status);
-    EXPECT_EQ(4u, array.capacity());
+    EXPECT_EQ(array.capacity(), 4u);
     array.reserve(2, &status);
-    EXPECT_EQ(4u, array.capacity());
+    EXPECT_EQ(array.capacity(), 4u);
 }
 
 TEST_F(ArrayTest, GrowsFromFourToEightAndThenByHalf) {
@@ -39,13 +39,13 @@ TEST_F(ArrayTest, GrowsFromFourToEightAndThenByHalf) {
     for (int value = 0; value < 5; ++value) {
         array.append(value, &status);
     }
-    EXPECT_EQ(8u, array.capacity());
+    EXPECT_EQ(array.capacity(), 8u);
     for (int value = 5; value < 9; ++value) {
         array.append(value, &status);
     }
-    EXPECT_EQ(12u, array.capacity());
+    EXPECT_EQ(array.capacity(), 12u);
     for (std::uint32_t index = 0; index < array.length(); ++index) {
-        EXPECT_EQ(static_cast<int>(index), array[index]);
+        EXPECT_EQ(array[index], static_cast<int>(index));
     }
 }
 
@@ -59,10 +59,10 @@ TEST_F(ArrayTest, ElementsThatOwnMemoryMoveAndAreFreed) {
             array.append(std::move(text), &status);
         }
         for (const qihtl::String& text : array) {
-            EXPECT_STREQ("element", text.c_str());
+            EXPECT_STREQ(text.c_str(), "element");
         }
     }
-    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
 }
 
 TEST_F(ArrayTest, AFailedAllocationSetsMemoryFullAndKeepsTheElements) {
@@ -72,17 +72,17 @@ TEST_F(ArrayTest, AFailedAllocationSetsMemoryFullAndKeepsTheElements) {
     }
     FaultyAllocator::failAt(0);
     array.append(8, &status);
-    EXPECT_EQ(-52000, status.code);
-    EXPECT_EQ(8u, array.length());
-    EXPECT_EQ(7, array[7]);
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_EQ(array.length(), 8u);
+    EXPECT_EQ(array[7], 7);
 }
 
 TEST_F(ArrayTest, ASizeThatOverflowsIsMemoryFull) {
     qihtl::Array<double> array;
     array.reserve(0x20000000, &status);
-    EXPECT_EQ(-52000, status.code);
-    EXPECT_EQ(0u, qihtl_grownCapacity(0x0FFFFFFF, 0x10000000, sizeof(double)));
-    EXPECT_EQ(0x0FFFFFFFu, qihtl_grownCapacity(0x0FFFFFFE, 0x0FFFFFFF, sizeof(double)));
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_EQ(qihtl_grownCapacity(0x0FFFFFFF, 0x10000000, sizeof(double)), 0u);
+    EXPECT_EQ(qihtl_grownCapacity(0x0FFFFFFE, 0x0FFFFFFF, sizeof(double)), 0x0FFFFFFFu);
 }
 
 TEST_F(ArrayTest, NothingIsDoneWhenTheStatusIsNegative) {
@@ -90,9 +90,9 @@ TEST_F(ArrayTest, NothingIsDoneWhenTheStatusIsNegative) {
     status.code = -1;
     array.reserve(4, &status);
     array.append(1, &status);
-    EXPECT_EQ(0u, array.capacity());
-    EXPECT_EQ(0u, array.length());
-    EXPECT_EQ(-1, status.code);
+    EXPECT_EQ(array.capacity(), 0u);
+    EXPECT_EQ(array.length(), 0u);
+    EXPECT_EQ(status.code, -1);
 }
 
 }  // namespace

@@ -24,31 +24,31 @@ class StringTest : public testing::Test {
 TEST_F(StringTest, AnUnusedStringIsEmptyAndHoldsNoMemory) {
     const std::int64_t before = FaultyAllocator::liveBlocks();
     qihtl::String string;
-    EXPECT_STREQ("", string.c_str());
-    EXPECT_EQ(0u, string.length());
+    EXPECT_STREQ(string.c_str(), "");
+    EXPECT_EQ(string.length(), 0u);
     EXPECT_TRUE(string.empty());
-    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
 }
 
 TEST_F(StringTest, AssignsAppendsAndReplaces) {
     qihtl::String string;
     string.assign("abc", &status);
     string.append("def", &status);
-    EXPECT_EQ("abcdef", text(string));
+    EXPECT_EQ(text(string), "abcdef");
     string.replace(1, 2, "XYZ", 3, &status);
-    EXPECT_EQ("aXYZdef", text(string));
+    EXPECT_EQ(text(string), "aXYZdef");
     string.replace(0, 7, "", 0, &status);
-    EXPECT_EQ("", text(string));
+    EXPECT_EQ(text(string), "");
     string.assign("longer than what was there before", &status);
-    EXPECT_EQ("longer than what was there before", text(string));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(text(string), "longer than what was there before");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(StringTest, KeepsNulBytesThatArePassedWithALength) {
     qihtl::String string;
     string.append("a\0b", 3, &status);
-    EXPECT_EQ(std::string("a\0b", 3), text(string));
-    EXPECT_EQ('\0', string.c_str()[3]);
+    EXPECT_EQ(text(string), std::string("a\0b", 3));
+    EXPECT_EQ(string.c_str()[3], '\0');
     EXPECT_FALSE(string.equals("a"));
 }
 
@@ -56,7 +56,7 @@ TEST_F(StringTest, ANullTextCountsAsEmpty) {
     qihtl::String string;
     string.append(nullptr, &status);
     EXPECT_TRUE(string.equals(""));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(StringTest, ComparesByLengthAndBytes) {
@@ -68,13 +68,13 @@ TEST_F(StringTest, ComparesByLengthAndBytes) {
     EXPECT_FALSE(string.equals("abcd"));
 }
 
-TEST_F(StringTest, ResizingFillsWithNulBytesAndCutsOff) {
+TEST_F(StringTest, ResizingPadsWithNulBytesOrTruncates) {
     qihtl::String string;
     string.assign("abc", &status);
     string.resize(5, &status);
-    EXPECT_EQ(std::string("abc\0\0", 5), text(string));
+    EXPECT_EQ(text(string), std::string("abc\0\0", 5));
     string.resize(2, &status);
-    EXPECT_EQ("ab", text(string));
+    EXPECT_EQ(text(string), "ab");
 }
 
 TEST_F(StringTest, TrimsTheNamedCharactersAtEachEnd) {
@@ -82,22 +82,22 @@ TEST_F(StringTest, TrimsTheNamedCharactersAtEachEnd) {
     string.assign("\r\n a b \n\r", &status);
     string.trimStart("\r\n");
     string.trimEnd("\r\n");
-    EXPECT_EQ(" a b ", text(string));
+    EXPECT_EQ(text(string), " a b ");
     string.assign("\n\n", &status);
     string.trimStart("\n");
-    EXPECT_EQ("", text(string));
+    EXPECT_EQ(text(string), "");
     string.assign("\n\n", &status);
     string.trimEnd("\n");
-    EXPECT_EQ("", text(string));
+    EXPECT_EQ(text(string), "");
 }
 
 TEST_F(StringTest, MovingLeavesTheSourceEmpty) {
     qihtl::String source;
     source.assign("abc", &status);
     qihtl::String target(std::move(source));
-    EXPECT_EQ("abc", text(target));
-    EXPECT_STREQ("", source.c_str());
-    EXPECT_EQ(0u, source.length());
+    EXPECT_EQ(text(target), "abc");
+    EXPECT_STREQ(source.c_str(), "");
+    EXPECT_EQ(source.length(), 0u);
 }
 
 TEST_F(StringTest, AFailedAllocationSetsMemoryFullAtTheAllocator) {
@@ -105,8 +105,8 @@ TEST_F(StringTest, AFailedAllocationSetsMemoryFullAtTheAllocator) {
     string.assign("abc", &status);
     FaultyAllocator::failAt(0);
     string.append("a text that is too long for the room that is there", &status);
-    EXPECT_EQ(-52000, status.code);
-    EXPECT_EQ("abc", text(string));
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_EQ(text(string), "abc");
     const std::string details = status.json;
     EXPECT_NE(std::string::npos, details.find("\"error_constant\":\"qiapalerr_memoryFull\""))
         << details;
@@ -116,8 +116,8 @@ TEST_F(StringTest, AFailedAllocationSetsMemoryFullAtTheAllocator) {
 TEST_F(StringTest, ATextBeyondTheLimitIsMemoryFull) {
     qihtl::String string;
     string.reserve(0xFFFFFFFF, &status);
-    EXPECT_EQ(-52000, status.code);
-    EXPECT_EQ(0u, string.capacity());
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_EQ(string.capacity(), 0u);
 }
 
 TEST_F(StringTest, NothingIsDoneWhenTheStatusIsNegative) {
@@ -129,16 +129,16 @@ TEST_F(StringTest, NothingIsDoneWhenTheStatusIsNegative) {
     string.replace(0, 1, "x", 1, &status);
     string.resize(1, &status);
     string.reserve(1000, &status);
-    EXPECT_EQ("abc", text(string));
+    EXPECT_EQ(text(string), "abc");
     EXPECT_GT(1000u, string.capacity());
-    EXPECT_EQ(-1, status.code);
+    EXPECT_EQ(status.code, -1);
 }
 
-TEST_F(StringTest, AWarningDoesNotHinderAnything) {
+TEST_F(StringTest, AWarningDoesNotPreventAnything) {
     qihtl::String string;
     status.code = 5;
     string.assign("x", &status);
-    EXPECT_EQ("x", text(string));
+    EXPECT_EQ(text(string), "x");
 }
 
 TEST_F(StringTest, AppendingByteByByteAllocatesALogarithmicNumberOfTimes) {
@@ -146,7 +146,7 @@ TEST_F(StringTest, AppendingByteByByteAllocatesALogarithmicNumberOfTimes) {
     for (int count = 0; count < 100000; ++count) {
         string.append("x", 1, &status);
     }
-    EXPECT_EQ(100000u, string.length());
+    EXPECT_EQ(string.length(), 100000u);
     EXPECT_GT(30u, FaultyAllocator::requests());
 }
 
@@ -155,9 +155,9 @@ TEST_F(StringTest, TheDestructorFreesTheText) {
     {
         qihtl::String string;
         string.assign("abc", &status);
-        EXPECT_EQ(before + 1, FaultyAllocator::liveBlocks());
+        EXPECT_EQ(FaultyAllocator::liveBlocks(), before + 1);
     }
-    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
 }
 
 }  // namespace

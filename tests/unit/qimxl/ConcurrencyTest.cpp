@@ -12,7 +12,7 @@
 
 namespace {
 
-// One program of its own, so that the first translations of the process meet.
+// A program of its own, so that the first translations of the process run at the same time.
 TEST(ConcurrencyTest, SessionsOfDifferentThreadsAreIndependent) {
     TestRoot root;
     root.write("/usr/local/qinstal/share/errors/English/a.txt",
@@ -44,7 +44,7 @@ TEST(ConcurrencyTest, SessionsOfDifferentThreadsAreIndependent) {
         thread.join();
     }
     for (int number = 0; number < threadCount; ++number) {
-        EXPECT_EQ("Text.\n\nName: thread " + std::to_string(number), results[number]);
+        EXPECT_EQ(results[number], "Text.\n\nName: thread " + std::to_string(number));
     }
 }
 

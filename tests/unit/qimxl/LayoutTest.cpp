@@ -51,7 +51,7 @@ class LayoutTest : public testing::Test {
         qixlator::Session* session = qixlator_createSession(&failure);
         function(session, &source, 0x200, flags, &text, &failure);
         qixlator_destroySession(session);
-        EXPECT_EQ(0, failure.code) << failure.json;
+        EXPECT_EQ(failure.code, 0) << failure.json;
         return text.c_str();
     }
 
@@ -61,41 +61,38 @@ class LayoutTest : public testing::Test {
 
 TEST_F(LayoutTest, TheRawTextOfADriversStatus) {
     EXPECT_EQ(
+        layOut(translateErrStatusToRawText, 11),
         "Outer.\n\nName: a \"name\"\n"
         "Reserved by Sessions: a, bThe following NVMEM areas are available:\n"
         "Device\nx: 3, 4\nAttribute ID: 0x00001234\n\nLine Number: 7\nDevice: \n\n"
         "   Inner one.\n   Inner two.\n   The following NVMEM areas are available:\n   Name: n\n\n"
         "      Outer.\n\n"
-        "   Error description not found",
-        layOut(translateErrStatusToRawText, 11));
+        "   Error description not found");
 }
 
 TEST_F(LayoutTest, TheFormattedTextOfADriversStatus) {
-    EXPECT_EQ(
-        "Outer.\n\n<B>Name: </B>a \"name\"\n<B>Reserved by Sessions: </B>a, b\n"
-        "<B>The following NVMEM areas are available:</B>\n"
-        "Device\n<B>x: </B>3, 4\n<B>Attribute ID: </B>0x00001234\n\n"
-        "<B>Line Number: </B>7\n<B>Device: </B>\n\n"
-        "   Inner one.\n   Inner two.\n   \n"
-        "   <B>The following NVMEM areas are available:</B>\n   <B>Name: </B>n\n\n"
-        "      Outer.\n\n"
-        "   Error description not found",
-        layOut(translateErrStatusToFormattedText, 11));
+    EXPECT_EQ(layOut(translateErrStatusToFormattedText, 11),
+              "Outer.\n\n<B>Name: </B>a \"name\"\n<B>Reserved by Sessions: </B>a, b\n"
+              "<B>The following NVMEM areas are available:</B>\n"
+              "Device\n<B>x: </B>3, 4\n<B>Attribute ID: </B>0x00001234\n\n"
+              "<B>Line Number: </B>7\n<B>Device: </B>\n\n"
+              "   Inner one.\n   Inner two.\n   \n"
+              "   <B>The following NVMEM areas are available:</B>\n   <B>Name: </B>n\n\n"
+              "      Outer.\n\n"
+              "   Error description not found");
 }
 
-// The rest of the status is compared elsewhere: the order of its members is not fixed.
+// The rest of the status is compared elsewhere, because the order of its members is not fixed.
 TEST_F(LayoutTest, TheDebugSectionFollowsTheItemsInBothForms) {
     qierr_Status_setJson(&source,
                          "{\"file\":\"f.cpp\",\"line\":12,\"component\":\"driver\","
                          "\"translator\":\"mxlator_qitrmc\"}");
-    EXPECT_EQ(
-        "Outer.\n\n\nComponent: driver\nFile: f.cpp\nLine: 12\n"
-        "rest_of_input_json: {\"translator\":\"mxlator_qitrmc\"}",
-        layOut(translateErrStatusToRawText, 15));
-    EXPECT_EQ(
-        "Outer.\n\n\n<B>Component: </B>driver\n<B>File: </B>f.cpp\n<B>Line: </B>12\n"
-        "<B>rest_of_input_json: </B>{\"translator\":\"mxlator_qitrmc\"}",
-        layOut(translateErrStatusToFormattedText, 15));
+    EXPECT_EQ(layOut(translateErrStatusToRawText, 15),
+              "Outer.\n\n\nComponent: driver\nFile: f.cpp\nLine: 12\n"
+              "rest_of_input_json: {\"translator\":\"mxlator_qitrmc\"}");
+    EXPECT_EQ(layOut(translateErrStatusToFormattedText, 15),
+              "Outer.\n\n\n<B>Component: </B>driver\n<B>File: </B>f.cpp\n<B>Line: </B>12\n"
+              "<B>rest_of_input_json: </B>{\"translator\":\"mxlator_qitrmc\"}");
 }
 
 }  // namespace

@@ -9,14 +9,14 @@
 #include <regex>
 #include <string>
 
-// The built plug-in as another program sees it: through one symbol and the headers of the platform.
+// The built plug-in as another program uses it: through one symbol and the headers of the platform.
 // Nothing of this system is linked, so the status and the allocation are this program's own.
 
 namespace {
 
-// ---- A program of somebody else -----------------------------------------------------------------
+// ---- Another program ----------------------------------------------------------------------------
 
-// Grows by what is asked for and no more, where the plug-in's own doubles its buffers.
+// Grows by exactly the requested size, whereas the plug-in's own function doubles its buffers.
 int32_t exactRealloc(qierr_Status* status, uint32_t size) {
     if (size == 0) {
         std::free(status->json);
@@ -50,7 +50,7 @@ struct ForeignStatus : qierr_Status {
     }
 };
 
-// Hands texts out of one block of its own, which nobody but it can free.
+// Returns texts in one block of its own, which only it can free.
 struct ForeignMemory {
     char block[4096] = "";
     int allocations = 0;
@@ -64,7 +64,7 @@ struct ForeignMemory {
             ++self->frees;
             return nullptr;
         }
-        EXPECT_EQ(nullptr, pointer);
+        EXPECT_EQ(pointer, nullptr);
         ++self->allocations;
         if (self->failure != 0) {
             status->code = self->failure;
@@ -74,7 +74,7 @@ struct ForeignMemory {
         return self->block + 16;
     }
 
-    // What a translator gave, which goes back.
+    // A text that a translator returned; it is given back at the end.
     std::string take(char* text, qierr_Status* status) {
         const std::string copy = text == nullptr ? "(null)" : text;
         if (text != nullptr) {
@@ -151,16 +151,16 @@ TEST_F(LentXlatorTest, DescribesCodesWithTheFilesOfItsRegistrationText) {
     explain("errors/English", "Shared text.");
     explain("errors/German", "Deutscher Text.");
     XlatorInterface* xlator = createLent();
-    EXPECT_EQ(16u, xlator->structSize);
-    EXPECT_EQ("Shared text.", describe(xlator, -77));
-    EXPECT_EQ("Deutscher Text.", describe(xlator, -77, 2));
+    EXPECT_EQ(xlator->structSize, 16u);
+    EXPECT_EQ(describe(xlator, -77), "Shared text.");
+    EXPECT_EQ(describe(xlator, -77, 2), "Deutscher Text.");
     explain("mierrors/foreign/English", "Text of the driver.");
-    EXPECT_EQ("Text of the driver.", describe(xlator, -77));
-    EXPECT_EQ("Error description not found", describe(xlator, -78));
-    EXPECT_EQ(0, status.code);
-    EXPECT_EQ(nullptr, status.json);
-    EXPECT_EQ(4, memory.allocations);
-    EXPECT_EQ(4, memory.frees);
+    EXPECT_EQ(describe(xlator, -77), "Text of the driver.");
+    EXPECT_EQ(describe(xlator, -78), "Error description not found");
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(status.json, nullptr);
+    EXPECT_EQ(memory.allocations, 4);
+    EXPECT_EQ(memory.frees, 4);
     xlator->destroy(xlator);
 }
 
@@ -173,7 +173,7 @@ TEST_F(LentXlatorTest, GivesTheItemsOfAStatus) {
     EXPECT_NE(std::string::npos, text.find("\"dynamic\":[{")) << text;
     EXPECT_NE(std::string::npos, text.find("\"key\":\"Name\"")) << text;
     EXPECT_NE(std::string::npos, text.find("\"value\":\"n\"")) << text;
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(status.code, 0);
     xlator->destroy(xlator);
 }
 
@@ -182,55 +182,53 @@ TEST_F(LentXlatorTest, TwoStatesOfOneProgramAreIndependent) {
     XlatorInterface* first = createLent();
     XlatorInterface* second = createLent();
     first->destroy(first);
-    EXPECT_EQ("Shared text.", describe(second, -77));
+    EXPECT_EQ(describe(second, -77), "Shared text.");
     second->destroy(second);
 }
 
 TEST_F(LentXlatorTest, FailuresAreWrittenIntoTheCallersStatus) {
     XlatorInterface* xlator = createLent();
-    EXPECT_EQ("(null)", describeJson(xlator, "{}", "json2"));
-    EXPECT_EQ(-52029, status.code);
-    EXPECT_EQ(
-        "{\"error_constant\":\"(int32_t)lua_tointeger(L, -1)\","
-        "\"file\":\"src/qixlatorlua/LuaXlator.cpp\",\"line\":#,\"component\":\"qitrmcsvc\","
-        "\"qixlatorlua_debug\":{\"debug\":\"failed to get dynamic desc\"}}",
-        status.text());
-    EXPECT_EQ('J', status.json[status.capacity - 1]);
+    EXPECT_EQ(describeJson(xlator, "{}", "json2"), "(null)");
+    EXPECT_EQ(status.code, -52029);
+    EXPECT_EQ(status.text(),
+              "{\"error_constant\":\"(int32_t)lua_tointeger(L, -1)\","
+              "\"file\":\"src/qixlatorlua/LuaXlator.cpp\",\"line\":#,\"component\":\"qitrmcsvc\","
+              "\"qixlatorlua_debug\":{\"debug\":\"failed to get dynamic desc\"}}");
+    EXPECT_EQ(status.json[status.capacity - 1], 'J');
     xlator->destroy(xlator);
 }
 
-TEST_F(LentXlatorTest, AWarningOfTheCallerIsNoReasonToDoNothing) {
+TEST_F(LentXlatorTest, AWarningOfTheCallerDoesNotPreventATranslation) {
     explain("errors/English", "Shared text.");
     status.code = 5;
     XlatorInterface* xlator = createLent();
-    EXPECT_EQ("Shared text.", describe(xlator, -77));
-    EXPECT_EQ(5, status.code);
+    EXPECT_EQ(describe(xlator, -77), "Shared text.");
+    EXPECT_EQ(status.code, 5);
     xlator->destroy(xlator);
 }
 
-TEST_F(LentXlatorTest, AnAllocationThatFailsGivesNoTextAndKeepsItsFailure) {
+TEST_F(LentXlatorTest, AnAllocationThatFailsReturnsNoTextAndItsFailure) {
     XlatorInterface* xlator = createLent();
     memory.failure = -9;
-    EXPECT_EQ("(null)", describe(xlator, -77));
-    EXPECT_EQ(-9, status.code);
-    EXPECT_EQ(nullptr, status.json);
+    EXPECT_EQ(describe(xlator, -77), "(null)");
+    EXPECT_EQ(status.code, -9);
+    EXPECT_EQ(status.json, nullptr);
     xlator->destroy(xlator);
 }
 
 TEST_F(LentXlatorTest, AnUnknownNameIsReported) {
-    EXPECT_EQ(nullptr, create("qixlator_default", "{}", &status));
-    EXPECT_EQ(-52005, status.code);
+    EXPECT_EQ(create("qixlator_default", "{}", &status), nullptr);
+    EXPECT_EQ(status.code, -52005);
     EXPECT_EQ(
-        "{\"error_constant\":\"qiapalerr_invalidParameter\",\"file\":\"src/qixlator/"
-        "exportedXlators.cpp\","
+        status.text(),
+        "{\"error_constant\":\"qiapalerr_invalidParameter\",\"file\":\"src/qixlator/exported.cpp\","
         "\"line\":#,\"component\":\"qitrmcsvc\",\"qixlator_debug\":{\"qixlator_exported\":"
-        "\"could not find xlator\",\"name\":\"qixlator_default\",\"registrationInfo\":\"{}\"}}",
-        status.text());
+        "\"could not find xlator\",\"name\":\"qixlator_default\",\"registrationInfo\":\"{}\"}}");
 }
 
-TEST_F(LentXlatorTest, ARegistrationTextThatDoesNotServeIsReported) {
-    EXPECT_EQ(nullptr, create("mxlator_qitrmc", "{\"qixlatorlua_xlator\":\"none\"}", &status));
-    EXPECT_EQ(-52003, status.code);
+TEST_F(LentXlatorTest, AnUnusableRegistrationTextIsReported) {
+    EXPECT_EQ(create("mxlator_qitrmc", "{\"qixlatorlua_xlator\":\"none\"}", &status), nullptr);
+    EXPECT_EQ(status.code, -52003);
     const std::string text = status.text();
     EXPECT_NE(std::string::npos,
               text.find("\"internal_error\":{\"api\":\"lua\",\"code\":2,\"string\":\""))
@@ -239,7 +237,7 @@ TEST_F(LentXlatorTest, ARegistrationTextThatDoesNotServeIsReported) {
         "\"},\"qixlatorlua_debug\":{\"debug\":\"lua setupEnv failed\",\"name\":\"mxlator_qitrmc\","
         "\"registrationInfo\":\"{\\\"qixlatorlua_xlator\\\":\\\"none\\\"}\"}}";
     ASSERT_LT(end.size(), text.size());
-    EXPECT_EQ(end, text.substr(text.size() - end.size()));
+    EXPECT_EQ(text.substr(text.size() - end.size()), end);
 }
 
 // ---- The tables of a driver ---------------------------------------------------------------------
@@ -258,7 +256,7 @@ std::string valueOf(const std::string& json1) {
 
 class DriverTablesTest : public LentXlatorTest {
   protected:
-    // An attribute table that knows the attribute 0000ABCD by this name.
+    // An attribute table that has the attribute 0000ABCD under this name.
     void nameAttribute(const std::string& module, const std::string& name) const {
         write(module + ".lua",
               "return { encoding = 'utf-8', getAttribute = function(attrid)\n"
@@ -266,7 +264,7 @@ class DriverTablesTest : public LentXlatorTest {
                   name + "', enums = { ['3'] = 'Three' } } end end }");
     }
 
-    // The name of that attribute in a fresh state.
+    // The name of that attribute in a new state.
     std::string attributeName(std::uint32_t attributes) {
         XlatorInterface* xlator = createLent();
         const std::string json = entry("kUsageTypeAttributeId", "43981", "\"uint32_t\"");
@@ -282,34 +280,35 @@ class DriverTablesTest : public LentXlatorTest {
 TEST_F(DriverTablesTest, AttributesAndTheirEnumsHaveTheNamesOfTheTable) {
     nameAttribute("foreign_attributes_eng", "Gain");
     XlatorInterface* xlator = createLent();
-    EXPECT_EQ("\"Gain\"", valueOf(describeJson(
-                              xlator, entry("kUsageTypeAttributeId", "43981", "\"uint32_t\""))));
-    EXPECT_EQ("[\"Gain\",\"0x00000001\"]",
-              valueOf(describeJson(
-                  xlator, entry("kUsageTypeConflictingAttr", "[43981,1]", "\"uint32_t\""))));
-    EXPECT_EQ("\"43981\"",
-              valueOf(describeJson(xlator, entry("kUsageTypeName", "43981", "\"uint32_t\""))));
+    EXPECT_EQ(
+        valueOf(describeJson(xlator, entry("kUsageTypeAttributeId", "43981", "\"uint32_t\""))),
+        "\"Gain\"");
+    EXPECT_EQ(valueOf(describeJson(
+                  xlator, entry("kUsageTypeConflictingAttr", "[43981,1]", "\"uint32_t\""))),
+              "[\"Gain\",\"0x00000001\"]");
+    EXPECT_EQ(valueOf(describeJson(xlator, entry("kUsageTypeName", "43981", "\"uint32_t\""))),
+              "\"43981\"");
     const std::string enumType = "{\"type\":\"enum\",\"id\":43981}";
-    EXPECT_EQ("\"Three\"", valueOf(describeJson(xlator, entry("x", "3", enumType))));
-    EXPECT_EQ("[\"Three\",\"4\"]", valueOf(describeJson(xlator, entry("x", "[3,4]", enumType))));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(valueOf(describeJson(xlator, entry("x", "3", enumType))), "\"Three\"");
+    EXPECT_EQ(valueOf(describeJson(xlator, entry("x", "[3,4]", enumType))), "[\"Three\",\"4\"]");
+    EXPECT_EQ(status.code, 0);
     xlator->destroy(xlator);
 }
 
-TEST_F(DriverTablesTest, TheAttributeTableIsOfTheEnvironmentFirstAndThenOfTheLanguage) {
+TEST_F(DriverTablesTest, TheAttributeTableOfTheEnvironmentComesBeforeThatOfTheLanguage) {
     constexpr std::uint32_t german = 2;
     constexpr std::uint32_t secondEnvironment = 2 << 8;
-    EXPECT_EQ("\"0x0000ABCD\"", attributeName(german | secondEnvironment));
+    EXPECT_EQ(attributeName(german | secondEnvironment), "\"0x0000ABCD\"");
     nameAttribute("foreign_attributes_eng", "plain English");
-    EXPECT_EQ("\"plain English\"", attributeName(german | secondEnvironment));
+    EXPECT_EQ(attributeName(german | secondEnvironment), "\"plain English\"");
     nameAttribute("foreign_attributes_deu", "plain German");
-    EXPECT_EQ("\"plain German\"", attributeName(german | secondEnvironment));
+    EXPECT_EQ(attributeName(german | secondEnvironment), "\"plain German\"");
     nameAttribute("foreign_attributes_eng_qvi", "English of the environment");
-    EXPECT_EQ("\"English of the environment\"", attributeName(german | secondEnvironment));
+    EXPECT_EQ(attributeName(german | secondEnvironment), "\"English of the environment\"");
     nameAttribute("foreign_attributes_deu_qvi", "German of the environment");
-    EXPECT_EQ("\"German of the environment\"", attributeName(german | secondEnvironment));
-    EXPECT_EQ("\"plain German\"", attributeName(german)) << "no environment";
-    EXPECT_EQ("\"plain English\"", attributeName(0));
+    EXPECT_EQ(attributeName(german | secondEnvironment), "\"German of the environment\"");
+    EXPECT_EQ(attributeName(german), "\"plain German\"") << "no environment";
+    EXPECT_EQ(attributeName(0), "\"plain English\"");
 }
 
 TEST_F(DriverTablesTest, AnErrorTableComesBeforeTheFiles) {
@@ -318,12 +317,12 @@ TEST_F(DriverTablesTest, AnErrorTableComesBeforeTheFiles) {
           "return { encoding = 'utf-8', getString = function(code) "
           "if code == -77 then return 'English table.' end end }");
     XlatorInterface* xlator = createLent();
-    EXPECT_EQ("English table.", describe(xlator, -77));
-    EXPECT_EQ("English table.", describe(xlator, -77, 1));
-    EXPECT_EQ("Error description not found", describe(xlator, -78));
+    EXPECT_EQ(describe(xlator, -77), "English table.");
+    EXPECT_EQ(describe(xlator, -77, 1), "English table.");
+    EXPECT_EQ(describe(xlator, -78), "Error description not found");
     write("errors_fra.lua",
           "return { encoding = 'utf-8', getString = function() return 'Table.' end }");
-    EXPECT_EQ("Table.", describe(xlator, -77, 1));
+    EXPECT_EQ(describe(xlator, -77, 1), "Table.");
     xlator->destroy(xlator);
 }
 
@@ -331,8 +330,8 @@ TEST_F(DriverTablesTest, AnErrorTableInAnotherEncodingIsAFailure) {
     write("errors_eng.lua",
           "return { encoding = 'latin-1', getString = function() return 'x' end }");
     XlatorInterface* xlator = createLent();
-    EXPECT_EQ("(null)", describe(xlator, -77));
-    EXPECT_EQ(-52003, status.code);
+    EXPECT_EQ(describe(xlator, -77), "(null)");
+    EXPECT_EQ(status.code, -52003);
     EXPECT_NE(std::string::npos, status.text().find("Unsupported encoding")) << status.text();
     xlator->destroy(xlator);
 }

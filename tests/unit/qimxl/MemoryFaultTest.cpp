@@ -18,8 +18,8 @@ namespace {
 
 using qixlatorlua::LuaRuntime;
 
-// Lets each single allocation of a translation fail, one after another, and each one and all that
-// follow it. The process goes on, nothing leaks, and there is a failure or a text.
+// Makes each single allocation of a translation fail in turn, and each one together with all that
+// follow it. The process must go on, nothing may leak, and there must be a failure or a text.
 class MemoryFaultTest : public testing::Test {
   protected:
     MemoryFaultTest() {
@@ -39,7 +39,7 @@ class MemoryFaultTest : public testing::Test {
     }
     ~MemoryFaultTest() override { FaultyAllocator::succeed(); }
 
-    // The road of the service: a session, the raw text, the end of the session.
+    // The translation as the service does it: a session, the raw text, the end of the session.
     void translateWholly() {
         failureCode = 0;
         text.clear();
@@ -55,7 +55,7 @@ class MemoryFaultTest : public testing::Test {
         failureCode = failure.code;
     }
 
-    // One translator of its own, which is asked for both descriptions.
+    // A translator of its own, from which both descriptions are requested.
     void askTranslator(LuaRuntime runtime) {
         text.clear();
         qierr::Status failure;
@@ -76,14 +76,14 @@ class MemoryFaultTest : public testing::Test {
         qixlator_realloc(description, 0, nullptr, nullptr);
     }
 
-    // The interpreter's handles of these files must never close them.
+    // The interpreter's handles for these files must never close them.
     static bool standardFilesAreOpen() {
         return fcntl(STDIN_FILENO, F_GETFD) >= 0 && fcntl(STDOUT_FILENO, F_GETFD) >= 0 &&
                fcntl(STDERR_FILENO, F_GETFD) >= 0;
     }
 
-    // Runs `action` with `count` requests failing from request `first` on, then from `step` later
-    // on, and so on; the first number beyond its requests.
+    // Runs `action` with `count` requests failing from request `first` on, then from `step` later,
+    // and so on. Returns the first number beyond its requests.
     template <typename Action>
     std::uint64_t failEach(Action action, std::uint64_t count, std::uint64_t first = 0,
                            std::uint64_t step = 1) {
@@ -93,11 +93,11 @@ class MemoryFaultTest : public testing::Test {
             action();
             const bool failed = FaultyAllocator::hasFailed();
             FaultyAllocator::succeed();
-            EXPECT_EQ(blocks, FaultyAllocator::liveBlocks()) << "request " << number;
+            EXPECT_EQ(FaultyAllocator::liveBlocks(), blocks) << "request " << number;
             EXPECT_TRUE(standardFilesAreOpen()) << "request " << number;
             EXPECT_TRUE(failureCode < 0 || !text.empty()) << "request " << number;
             if (!failed || HasFailure()) {
-                EXPECT_EQ(0, failureCode);
+                EXPECT_EQ(failureCode, 0);
                 return number;
             }
         }
@@ -111,21 +111,22 @@ class MemoryFaultTest : public testing::Test {
 
 TEST_F(MemoryFaultTest, ATranslationSurvivesEachSingleFailure) {
     EXPECT_LT(100u, failEach([this] { translateWholly(); }, 1));
-    EXPECT_EQ(0u, text.find("Text.\n\nReserved by Sessions: a, b\n")) << text;
+    EXPECT_EQ(text.find("Text.\n\nReserved by Sessions: a, b\n"), 0u) << text;
 }
 
 TEST_F(MemoryFaultTest, ATranslationSurvivesTheEndOfAllMemoryAtEachPoint) {
     EXPECT_LT(100u, failEach([this] { translateWholly(); }, FaultyAllocator::never));
 }
 
-TEST_F(MemoryFaultTest, WantOfMemoryIsReportedAsTheInterpretersFailure) {
+TEST_F(MemoryFaultTest, LackOfMemoryIsReportedAsTheInterpretersFailure) {
     FaultyAllocator::failAt(2000, FaultyAllocator::never);
     qierr::Status failure;
-    EXPECT_EQ(nullptr, qixlatorlua::createLuaXlator(
-                           "n", qixlator::localRegistrations().next->registrationInfo,
-                           LuaRuntime::plain, &failure));
+    EXPECT_EQ(
+        qixlatorlua::createLuaXlator("n", qixlator::localRegistrations().next->registrationInfo,
+                                     LuaRuntime::plain, &failure),
+        nullptr);
     EXPECT_TRUE(FaultyAllocator::hasFailed());
-    EXPECT_EQ(-52003, failure.code);
+    EXPECT_EQ(failure.code, -52003);
 }
 
 TEST_F(MemoryFaultTest, AStateThatCannotBeMadeIsReported) {
@@ -133,9 +134,9 @@ TEST_F(MemoryFaultTest, AStateThatCannotBeMadeIsReported) {
         // The first request is for the translator itself.
         FaultyAllocator::failAt(1);
         qierr::Status failure;
-        EXPECT_EQ(nullptr, qixlatorlua::createLuaXlator("n", "{}", runtime, &failure));
+        EXPECT_EQ(qixlatorlua::createLuaXlator("n", "{}", runtime, &failure), nullptr);
         FaultyAllocator::succeed();
-        EXPECT_EQ(-52000, failure.code);
+        EXPECT_EQ(failure.code, -52000);
         ASSERT_NE(nullptr, failure.json);
         EXPECT_NE(std::string::npos,
                   std::string(failure.json)
@@ -144,7 +145,7 @@ TEST_F(MemoryFaultTest, AStateThatCannotBeMadeIsReported) {
     }
 }
 
-// Every block of the interpreter is a request in the plain way: thousands, so in several parts.
+// Every block of the interpreter is a request in the plain runtime: thousands, so in several parts.
 constexpr int parts = 8;
 class PlainMemoryFaultTest : public MemoryFaultTest, public testing::WithParamInterface<int> {};
 

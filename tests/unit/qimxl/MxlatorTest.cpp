@@ -17,7 +17,7 @@ namespace {
 using statusTexts::usage;
 using statusTexts::withEntries;
 
-// The translator of the service, asked through a session as it is in use.
+// The translator of the service, used through a session as in production.
 class MxlatorTest : public testing::Test {
   protected:
     MxlatorTest() : session(qixlator_createSession(&status)) {}
@@ -40,7 +40,7 @@ class MxlatorTest : public testing::Test {
                                              qixlator_realloc, nullptr, &status));
     }
 
-    // The items as they are laid out, one a line: "type: key: value".
+    // The items in the order of the text, one per line: "type: key: value".
     std::string items(const std::string& json, const char* section = "dynamic",
                       std::uint32_t attributes = 0x200) {
         const std::string text = json1(json, attributes);
@@ -90,102 +90,102 @@ class MxlatorTest : public testing::Test {
 
 TEST_F(MxlatorTest, IsRegisteredBeforeTheDefaultTranslator) {
     const qixlator::XlatorRegistration& list = qixlator::localRegistrations();
-    EXPECT_STREQ("mxlator_qitrmc", list.next->name);
+    EXPECT_STREQ(list.next->name, "mxlator_qitrmc");
     EXPECT_STREQ(
+        list.next->registrationInfo,
         "{\"qixlatorlua_xlator\":\"mxlator\",\"qixlatorlua_settings\":{\"driverName\":\"qitrmc\","
         "\"qiSharedErrorsDir\":\"$_qiShared32Dir/errors\","
-        "\"MIErrorsDir\":\"$_qiShared32Dir/mierrors\"}}",
-        list.next->registrationInfo);
-    EXPECT_STREQ("qixlator_default", list.next->next->name);
-    EXPECT_STREQ("{}", list.next->next->registrationInfo);
-    EXPECT_EQ(&list, list.next->next->next);
+        "\"MIErrorsDir\":\"$_qiShared32Dir/mierrors\"}}");
+    EXPECT_STREQ(list.next->next->name, "qixlator_default");
+    EXPECT_STREQ(list.next->next->registrationInfo, "{}");
+    EXPECT_EQ(list.next->next->next, &list);
 }
 
 TEST_F(MxlatorTest, IsTheOneTranslatorThatIsExported) {
     const qixlator::XlatorRegistration& list = qixlator::exportedRegistrations();
-    EXPECT_STREQ("mxlator_qitrmc", list.next->name);
-    EXPECT_EQ(nullptr, list.next->registrationInfo);
-    EXPECT_EQ(&list, list.next->next);
+    EXPECT_STREQ(list.next->name, "mxlator_qitrmc");
+    EXPECT_EQ(list.next->registrationInfo, nullptr);
+    EXPECT_EQ(list.next->next, &list);
     XlatorInterface* xlator = qixlator_exported_create(
         "mxlator_qitrmc", qixlator::localRegistrations().next->registrationInfo, &status);
     ASSERT_NE(nullptr, xlator);
-    EXPECT_EQ("Error description not found",
-              taken(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status)));
+    EXPECT_EQ(taken(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status)),
+              "Error description not found");
     xlator->destroy(xlator);
 }
 
 // ---- Descriptions of codes ----------------------------------------------------------------------
 
-TEST_F(MxlatorTest, ACodeThatIsUnknownEverywhereHasAStandingText) {
-    EXPECT_EQ("Error description not found", describe(-250800));
-    EXPECT_EQ(0, status.code);
+TEST_F(MxlatorTest, AnUnknownCodeHasAFixedText) {
+    EXPECT_EQ(describe(-250800), "Error description not found");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(MxlatorTest, TheDriversTextComesBeforeTheSharedOne) {
     explain("errors", "Any language.");
-    EXPECT_EQ("Error description not found", describe(-250800)) << "no language directory";
+    EXPECT_EQ(describe(-250800), "Error description not found") << "no language directory";
     root.makeDirectory("/usr/local/qinstal/share/errors/English");
-    EXPECT_EQ("Any language.", describe(-250800));
+    EXPECT_EQ(describe(-250800), "Any language.");
     explain("errors/English", "Shared.");
-    EXPECT_EQ("Shared.", describe(-250800));
+    EXPECT_EQ(describe(-250800), "Shared.");
     explain("mierrors/qitrmc/English", "Driver.");
-    EXPECT_EQ("Driver.", describe(-250800));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describe(-250800), "Driver.");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(MxlatorTest, EachPlaceFallsBackToEnglishBeforeTheNext) {
+TEST_F(MxlatorTest, EachDirectoryFallsBackToEnglishBeforeTheNext) {
     explain("errors/English", "Shared English.");
-    EXPECT_EQ("Shared English.", describe(-250800, 2));
+    EXPECT_EQ(describe(-250800, 2), "Shared English.");
     explain("errors/German", "Shared German.");
-    EXPECT_EQ("Shared German.", describe(-250800, 2));
+    EXPECT_EQ(describe(-250800, 2), "Shared German.");
     explain("mierrors/qitrmc/English", "Driver English.");
-    EXPECT_EQ("Driver English.", describe(-250800, 2));
+    EXPECT_EQ(describe(-250800, 2), "Driver English.");
     explain("mierrors/qitrmc/German", "Driver German.");
-    EXPECT_EQ("Driver German.", describe(-250800, 2));
-    EXPECT_EQ("Driver English.", describe(-250800, 0));
+    EXPECT_EQ(describe(-250800, 2), "Driver German.");
+    EXPECT_EQ(describe(-250800, 0), "Driver English.");
 }
 
 TEST_F(MxlatorTest, AnUnknownLanguageFallsBackToEnglish) {
     explain("mierrors/qitrmc/Zzzzzzz", "Test language.");
-    EXPECT_EQ("Test language.", describe(-250800, 9));
+    EXPECT_EQ(describe(-250800, 9), "Test language.");
     root.remove("/usr/local/qinstal/share/mierrors");
     explain("mierrors/qitrmc/English", "English.");
-    EXPECT_EQ("English.", describe(-250800, 9));
+    EXPECT_EQ(describe(-250800, 9), "English.");
     root.remove("/usr/local/qinstal/share/mierrors");
     explain("errors/English", "Shared English.");
-    EXPECT_EQ("Shared English.", describe(-250800, 9));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describe(-250800, 9), "Shared English.");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(MxlatorTest, ABadFileCountsAsNoText) {
     root.write("/usr/local/qinstal/share/mierrors/qitrmc/English/bad.txt",
                "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"x\">\n");
     explain("errors/English", "Shared.");
-    EXPECT_EQ("Shared.", describe(-250800));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describe(-250800), "Shared.");
+    EXPECT_EQ(status.code, 0);
 }
 
 // ---- Details ------------------------------------------------------------------------------------
 
 TEST_F(MxlatorTest, AUsageShowsTheTermOfItsTagAndItsValue) {
-    EXPECT_EQ("usage|Name|n\n", usageItem(usage("kUsageTypeName", "\"n\"", "\"string\"")));
-    EXPECT_EQ("usage|Line Number|17\n",
-              usageItem(usage("kUsageTypeLineNumber", "17", "\"uint32_t\"")));
-    EXPECT_EQ("usage|Line Number|4294967295\n",
-              usageItem(usage("kUsageTypeLineNumber", "4294967295", "\"uint32_t\"")));
-    EXPECT_EQ("usage|Reserved by Sessions|[\"a\",\"b\"]\n",
-              usageItem(usage("kUsageTypeReservedBySessions", "[\"a\",\"b\"]", "\"string\"")));
+    EXPECT_EQ(usageItem(usage("kUsageTypeName", "\"n\"", "\"string\"")), "usage|Name|n\n");
+    EXPECT_EQ(usageItem(usage("kUsageTypeLineNumber", "17", "\"uint32_t\"")),
+              "usage|Line Number|17\n");
+    EXPECT_EQ(usageItem(usage("kUsageTypeLineNumber", "4294967295", "\"uint32_t\"")),
+              "usage|Line Number|4294967295\n");
+    EXPECT_EQ(usageItem(usage("kUsageTypeReservedBySessions", "[\"a\",\"b\"]", "\"string\"")),
+              "usage|Reserved by Sessions|[\"a\",\"b\"]\n");
 }
 
-TEST_F(MxlatorTest, ATagWithoutATermIsShownAsItStands) {
-    EXPECT_EQ("usage|kUsageTypeNobodyKnows|n\n",
-              usageItem(usage("kUsageTypeNobodyKnows", "\"n\"", "\"string\"")));
+TEST_F(MxlatorTest, ATagWithoutATermIsShownUnchanged) {
+    EXPECT_EQ(usageItem(usage("kUsageTypeNobodyKnows", "\"n\"", "\"string\"")),
+              "usage|kUsageTypeNobodyKnows|n\n");
 }
 
 TEST_F(MxlatorTest, TheTermsAreThoseOfTheLanguage) {
     const std::string entry = usage("kUsageTypeName", "\"n\"", "\"string\"");
-    EXPECT_EQ("usage|Nom|n\n", usageItem(entry, 1));
-    EXPECT_EQ("usage|Name|n\n", usageItem(entry, 9)) << "no dictionary of the test language";
+    EXPECT_EQ(usageItem(entry, 1), "usage|Nom|n\n");
+    EXPECT_EQ(usageItem(entry, 9), "usage|Name|n\n") << "no dictionary of the test language";
 }
 
 TEST_F(MxlatorTest, AnUnknownAttributeIsShownAsItsHexadecimalNumber) {
@@ -193,12 +193,12 @@ TEST_F(MxlatorTest, AnUnknownAttributeIsShownAsItsHexadecimalNumber) {
                             "kUsageTypeAffectedAttribute", "kUsageTypeConflictingAttr",
                             "kUsageTypeConflictingProperty", "kUsageTypeUnspecifiedProperty"}) {
         const std::string item = usageItem(usage(tag, "4660", "\"uint32_t\""));
-        EXPECT_EQ("|0x00001234\n", item.substr(item.rfind('|'))) << tag;
+        EXPECT_EQ(item.substr(item.rfind('|')), "|0x00001234\n") << tag;
     }
     const std::string items = usageItem(usage("kUsageTypeAttributeId", "[4660,-1]", "\"x\""));
-    EXPECT_EQ("|[\"0x00001234\",\"0xFFFFFFFF\"]\n", items.substr(items.rfind('|')));
+    EXPECT_EQ(items.substr(items.rfind('|')), "|[\"0x00001234\",\"0xFFFFFFFF\"]\n");
     const std::string text = usageItem(usage("kUsageTypeAttributeId", "\"name\"", "\"string\""));
-    EXPECT_EQ("|name\n", text.substr(text.rfind('|')));
+    EXPECT_EQ(text.substr(text.rfind('|')), "|name\n");
 }
 
 TEST_F(MxlatorTest, AnAttributeIdThatIsNoFiniteNumberIsNotShownAs0x8000000000000000) {
@@ -234,37 +234,37 @@ TEST_F(MxlatorTest, ANumberThatTheDecoderHasRoundedIsShownRounded) {
 }
 
 TEST_F(MxlatorTest, AnEnumWithoutANameIsShownAsItsValue) {
-    EXPECT_EQ("usage|x|3\n", usageItem(usage("x", "3", "{\"type\":\"enum\",\"id\":9}")));
-    EXPECT_EQ("usage|x|[\"3\",\"4\"]\n",
-              usageItem(usage("x", "[3,4]", "{\"type\":\"enum\",\"id\":9}")));
+    EXPECT_EQ(usageItem(usage("x", "3", "{\"type\":\"enum\",\"id\":9}")), "usage|x|3\n");
+    EXPECT_EQ(usageItem(usage("x", "[3,4]", "{\"type\":\"enum\",\"id\":9}")),
+              "usage|x|[\"3\",\"4\"]\n");
 }
 
 TEST_F(MxlatorTest, AnUnknownValueTypeShowsNoValue) {
-    EXPECT_EQ("usage|x|-\n", usageItem(usage("x", "3", "{\"type\":\"other\"}")));
+    EXPECT_EQ(usageItem(usage("x", "3", "{\"type\":\"other\"}")), "usage|x|-\n");
 }
 
 TEST_F(MxlatorTest, OtherValuesAreShownAsTheirJsonText) {
-    EXPECT_EQ("usage|x|true\n", usageItem(usage("x", "true", "\"bool\"")));
-    EXPECT_EQ("usage|x|null\n", usageItem(usage("x", "null", "\"string\"")));
-    EXPECT_EQ("usage|x|[\"[1]\",\"a\"]\n", usageItem(usage("x", "[[1],\"a\"]", "\"string\"")));
+    EXPECT_EQ(usageItem(usage("x", "true", "\"bool\"")), "usage|x|true\n");
+    EXPECT_EQ(usageItem(usage("x", "null", "\"string\"")), "usage|x|null\n");
+    EXPECT_EQ(usageItem(usage("x", "[[1],\"a\"]", "\"string\"")), "usage|x|[\"[1]\",\"a\"]\n");
 }
 
-TEST_F(MxlatorTest, AnEmptyArrayOrNoneShowsNoValue) {
-    EXPECT_EQ("usage|Name|-\n", usageItem("{\"type\":\"usage\",\"usage\":\"kUsageTypeName\"}"));
-    EXPECT_EQ("usage|x|-\n", usageItem(usage("x", "[]", "\"string\"")));
+TEST_F(MxlatorTest, AnEmptyOrMissingArrayShowsNoValue) {
+    EXPECT_EQ(usageItem("{\"type\":\"usage\",\"usage\":\"kUsageTypeName\"}"), "usage|Name|-\n");
+    EXPECT_EQ(usageItem(usage("x", "[]", "\"string\"")), "usage|x|-\n");
 }
 
-TEST_F(MxlatorTest, OtherKindsOfEntries) {
-    EXPECT_EQ("elaboration|-|The following NVMEM areas are available:\nheader|-|Name\nempty|-|-\n",
-              usageItem("{\"type\":\"elaboration\",\"usage\":\"kAuxTermAvailableAreas\"},"
+TEST_F(MxlatorTest, EntriesOfOtherKindsAreShown) {
+    EXPECT_EQ(usageItem("{\"type\":\"elaboration\",\"usage\":\"kAuxTermAvailableAreas\"},"
                         "{\"type\":\"comment\",\"comment\":\"secret\"},"
                         "{\"type\":\"header\",\"usage\":\"kUsageTypeName\"},{\"type\":\"strange\"},"
-                        "{\"type\":\"empty\"},7,null"));
+                        "{\"type\":\"empty\"},7,null"),
+              "elaboration|-|The following NVMEM areas are available:\nheader|-|Name\nempty|-|-\n");
 }
 
-TEST_F(MxlatorTest, ACommentIsShownNowhere) {
+TEST_F(MxlatorTest, ACommentIsNeverShown) {
     const std::string text = json1(withEntries("{\"type\":\"comment\",\"comment\":\"secret\"}"));
-    EXPECT_EQ(std::string::npos, text.find("secret")) << text;
+    EXPECT_EQ(text.find("secret"), std::string::npos) << text;
     EXPECT_NE(std::string::npos, text.find("\"dynamic\":{}")) << text;
 }
 
@@ -276,46 +276,45 @@ TEST_F(MxlatorTest, ManyEntriesKeepTheirOrder) {
         entries += (number == 0 ? "" : ",") + usage("t" + text, "\"v\"", "\"string\"");
         expected += "usage|t" + text + "|v\n";
     }
-    EXPECT_EQ(expected, usageItem(entries));
+    EXPECT_EQ(usageItem(entries), expected);
 }
 
 TEST_F(MxlatorTest, AStatusWithoutDetailsHasNoItems) {
-    EXPECT_EQ("", items("{\"translator\":\"mxlator_qitrmc\"}"));
-    EXPECT_EQ("", items("{\"translator\":\"mxlator_qitrmc\",\"translator_info\":{}}"));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(items("{\"translator\":\"mxlator_qitrmc\"}"), "");
+    EXPECT_EQ(items("{\"translator\":\"mxlator_qitrmc\",\"translator_info\":{}}"), "");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(MxlatorTest, TheDebugItemsTellTheOriginAndTheRest) {
-    EXPECT_EQ(
-        "usage|Component|qitrmcsvc\nusage|File|f.cpp\nusage|Line|12\n"
-        "usage|rest_of_input_json|{\"translator\":\"mxlator_qitrmc\"}\n",
-        items("{\"file\":\"f.cpp\",\"line\":12,\"component\":\"qitrmcsvc\","
-              "\"translator\":\"mxlator_qitrmc\",\"translator_info\":{\"ordered_data\":[]}}",
-              "debug"));
-    EXPECT_EQ("usage|rest_of_input_json|{\"translator\":\"mxlator_qitrmc\"}\n",
-              items("{\"translator\":\"mxlator_qitrmc\"}", "debug"));
+TEST_F(MxlatorTest, TheDebugItemsContainTheOriginAndTheOtherMembers) {
+    EXPECT_EQ(items("{\"file\":\"f.cpp\",\"line\":12,\"component\":\"qitrmcsvc\","
+                    "\"translator\":\"mxlator_qitrmc\",\"translator_info\":{\"ordered_data\":[]}}",
+                    "debug"),
+              "usage|Component|qitrmcsvc\nusage|File|f.cpp\nusage|Line|12\n"
+              "usage|rest_of_input_json|{\"translator\":\"mxlator_qitrmc\"}\n");
+    EXPECT_EQ(items("{\"translator\":\"mxlator_qitrmc\"}", "debug"),
+              "usage|rest_of_input_json|{\"translator\":\"mxlator_qitrmc\"}\n");
 }
 
 TEST_F(MxlatorTest, AnotherFormatIsRefused) {
-    EXPECT_EQ("(null)", json1("{\"translator\":\"mxlator_qitrmc\"}", 0x200, "json2"));
-    EXPECT_EQ(-52029, status.code);
+    EXPECT_EQ(json1("{\"translator\":\"mxlator_qitrmc\"}", 0x200, "json2"), "(null)");
+    EXPECT_EQ(status.code, -52029);
     EXPECT_NE(std::string::npos, std::string(status.json).find("failed to get dynamic desc"));
 }
 
-TEST_F(MxlatorTest, ATextThatIsNoJsonIsAFailure) {
-    EXPECT_EQ("(null)", json1("{\"translator\":\"mxlator_qitrmc\",\"broken"));
-    EXPECT_EQ(-52003, status.code);
+TEST_F(MxlatorTest, ATextThatIsNotJsonIsAFailure) {
+    EXPECT_EQ(json1("{\"translator\":\"mxlator_qitrmc\",\"broken"), "(null)");
+    EXPECT_EQ(status.code, -52003);
     EXPECT_NE(std::string::npos,
               std::string(status.json)
                   .find("\"qixlatorlua_debug\":{\"debug\":\"failed to get dynamic desc\"}"));
 }
 
-TEST_F(MxlatorTest, AnEnvironmentThatIsUnknownIsNoFailure) {
-    EXPECT_EQ("usage|Name|n\n", usageItem(usage("kUsageTypeName", "\"n\"", "\"string\""), 0xF00));
-    EXPECT_EQ(0, status.code);
+TEST_F(MxlatorTest, AnUnknownEnvironmentIsNotAFailure) {
+    EXPECT_EQ(usageItem(usage("kUsageTypeName", "\"n\"", "\"string\""), 0xF00), "usage|Name|n\n");
+    EXPECT_EQ(status.code, 0);
 }
 
-// ---- The whole road -----------------------------------------------------------------------------
+// ---- A whole translation ------------------------------------------------------------------------
 
 TEST_F(MxlatorTest, AStatusOfTheServiceBecomesAText) {
     explain("mierrors/qitrmc/English", "The device is reserved.");
@@ -327,11 +326,10 @@ TEST_F(MxlatorTest, AStatusOfTheServiceBecomesAText) {
     addUsageStringArray(writer, "kUsageTypeReservedBySessions", {"_session1", "_session2"});
     qihtl::String text;
     qixlator::json1::translateErrStatusToRawText(session, &failure, 0x200, 11, &text, &status);
-    EXPECT_EQ(0, status.code) << status.json;
-    EXPECT_STREQ(
-        "The device is reserved.\n\nName: device \"1\"\n"
-        "Reserved by Sessions: _session1, _session2",
-        text.c_str());
+    EXPECT_EQ(status.code, 0) << status.json;
+    EXPECT_STREQ(text.c_str(),
+                 "The device is reserved.\n\nName: device \"1\"\n"
+                 "Reserved by Sessions: _session1, _session2");
 }
 
 TEST_F(MxlatorTest, EveryTagOfTheServiceHasAnEnglishTerm) {
@@ -340,7 +338,7 @@ TEST_F(MxlatorTest, EveryTagOfTheServiceHasAnEnglishTerm) {
           "kUsageTypeParameter", "kUsageTypeJsonDocPointer", "kUsageTypeJsonSchemaKeyword",
           "kUsageTypeJsonSchemaPointer", "kUsageTypeReservedBySessions", "kUsageTypeSessionId",
           "kUsageTypeRequestedValue", "kUsageTypeDevices", "kUsageTypeRequestedDataType"}) {
-        EXPECT_EQ(std::string::npos, usageItem(usage(tag, "\"v\"", "\"string\"")).find(tag)) << tag;
+        EXPECT_EQ(usageItem(usage(tag, "\"v\"", "\"string\"")).find(tag), std::string::npos) << tag;
     }
 }
 

@@ -15,8 +15,8 @@ namespace {
 
 using qixlatorlua::LuaRuntime;
 
-// Holds the fast way of running the translator against the plain one: the same texts, statuses,
-// tracebacks and lines on standard error.
+// Compares the fast way of running the translator with the plain one: texts, statuses, tracebacks
+// and lines on standard error must be the same.
 class RuntimesTest : public testing::Test {
   protected:
     RuntimesTest() {
@@ -28,7 +28,7 @@ class RuntimesTest : public testing::Test {
                    "</qierror>\n</qidocument>\n");
     }
 
-    // Everything that can be seen of a new translator asked once.
+    // Everything observable about a new translator that is used once.
     static std::string observe(LuaRuntime runtime, std::int32_t code, const char* json,
                                std::uint32_t attributes, const char* format) {
         testing::internal::CaptureStderr();
@@ -76,7 +76,7 @@ TEST_F(RuntimesTest, GiveTheSameDetailsInEveryLanguage) {
     compare(0, "{}", 0, "json2");
 }
 
-// A JSON value of some depth, made of what statuses hold and what they should not hold.
+// A JSON value of some depth, made of valid and invalid parts of statuses.
 std::string randomValue(std::mt19937& random, int depth) {
     static const std::vector<std::string> leaves = {"null",
                                                     "true",

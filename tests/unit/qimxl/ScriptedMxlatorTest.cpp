@@ -13,7 +13,7 @@ using statusTexts::usage;
 using statusTexts::withEntries;
 
 // The translator's script in a state that another script has prepared, with modules and settings
-// that the service does not bring.
+// that the service does not provide.
 class ScriptedMxlatorTest : public testing::Test {
   protected:
     ~ScriptedMxlatorTest() override {
@@ -51,9 +51,9 @@ class ScriptedMxlatorTest : public testing::Test {
                             "\n</qierror>\n</qidocument>\n");
     }
 
-    // The script failed with this message, which the traceback follows.
+    // Expects that the script failed with this message, which the traceback follows.
     void expectFailure(const std::string& message) {
-        EXPECT_EQ(-52003, status.code);
+        EXPECT_EQ(status.code, -52003);
         EXPECT_TRUE(reported(status, message)) << status.json;
     }
 
@@ -72,24 +72,25 @@ TEST_F(ScriptedMxlatorTest, AMissingAttributeTableIsNamedAmongTheDebugItems) {
     prepare("package.preload.qimxl_defaultAttrTable = function() error('none') end");
     const std::string json = "{\"line\":12,\"translator\":\"x\"}";
     const std::string text = json1(json);
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(status.code, 0);
     const std::size_t line = text.find("\"Line\"");
     const std::size_t missing = text.find("\"internal_error_string\"");
     const std::size_t rest = text.find("\"rest_of_input_json\"");
     EXPECT_LT(line, missing) << text;
     EXPECT_LT(missing, rest) << text;
-    EXPECT_EQ("", holds(text, "\"Cannot load qimxl_defaultAttrTable\\n\""));
+    EXPECT_EQ(holds(text, "\"Cannot load qimxl_defaultAttrTable\\n\""), "");
 }
 
 TEST_F(ScriptedMxlatorTest, WithAnAttributeTableNoneIsNamedAmongTheDebugItems) {
     prepare("");
-    EXPECT_EQ(std::string::npos, json1("{\"line\":12}").find("internal_error_string"));
+    EXPECT_EQ(json1("{\"line\":12}").find("internal_error_string"), std::string::npos);
 }
 
 TEST_F(ScriptedMxlatorTest, WithoutAnAttributeTableAnAttributeIsItsNumber) {
     prepare("package.preload.qimxl_defaultAttrTable = function() error('none') end");
-    EXPECT_EQ("", holds(usageItem(usage("kUsageTypeAttributeId", "4660", "\"uint32_t\"")),
-                        "\"0x00001234\""));
+    EXPECT_EQ(
+        holds(usageItem(usage("kUsageTypeAttributeId", "4660", "\"uint32_t\"")), "\"0x00001234\""),
+        "");
 }
 
 TEST_F(ScriptedMxlatorTest, EachEnvironmentHasItsAttributeTables) {
@@ -102,13 +103,13 @@ TEST_F(ScriptedMxlatorTest, EachEnvironmentHasItsAttributeTables) {
         "end",
         "{\"driverName\":\"d\"}");
     const std::string entry = usage("kUsageTypeAttributeId", "4660", "\"uint32_t\"");
-    EXPECT_EQ("", holds(usageItem(entry, 0x000), "\"eng 00001234\""));
-    EXPECT_EQ("", holds(usageItem(entry, 0x100), "\"eng_qv 00001234\""));
-    EXPECT_EQ("", holds(usageItem(entry, 0x200), "\"eng_qvi 00001234\""));
-    EXPECT_EQ("", holds(usageItem(entry, 0x300), "\"eng_qstudio 00001234\""));
-    EXPECT_EQ("", holds(usageItem(entry, 0x301), "\"fra_qstudio 00001234\""));
-    EXPECT_EQ("", holds(usageItem(entry, 0x302), "\"eng_qstudio 00001234\""));
-    EXPECT_EQ("", holds(usageItem(entry, 0xFFFFF300), "\"eng_qstudio 00001234\""));
+    EXPECT_EQ(holds(usageItem(entry, 0x000), "\"eng 00001234\""), "");
+    EXPECT_EQ(holds(usageItem(entry, 0x100), "\"eng_qv 00001234\""), "");
+    EXPECT_EQ(holds(usageItem(entry, 0x200), "\"eng_qvi 00001234\""), "");
+    EXPECT_EQ(holds(usageItem(entry, 0x300), "\"eng_qstudio 00001234\""), "");
+    EXPECT_EQ(holds(usageItem(entry, 0x301), "\"fra_qstudio 00001234\""), "");
+    EXPECT_EQ(holds(usageItem(entry, 0x302), "\"eng_qstudio 00001234\""), "");
+    EXPECT_EQ(holds(usageItem(entry, 0xFFFFF300), "\"eng_qstudio 00001234\""), "");
 }
 
 // ---- Encodings ----------------------------------------------------------------------------------
@@ -118,8 +119,8 @@ TEST_F(ScriptedMxlatorTest, ADictionaryInAnotherEncodingIsRefused) {
         "package.preload.commonTerms_fra = function()\n"
         "  return { encoding = 'latin-1', getString = function() return 'x' end } end");
     const std::string entry = usage("kUsageTypeName", "\"n\"", "\"string\"");
-    EXPECT_EQ("", holds(usageItem(entry, 0), "\"Name\""));
-    EXPECT_EQ("(null)", json1(withEntries(entry), 1));
+    EXPECT_EQ(holds(usageItem(entry, 0), "\"Name\""), "");
+    EXPECT_EQ(json1(withEntries(entry), 1), "(null)");
     expectFailure("Unsupported encoding");
 }
 
@@ -128,8 +129,8 @@ TEST_F(ScriptedMxlatorTest, AnErrorTableInAnotherEncodingIsRefused) {
         "package.preload.errors_fra = function()\n"
         "  return { encoding = 'latin-1', getString = function() return 'x' end } end",
         "{\"qiSharedErrorsDir\":\"/nowhere\"}");
-    EXPECT_EQ("Error description not found", describe(0));
-    EXPECT_EQ("(null)", describe(1));
+    EXPECT_EQ(describe(0), "Error description not found");
+    EXPECT_EQ(describe(1), "(null)");
     expectFailure("Unsupported encoding");
 }
 
@@ -137,7 +138,7 @@ TEST_F(ScriptedMxlatorTest, AnErrorTableInAnotherEncodingIsRefused) {
 
 TEST_F(ScriptedMxlatorTest, ASharedErrorsDirectoryThatCannotBeExpandedIsAFailure) {
     prepare("", "{\"qiSharedErrorsDir\":\"$_tempDir\"}");
-    EXPECT_EQ("(null)", describe());
+    EXPECT_EQ(describe(), "(null)");
     expectFailure("plugin dll path invalid");
     EXPECT_TRUE(reported(status, "\"qixlatorlua_debug\":{\"debug\":\"failed to get static desc\"}"))
         << status.json;
@@ -147,7 +148,7 @@ TEST_F(ScriptedMxlatorTest, ADriverErrorsDirectoryThatCannotBeExpandedIsAFailure
     prepare("",
             "{\"qiSharedErrorsDir\":\"/nowhere\",\"MIErrorsDir\":\"$_tempDir\","
             "\"driverName\":\"d\"}");
-    EXPECT_EQ("(null)", describe());
+    EXPECT_EQ(describe(), "(null)");
     expectFailure("plugin dll path invalid");
 }
 
@@ -160,12 +161,12 @@ TEST_F(ScriptedMxlatorTest, DriverFilesAreSearchedOnlyWithBothOfTheirSettings) {
          {"{" + shared + "," + directory + "}", "{" + shared + ",\"driverName\":\"d\"}",
           "{" + shared + "}"}) {
         prepare("", settings);
-        ASSERT_EQ("Shared.", describe()) << settings;
+        ASSERT_EQ(describe(), "Shared.") << settings;
         xlator->destroy(std::exchange(xlator, nullptr));
     }
     prepare("", "{" + shared + "," + directory + ",\"driverName\":\"d\"}");
-    EXPECT_EQ("Driver.", describe());
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describe(), "Driver.");
+    EXPECT_EQ(status.code, 0);
 }
 
 // ---- Names of languages -------------------------------------------------------------------------
@@ -175,26 +176,28 @@ TEST_F(ScriptedMxlatorTest, TheNamesOfTheLanguagesAreConvertedBothWays) {
          {std::pair("eng", "English"), std::pair("fra", "French"), std::pair("deu", "German"),
           std::pair("jpn", "Japanese"), std::pair("kor", "Korean"), std::pair("chs", "ChineseS")}) {
         const std::string function = "return require('qimxl_utilities').convertLang";
-        EXPECT_EQ(name, host.run(function + "ShortToLong('" + word + "')", &status));
-        EXPECT_EQ(word, host.run(function + "LongToShort('" + name + "')", &status));
+        EXPECT_EQ(host.run(function + "ShortToLong('" + word + "')", &status), name);
+        EXPECT_EQ(host.run(function + "LongToShort('" + name + "')", &status), word);
     }
-    EXPECT_EQ("Zzzzzzz",
-              host.run("return require('qimxl_utilities').convertLangShortToLong('zzz')", &status));
+    EXPECT_EQ(host.run("return require('qimxl_utilities').convertLangShortToLong('zzz')", &status),
+              "Zzzzzzz");
 }
 
 TEST_F(ScriptedMxlatorTest, AnUnknownNameOfALanguageGivesWhatTheLastKnownOneGave) {
     const std::string head = "local u = require('qimxl_utilities') return ";
-    EXPECT_EQ("nil", host.run(head + "tostring(u.convertLangLongToShort('Latin'))", &status));
-    EXPECT_EQ("nil", host.run(head + "tostring(u.convertLangLongToShort('Zzzzzzz'))", &status))
+    EXPECT_EQ(host.run(head + "tostring(u.convertLangLongToShort('Latin'))", &status), "nil");
+    EXPECT_EQ(host.run(head + "tostring(u.convertLangLongToShort('Zzzzzzz'))", &status), "nil")
         << "the test language has no way back";
-    EXPECT_EQ("nil", host.run(head + "tostring(u.convertLangShortToLong('lat'))", &status));
-    EXPECT_EQ("deu deu", host.run(head + "u.convertLangLongToShort('German') .. ' ' .. "
-                                         "u.convertLangLongToShort('Latin')",
-                                  &status));
-    EXPECT_EQ("German German", host.run(head + "u.convertLangShortToLong('deu') .. ' ' .. "
-                                               "u.convertLangShortToLong('lat')",
-                                        &status));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(host.run(head + "tostring(u.convertLangShortToLong('lat'))", &status), "nil");
+    EXPECT_EQ(host.run(head + "u.convertLangLongToShort('German') .. ' ' .. "
+                              "u.convertLangLongToShort('Latin')",
+                       &status),
+              "deu deu");
+    EXPECT_EQ(host.run(head + "u.convertLangShortToLong('deu') .. ' ' .. "
+                              "u.convertLangShortToLong('lat')",
+                       &status),
+              "German German");
+    EXPECT_EQ(status.code, 0);
 }
 
 // ---- A locale with a decimal comma --------------------------------------------------------------
@@ -202,10 +205,10 @@ TEST_F(ScriptedMxlatorTest, AnUnknownNameOfALanguageGivesWhatTheLastKnownOneGave
 TEST_F(ScriptedMxlatorTest, NumbersKeepTheirPointUnderALocaleWithADecimalComma) {
     const CommaLocale locale;
     prepare("");
-    EXPECT_EQ("", holds(usageItem(usage("x", "-1.5", "\"double\"")), "\"-1.5\""));
-    EXPECT_EQ("", holds(usageItem(usage("x", "[0.25,3]", "\"double\"")), "[\"0.25\",\"3\"]"));
-    EXPECT_EQ("", holds(json1("{\"line\":12,\"real\":0.5}"), "{\\\"real\\\":0.5}"));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(holds(usageItem(usage("x", "-1.5", "\"double\"")), "\"-1.5\""), "");
+    EXPECT_EQ(holds(usageItem(usage("x", "[0.25,3]", "\"double\"")), "[\"0.25\",\"3\"]"), "");
+    EXPECT_EQ(holds(json1("{\"line\":12,\"real\":0.5}"), "{\\\"real\\\":0.5}"), "");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(ScriptedMxlatorTest, SettingsKeepTheirFractionsUnderALocaleWithADecimalComma) {
@@ -216,7 +219,7 @@ TEST_F(ScriptedMxlatorTest, SettingsKeepTheirFractionsUnderALocaleWithADecimalCo
         "  return { encoding = 'utf-8', getString = function()\n"
         "    return json.encode({ qixlatorlua_settings.real, 0.25 }) end } end",
         "{\"qiSharedErrorsDir\":\"/nowhere\",\"real\":-1.5e-1}");
-    EXPECT_EQ("[-0.15,0.25]", describe());
+    EXPECT_EQ(describe(), "[-0.15,0.25]");
 }
 
 }  // namespace

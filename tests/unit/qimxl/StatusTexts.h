@@ -3,7 +3,7 @@
 #include <string>
 #include <vector>
 
-// Texts of statuses of the translator mxlator_qitrmc, with what the scripts must cope with.
+// Texts of statuses of the translator mxlator_qitrmc, with inputs that the scripts must handle.
 namespace statusTexts {
 
 inline std::string withEntries(const std::string& entries) {
@@ -18,7 +18,7 @@ inline std::string usage(const std::string& tag, const std::string& value,
            ",\"value_type\":" + valueType + "}";
 }
 
-// Good and bad ones, for comparing the two ways of running the scripts.
+// Valid and invalid ones, for comparing the two ways of running the scripts.
 inline std::vector<std::string> ofEveryKind() {
     const std::string one = usage("kUsageTypeName", "\"n\"", "\"string\"");
     return {

@@ -15,39 +15,39 @@ TEST(QidynlibTest, LoadsALibraryAndFindsASymbol) {
     qierr::Status status;
     void* handle = qidynlib_load(RELOCATIONS_COMPLETE, &status);
     EXPECT_NE(nullptr, qidynlib_symbol(handle, "get_relocated_dir", &status));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(status.code, 0);
     dlclose(handle);
 }
 
-TEST(QidynlibTest, AMissingLibraryIsReportedWithTheLoadersWords) {
+TEST(QidynlibTest, AMissingLibraryIsReportedWithTheLoadersText) {
     qierr::Status status;
-    EXPECT_EQ(nullptr, qidynlib_load("libabsent-from-every-system.so.0", &status));
-    EXPECT_EQ(-52005, status.code);
+    EXPECT_EQ(qidynlib_load("libabsent-from-every-system.so.0", &status), nullptr);
+    EXPECT_EQ(status.code, -52005);
     EXPECT_TRUE(contains(status, "\"error_constant\":\"qiapalerr_invalidParameter\""));
     EXPECT_TRUE(contains(status,
                          "\"qidynlib_debug\":{\"debug\":\"failed to qidynlib_load library\","
                          "\"path\":\"libabsent-from-every-system.so.0\"},"
                          "\"internal_error\":{\"api\":\"dlerror\",\"string\":\"libabsent"))
         << status.json;
-    EXPECT_EQ(nullptr, dlerror()) << "the pending text was not cleared";
+    EXPECT_EQ(dlerror(), nullptr) << "the pending text was not cleared";
 }
 
-TEST(QidynlibTest, AMissingSymbolIsReportedWithTheLoadersWords) {
+TEST(QidynlibTest, AMissingSymbolIsReportedWithTheLoadersText) {
     qierr::Status status;
     void* handle = qidynlib_load(RELOCATIONS_LACKING, &status);
-    EXPECT_EQ(nullptr, qidynlib_symbol(handle, "get_relocated_dir", &status));
-    EXPECT_EQ(-52005, status.code);
+    EXPECT_EQ(qidynlib_symbol(handle, "get_relocated_dir", &status), nullptr);
+    EXPECT_EQ(status.code, -52005);
     EXPECT_TRUE(contains(status,
                          "\"qidynlib_debug\":{\"debug\":\"failed to get symbol\","
                          "\"qidynlib_symbol\":\"get_relocated_dir\"},"
                          "\"internal_error\":{\"api\":\"dlerror\",\"string\":\""))
         << status.json;
-    EXPECT_EQ(nullptr, dlerror());
+    EXPECT_EQ(dlerror(), nullptr);
     dlclose(handle);
 }
 
-TEST(QidynlibTest, TheSymbolsOfALibraryServeTheWholeProcess) {
-    ASSERT_EQ(nullptr, dlsym(RTLD_DEFAULT, "another_function"));
+TEST(QidynlibTest, TheSymbolsOfALibraryAreVisibleToTheWholeProcess) {
+    ASSERT_EQ(dlsym(RTLD_DEFAULT, "another_function"), nullptr);
     qierr::Status status;
     // A library of its own, since finding the symbol keeps it loaded.
     void* handle = qidynlib_load(SHARED_SYMBOLS, &status);
@@ -56,20 +56,20 @@ TEST(QidynlibTest, TheSymbolsOfALibraryServeTheWholeProcess) {
     dlclose(handle);
 }
 
-TEST(QidynlibTest, AFunctionThatNobodyHasIsMissedAtOnce) {
+TEST(QidynlibTest, AnUnresolvedFunctionFailsTheLoadAtOnce) {
     qierr::Status status;
-    EXPECT_EQ(nullptr, qidynlib_load(RELOCATIONS_UNRESOLVED, &status));
-    EXPECT_EQ(-52005, status.code);
+    EXPECT_EQ(qidynlib_load(RELOCATIONS_UNRESOLVED, &status), nullptr);
+    EXPECT_EQ(status.code, -52005);
     EXPECT_TRUE(contains(status, "function_of_no_library")) << status.json;
 }
 
 TEST(QidynlibTest, NothingIsDoneWhenTheStatusIsNegative) {
     qierr::Status status;
     status.code = -1;
-    EXPECT_EQ(nullptr, qidynlib_load(RELOCATIONS_COMPLETE, &status));
-    EXPECT_EQ(nullptr, qidynlib_symbol(nullptr, "get_relocated_dir", &status));
-    EXPECT_EQ(-1, status.code);
-    EXPECT_EQ(nullptr, status.json);
+    EXPECT_EQ(qidynlib_load(RELOCATIONS_COMPLETE, &status), nullptr);
+    EXPECT_EQ(qidynlib_symbol(nullptr, "get_relocated_dir", &status), nullptr);
+    EXPECT_EQ(status.code, -1);
+    EXPECT_EQ(status.json, nullptr);
 }
 
 }  // namespace

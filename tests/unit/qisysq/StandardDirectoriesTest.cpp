@@ -46,40 +46,40 @@ const std::map<std::string, std::string> defaults = {
 TEST(StandardDirectoriesTest, WithoutTheLibraryEveryKeyHasItsDefaultBelowTheRoot) {
     const qisysq::StandardDirectories table(absent);
     for (const auto& [key, directory] : defaults) {
-        EXPECT_EQ(qisysq_installRoot() + directory, lookUp(table, key.c_str())) << key;
+        EXPECT_EQ(lookUp(table, key.c_str()), qisysq_installRoot() + directory) << key;
     }
 }
 
 TEST(StandardDirectoriesTest, ALibraryWithoutTheFunctionRelocatesNothing) {
     const qisysq::StandardDirectories table(RELOCATIONS_LACKING);
-    EXPECT_EQ(std::string(qisysq_installRoot()) + "/usr/bin", lookUp(table, "bindir"));
+    EXPECT_EQ(lookUp(table, "bindir"), std::string(qisysq_installRoot()) + "/usr/bin");
 }
 
-TEST(StandardDirectoriesTest, ARelocatedDirectoryIsUsedAsItStands) {
+TEST(StandardDirectoriesTest, ARelocatedDirectoryIsUsedUnchanged) {
     const qisysq::StandardDirectories table(RELOCATIONS_COMPLETE);
-    EXPECT_EQ("/moved/bin", lookUp(table, "bindir"));
-    EXPECT_EQ(std::string(255, 'd'), lookUp(table, "docdir"));
-    EXPECT_EQ(std::string(qisysq_installRoot()) + "/usr/sbin", lookUp(table, "sbindir"));
+    EXPECT_EQ(lookUp(table, "bindir"), "/moved/bin");
+    EXPECT_EQ(lookUp(table, "docdir"), std::string(255, 'd'));
+    EXPECT_EQ(lookUp(table, "sbindir"), std::string(qisysq_installRoot()) + "/usr/sbin");
 }
 
 TEST(StandardDirectoriesTest, AFailedRelocationIsReportedForItsKeyOnly) {
     const qisysq::StandardDirectories table(RELOCATIONS_COMPLETE);
-    EXPECT_EQ("failed with -52006", lookUp(table, "libdir"));
-    EXPECT_EQ("failed with -52006", lookUp(table, "libdir"));
-    EXPECT_EQ("/moved/bin", lookUp(table, "bindir"));
+    EXPECT_EQ(lookUp(table, "libdir"), "failed with -52006");
+    EXPECT_EQ(lookUp(table, "libdir"), "failed with -52006");
+    EXPECT_EQ(lookUp(table, "bindir"), "/moved/bin");
 }
 
 TEST(StandardDirectoriesTest, TheLibraryIsUnloadedAgain) {
     const qisysq::StandardDirectories table(RELOCATIONS_COMPLETE);
-    EXPECT_EQ(nullptr, dlopen(RELOCATIONS_COMPLETE, RTLD_NOW | RTLD_NOLOAD));
+    EXPECT_EQ(dlopen(RELOCATIONS_COMPLETE, RTLD_NOW | RTLD_NOLOAD), nullptr);
 }
 
 TEST(StandardDirectoriesTest, AnUnknownKeyIsAnErrorWithoutDetails) {
     qierr::Status status;
     qihtl::String directory;
     qisysq::getStandardDir("nosuchdir", &directory, &status);
-    EXPECT_EQ(-52008, status.code);
-    EXPECT_EQ(nullptr, status.json);
+    EXPECT_EQ(status.code, -52008);
+    EXPECT_EQ(status.json, nullptr);
 }
 
 TEST(StandardDirectoriesTest, TheProcessWideTableFindsTheLibraryByItsName) {
@@ -87,17 +87,17 @@ TEST(StandardDirectoriesTest, TheProcessWideTableFindsTheLibraryByItsName) {
     void* library = dlopen(RELOCATIONS_COMPLETE, RTLD_NOW);
     ASSERT_NE(nullptr, library) << dlerror();
     const qisysq::StandardDirectories table("libqirelocations.so.0");
-    EXPECT_EQ("/moved/bin", lookUp(table, "bindir"));
+    EXPECT_EQ(lookUp(table, "bindir"), "/moved/bin");
     dlclose(library);
 }
 
-TEST(StandardDirectoriesTest, AFailureOfBuildingIsReportedOnEachLookup) {
+TEST(StandardDirectoriesTest, AFailureToBuildTheTableIsReportedOnEachLookup) {
     FaultyAllocator::failAt(3);
     const qisysq::StandardDirectories table(absent);
     FaultyAllocator::succeed();
-    EXPECT_EQ("failed with -52000", lookUp(table, "bindir"));
-    EXPECT_EQ("failed with -52000", lookUp(table, "prefixdir"));
-    EXPECT_EQ("failed with -52000", lookUp(table, "nosuchdir"));
+    EXPECT_EQ(lookUp(table, "bindir"), "failed with -52000");
+    EXPECT_EQ(lookUp(table, "prefixdir"), "failed with -52000");
+    EXPECT_EQ(lookUp(table, "nosuchdir"), "failed with -52000");
 }
 
 TEST(StandardDirectoriesTest, ALookupDoesNothingWhenTheStatusIsNegative) {
@@ -105,7 +105,7 @@ TEST(StandardDirectoriesTest, ALookupDoesNothingWhenTheStatusIsNegative) {
     status.code = -1;
     qihtl::String directory;
     qisysq::getStandardDir("bindir", &directory, &status);
-    EXPECT_EQ(-1, status.code);
+    EXPECT_EQ(status.code, -1);
     EXPECT_TRUE(directory.empty());
 }
 

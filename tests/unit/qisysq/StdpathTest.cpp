@@ -23,7 +23,7 @@ class StdpathTest : public testing::Test {
         qierr::Status status;
         qihtl::String directory;
         function(&directory, &status);
-        EXPECT_EQ(0, status.code);
+        EXPECT_EQ(status.code, 0);
         return std::string(directory.c_str(), directory.length());
     }
 
@@ -38,40 +38,40 @@ class StdpathTest : public testing::Test {
 };
 
 TEST_F(StdpathTest, WithoutTheFileTheSharedDirectoryIsTheStandardOne) {
-    EXPECT_EQ(root.locate("/usr/local/qinstal/share"), get(qisysq::getSharedDir));
+    EXPECT_EQ(get(qisysq::getSharedDir), root.locate("/usr/local/qinstal/share"));
 }
 
-TEST_F(StdpathTest, TheTextOfTheFileIsTheSharedDirectoryAsItStands) {
-    EXPECT_EQ("/opt/shared", sharedDirFor("/opt/shared/\n"));
+TEST_F(StdpathTest, TheTextOfTheFileIsTheSharedDirectory) {
+    EXPECT_EQ(sharedDirFor("/opt/shared/\n"), "/opt/shared");
 }
 
 TEST_F(StdpathTest, TrailingBlanksSlashesAndNulBytesAndLeadingBlanksAreRemoved) {
-    EXPECT_EQ("/a/b", sharedDirFor("/a/b//  \n"));
-    EXPECT_EQ("/a b", sharedDirFor(" \t\r\n\v\f/a b \v\f\t/\r\n"));
-    EXPECT_EQ("/a", sharedDirFor(std::string("/a/\0\0 \0", 7)));
+    EXPECT_EQ(sharedDirFor("/a/b//  \n"), "/a/b");
+    EXPECT_EQ(sharedDirFor(" \t\r\n\v\f/a b \v\f\t/\r\n"), "/a b");
+    EXPECT_EQ(sharedDirFor(std::string("/a/\0\0 \0", 7)), "/a");
 }
 
-TEST_F(StdpathTest, AnEmptyFileGivesAnEmptySharedDirectory) {
-    EXPECT_EQ("", sharedDirFor(""));
-    EXPECT_EQ("", sharedDirFor("/\n"));
+TEST_F(StdpathTest, AnEmptyFileMeansAnEmptySharedDirectory) {
+    EXPECT_EQ(sharedDirFor(""), "");
+    EXPECT_EQ(sharedDirFor("/\n"), "");
 }
 
 TEST_F(StdpathTest, AFileThatCannotBeReadCountsAsMissing) {
     root.makeDirectory("/etc/qinstal/share/share.dir");
-    EXPECT_EQ(root.locate("/usr/local/qinstal/share"), get(qisysq::getSharedDir));
+    EXPECT_EQ(get(qisysq::getSharedDir), root.locate("/usr/local/qinstal/share"));
 }
 
-TEST_F(StdpathTest, TheCommonApplicationDataLiesBelowTheRoot) {
-    EXPECT_EQ(root.locate("/var/local/qinstal"), get(qisysq::getCommonAppDataDir));
+TEST_F(StdpathTest, TheCommonApplicationDataIsBelowTheRoot) {
+    EXPECT_EQ(get(qisysq::getCommonAppDataDir), root.locate("/var/local/qinstal"));
 }
 
 TEST_F(StdpathTest, TheTemporaryDirectoryComesFromTheEnvironment) {
     setenv("TMPDIR", "/some/where", 1);
-    EXPECT_EQ("/some/where", get(qisysq::getTempDir));
+    EXPECT_EQ(get(qisysq::getTempDir), "/some/where");
     setenv("TMPDIR", "", 1);
-    EXPECT_EQ("", get(qisysq::getTempDir));
+    EXPECT_EQ(get(qisysq::getTempDir), "");
     unsetenv("TMPDIR");
-    EXPECT_EQ("/tmp", get(qisysq::getTempDir));
+    EXPECT_EQ(get(qisysq::getTempDir), "/tmp");
 }
 
 TEST_F(StdpathTest, NothingIsDoneWhenTheStatusIsNegative) {
@@ -80,7 +80,7 @@ TEST_F(StdpathTest, NothingIsDoneWhenTheStatusIsNegative) {
         status.code = -1;
         qihtl::String directory;
         function(&directory, &status);
-        EXPECT_EQ(-1, status.code);
+        EXPECT_EQ(status.code, -1);
         EXPECT_TRUE(directory.empty());
     }
 }

@@ -15,7 +15,7 @@ bool contains(const qierr::Status& status, const std::string& part) {
     return std::string(status.json).find(part) != std::string::npos;
 }
 
-// While it lives, the C library has this text for every error.
+// While it exists, the C library has this text for every error.
 class ErrnoText {
   public:
     explicit ErrnoText(const char* text) {
@@ -41,25 +41,25 @@ class ReadFileToBufferTest : public testing::Test {
     qierr::Status status;
 };
 
-TEST_F(ReadFileToBufferTest, GivesTheWholeFileWithANulBehindIt) {
+TEST_F(ReadFileToBufferTest, ReturnsTheWholeFileAndANul) {
     const std::string content("a\0b\n", 4);
     root.write("/file", content);
     read("/file");
-    EXPECT_EQ(0, status.code);
-    EXPECT_EQ(content, std::string(buffer.c_str(), buffer.length()));
-    EXPECT_EQ('\0', buffer.c_str()[4]);
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(std::string(buffer.c_str(), buffer.length()), content);
+    EXPECT_EQ(buffer.c_str()[4], '\0');
 }
 
-TEST_F(ReadFileToBufferTest, ReplacesWhatTheBufferHeld) {
+TEST_F(ReadFileToBufferTest, ReplacesTheContentOfTheBuffer) {
     root.write("/file", "new");
     buffer.assign("what was there before", &status);
     read("/file");
-    EXPECT_STREQ("new", buffer.c_str());
+    EXPECT_STREQ(buffer.c_str(), "new");
 }
 
 TEST_F(ReadFileToBufferTest, AMissingFileIsReportedWithTheErrno) {
     read("/missing");
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(contains(status, "\"error_constant\":\"qiapalerr_resourceNotFound\""));
     EXPECT_TRUE(contains(
         status, "\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENOENT) +
@@ -70,14 +70,14 @@ TEST_F(ReadFileToBufferTest, AMissingFileIsReportedWithTheErrno) {
         << status.json;
 }
 
-TEST_F(ReadFileToBufferTest, AnErrnoWithoutATextIsReportedWithoutOne) {
+TEST_F(ReadFileToBufferTest, AnErrnoWithoutATextIsReportedWithoutText) {
     for (const char* text : {"", static_cast<const char*>(nullptr)}) {
         qierr::Status failure;
         {
             const ErrnoText replaced(text);
             qisysq::readFileToBuffer(root.locate("/missing").c_str(), &buffer, &failure);
         }
-        EXPECT_EQ(-52006, failure.code);
+        EXPECT_EQ(failure.code, -52006);
         EXPECT_TRUE(contains(failure, "\"internal_error\":{\"api\":\"errno\",\"code\":" +
                                           std::to_string(ENOENT) + "},\"qisysq_debug\":{"))
             << failure.json;
@@ -87,7 +87,7 @@ TEST_F(ReadFileToBufferTest, AnErrnoWithoutATextIsReportedWithoutOne) {
 TEST_F(ReadFileToBufferTest, AFileThatCannotBeReadToItsEndIsReported) {
     root.makeDirectory("/folder");
     read("/folder");
-    EXPECT_EQ(-52008, status.code);
+    EXPECT_EQ(status.code, -52008);
     EXPECT_TRUE(contains(status, "\"error_constant\":\"qiapalerr_osFault\""));
     EXPECT_TRUE(contains(status, "\"internal_error\":{\"api\":\"errno\",\"code\":"));
     EXPECT_TRUE(contains(status,
@@ -98,19 +98,19 @@ TEST_F(ReadFileToBufferTest, AFileThatCannotBeReadToItsEndIsReported) {
         contains(status, ",\"fread_return\":0,\"filename\":\"" + root.locate("/folder") + "\"}"));
 }
 
-TEST_F(ReadFileToBufferTest, WantOfMemoryIsReported) {
+TEST_F(ReadFileToBufferTest, LackOfMemoryIsReported) {
     root.write("/file", "content");
     FaultyAllocator::failAt(0);
     read("/file");
     FaultyAllocator::succeed();
-    EXPECT_EQ(-52000, status.code);
+    EXPECT_EQ(status.code, -52000);
 }
 
 TEST_F(ReadFileToBufferTest, NothingIsDoneWhenTheStatusIsNegative) {
     status.code = -1;
     read("/missing");
-    EXPECT_EQ(-1, status.code);
-    EXPECT_EQ(nullptr, status.json);
+    EXPECT_EQ(status.code, -1);
+    EXPECT_EQ(status.json, nullptr);
 }
 
 }  // namespace

@@ -23,7 +23,7 @@ char tail(std::uint32_t bits) {
     return static_cast<char>(0x80 | (bits & 0x3F));
 }
 
-// A code point in the given number of bytes, whether that is the right number or not.
+// A code point encoded in the given number of bytes, whether that is the correct number or not.
 std::string encoded(std::uint32_t point, int bytes) {
     switch (bytes) {
         case 1:
@@ -39,7 +39,7 @@ std::string encoded(std::uint32_t point, int bytes) {
 
 }  // namespace
 
-TEST(CheckUtf8, TakesEachScalarValueInItsShortestForm) {
+TEST(CheckUtf8, AcceptsEachScalarValueInItsShortestForm) {
     const auto bytesOf = [](std::uint32_t p) {
         return p < 0x80 ? 1 : p < 0x800 ? 2 : p < 0x10000 ? 3 : 4;
     };

@@ -17,7 +17,7 @@ std::string textOf(const qierr_Status& status) {
     return status.json != nullptr ? status.json : "(null)";
 }
 
-// What captureCurrentException makes of a thrown object.
+// What captureCurrentException stores for a thrown object.
 template <typename Thrown>
 void capture(const Thrown& thrown, qierr_Status* status) {
     try {
@@ -27,7 +27,7 @@ void capture(const Thrown& thrown, qierr_Status* status) {
     }
 }
 
-// The text of a capture, up to its line number and from behind it.
+// The text of a capture with its line number removed.
 std::string withoutLine(const std::string& text) {
     const std::string mark = "\"line\":";
     const std::size_t begin = text.find(mark) + mark.size();
@@ -61,7 +61,7 @@ TEST(BasicError, WhatIsNullWithoutDetails) {
     EXPECT_EQ(static_cast<const qierr::ExceptionBase&>(error).what(), nullptr);
 }
 
-TEST(BasicError, CopyMovesTheTextAndKeepsTheCode) {
+TEST(BasicError, CopyTakesOverTheTextAndKeepsTheCode) {
     const BasicError first(-250828, here);
     const BasicError second(first);
     EXPECT_EQ(first.status()->code, -250828);
@@ -71,7 +71,7 @@ TEST(BasicError, CopyMovesTheTextAndKeepsTheCode) {
     EXPECT_STREQ(second.what(), hereText);
 }
 
-TEST(BasicError, ThrownLocalTakesItsDetailsAlong) {
+TEST(BasicError, ThrownLocalKeepsItsDetails) {
     try {
         BasicError error(-250828, here);
         addUsageString(error.details(), "tag", "value");
@@ -146,7 +146,7 @@ TEST(CaptureCurrentException, AllocationFailureHasNoText) {
     EXPECT_EQ(withoutLine(textOf(status)), std::string(capturedBegin) + "}");
 }
 
-TEST(CaptureCurrentException, FirstErrorStands) {
+TEST(CaptureCurrentException, FirstErrorIsKept) {
     qierr::Status status;
     qierr_Status_setCodeAt(&status, -9, here);
     capture(std::runtime_error("later"), &status);

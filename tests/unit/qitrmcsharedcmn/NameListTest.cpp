@@ -13,7 +13,7 @@ using Names = std::vector<std::string>;
 
 }  // namespace
 
-TEST(ExpandNames, WritesRangesOut) {
+TEST(ExpandNames, ExpandsRanges) {
     EXPECT_EQ(expandNames("Mod1/ch0:2,Mod2/ch7", path),
               (Names{"Mod1/ch0", "Mod1/ch1", "Mod1/ch2", "Mod2/ch7"}));
     EXPECT_EQ(expandNames("Mod1/ch03", path), (Names{"Mod1/ch3"}));
@@ -22,7 +22,7 @@ TEST(ExpandNames, WritesRangesOut) {
     EXPECT_EQ(expandNames("12:14", plain), (Names{"12", "13", "14"}));
 }
 
-TEST(ExpandNames, LeavesDeviceNamesAlone) {
+TEST(ExpandNames, DoesNotChangeDeviceNames) {
     EXPECT_EQ(expandNames("Mod1,Mod2", path), (Names{"Mod1", "Mod2"}));
     EXPECT_EQ(expandNames("Mod03,Mod1:3", path), (Names{"Mod03", "Mod1:3"}));
 }
@@ -54,7 +54,7 @@ TEST(CompressNames, JoinsConsecutiveNumbers) {
     EXPECT_EQ(compressNames({"a/2", "a/1", "a/1", "a/2"}, path), "a/2,a/1,a/1:2");
 }
 
-TEST(CompressNames, LeavesDeviceNamesAlone) {
+TEST(CompressNames, DoesNotChangeDeviceNames) {
     EXPECT_EQ(compressNames({"Mod1", "Mod2"}, path), "Mod1,Mod2");
     EXPECT_EQ(compressNames({"Mod03", "Mod1:3"}, path), "Mod03,Mod1:3");
 }
@@ -75,7 +75,7 @@ TEST(CompressNames, RangeThatContinuesARunAddsOne) {
     EXPECT_EQ(compressNames({"a/2:5"}, path), "a/2:5");
 }
 
-TEST(CompressNames, NameWithoutANumberIsNoStartOfARun) {
+TEST(CompressNames, NameWithoutANumberDoesNotStartARun) {
     EXPECT_EQ(compressNames({"a/ch", "a/ch1", "a/ch2"}, path), "a/ch,a/ch1:2");
 }
 
@@ -101,7 +101,7 @@ TEST(NameLists, CompressedNamesExpandToTheSameNames) {
     }
 }
 
-TEST(NameLists, CostGrowsWithTheTextOnly) {
+TEST(NameLists, TheTimeGrowsLinearlyWithTheText) {
     const std::string commas(1000000, ',');
     const Names parts = expandNames(commas, path);
     ASSERT_EQ(parts.size(), 1000001u);

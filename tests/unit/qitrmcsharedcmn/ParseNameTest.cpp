@@ -30,13 +30,13 @@ void expectRefused(const std::string& name, NameKind kind) {
 
 }  // namespace
 
-TEST(ParsePathName, NameWithoutASlashStandsAsItIs) {
+TEST(ParsePathName, NameWithoutASlashIsNotSplit) {
     for (const char* name : {"", "Mod1", "Mod03", "Mod1:3", "Mod1:", ":", "12", "12:14", "a:b:c"}) {
         expectWhole(name, path);
     }
 }
 
-TEST(ParsePathName, NumberStandsAtTheEndOfTheLastPart) {
+TEST(ParsePathName, NumberIsAtTheEndOfTheLastPart) {
     expectNumbered("Mod1/ch0", path, "Mod1/ch", 0, 0);
     expectNumbered("Mod1/ch03", path, "Mod1/ch", 3, 3);
     expectNumbered("Mod1/12", path, "Mod1/", 12, 12);
@@ -46,14 +46,14 @@ TEST(ParsePathName, NumberStandsAtTheEndOfTheLastPart) {
     expectWhole("1/", path);
 }
 
-TEST(ParsePathName, RangeStandsAtTheEndToo) {
+TEST(ParsePathName, RangeIsAtTheEndToo) {
     expectNumbered("Mod1/ch0:2", path, "Mod1/ch", 0, 2);
     expectNumbered("Mod1/ch03:004", path, "Mod1/ch", 3, 4);
     expectNumbered("Mod1/ch5:5", path, "Mod1/ch", 5, 5);
     expectNumbered("Mod1/0:2", path, "Mod1/", 0, 2);
 }
 
-TEST(ParsePathName, RefusesWhatIsNoRange) {
+TEST(ParsePathName, RefusesMalformedRanges) {
     for (const char* name :
          {"Mod1/ch1:", "Mod1/ch:1", "Mod1/ch1:x", "Mod1/ch1:2x", "Mod1/ch1:2:3", "Mod1:2/ch0",
           "1:2/ch0", "12:/", ":/", "/:", "Mod1/ch1: 2", "Mod1/ch1:-2", "Mod1/ch1:+2"}) {
@@ -90,7 +90,7 @@ TEST(ParsePathName, OtherKindsAreTreatedAsPaths) {
     expectRefused("1:2/x", static_cast<NameKind>(2));
 }
 
-TEST(ParsePlainName, NumberStandsAtTheEnd) {
+TEST(ParsePlainName, NumberIsAtTheEnd) {
     expectNumbered("Mod1", plain, "Mod", 1, 1);
     expectNumbered("Mod03", plain, "Mod", 3, 3);
     expectNumbered("12", plain, "", 12, 12);
@@ -118,7 +118,7 @@ TEST(ParseName, ReportsTheNameEscaped) {
     shared_test::expectRefused("a\\\"\\n\xc3\xa9/1:", [] { parseName("a\"\n\xc3\xa9/1:", path); });
 }
 
-TEST(ParseName, InvalidUtf8ComesBeforeTheRefusal) {
+TEST(ParseName, InvalidUtf8IsReportedBeforeAMalformedName) {
     try {
         parseName("Mod\xff/ch4:1", path);
         ADD_FAILURE() << "not refused";

@@ -9,7 +9,7 @@
 
 namespace shared_test {
 
-// Runs `call` and expects the refusal of a name: code -250828 and the one detail.
+// Runs `call` and expects a name to be refused: code -250828 and the one detail.
 template <typename Call>
 void expectRefused(const std::string& escapedName, Call call) {
     SCOPED_TRACE(escapedName);

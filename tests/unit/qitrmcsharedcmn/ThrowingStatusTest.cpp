@@ -17,7 +17,7 @@ void driverCall(std::int32_t code, qierr_Status* status) {
 
 }  // namespace
 
-TEST(ThrowingStatus, IsSilentOnSuccess) {
+TEST(ThrowingStatus, DoesNotThrowOnSuccess) {
     EXPECT_NO_THROW({ ThrowingStatus status; });
 }
 

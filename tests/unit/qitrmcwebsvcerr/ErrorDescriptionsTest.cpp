@@ -67,22 +67,22 @@ std::string statusTextOfLookup(const std::string& name) {
     try {
         getErrorDescription(name);
     } catch (const InternalError& error) {
-        EXPECT_EQ(-250800, error.status()->code);
+        EXPECT_EQ(error.status()->code, -250800);
         return error.status()->json ? error.status()->json : "";
     }
     ADD_FAILURE() << name << " is in the table";
     return "";
 }
 
-TEST(ErrorDescriptions, GiveTheTextOfEachOfThe21Names) {
-    ASSERT_EQ(21u, expectedDescriptions().size());
+TEST(ErrorDescriptions, HaveATextForEachOfThe21Names) {
+    ASSERT_EQ(expectedDescriptions().size(), 21u);
     for (const auto& [name, text] : expectedDescriptions())
         EXPECT_EQ(text, getErrorDescription(name)) << name;
 }
 
 TEST(ErrorDescriptions, LeaveThePlaceholderInPlace) {
-    EXPECT_EQ("The number must be less than or equal to %s",
-              getErrorDescription("GreaterThanMaxValue"));
+    EXPECT_EQ(getErrorDescription("GreaterThanMaxValue"),
+              "The number must be less than or equal to %s");
 }
 
 TEST(ErrorDescriptions, RefuseANameThatDiffersInCaseOrLength) {
@@ -93,7 +93,7 @@ TEST(ErrorDescriptions, RefuseANameThatDiffersInCaseOrLength) {
     }
 }
 
-TEST(ErrorDescriptions, SayWhereARefusedNameWasLookedUp) {
+TEST(ErrorDescriptions, ReportWhereARefusedNameWasLookedUp) {
     const std::string text = statusTextOfLookup("unknown");
     EXPECT_NE(std::string::npos, text.find("ErrorDescriptions.cpp\"")) << text;
     EXPECT_NE(std::string::npos, text.find("\"component\":\"qitrmcsvc\"")) << text;

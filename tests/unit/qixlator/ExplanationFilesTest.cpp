@@ -36,8 +36,8 @@ std::string lengthened(std::string path, std::size_t length) {
     return path.append(length - path.size(), '/');
 }
 
-// While it lives, a directory seems to hold one entry, whose name is longer than a file system lets
-// a name be.
+// While it exists, every directory appears to contain one entry, whose name is longer than a file
+// system allows.
 class LongName {
   public:
     explicit LongName(std::size_t length) {
@@ -99,31 +99,32 @@ class ExplanationFilesTest : public testing::Test {
 // ---- One file -----------------------------------------------------------------------------------
 
 TEST_F(ExplanationFilesTest, FindsTheDescriptionOfTheCode) {
-    EXPECT_EQ("Second.", inFile(document(block("-2", "First.\n") + block("-1", "Second.\n"))));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(inFile(document(block("-2", "First.\n") + block("-1", "Second.\n"))), "Second.");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(ExplanationFilesTest, InnerLineEndsStayAndTrailingOnesGo) {
-    EXPECT_EQ("One.\n\nTwo.", inFile(document(block("-1", "One.\n\nTwo.\r\n\n"))));
+TEST_F(ExplanationFilesTest, InnerLineEndsAreKeptAndTrailingOnesRemoved) {
+    EXPECT_EQ(inFile(document(block("-1", "One.\n\nTwo.\r\n\n"))), "One.\n\nTwo.");
 }
 
-TEST_F(ExplanationFilesTest, AnUnknownCodeGivesNothingAndIsNoFailure) {
-    EXPECT_EQ("", inFile(document(block("-2", "First.\n"))));
-    EXPECT_EQ(0, status.code);
+TEST_F(ExplanationFilesTest, AnUnknownCodeHasNoTextAndIsNotAFailure) {
+    EXPECT_EQ(inFile(document(block("-2", "First.\n"))), "");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(ExplanationFilesTest, TheFirstBlockOfACodeWins) {
-    EXPECT_EQ("First.", inFile(document(block("-1", "First.\n") + block("-1", "Second.\n"))));
+    EXPECT_EQ(inFile(document(block("-1", "First.\n") + block("-1", "Second.\n"))), "First.");
 }
 
 TEST_F(ExplanationFilesTest, TagsIgnoreCase) {
-    EXPECT_EQ("Text.", inFile("<?XML VERSION=\"1.0\"?>\n<QIDocument>\n<QIERROR CODE=\"-1\">\n"
-                              "Text.\n</QIERROR>\n</QIDOCUMENT>\n"));
+    EXPECT_EQ(inFile("<?XML VERSION=\"1.0\"?>\n<QIDocument>\n<QIERROR CODE=\"-1\">\n"
+                     "Text.\n</QIERROR>\n</QIDOCUMENT>\n"),
+              "Text.");
 }
 
 TEST_F(ExplanationFilesTest, CodesMayBeHexadecimal) {
-    EXPECT_EQ("Text.", inFile(document(block("0x1A", "Text.\n")), 26));
-    EXPECT_EQ("Text.", inFile(document(block("-0x1A", "Text.\n")), -26));
+    EXPECT_EQ(inFile(document(block("0x1A", "Text.\n")), 26), "Text.");
+    EXPECT_EQ(inFile(document(block("-0x1A", "Text.\n")), -26), "Text.");
 }
 
 TEST_F(ExplanationFilesTest, ANumberBeyondACodeDoesNotWrapToOne) {
@@ -146,9 +147,10 @@ TEST_F(ExplanationFilesTest, TheFirstAndTheLastCodeAreFound) {
 }
 
 TEST_F(ExplanationFilesTest, TheRestOfATagLineIsIgnored) {
-    EXPECT_EQ("Text.", inFile(std::string(heading) +
-                              "<qierror code=\"-1\" since=\"2\"> not the text\nText.\n"
-                              "</qierror> more\n</qidocument>\n"));
+    EXPECT_EQ(
+        inFile(std::string(heading) + "<qierror code=\"-1\" since=\"2\"> not the text\nText.\n"
+                                      "</qierror> more\n</qidocument>\n"),
+        "Text.");
 }
 
 TEST_F(ExplanationFilesTest, AFileOfAnotherFormIsSkippedWithoutAFailure) {
@@ -158,61 +160,61 @@ TEST_F(ExplanationFilesTest, AFileOfAnotherFormIsSkippedWithoutAFailure) {
           "<?xml version=\"1.0\"?>\n<other>\n" + block("-1", "Text.\n"),
           "<?xml version=\"1.1\"?>\n<qidocument>\n" + block("-1", "Text.\n"),
           std::string(heading)}) {
-        EXPECT_EQ("", inFile(content)) << content;
-        EXPECT_EQ(0, status.code) << content;
+        EXPECT_EQ(inFile(content), "") << content;
+        EXPECT_EQ(status.code, 0) << content;
     }
 }
 
-TEST_F(ExplanationFilesTest, NothingBehindTheEndMarkerIsSeen) {
-    EXPECT_EQ("", inFile(document("") + block("-1", "Text.\n")));
+TEST_F(ExplanationFilesTest, NothingAfterTheEndMarkerIsRead) {
+    EXPECT_EQ(inFile(document("") + block("-1", "Text.\n")), "");
 }
 
-TEST_F(ExplanationFilesTest, AMissingEndMarkerIsNoFailure) {
-    EXPECT_EQ("", inFile(heading + block("-2", "Text.\n")));
-    EXPECT_EQ(0, status.code);
+TEST_F(ExplanationFilesTest, AMissingEndMarkerIsNotAFailure) {
+    EXPECT_EQ(inFile(heading + block("-2", "Text.\n")), "");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(ExplanationFilesTest, CommentsAndUnknownTagsAndOtherLinesAreSkipped) {
-    EXPECT_EQ("Text.",
-              inFile(document("<foo>\nany line\n\n<qicomment>\n" + block("-1", "Not this.\n") +
-                              "</qicomment>\n" + block("-1", "Text.\n"))));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(inFile(document("<foo>\nany line\n\n<qicomment>\n" + block("-1", "Not this.\n") +
+                              "</qicomment>\n" + block("-1", "Text.\n"))),
+              "Text.");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(ExplanationFilesTest, AnUnfinishedCommentReachesToTheEnd) {
-    EXPECT_EQ("", inFile(document("<qicomment>\n" + block("-1", "Text.\n"))));
-    EXPECT_EQ(0, status.code);
+TEST_F(ExplanationFilesTest, AnUnfinishedCommentExtendsToTheEnd) {
+    EXPECT_EQ(inFile(document("<qicomment>\n" + block("-1", "Text.\n"))), "");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(ExplanationFilesTest, OnlyTheClosingTagCountsInsideABlock) {
-    EXPECT_EQ("<b>\n</qidocument>\n<qicomment>\n<qierror code=\"-2\">\n &lt; </qierror>",
-              inFile(document(block("-1",
+    EXPECT_EQ(inFile(document(block("-1",
                                     "<b>\n</qidocument>\n<qicomment>\n<qierror code=\"-2\">\n"
-                                    " &lt; </qierror>\n"))));
+                                    " &lt; </qierror>\n"))),
+              "<b>\n</qidocument>\n<qicomment>\n<qierror code=\"-2\">\n &lt; </qierror>");
 }
 
-TEST_F(ExplanationFilesTest, ALongLineIsCollectedWhole) {
+TEST_F(ExplanationFilesTest, ALongLineIsReadCompletely) {
     const std::string longLine = std::string(3000, 'x') + "end";
-    EXPECT_EQ(longLine, inFile(document(block("-1", longLine + "\n"))));
+    EXPECT_EQ(inFile(document(block("-1", longLine + "\n"))), longLine);
 }
 
 TEST_F(ExplanationFilesTest, APieceOfALongLineMayEndTheBlock) {
     const std::string firstPiece(1023, 'x');
-    EXPECT_EQ(firstPiece, inFile(document(block("-1", firstPiece + "</qierror>yyy\n"))));
+    EXPECT_EQ(inFile(document(block("-1", firstPiece + "</qierror>yyy\n"))), firstPiece);
 }
 
-TEST_F(ExplanationFilesTest, ABlockWithoutLinesGivesNothing) {
-    EXPECT_EQ("", inFile(document(block("-1", "") + block("-1", "Second.\n"))));
-    EXPECT_EQ(0, status.code);
+TEST_F(ExplanationFilesTest, ABlockWithoutLinesHasNoText) {
+    EXPECT_EQ(inFile(document(block("-1", "") + block("-1", "Second.\n"))), "");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(ExplanationFilesTest, ABlockOfLineEndsOnlyIsLeftAsItIs) {
-    EXPECT_EQ("\n\r\n", inFile(document(block("-1", "\n\r\n"))));
+TEST_F(ExplanationFilesTest, ABlockOfOnlyLineEndsIsReturnedUnchanged) {
+    EXPECT_EQ(inFile(document(block("-1", "\n\r\n"))), "\n\r\n");
 }
 
-TEST_F(ExplanationFilesTest, ACodeThatIsNoNumberIsAFailure) {
-    EXPECT_EQ("", inFile(document(block("none", "Text.\n"))));
-    EXPECT_EQ(-52006, status.code);
+TEST_F(ExplanationFilesTest, ACodeThatIsNotANumberIsAFailure) {
+    EXPECT_EQ(inFile(document(block("none", "Text.\n"))), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported("\"error_constant\":\"qiapalerr_resourceNotFound\""));
     EXPECT_TRUE(
         reported("\"qixlator_debug\":{\"debug\":"
@@ -221,8 +223,8 @@ TEST_F(ExplanationFilesTest, ACodeThatIsNoNumberIsAFailure) {
 }
 
 TEST_F(ExplanationFilesTest, ATagLineThatEndsBeforeItsCodeIsReportedAsTheEndOfTheText) {
-    EXPECT_EQ("", inFile(document("<qierror code=\"\nText.\n</qierror>\n"), 0));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inFile(document("<qierror code=\"\nText.\n</qierror>\n"), 0), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(
         reported("\"qixlator_debug\":{\"debug\":"
                  "\"Could not successfully read the status data!\",\"sscanf\":-1}"))
@@ -230,22 +232,22 @@ TEST_F(ExplanationFilesTest, ATagLineThatEndsBeforeItsCodeIsReportedAsTheEndOfTh
 }
 
 TEST_F(ExplanationFilesTest, AnUnfinishedBlockIsAFailureWhateverItsCode) {
-    EXPECT_EQ("", inFile(std::string(heading) + "<qierror code=\"-2\">\nText.\n"));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inFile(std::string(heading) + "<qierror code=\"-2\">\nText.\n"), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(
         reported("\"debug\":\"Bad explanation file. Could not find the end of the status "
                  "code definition !\"}"))
         << status.json;
 }
 
-TEST_F(ExplanationFilesTest, AnUnfinishedBlockOfTheCodeGivesNoText) {
-    EXPECT_EQ("", inFile(std::string(heading) + "<qierror code=\"-1\">\nText.\n"));
-    EXPECT_EQ(-52006, status.code);
+TEST_F(ExplanationFilesTest, AnUnfinishedBlockOfTheCodeHasNoText) {
+    EXPECT_EQ(inFile(std::string(heading) + "<qierror code=\"-1\">\nText.\n"), "");
+    EXPECT_EQ(status.code, -52006);
 }
 
 TEST_F(ExplanationFilesTest, ALineThatBeginsWithANulIsAFailure) {
-    EXPECT_EQ("", inFile(document(std::string("\0x\n", 3) + block("-1", "Text.\n"))));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inFile(document(std::string("\0x\n", 3) + block("-1", "Text.\n"))), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported("\"debug\":\"Bad explanation file. Unidentified section heading !\"}"))
         << status.json;
 }
@@ -253,7 +255,7 @@ TEST_F(ExplanationFilesTest, ALineThatBeginsWithANulIsAFailure) {
 TEST_F(ExplanationFilesTest, AFileThatCannotBeOpenedIsAFailure) {
     const std::string path = root.locate("/missing.txt");
     qixlator::findErrorDescriptionFromFile(path.c_str(), -1, &output, &status);
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(
         reported("\"qixlator_debug\":{\"debug\":\"Could not open status explanations "
                  "file\",\"path\":\"" +
@@ -265,10 +267,10 @@ TEST_F(ExplanationFilesTest, ASearchOnlyClearsTheOutputWhenTheStatusIsNegative) 
     root.write("/errors/English/a.txt", document(block("-1", "Text.\n")));
     output.assign("old", &status);
     status.code = -7;
-    EXPECT_EQ("", inFile(document(block("-1", "Text.\n"))));
-    EXPECT_EQ("", inDirectory("/errors/English"));
-    EXPECT_EQ("", inErrorsDirectory("/errors", 0));
-    EXPECT_EQ(-7, status.code);
+    EXPECT_EQ(inFile(document(block("-1", "Text.\n"))), "");
+    EXPECT_EQ(inDirectory("/errors/English"), "");
+    EXPECT_EQ(inErrorsDirectory("/errors", 0), "");
+    EXPECT_EQ(status.code, -7);
 }
 
 // ---- A directory --------------------------------------------------------------------------------
@@ -277,56 +279,56 @@ TEST_F(ExplanationFilesTest, FindsTheCodeInAnyExplanationFileOfTheDirectory) {
     root.write("/dir/a.txt", document(block("-2", "Two.\n")));
     root.write("/dir/b.err", document(block("-1", "One.\n")));
     root.write("/dir/notes.md", "no explanation file");
-    EXPECT_EQ("One.", inDirectory("/dir"));
-    EXPECT_EQ("Two.", inDirectory("/dir", -2));
-    EXPECT_EQ("", inDirectory("/dir", -3));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(inDirectory("/dir"), "One.");
+    EXPECT_EQ(inDirectory("/dir", -2), "Two.");
+    EXPECT_EQ(inDirectory("/dir", -3), "");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(ExplanationFilesTest, OnlyTheExactExtensionsCount) {
     for (const char* name : {"notes.TXT", "notes.err.bak", "notes", "txt", "notes.txtx"}) {
         root.write(std::string("/dir/") + name, document(block("-1", name)));
     }
-    EXPECT_EQ("", inDirectory("/dir"));
+    EXPECT_EQ(inDirectory("/dir"), "");
     root.write("/dir/.txt", document(block("-1", "Found.\n")));
-    EXPECT_EQ("Found.", inDirectory("/dir"));
+    EXPECT_EQ(inDirectory("/dir"), "Found.");
 }
 
-TEST_F(ExplanationFilesTest, DirectoriesAndWhatLiesInThemAreNotRead) {
+TEST_F(ExplanationFilesTest, SubdirectoriesAndTheirFilesAreNotRead) {
     root.write("/dir/below.txt/a.txt", document(block("-1", "Text.\n")));
-    EXPECT_EQ("", inDirectory("/dir"));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(inDirectory("/dir"), "");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(ExplanationFilesTest, APipeIsNotRead) {
     root.makeDirectory("/dir");
-    ASSERT_EQ(0, mkfifo(root.locate("/dir/pipe.txt").c_str(), 0600));
-    EXPECT_EQ("", inDirectory("/dir"));
-    EXPECT_EQ(0, status.code);
+    ASSERT_EQ(mkfifo(root.locate("/dir/pipe.txt").c_str(), 0600), 0);
+    EXPECT_EQ(inDirectory("/dir"), "");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(ExplanationFilesTest, AnEmptyDirectoryGivesNothingAndIsNoFailure) {
+TEST_F(ExplanationFilesTest, AnEmptyDirectoryHasNoTextAndIsNotAFailure) {
     root.makeDirectory("/dir");
-    EXPECT_EQ("", inDirectory("/dir"));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(inDirectory("/dir"), "");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(ExplanationFilesTest, TheSearchGoesOnBehindAnEmptyBlock) {
+TEST_F(ExplanationFilesTest, TheSearchContinuesAfterAnEmptyBlock) {
     root.write("/dir/a.txt", document(block("-1", "")));
     root.write("/dir/b.txt", document(block("-1", "Text.\n")));
     root.write("/dir/c.txt", document(block("-1", "")));
-    EXPECT_EQ("Text.", inDirectory("/dir"));
+    EXPECT_EQ(inDirectory("/dir"), "Text.");
 }
 
 TEST_F(ExplanationFilesTest, ABadFileStopsTheSearch) {
     root.write("/dir/bad.txt", document(block("none", "")));
-    EXPECT_EQ("", inDirectory("/dir"));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inDirectory("/dir"), "");
+    EXPECT_EQ(status.code, -52006);
 }
 
 TEST_F(ExplanationFilesTest, AMissingDirectoryIsAFailure) {
-    EXPECT_EQ("", inDirectory("/missing"));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inDirectory("/missing"), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported("\"internal_error\":{\"api\":\"errno\",\"code\":" +
                          std::to_string(ENOENT) + ",\"string\":\"" + std::strerror(ENOENT) +
                          "\"},\"qixlator_debug\":{\"debug\":\"open dir failed\",\"path\":\"" +
@@ -334,28 +336,28 @@ TEST_F(ExplanationFilesTest, AMissingDirectoryIsAFailure) {
         << status.json;
 }
 
-TEST_F(ExplanationFilesTest, WhateverKeepsADirectoryShutIsReportedAsMissing) {
+TEST_F(ExplanationFilesTest, ADirectoryThatCannotBeOpenedIsReportedAsMissing) {
     root.write("/file", "");
-    EXPECT_EQ("", inDirectory("/file"));
+    EXPECT_EQ(inDirectory("/file"), "");
     EXPECT_TRUE(reported("\"code\":" + std::to_string(ENOENT) + ",")) << status.json;
 }
 
 TEST_F(ExplanationFilesTest, AnEmptyPathAndATooLongPathAreFailures) {
     qixlator::findErrorDescriptionFromDir("", -1, &output, &status);
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported("\"code\":" + std::to_string(EINVAL) + ",")) << status.json;
     qierr::Status longStatus;
     qixlator::findErrorDescriptionFromDir(std::string(4096, 'd').c_str(), -1, &output, &longStatus);
-    EXPECT_EQ(-52006, longStatus.code);
+    EXPECT_EQ(longStatus.code, -52006);
     EXPECT_NE(std::string::npos,
               std::string(longStatus.json).find("\"code\":" + std::to_string(ENAMETOOLONG) + ","));
 }
 
-TEST_F(ExplanationFilesTest, AnEntryThatCannotBeLookedAtStopsTheSearch) {
+TEST_F(ExplanationFilesTest, AnEntryWhoseTypeCannotBeReadStopsTheSearch) {
     root.makeDirectory("/dir");
     std::filesystem::create_symlink("nowhere", root.locate("/dir/link.txt"));
-    EXPECT_EQ("", inDirectory("/dir"));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inDirectory("/dir"), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(
         reported("\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENOENT) + ","));
     EXPECT_TRUE(reported("\"qixlator_debug\":{\"qixlator\":\"get file info failed\",\"path\":\"" +
@@ -365,8 +367,8 @@ TEST_F(ExplanationFilesTest, AnEntryThatCannotBeLookedAtStopsTheSearch) {
 
 TEST_F(ExplanationFilesTest, AnEntryWhosePathIsTooLongStopsTheSearch) {
     root.write("/dir/explain.txt", document(block("-1", "Text.\n")));
-    EXPECT_EQ("", inLongDirectory(4096 - 1 - 11));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inLongDirectory(4096 - 1 - 11), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(
         reported("\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENAMETOOLONG) +
                  ",\"string\":\"" + std::strerror(ENAMETOOLONG) +
@@ -377,8 +379,8 @@ TEST_F(ExplanationFilesTest, AnEntryWhosePathIsTooLongStopsTheSearch) {
 
 TEST_F(ExplanationFilesTest, AnEntryWhosePathJustFitsIsRead) {
     root.write("/dir/explain.txt", document(block("-1", "Text.\n")));
-    EXPECT_EQ("Text.", inLongDirectory(4096 - 1 - 12));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(inLongDirectory(4096 - 1 - 12), "Text.");
+    EXPECT_EQ(status.code, 0);
 }
 
 // The operating system refuses such paths and names too, but only after they have been written.
@@ -387,8 +389,8 @@ TEST_F(ExplanationFilesTest, NothingOfAPathThatIsTooLongIsWritten) {
     qixlator::DirectoryWalker walker;
     ASSERT_TRUE(walker.open(lengthened(root.locate("/dir"), 4095).c_str()));
     qixlator::FileEntry entry = {};
-    EXPECT_EQ(ENAMETOOLONG, walker.describe(&entry));
-    EXPECT_STREQ("", entry.path);
+    EXPECT_EQ(walker.describe(&entry), ENAMETOOLONG);
+    EXPECT_STREQ(entry.path, "");
 }
 
 TEST_F(ExplanationFilesTest, NothingOfANameThatIsTooLongIsWritten) {
@@ -397,29 +399,29 @@ TEST_F(ExplanationFilesTest, NothingOfANameThatIsTooLongIsWritten) {
     qixlator::DirectoryWalker walker;
     ASSERT_TRUE(walker.open(root.locate("/dir").c_str()));
     qixlator::FileEntry entry = {};
-    EXPECT_EQ(ENAMETOOLONG, walker.describe(&entry));
-    EXPECT_STREQ("", entry.name);
+    EXPECT_EQ(walker.describe(&entry), ENAMETOOLONG);
+    EXPECT_STREQ(entry.name, "");
 }
 
 TEST_F(ExplanationFilesTest, AnEntryWhoseNameIsTooLongStopsTheSearch) {
     root.write("/dir/a.txt", document(block("-1", "Text.\n")));
     const LongName longName(256);
-    EXPECT_EQ("", inDirectory("/dir"));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inDirectory("/dir"), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported(
         "\"internal_error\":{\"api\":\"errno\",\"code\":" + std::to_string(ENAMETOOLONG) + ","))
         << status.json;
     EXPECT_TRUE(reported("\"qixlator\":\"get file info failed\""));
 }
 
-TEST_F(ExplanationFilesTest, WantOfMemoryForTheWalkIsReported) {
+TEST_F(ExplanationFilesTest, LackOfMemoryForTheSearchIsReported) {
     root.makeDirectory("/dir");
     for (int allocation = 0; allocation < 2; ++allocation) {
         qierr::Status failure;
         FaultyAllocator::failAt(allocation);
         qixlator::findErrorDescriptionFromDir(root.locate("/dir").c_str(), -1, &output, &failure);
         FaultyAllocator::succeed();
-        EXPECT_EQ(-52000, failure.code);
+        EXPECT_EQ(failure.code, -52000);
         EXPECT_NE(std::string::npos,
                   std::string(failure.json)
                       .find("\"qixlator_debug\":{\"qixlator\":\"failed to allocate memory\"}"))
@@ -433,15 +435,15 @@ TEST_F(ExplanationFilesTest, TheLanguagesDirectoryComesBeforeItsParent) {
     root.write("/errors/all.txt", document(block("-1", "Parent.\n")));
     root.write("/errors/German/a.txt", document(block("-1", "German.\n")));
     root.makeDirectory("/errors/French");
-    EXPECT_EQ("German.", inErrorsDirectory("/errors", 2));
-    EXPECT_EQ("Parent.", inErrorsDirectory("/errors", 1));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(inErrorsDirectory("/errors", 2), "German.");
+    EXPECT_EQ(inErrorsDirectory("/errors", 1), "Parent.");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(ExplanationFilesTest, AMissingLanguageDirectoryIsAFailureAndNoFallback) {
+TEST_F(ExplanationFilesTest, AMissingLanguageDirectoryIsAFailureWithoutFallback) {
     root.write("/errors/all.txt", document(block("-1", "Parent.\n")));
-    EXPECT_EQ("", inErrorsDirectory("/errors", 3));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(inErrorsDirectory("/errors", 3), "");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported("\"debug\":\"open dir failed\",\"path\":\"" +
                          root.locate("/errors/Japanese") + "\""))
         << status.json;
@@ -450,16 +452,16 @@ TEST_F(ExplanationFilesTest, AMissingLanguageDirectoryIsAFailureAndNoFallback) {
 TEST_F(ExplanationFilesTest, EachLanguageHasItsDirectory) {
     const char* directories[] = {"English", "French", "German", "Japanese", "Korean", "ChineseS"};
     for (int language = 0; language < 6; ++language) {
-        EXPECT_STREQ(directories[language], qixlator::convertLangToDir(language, &status));
+        EXPECT_STREQ(qixlator::convertLangToDir(language, &status), directories[language]);
     }
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(ExplanationFilesTest, AnUnknownLanguageIsAFailure) {
     for (const int language : {6, -1}) {
         qierr::Status failure;
-        EXPECT_STREQ("", qixlator::convertLangToDir(language, &failure));
-        EXPECT_EQ(-52005, failure.code);
+        EXPECT_STREQ(qixlator::convertLangToDir(language, &failure), "");
+        EXPECT_EQ(failure.code, -52005);
         EXPECT_NE(
             std::string::npos,
             std::string(failure.json)
@@ -471,7 +473,7 @@ TEST_F(ExplanationFilesTest, AnUnknownLanguageIsAFailure) {
 
 }  // namespace
 
-// One of the two is what the compiler makes of readdir, depending on the size of offsets in files.
+// The compiler maps readdir to one of the two, depending on the size of file offsets.
 extern "C" {
 dirent* __real_readdir(DIR* directory);
 dirent64* __real_readdir64(DIR* directory);

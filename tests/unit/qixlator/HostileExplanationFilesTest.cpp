@@ -36,7 +36,7 @@ int openDescriptors() {
     return count;
 }
 
-// Lets this process open a few descriptors more and no further ones.
+// Lets this process open only a few more descriptors.
 class FewDescriptors {
   public:
     explicit FewDescriptors(rlim_t more) {
@@ -54,7 +54,8 @@ class FewDescriptors {
     rlimit before{};
 };
 
-// What lies on the disk is not this program's own: it may be anything, and may change at any time.
+// The files on the disk are not under this program's control: they may hold anything, and may
+// change at any time.
 class HostileExplanationFilesTest : public testing::Test {
   protected:
     std::string search(const std::string& directory) {
@@ -74,12 +75,12 @@ TEST_F(HostileExplanationFilesTest, AFileThatDoesNotOpenStopsTheSearch) {
     qihtl::String text;
     qierr::Status failure;
     {
-        // One for the directory, none for the file, and none for a sanitizer that looks at *this.
+        // One for the directory, none for the file, and none for a sanitizer that inspects *this.
         const FewDescriptors few(1);
         qixlator::findErrorDescriptionFromDir(directory.c_str(), -1, &text, &failure);
     }
     EXPECT_TRUE(text.empty());
-    EXPECT_EQ(-52006, failure.code);
+    EXPECT_EQ(failure.code, -52006);
     EXPECT_NE(std::string::npos,
               std::string(failure.json)
                   .find("\"qixlator_debug\":{\"debug\":\"Could not open status explanations "
@@ -92,26 +93,26 @@ TEST_F(HostileExplanationFilesTest, EmptyFilesAreSkipped) {
     root.write("/dir/a.txt", "");
     root.write("/dir/b.txt", document(block("-1", "Text.\n")));
     root.write("/dir/c.err", "");
-    EXPECT_EQ("Text.", search("/dir"));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(search("/dir"), "Text.");
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(HostileExplanationFilesTest, BytesThatAreNoUtf8AreTakenAsTheyStand) {
+TEST_F(HostileExplanationFilesTest, BytesThatAreNotUtf8AreReturnedUnchanged) {
     root.write("/dir/a.txt", document("\xFF\xFE\n" + block("-1", "a\xFF\xC3(\xED\xA0\x80\n")));
-    EXPECT_EQ("a\xFF\xC3(\xED\xA0\x80", search("/dir"));
+    EXPECT_EQ(search("/dir"), "a\xFF\xC3(\xED\xA0\x80");
 }
 
 TEST_F(HostileExplanationFilesTest, ANulEndsALineOfTextButNotTheFile) {
     root.write("/dir/a.txt", document(block("-1", std::string("one\0two\n", 8) +
                                                       std::string("\0\n", 2) + "\n" + "three\n")));
-    EXPECT_EQ("one\nthree", search("/dir"));
+    EXPECT_EQ(search("/dir"), "one\nthree");
 }
 
-TEST_F(HostileExplanationFilesTest, ACodeInSeveralFilesGivesOneOfTheTexts) {
+TEST_F(HostileExplanationFilesTest, ACodeInSeveralFilesHasOneOfTheTexts) {
     root.write("/dir/a.txt", document(block("-1", "First.\n")));
     root.write("/dir/b.txt", document(block("-1", "Second.\n")));
     EXPECT_THAT(search("/dir"), testing::AnyOf("First.", "Second."));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(HostileExplanationFilesTest, AHugeFileTakesNoMemory) {
@@ -127,21 +128,21 @@ TEST_F(HostileExplanationFilesTest, AHugeFileTakesNoMemory) {
     ASSERT_LT(32000000u, std::filesystem::file_size(root.locate("/dir/a.txt")));
     FaultyAllocator::succeed();
     const std::int64_t before = FaultyAllocator::liveBytes();
-    EXPECT_EQ("Text.", search("/dir"));
+    EXPECT_EQ(search("/dir"), "Text.");
     EXPECT_GT(20000, FaultyAllocator::peakBytes() - before);
 }
 
-TEST_F(HostileExplanationFilesTest, ALineOfMillionsOfBytesIsSkippedOrCollectedWhole) {
+TEST_F(HostileExplanationFilesTest, ALineOfMillionsOfBytesIsSkippedOrReadCompletely) {
     const std::string line(16000000, 'x');
     root.write("/dir/a.txt",
                document(line + "\n" + block("-2", line + "\n") + block("-1", line + "end\n")));
-    EXPECT_EQ(line + "end", search("/dir"));
+    EXPECT_EQ(search("/dir"), line + "end");
 }
 
 TEST_F(HostileExplanationFilesTest, ADescriptionWithoutMemoryIsAFailure) {
     root.write("/dir/a.txt", document(block("-1", std::string(100000, 'x') + "\n")));
     const std::int64_t blocks = FaultyAllocator::liveBlocks();
-    // The two records of the walk come first, then the text as it grows.
+    // The two allocations for the search come first, then the text as it grows.
     for (int allocation = 2; allocation < 10; ++allocation) {
         qihtl::String text;
         qierr::Status failure;
@@ -149,13 +150,13 @@ TEST_F(HostileExplanationFilesTest, ADescriptionWithoutMemoryIsAFailure) {
         qixlator::findErrorDescriptionFromDir(root.locate("/dir").c_str(), -1, &text, &failure);
         EXPECT_TRUE(FaultyAllocator::hasFailed());
         FaultyAllocator::succeed();
-        EXPECT_EQ(-52000, failure.code);
+        EXPECT_EQ(failure.code, -52000);
         EXPECT_TRUE(text.empty());
     }
-    EXPECT_EQ(blocks, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), blocks);
 }
 
-TEST_F(HostileExplanationFilesTest, NoDescriptorIsLeftOpenWhateverTheSearchMeets) {
+TEST_F(HostileExplanationFilesTest, NoDescriptorIsLeftOpenWhateverTheSearchFinds) {
     root.write("/found/a.txt", document(block("-1", "Text.\n")));
     root.write("/none/a.txt", document(block("-2", "Text.\n")));
     root.write("/empty/a.txt", "");
@@ -172,10 +173,10 @@ TEST_F(HostileExplanationFilesTest, NoDescriptorIsLeftOpenWhateverTheSearchMeets
             search(directory);
         }
     }
-    EXPECT_EQ(before, openDescriptors());
+    EXPECT_EQ(openDescriptors(), before);
 }
 
-// Makes and removes a directory with two files for as long as it lives.
+// Repeatedly creates and removes a directory with two files while it exists.
 class Flicker {
   public:
     explicit Flicker(const TestRoot& root)
@@ -200,7 +201,7 @@ class Flicker {
     std::thread thread;
 };
 
-TEST_F(HostileExplanationFilesTest, FilesThatComeAndGoDuringASearchGiveTheTextNoneOrAFailure) {
+TEST_F(HostileExplanationFilesTest, FilesThatChangeDuringASearchResultInTheTextNoneOrAFailure) {
     const int before = openDescriptors();
     int found = 0;
     int failed = 0;
@@ -215,7 +216,7 @@ TEST_F(HostileExplanationFilesTest, FilesThatComeAndGoDuringASearchGiveTheTextNo
             failed += status.code < 0 ? 1 : 0;
         }
     }
-    EXPECT_EQ(before, openDescriptors());
+    EXPECT_EQ(openDescriptors(), before);
 }
 
 }  // namespace

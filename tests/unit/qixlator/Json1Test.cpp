@@ -13,7 +13,7 @@ namespace {
 using qixlator::json1::translateErrStatusToFormattedText;
 using qixlator::json1::translateErrStatusToRawText;
 
-// The service's own attribute word and flag word.
+// The attribute word and flag word that the service uses.
 constexpr std::uint32_t attributes = 0x200;
 constexpr std::uint32_t serviceFlags = 11;
 
@@ -67,73 +67,73 @@ class Json1Test : public testing::Test {
 // ---- Sections and items -------------------------------------------------------------------------
 
 TEST_F(Json1Test, ASuccessHasNoText) {
-    EXPECT_EQ("", raw(0, "{\"translator\":\"test\"}"));
+    EXPECT_EQ(raw(0, "{\"translator\":\"test\"}"), "");
     EXPECT_TRUE(xlator.calls.empty());
 }
 
 TEST_F(Json1Test, NothingIsDoneWhenTheFailureStatusIsNegative) {
     failure.code = -3;
-    EXPECT_EQ("", raw(-1, "{\"translator\":\"test\"}"));
+    EXPECT_EQ(raw(-1, "{\"translator\":\"test\"}"), "");
     EXPECT_TRUE(xlator.calls.empty());
 }
 
-TEST_F(Json1Test, AnItemStandsBelowTheDescriptionAfterAnEmptyLine) {
-    EXPECT_EQ("Static one\n\nK: V",
-              rawItems("[{\"type\":\"usage\",\"key\":\"K\",\"value\":\"V\"}]"));
-    EXPECT_EQ("Static one\n\nK: V\nL: W",
-              rawItems("[{\"type\":\"usage\",\"key\":\"K\",\"value\":\"V\"},"
-                       "{\"key\":\"L\",\"value\":\"W\"}]"));
+TEST_F(Json1Test, AnItemFollowsTheDescriptionAfterAnEmptyLine) {
+    EXPECT_EQ(rawItems("[{\"type\":\"usage\",\"key\":\"K\",\"value\":\"V\"}]"),
+              "Static one\n\nK: V");
+    EXPECT_EQ(rawItems("[{\"type\":\"usage\",\"key\":\"K\",\"value\":\"V\"},"
+                       "{\"key\":\"L\",\"value\":\"W\"}]"),
+              "Static one\n\nK: V\nL: W");
 }
 
 TEST_F(Json1Test, TheElementsOfAnArrayAreSeparatedByCommas) {
-    EXPECT_EQ("Static one\n\nK: a, b", rawItems("[{\"key\":\"K\",\"value\":[\"a\", \"b\"]}]"));
-    EXPECT_EQ("Static one\n\nK: a", rawItems("[{\"key\":\"K\",\"value\":[\"a\"]}]"));
-    EXPECT_EQ("Static one\n\nK: ", rawItems("[{\"key\":\"K\",\"value\":[]}]"));
+    EXPECT_EQ(rawItems("[{\"key\":\"K\",\"value\":[\"a\", \"b\"]}]"), "Static one\n\nK: a, b");
+    EXPECT_EQ(rawItems("[{\"key\":\"K\",\"value\":[\"a\"]}]"), "Static one\n\nK: a");
+    EXPECT_EQ(rawItems("[{\"key\":\"K\",\"value\":[]}]"), "Static one\n\nK: ");
 }
 
 TEST_F(Json1Test, AnElaborationFollowsDirectlyInTheRawForm) {
     EXPECT_EQ(
-        "Static one\n\nK: VE",
-        rawItems("[{\"key\":\"K\",\"value\":\"V\"},{\"type\":\"elaboration\",\"value\":\"E\"}]"));
+        rawItems("[{\"key\":\"K\",\"value\":\"V\"},{\"type\":\"elaboration\",\"value\":\"E\"}]"),
+        "Static one\n\nK: VE");
 }
 
 TEST_F(Json1Test, TheElementsOfARawElaborationHaveNoSeparator) {
-    EXPECT_EQ("Static one\n\nK: Vcd",
-              rawItems("[{\"key\":\"K\",\"value\":\"V\"},"
-                       "{\"type\":\"elaboration\",\"value\":[\"c\",\"d\"]}]"));
+    EXPECT_EQ(rawItems("[{\"key\":\"K\",\"value\":\"V\"},"
+                       "{\"type\":\"elaboration\",\"value\":[\"c\",\"d\"]}]"),
+              "Static one\n\nK: Vcd");
 }
 
 TEST_F(Json1Test, TheFormattedFormMarksLabelsAndElaborations) {
-    EXPECT_EQ("Static one\n\n<B>K: </B>V\n<B>E</B>",
-              formattedItems("[{\"key\":\"K\",\"value\":\"V\"},"
-                             "{\"type\":\"elaboration\",\"value\":\"E\"}]"));
-    EXPECT_EQ("Static one\n\n<B>K: </B>a, b\n<B>c, d</B>",
-              formattedItems("[{\"key\":\"K\",\"value\":[\"a\",\"b\"]},"
-                             "{\"type\":\"elaboration\",\"value\":[\"c\",\"d\"]}]"));
+    EXPECT_EQ(formattedItems("[{\"key\":\"K\",\"value\":\"V\"},"
+                             "{\"type\":\"elaboration\",\"value\":\"E\"}]"),
+              "Static one\n\n<B>K: </B>V\n<B>E</B>");
+    EXPECT_EQ(formattedItems("[{\"key\":\"K\",\"value\":[\"a\",\"b\"]},"
+                             "{\"type\":\"elaboration\",\"value\":[\"c\",\"d\"]}]"),
+              "Static one\n\n<B>K: </B>a, b\n<B>c, d</B>");
 }
 
-TEST_F(Json1Test, AnItemWithoutKeyOrValueLeavesItsPartOut) {
-    EXPECT_EQ("Static one\n\nV", rawItems("[{\"type\":\"header\",\"value\":\"V\"}]"));
-    EXPECT_EQ("Static one\n\nK: ", rawItems("[{\"key\":\"K\"}]"));
-    EXPECT_EQ("Static one\n\nV", rawItems("[{\"key\":\"\",\"value\":\"V\"}]"));
-    EXPECT_EQ("Static one\n\n\nV", rawItems("[{\"type\":\"empty\"},{\"value\":\"V\"}]"));
+TEST_F(Json1Test, AnItemWithoutKeyOrValueOmitsThatPart) {
+    EXPECT_EQ(rawItems("[{\"type\":\"header\",\"value\":\"V\"}]"), "Static one\n\nV");
+    EXPECT_EQ(rawItems("[{\"key\":\"K\"}]"), "Static one\n\nK: ");
+    EXPECT_EQ(rawItems("[{\"key\":\"\",\"value\":\"V\"}]"), "Static one\n\nV");
+    EXPECT_EQ(rawItems("[{\"type\":\"empty\"},{\"value\":\"V\"}]"), "Static one\n\n\nV");
 }
 
 TEST_F(Json1Test, EscapesAreResolved) {
-    EXPECT_EQ("Static one\n\n\"K\": a\tb\xC3\xA9, \\",
-              rawItems("[{\"key\":\"\\\"K\\\"\",\"value\":[\"a\\tb\\u00e9\",\"\\\\\"]}]"));
+    EXPECT_EQ(rawItems("[{\"key\":\"\\\"K\\\"\",\"value\":[\"a\\tb\\u00e9\",\"\\\\\"]}]"),
+              "Static one\n\n\"K\": a\tb\xC3\xA9, \\");
 }
 
-TEST_F(Json1Test, AFaultyEscapeEndsItsTextOnly) {
-    EXPECT_EQ("Static one\n\nK: a, b",
-              rawItems("[{\"key\":\"K\",\"value\":[\"a\\ud800z\",\"b\"]}]"));
-    EXPECT_EQ(0, failure.code);
+TEST_F(Json1Test, AFaultyEscapeEndsOnlyItsOwnText) {
+    EXPECT_EQ(rawItems("[{\"key\":\"K\",\"value\":[\"a\\ud800z\",\"b\"]}]"),
+              "Static one\n\nK: a, b");
+    EXPECT_EQ(failure.code, 0);
 }
 
-TEST_F(Json1Test, WhatIsNoArrayHasNoItems) {
-    EXPECT_EQ("Static one", rawItems("{}"));
-    EXPECT_EQ("Static one", rawItems("5"));
-    EXPECT_EQ(0, failure.code);
+TEST_F(Json1Test, WhatIsNotAnArrayHasNoItems) {
+    EXPECT_EQ(rawItems("{}"), "Static one");
+    EXPECT_EQ(rawItems("5"), "Static one");
+    EXPECT_EQ(failure.code, 0);
 }
 
 TEST_F(Json1Test, TheFlagsSelectTheSections) {
@@ -141,18 +141,18 @@ TEST_F(Json1Test, TheFlagsSelectTheSections) {
         "{\"dynamic\":[{\"key\":\"K\",\"value\":\"V\"}],"
         "\"debug\":[{\"key\":\"D\",\"value\":\"W\"}]}";
     const char* json = "{\"translator\":\"test\"}";
-    EXPECT_EQ("", raw(-1, json, 0));
-    EXPECT_EQ("Static one", raw(-1, json, 1));
-    EXPECT_EQ("K: V", raw(-1, json, 2));
-    EXPECT_EQ("D: W", raw(-1, json, 4));
-    EXPECT_EQ("Static one\n\nK: V", raw(-1, json, 3));
-    EXPECT_EQ("Static one\n\nK: V\n\nD: W", raw(-1, json, 7));
+    EXPECT_EQ(raw(-1, json, 0), "");
+    EXPECT_EQ(raw(-1, json, 1), "Static one");
+    EXPECT_EQ(raw(-1, json, 2), "K: V");
+    EXPECT_EQ(raw(-1, json, 4), "D: W");
+    EXPECT_EQ(raw(-1, json, 3), "Static one\n\nK: V");
+    EXPECT_EQ(raw(-1, json, 7), "Static one\n\nK: V\n\nD: W");
 }
 
-TEST_F(Json1Test, WithoutAFlagForItemsNoneAreAskedFor) {
+TEST_F(Json1Test, WithoutAFlagForItemsNoneAreRequested) {
     raw(-1, "{\"translator\":\"test\"}", 1);
-    EXPECT_EQ((std::vector<std::string>{"create test with the registration text", "static -1 512"}),
-              xlator.calls);
+    EXPECT_EQ(xlator.calls, (std::vector<std::string>{"create test with the registration text",
+                                                      "static -1 512"}));
 }
 
 TEST_F(Json1Test, TheTextIsAppendedAndLineEndsAreTrimmedOffBothEnds) {
@@ -162,12 +162,12 @@ TEST_F(Json1Test, TheTextIsAppendedAndLineEndsAreTrimmedOffBothEnds) {
     qihtl::String text;
     text.assign("\r\nbefore ", &failure);
     translateErrStatusToRawText(session, &status, attributes, 1, &text, &failure);
-    EXPECT_STREQ("before Static one", text.c_str());
+    EXPECT_STREQ(text.c_str(), "before Static one");
 }
 
-TEST_F(Json1Test, ANoTextFromTheTranslatorIsNoFailure) {
-    EXPECT_EQ("", raw(-99, "{\"translator\":\"test\"}"));
-    EXPECT_EQ(0, failure.code);
+TEST_F(Json1Test, ANullTextFromTheTranslatorIsNotAFailure) {
+    EXPECT_EQ(raw(-99, "{\"translator\":\"test\"}"), "");
+    EXPECT_EQ(failure.code, 0);
 }
 
 // ---- The translator of a status -----------------------------------------------------------------
@@ -176,74 +176,73 @@ TEST_F(Json1Test, AStatusWithoutATranslatorGoesToTheDefaultOne) {
     root.write("/usr/local/qinstal/share/errors/English/a.txt",
                "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"-1\">\nDefault text.\n"
                "</qierror>\n</qidocument>\n");
-    EXPECT_EQ("Default text.", raw(-1, nullptr));
-    EXPECT_EQ("Default text.", raw(-1, "{\"file\":\"x\"}"));
-    EXPECT_EQ("Default text.", raw(-1, "{\"translator\":\"\"}"));
-    EXPECT_EQ("Default text.", raw(-1, "{\"translator\":7}"));
-    EXPECT_EQ("Default text.", raw(-1, "{\"translator\":\"qixlator_default\"}"));
-    EXPECT_EQ(0, failure.code);
+    EXPECT_EQ(raw(-1, nullptr), "Default text.");
+    EXPECT_EQ(raw(-1, "{\"file\":\"x\"}"), "Default text.");
+    EXPECT_EQ(raw(-1, "{\"translator\":\"\"}"), "Default text.");
+    EXPECT_EQ(raw(-1, "{\"translator\":7}"), "Default text.");
+    EXPECT_EQ(raw(-1, "{\"translator\":\"qixlator_default\"}"), "Default text.");
+    EXPECT_EQ(failure.code, 0);
 }
 
 TEST_F(Json1Test, AFailedDescriptionFailsTheTranslation) {
-    EXPECT_EQ("", raw(-1, nullptr));
-    EXPECT_EQ(-52006, failure.code);
+    EXPECT_EQ(raw(-1, nullptr), "");
+    EXPECT_EQ(failure.code, -52006);
 }
 
 // ---- Nested errors ------------------------------------------------------------------------------
 
 TEST_F(Json1Test, NestedErrorsAreIndentedByThreeBlanksALevelOnEveryLine) {
     xlator.json1 = "{\"dynamic\":[{\"key\":\"K\",\"value\":\"V\"}]}";
-    EXPECT_EQ(
-        "Static one\n\nK: V\n\n"
-        "   Static two\n   \n   K: V\n\n"
-        "      Static one\n      \n      K: V",
-        raw(-1,
-            "{\"translator\":\"test\",\"nested_error\":{\"code\":-2,\"translator\":\"test\","
-            "\"nested_error\":{\"code\":-1,\"translator\":\"test\"}}}"));
+    EXPECT_EQ(raw(-1,
+                  "{\"translator\":\"test\",\"nested_error\":{\"code\":-2,\"translator\":\"test\","
+                  "\"nested_error\":{\"code\":-1,\"translator\":\"test\"}}}"),
+              "Static one\n\nK: V\n\n"
+              "   Static two\n   \n   K: V\n\n"
+              "      Static one\n      \n      K: V");
 }
 
 TEST_F(Json1Test, CarriageReturnsAreTrimmedOffBothEndsOfANestedText) {
     xlator.descriptions[-2] = "\r\n\rStatic two\r\nmore\r\n\r";
     EXPECT_EQ(
-        "Static one\n\n   Static two\r\n   more\n\n   Static one",
         raw(-1,
             "{\"translator\":\"test\",\"nested_error\":[{\"code\":-2,\"translator\":\"test\"},"
-            "{\"code\":-1,\"translator\":\"test\"}]}"));
+            "{\"code\":-1,\"translator\":\"test\"}]}"),
+        "Static one\n\n   Static two\r\n   more\n\n   Static one");
 }
 
 TEST_F(Json1Test, AnArrayOfNestedErrorsIsTakenInOrder) {
-    EXPECT_EQ("Static one\n\n   Static two\n\n      Static one\n\n   Static one",
-              raw(-1,
+    EXPECT_EQ(raw(-1,
                   "{\"translator\":\"test\",\"nested_error\":[{\"code\":-2,\"translator\":\"test\","
                   "\"nested_error\":[{\"code\":-1,\"translator\":\"test\"}]},"
-                  "{\"code\":-1,\"translator\":\"test\"}]}"));
+                  "{\"code\":-1,\"translator\":\"test\"}]}"),
+              "Static one\n\n   Static two\n\n      Static one\n\n   Static one");
 }
 
-TEST_F(Json1Test, ANestedErrorIsTranslatedByItsOwnText) {
+TEST_F(Json1Test, TheTranslatorOfANestedErrorGetsOnlyItsText) {
     const std::string nested = "{\"code\":-2, \"translator\":\"test\", \"x\":[1]}";
     raw(-1, ("{\"translator\":\"test\",\"nested_error\": " + nested + " ,\"y\":2}").c_str());
-    EXPECT_EQ("dynamic json1 " + nested, xlator.calls.back());
+    EXPECT_EQ(xlator.calls.back(), "dynamic json1 " + nested);
 }
 
-TEST_F(Json1Test, OnlyTheNestedFlagOpensNestedErrorsAndTheyShowTheirItems) {
+TEST_F(Json1Test, OnlyTheNestedFlagShowsNestedErrorsWithTheirItems) {
     xlator.json1 =
         "{\"dynamic\":[{\"key\":\"K\",\"value\":\"V\"}],"
         "\"debug\":[{\"key\":\"D\",\"value\":\"W\"}]}";
     const char* json =
         "{\"translator\":\"test\",\"nested_error\":{\"code\":-2,\"translator\":\"test\"}}";
-    EXPECT_EQ("Static one", raw(-1, json, 1));
-    EXPECT_EQ("Static one\n\n   Static two\n   \n   K: V", raw(-1, json, 9));
-    EXPECT_EQ("D: W\n\n   Static two\n   \n   K: V\n   \n   D: W", raw(-1, json, 12));
+    EXPECT_EQ(raw(-1, json, 1), "Static one");
+    EXPECT_EQ(raw(-1, json, 9), "Static one\n\n   Static two\n   \n   K: V");
+    EXPECT_EQ(raw(-1, json, 12), "D: W\n\n   Static two\n   \n   K: V\n   \n   D: W");
 }
 
-TEST_F(Json1Test, AnEmptyArrayOfNestedErrorsIsNoFailure) {
-    EXPECT_EQ("Static one", raw(-1, "{\"translator\":\"test\",\"nested_error\":[]}"));
-    EXPECT_EQ(0, failure.code);
+TEST_F(Json1Test, AnEmptyArrayOfNestedErrorsIsNotAFailure) {
+    EXPECT_EQ(raw(-1, "{\"translator\":\"test\",\"nested_error\":[]}"), "Static one");
+    EXPECT_EQ(failure.code, 0);
 }
 
-TEST_F(Json1Test, ANestedErrorWithoutCodeHasCodeZeroAndStillAText) {
-    EXPECT_EQ("Static one\n\n   Static zero",
-              raw(-1, "{\"translator\":\"test\",\"nested_error\":{\"translator\":\"test\"}}"));
+TEST_F(Json1Test, ANestedErrorWithoutCodeHasTheTextOfCodeZero) {
+    EXPECT_EQ(raw(-1, "{\"translator\":\"test\",\"nested_error\":{\"translator\":\"test\"}}"),
+              "Static one\n\n   Static zero");
 }
 
 TEST_F(Json1Test, ErrorsMayNestDeeply) {
@@ -254,17 +253,17 @@ TEST_F(Json1Test, ErrorsMayNestDeeply) {
     }
     json += "{\"translator\":\"test\",\"code\":-2}" + std::string(depth, '}');
     const std::string text = raw(-1, json.c_str(), 9);
-    EXPECT_EQ(0, failure.code);
+    EXPECT_EQ(failure.code, 0);
     const std::string innermost = "\n" + std::string(3 * depth, ' ') + "Static two";
     ASSERT_LT(innermost.size(), text.size());
-    EXPECT_EQ(innermost, text.substr(text.size() - innermost.size()));
+    EXPECT_EQ(text.substr(text.size() - innermost.size()), innermost);
 }
 
 // ---- Failures -----------------------------------------------------------------------------------
 
-TEST_F(Json1Test, AnItemThatIsNoObjectIsAFailure) {
-    EXPECT_EQ("", rawItems("[{\"key\":\"K\",\"value\":\"V\"},[\"x\"]]"));
-    EXPECT_EQ(-52005, failure.code);
+TEST_F(Json1Test, AnItemThatIsNotAnObjectIsAFailure) {
+    EXPECT_EQ(rawItems("[{\"key\":\"K\",\"value\":\"V\"},[\"x\"]]"), "");
+    EXPECT_EQ(failure.code, -52005);
     EXPECT_TRUE(reported("\"error_constant\":\"qiapalerr_invalidParameter\""));
     EXPECT_TRUE(reported(
         "\"qixlator_debug\":{\"formatDynamicReportItems\":\"json1 dynamic object invalid. each "
@@ -273,9 +272,9 @@ TEST_F(Json1Test, AnItemThatIsNoObjectIsAFailure) {
         << failure.json;
 }
 
-TEST_F(Json1Test, AValueThatIsNoStringIsAFailure) {
-    EXPECT_EQ("", rawItems("[{\"key\":\"K\",\"value\":5}]"));
-    EXPECT_EQ(-52005, failure.code);
+TEST_F(Json1Test, AValueThatIsNotAStringIsAFailure) {
+    EXPECT_EQ(rawItems("[{\"key\":\"K\",\"value\":5}]"), "");
+    EXPECT_EQ(failure.code, -52005);
     EXPECT_TRUE(reported(
         "\"qixlator_debug\":{\"formatDynamicReportItems\":\"json1 dynamic object invalid. value "
         "can only be string\",\"value type\":3}"))
@@ -283,8 +282,8 @@ TEST_F(Json1Test, AValueThatIsNoStringIsAFailure) {
 }
 
 TEST_F(Json1Test, AValueThatCannotBeParsedIsAFailure) {
-    EXPECT_EQ("", rawItems("[{\"key\":\"J\",\"value\":\"U\"},{\"key\":\"K\",\"value\":x}]"));
-    EXPECT_EQ(-52005, failure.code);
+    EXPECT_EQ(rawItems("[{\"key\":\"J\",\"value\":\"U\"},{\"key\":\"K\",\"value\":x}]"), "");
+    EXPECT_EQ(failure.code, -52005);
     EXPECT_TRUE(reported("\"error_constant\":\"qiapalerr_invalidParameter\""));
     EXPECT_TRUE(
         reported("\"qixlator_debug\":{\"formatDynamicReportItems\":\"json1 dynamic object invalid. "
@@ -295,26 +294,26 @@ TEST_F(Json1Test, AValueThatCannotBeParsedIsAFailure) {
         << failure.json;
 }
 
-TEST_F(Json1Test, AnItemThatIsBrokenElsewhereIsNoObject) {
+TEST_F(Json1Test, AnItemWithASyntaxErrorElsewhereIsNotAnObject) {
     for (const char* item : {"{\"key\":\"K\",\"value\":\"V\",5}", "{\"key\":x,\"value\":\"V\"}",
                              "{\"key\" \"K\"}", "{5}", "x"}) {
         failure.code = 0;
-        EXPECT_EQ("", rawItems(std::string("[") + item + "]")) << item;
-        EXPECT_EQ(-52005, failure.code) << item;
+        EXPECT_EQ(rawItems(std::string("[") + item + "]"), "") << item;
+        EXPECT_EQ(failure.code, -52005) << item;
         EXPECT_TRUE(reported("each array item must be an object")) << failure.json;
     }
 }
 
-TEST_F(Json1Test, AnElementThatIsNoStringIsAFailure) {
-    EXPECT_EQ("", rawItems("[{\"key\":\"K\",\"value\":[\"a\",null]}]"));
-    EXPECT_EQ(-52005, failure.code);
+TEST_F(Json1Test, AnElementThatIsNotAStringIsAFailure) {
+    EXPECT_EQ(rawItems("[{\"key\":\"K\",\"value\":[\"a\",null]}]"), "");
+    EXPECT_EQ(failure.code, -52005);
     EXPECT_TRUE(reported("\"value type\":1}")) << failure.json;
 }
 
 TEST_F(Json1Test, ANestedErrorOfAnotherTypeIsAFailure) {
     const std::string json = "{\"translator\":\"test\",\"nested_error\":\"x\"}";
-    EXPECT_EQ("Static one", raw(-1, json.c_str()));
-    EXPECT_EQ(-52005, failure.code);
+    EXPECT_EQ(raw(-1, json.c_str()), "Static one");
+    EXPECT_EQ(failure.code, -52005);
     EXPECT_TRUE(reported(
         "\"qixlator_debug\":{\"translateErrStatusToFormattedText\":\"nested_error contains invalid "
         "json type\",\"json\":\"{\\\"translator\\\":\\\"test\\\",\\\"nested_error\\\":\\\"x\\\"}\","
@@ -323,11 +322,11 @@ TEST_F(Json1Test, ANestedErrorOfAnotherTypeIsAFailure) {
 }
 
 TEST_F(Json1Test, AnElementOfNestedErrorsOfAnotherTypeIsAFailure) {
-    EXPECT_EQ("Static one\n\n   Static two",
-              raw(-1,
+    EXPECT_EQ(raw(-1,
                   "{\"translator\":\"test\",\"nested_error\":[{\"translator\":\"test\","
-                  "\"code\":-2},true,{\"translator\":\"test\",\"code\":-1}]}"));
-    EXPECT_EQ(-52005, failure.code);
+                  "\"code\":-2},true,{\"translator\":\"test\",\"code\":-1}]}"),
+              "Static one\n\n   Static two");
+    EXPECT_EQ(failure.code, -52005);
     EXPECT_TRUE(
         reported("\"translateErrStatusToFormattedText\":\"nested_error contains invalid "
                  "json type on one of the element\",\"json\":\"{\\\"translator\\\""));

@@ -65,15 +65,14 @@ class SessionTest : public testing::Test {
 TEST_F(SessionTest, ATranslatorIsCreatedOnceAndDestroyedWithTheSession) {
     TestXlator xlator("test");
     xlator.descriptions[-1] = "minus one";
-    EXPECT_EQ("minus one", describe("test", -1, &status));
-    EXPECT_EQ("minus one", describe("test", -1, &status));
-    EXPECT_EQ("(null)", describe("test", -2, &status));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describe("test", -1, &status), "minus one");
+    EXPECT_EQ(describe("test", -1, &status), "minus one");
+    EXPECT_EQ(describe("test", -2, &status), "(null)");
+    EXPECT_EQ(status.code, 0);
     qixlator_destroySession(session);
     session = nullptr;
-    EXPECT_EQ((Calls{"create test with the registration text", "static -1 512", "static -1 512",
-                     "static -2 512", "destroy"}),
-              xlator.calls);
+    EXPECT_EQ(xlator.calls, (Calls{"create test with the registration text", "static -1 512",
+                                   "static -1 512", "static -2 512", "destroy"}));
 }
 
 TEST_F(SessionTest, TranslatorsAreDestroyedInTheOrderOfTheirCreation) {
@@ -84,34 +83,34 @@ TEST_F(SessionTest, TranslatorsAreDestroyedInTheOrderOfTheirCreation) {
     TestXlator::destroyed().clear();
     qixlator_destroySession(session);
     session = nullptr;
-    EXPECT_EQ((Calls{"second", "first"}), TestXlator::destroyed());
+    EXPECT_EQ(TestXlator::destroyed(), (Calls{"second", "first"}));
 }
 
-TEST_F(SessionTest, AFailedCreationIsReportedAndTriedAgain) {
+TEST_F(SessionTest, AFailedCreationIsReportedAndRepeatedAtTheNextUse) {
     TestXlator xlator("test");
     xlator.failure = -9;
-    EXPECT_EQ("(null)", describe("test", -1, &status));
-    EXPECT_EQ(-9, status.code);
+    EXPECT_EQ(describe("test", -1, &status), "(null)");
+    EXPECT_EQ(status.code, -9);
     qierr::Status second;
     xlator.failure = 0;
     xlator.descriptions[-1] = "minus one";
-    EXPECT_EQ("minus one", describe("test", -1, &second));
+    EXPECT_EQ(describe("test", -1, &second), "minus one");
 }
 
 TEST_F(SessionTest, AStatusNamesItsTranslator) {
     TestXlator xlator("te st");
     xlator.json1 = "{}";
     const std::string json = "{\"translator\":\"te\\u0020st\"}";
-    EXPECT_EQ("{}", describeJson(json.c_str(), &status));
-    EXPECT_EQ("dynamic json1 " + json, xlator.calls.back());
+    EXPECT_EQ(describeJson(json.c_str(), &status), "{}");
+    EXPECT_EQ(xlator.calls.back(), "dynamic json1 " + json);
 }
 
 TEST_F(SessionTest, AStatusWithoutTranslatorHasNoDynamicDescription) {
     for (const char* json :
          {"{}", "{\"translator\":\"\"}", "{\"translator\":5}", "[]", "{\"translator\""}) {
         qierr::Status failure;
-        EXPECT_EQ("(null)", describeJson(json, &failure)) << json;
-        EXPECT_EQ(-52006, failure.code) << json;
+        EXPECT_EQ(describeJson(json, &failure), "(null)") << json;
+        EXPECT_EQ(failure.code, -52006) << json;
         EXPECT_TRUE(reported(failure,
                              "\"qixlator_debug\":{\"debug\":\"could not find translator key in "
                              "json\",\"json\":\""))
@@ -120,8 +119,8 @@ TEST_F(SessionTest, AStatusWithoutTranslatorHasNoDynamicDescription) {
 }
 
 TEST_F(SessionTest, TheDefaultTranslatorHasNoDynamicDescriptions) {
-    EXPECT_EQ("(null)", describeJson("{\"translator\":\"qixlator_default\"}", &status));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(describeJson("{\"translator\":\"qixlator_default\"}", &status), "(null)");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported(status,
                          "\"qixlator_debug\":{\"debug\":\"xlator doesn't support getDynamicDesc\","
                          "\"xlatorName\":\"qixlator_default\"}"))
@@ -133,8 +132,8 @@ TEST_F(SessionTest, ATranslatorMayLackStaticDescriptions) {
     const qixlator::XlatorRegistration registration(
         qixlator::localRegistrations(), "bare", "{}",
         [](const char*, const char*, qierr_Status*) { return &bare; });
-    EXPECT_EQ("(null)", describe("bare", -1, &status));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(describe("bare", -1, &status), "(null)");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported(status,
                          "\"qixlator_debug\":{\"debug\":\"xlator doesn't support getStaticDesc\","
                          "\"xlatorName\":\"bare\"}"))
@@ -144,12 +143,12 @@ TEST_F(SessionTest, ATranslatorMayLackStaticDescriptions) {
 TEST_F(SessionTest, NothingIsDoneWhenTheStatusIsNegative) {
     TestXlator xlator("test");
     status.code = -1;
-    EXPECT_EQ("(null)", describe("test", -1, &status));
-    EXPECT_EQ("(null)", describeJson("{\"translator\":\"test\"}", &status));
-    EXPECT_EQ(nullptr, qixlator_createSession(&status));
-    EXPECT_EQ(nullptr, qixlator_exported_create("test", "{}", &status));
-    EXPECT_EQ(Calls{}, xlator.calls);
-    EXPECT_EQ(nullptr, status.json);
+    EXPECT_EQ(describe("test", -1, &status), "(null)");
+    EXPECT_EQ(describeJson("{\"translator\":\"test\"}", &status), "(null)");
+    EXPECT_EQ(qixlator_createSession(&status), nullptr);
+    EXPECT_EQ(qixlator_exported_create("test", "{}", &status), nullptr);
+    EXPECT_EQ(xlator.calls, Calls{});
+    EXPECT_EQ(status.json, nullptr);
 }
 
 TEST_F(SessionTest, ASessionWithoutMemoryIsReported) {
@@ -157,26 +156,26 @@ TEST_F(SessionTest, ASessionWithoutMemoryIsReported) {
         const std::int64_t before = FaultyAllocator::liveBlocks();
         qierr::Status failure;
         FaultyAllocator::failAt(allocation);
-        EXPECT_EQ(nullptr, qixlator_createSession(&failure));
+        EXPECT_EQ(qixlator_createSession(&failure), nullptr);
         FaultyAllocator::succeed();
-        EXPECT_EQ(-52000, failure.code);
+        EXPECT_EQ(failure.code, -52000);
         EXPECT_TRUE(reported(
             failure, "\"qixlator_debug\":{\"debug\":\"failed to allocate Session memory\"}"))
             << failure.json;
-        EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+        EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
     }
 }
 
-TEST_F(SessionTest, ATranslatorThatCannotBeKeptIsDestroyedAtOnce) {
+TEST_F(SessionTest, ATranslatorThatCannotBeStoredIsDestroyedAtOnce) {
     TestXlator xlator("test");
     FaultyAllocator::failAt(0);
-    EXPECT_EQ("(null)", describe("test", -1, &status));
+    EXPECT_EQ(describe("test", -1, &status), "(null)");
     FaultyAllocator::succeed();
-    EXPECT_EQ(-52000, status.code);
-    EXPECT_EQ((Calls{"create test with the registration text", "destroy"}), xlator.calls);
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_EQ(xlator.calls, (Calls{"create test with the registration text", "destroy"}));
 }
 
-TEST_F(SessionTest, MoreTranslatorsThanThereIsRoomForAtFirstAreKept) {
+TEST_F(SessionTest, TheTableOfTranslatorsGrows) {
     std::vector<std::string> names;
     std::vector<std::unique_ptr<TestXlator>> xlators;
     for (int number = 0; number < 10; ++number) {
@@ -189,9 +188,9 @@ TEST_F(SessionTest, MoreTranslatorsThanThereIsRoomForAtFirstAreKept) {
     for (const std::string& name : names) {
         describe(name.c_str(), -2, &status);
     }
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(status.code, 0);
     for (const auto& xlator : xlators) {
-        EXPECT_EQ(3u, xlator->calls.size());
+        EXPECT_EQ(xlator->calls.size(), 3u);
     }
     qixlator_destroySession(session);
     session = nullptr;
@@ -199,75 +198,75 @@ TEST_F(SessionTest, MoreTranslatorsThanThereIsRoomForAtFirstAreKept) {
 
 // ---- The manager library ------------------------------------------------------------------------
 
-TEST_F(SessionTest, WithoutTheManagerAnUnknownNameIsTheLoadersFailure) {
+TEST_F(SessionTest, WithoutTheManagerAnUnknownNameReportsTheLoadersFailure) {
     TestXlator local("test");
     local.descriptions[-1] = "minus one";
-    EXPECT_EQ("(null)", describe("known", -1, &status));
-    EXPECT_EQ(-52005, status.code);
+    EXPECT_EQ(describe("known", -1, &status), "(null)");
+    EXPECT_EQ(status.code, -52005);
     EXPECT_TRUE(reported(status,
                          "\"qidynlib_debug\":{\"debug\":\"failed to qidynlib_load library\","
                          "\"path\":\"libqixlator.so.1\"},\"internal_error\":{\"api\":\"dlerror\""))
         << status.json;
     qierr::Status localStatus;
-    EXPECT_EQ("minus one", describe("test", -1, &localStatus));
+    EXPECT_EQ(describe("test", -1, &localStatus), "minus one");
 }
 
 TEST_F(SessionTest, AFailedLoadIsNotRepeatedInTheSession) {
-    EXPECT_EQ("(null)", describe("known", -1, &status));
+    EXPECT_EQ(describe("known", -1, &status), "(null)");
     const Manager manager(MANAGER_COMPLETE);
     qierr::Status second;
-    EXPECT_EQ("(null)", describe("known", -1, &second));
-    EXPECT_EQ(-52005, second.code);
+    EXPECT_EQ(describe("known", -1, &second), "(null)");
+    EXPECT_EQ(second.code, -52005);
     EXPECT_STREQ(status.json, second.json);
-    EXPECT_EQ("", manager.calls());
+    EXPECT_EQ(manager.calls(), "");
 }
 
-TEST_F(SessionTest, TheManagerServesUnknownNames) {
+TEST_F(SessionTest, TheManagerProvidesUnknownNames) {
     const Manager manager(MANAGER_COMPLETE);
-    EXPECT_EQ("managed -7", describe("known", -7, &status));
-    EXPECT_EQ("managed -8", describe("known", -8, &status));
-    EXPECT_EQ(0, status.code);
-    EXPECT_EQ("createSession;createXlator;", manager.calls());
-    EXPECT_EQ("(null)", describe("unknown", -7, &status));
-    EXPECT_EQ(-6, status.code);
+    EXPECT_EQ(describe("known", -7, &status), "managed -7");
+    EXPECT_EQ(describe("known", -8, &status), "managed -8");
+    EXPECT_EQ(status.code, 0);
+    EXPECT_EQ(manager.calls(), "createSession;createXlator;");
+    EXPECT_EQ(describe("unknown", -7, &status), "(null)");
+    EXPECT_EQ(status.code, -6);
     qixlator_destroySession(session);
     session = nullptr;
-    EXPECT_EQ("createSession;createXlator;createXlator;destroyXlator;destroySession;",
-              manager.calls());
+    EXPECT_EQ(manager.calls(),
+              "createSession;createXlator;createXlator;destroyXlator;destroySession;");
 }
 
-TEST_F(SessionTest, TheManagersTranslatorThatCannotBeKeptGoesBackAtOnce) {
+TEST_F(SessionTest, AManagersTranslatorThatCannotBeStoredIsReturnedAtOnce) {
     const Manager manager(MANAGER_COMPLETE);
     FaultyAllocator::failAt(0);
-    EXPECT_EQ("(null)", describe("known", -7, &status));
+    EXPECT_EQ(describe("known", -7, &status), "(null)");
     FaultyAllocator::succeed();
-    EXPECT_EQ(-52000, status.code);
-    EXPECT_EQ("createSession;createXlator;destroyXlator;", manager.calls());
+    EXPECT_EQ(status.code, -52000);
+    EXPECT_EQ(manager.calls(), "createSession;createXlator;destroyXlator;");
 }
 
 TEST_F(SessionTest, AManagerThatLacksAFunctionIsUnloaded) {
     {
         const Manager manager(MANAGER_LACKING);
-        EXPECT_EQ("(null)", describe("known", -7, &status));
-        EXPECT_EQ(-52005, status.code);
+        EXPECT_EQ(describe("known", -7, &status), "(null)");
+        EXPECT_EQ(status.code, -52005);
         EXPECT_TRUE(reported(status, "\"qidynlib_symbol\":\"qixlatormgr_destroyXlator\""))
             << status.json;
-        EXPECT_EQ("", manager.calls());
+        EXPECT_EQ(manager.calls(), "");
     }
-    EXPECT_EQ(nullptr, dlopen(MANAGER_LACKING, RTLD_NOW | RTLD_NOLOAD));
+    EXPECT_EQ(dlopen(MANAGER_LACKING, RTLD_NOW | RTLD_NOLOAD), nullptr);
 }
 
-TEST_F(SessionTest, AManagerWithoutASessionIsUnloadedAndNotAskedAgain) {
+TEST_F(SessionTest, AManagerWithoutASessionIsUnloadedAndNotUsedAgain) {
     {
         const Manager manager(MANAGER_FAILING);
-        EXPECT_EQ("(null)", describe("known", -7, &status));
-        EXPECT_EQ(-5, status.code);
+        EXPECT_EQ(describe("known", -7, &status), "(null)");
+        EXPECT_EQ(status.code, -5);
         qierr::Status second;
-        EXPECT_EQ("(null)", describe("known", -7, &second));
-        EXPECT_EQ(-5, second.code);
-        EXPECT_EQ("createSession;destroySession;", manager.calls());
+        EXPECT_EQ(describe("known", -7, &second), "(null)");
+        EXPECT_EQ(second.code, -5);
+        EXPECT_EQ(manager.calls(), "createSession;destroySession;");
     }
-    EXPECT_EQ(nullptr, dlopen(MANAGER_FAILING, RTLD_NOW | RTLD_NOLOAD));
+    EXPECT_EQ(dlopen(MANAGER_FAILING, RTLD_NOW | RTLD_NOLOAD), nullptr);
 }
 
 // ---- What this program lends --------------------------------------------------------------------
@@ -281,13 +280,13 @@ TEST_F(SessionTest, AnExportedTranslatorIsMadeWithTheCallersText) {
             seen = std::string(name) + " " + info;
             return &bare;
         });
-    EXPECT_EQ(&bare, qixlator_exported_create("lent", "{\"a\":1}", &status));
-    EXPECT_EQ("lent {\"a\":1}", seen);
+    EXPECT_EQ(qixlator_exported_create("lent", "{\"a\":1}", &status), &bare);
+    EXPECT_EQ(seen, "lent {\"a\":1}");
 }
 
 TEST_F(SessionTest, AnUnknownExportIsReported) {
-    EXPECT_EQ(nullptr, qixlator_exported_create("qixlator_default", "{}", &status));
-    EXPECT_EQ(-52005, status.code);
+    EXPECT_EQ(qixlator_exported_create("qixlator_default", "{}", &status), nullptr);
+    EXPECT_EQ(status.code, -52005);
     EXPECT_TRUE(reported(status,
                          "\"qixlator_debug\":{\"qixlator_exported\":\"could not find xlator\","
                          "\"name\":\"qixlator_default\",\"registrationInfo\":\"{}\"}"))
@@ -296,21 +295,21 @@ TEST_F(SessionTest, AnUnknownExportIsReported) {
 
 TEST_F(SessionTest, ARegistrationUnlinksItselfAtItsEnd) {
     { const TestXlator xlator("test"); }
-    EXPECT_EQ(nullptr, qixlator::localRegistrations().find("test"));
+    EXPECT_EQ(qixlator::localRegistrations().find("test"), nullptr);
     EXPECT_NE(nullptr, qixlator::localRegistrations().find("qixlator_default"));
 }
 
 // ---- The framework's allocation -----------------------------------------------------------------
 
-TEST_F(SessionTest, ReallocReportsWantOfMemory) {
+TEST_F(SessionTest, ReallocReportsLackOfMemory) {
     FaultyAllocator::failAt(0, 2);
-    EXPECT_EQ(nullptr, qixlator_realloc(nullptr, 8, nullptr, nullptr));
-    EXPECT_EQ(nullptr, qixlator_realloc(nullptr, 8, nullptr, &status));
+    EXPECT_EQ(qixlator_realloc(nullptr, 8, nullptr, nullptr), nullptr);
+    EXPECT_EQ(qixlator_realloc(nullptr, 8, nullptr, &status), nullptr);
     FaultyAllocator::succeed();
-    EXPECT_EQ(-52000, status.code);
+    EXPECT_EQ(status.code, -52000);
     EXPECT_TRUE(reported(status, "\"qixlator_debug\":{\"debug\":\"realloc failed\"}"));
-    EXPECT_EQ(nullptr, qixlator_realloc(nullptr, 8, nullptr, &status));
-    EXPECT_EQ(0u, FaultyAllocator::requests());
+    EXPECT_EQ(qixlator_realloc(nullptr, 8, nullptr, &status), nullptr);
+    EXPECT_EQ(FaultyAllocator::requests(), 0u);
 }
 
 TEST_F(SessionTest, ReallocFreesWhateverTheStatusIs) {
@@ -318,8 +317,8 @@ TEST_F(SessionTest, ReallocFreesWhateverTheStatusIs) {
     void* block = qixlator_realloc(nullptr, 8, nullptr, &status);
     EXPECT_NE(nullptr, block);
     status.code = -1;
-    EXPECT_EQ(nullptr, qixlator_realloc(block, 0, nullptr, &status));
-    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(qixlator_realloc(block, 0, nullptr, &status), nullptr);
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
 }
 
 // ---- The default translator ---------------------------------------------------------------------
@@ -341,30 +340,30 @@ class DefaultXlatorTest : public SessionTest {
 TEST_F(DefaultXlatorTest, FindsTheTextInTheLanguage) {
     explain("/English", "-1", "English text.");
     explain("/German", "-1", "Deutscher Text.");
-    EXPECT_EQ("Deutscher Text.", describeIn(2, &status));
-    EXPECT_EQ("English text.", describeIn(0x300, &status));
+    EXPECT_EQ(describeIn(2, &status), "Deutscher Text.");
+    EXPECT_EQ(describeIn(0x300, &status), "English text.");
 }
 
 TEST_F(DefaultXlatorTest, FallsBackToEnglish) {
     explain("/English", "-1", "English text.");
-    EXPECT_EQ("English text.", describeIn(2, &status)) << "no directory of the language";
+    EXPECT_EQ(describeIn(2, &status), "English text.") << "no directory of the language";
     explain("/German", "-2", "Anderer Text.");
-    EXPECT_EQ("English text.", describeIn(2, &status)) << "no text in the language";
-    EXPECT_EQ("English text.", describeIn(77, &status)) << "no such language";
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describeIn(2, &status), "English text.") << "no text in the language";
+    EXPECT_EQ(describeIn(77, &status), "English text.") << "no such language";
+    EXPECT_EQ(status.code, 0);
 }
 
-TEST_F(DefaultXlatorTest, ATextOutsideTheLanguageDirectoriesServesAnyLanguage) {
+TEST_F(DefaultXlatorTest, ATextOutsideTheLanguageDirectoriesIsUsedForAnyLanguage) {
     explain("/English", "-2", "Other text.");
     explain("/French", "-2", "Autre texte.");
     explain("", "-1", "Text for all.");
-    EXPECT_EQ("Text for all.", describeIn(1, &status));
+    EXPECT_EQ(describeIn(1, &status), "Text for all.");
 }
 
 TEST_F(DefaultXlatorTest, ACodeWithoutTextIsReported) {
     explain("/English", "-2", "Other text.");
-    EXPECT_EQ("(null)", describeIn(0x302, &status));
-    EXPECT_EQ(-52006, status.code);
+    EXPECT_EQ(describeIn(0x302, &status), "(null)");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported(status,
                          "\"qixlator_debug\":{\"qixlator_defaultTranslator\":\"couldn't find "
                          "description for code\",\"code\":-1,\"lang\":0,\"ade\":3}"))
@@ -376,15 +375,15 @@ TEST_F(DefaultXlatorTest, TheEnvironmentIsFourBitsOfTheAttributes) {
     for (const auto& [attributes, ade] :
          {std::pair(0xF00u, "15"), std::pair(0xFFFFF2FFu, "2"), std::pair(0x1000u, "0")}) {
         qierr::Status failure;
-        EXPECT_EQ("(null)", describeIn(attributes, &failure));
+        EXPECT_EQ(describeIn(attributes, &failure), "(null)");
         EXPECT_TRUE(reported(failure, std::string("\"lang\":0,\"ade\":") + ade + "}"))
             << failure.json;
     }
 }
 
-TEST_F(DefaultXlatorTest, MissingDirectoriesAreReportedForEnglish) {
-    EXPECT_EQ("(null)", describeIn(2, &status));
-    EXPECT_EQ(-52006, status.code);
+TEST_F(DefaultXlatorTest, MissingDirectoriesAreReportedWithTheEnglishDirectory) {
+    EXPECT_EQ(describeIn(2, &status), "(null)");
+    EXPECT_EQ(status.code, -52006);
     EXPECT_TRUE(reported(status, "\"debug\":\"open dir failed\",\"path\":\"" +
                                      root.locate("/usr/local/qinstal/share/errors/English") + "\""))
         << status.json;

@@ -12,7 +12,7 @@
 #include "qierr/Status.h"
 #include "qixlator/Registration.h"
 
-// A registered translator that answers with texts laid down by the test. One of a name at a time.
+// A registered translator that returns texts set by the test. Only one of a name may exist.
 class TestXlator {
   public:
     explicit TestXlator(const char* name)
@@ -21,13 +21,13 @@ class TestXlator {
     }
     ~TestXlator() { registry().erase(registration.name); }
 
-    // What the description of a code is; nothing for a code that is not there.
+    // The description of each code; a code that is missing has none.
     std::map<std::int32_t, std::string> descriptions;
-    // The json1 text of every status.
+    // The json1 text for every status.
     std::string json1;
-    // The code that a description fails with.
+    // The code with which a description fails.
     std::int32_t failure = 0;
-    // What happened, in order; the beginnings of long JSON texts only.
+    // The calls, in order; of long JSON texts only the beginnings.
     std::vector<std::string> calls;
     // The names of the translators that were destroyed, those of other objects of this class too.
     static std::vector<std::string>& destroyed() {

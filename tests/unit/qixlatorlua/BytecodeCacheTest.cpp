@@ -29,7 +29,7 @@ const EmbeddedFile files[] = {
 };
 const EmbeddedFiles table = {files, files + std::size(files)};
 
-// What a chunk does in a state whose modules come from source or from the cache.
+// The outcome of a chunk in a state whose modules come from source or from the cache.
 struct Outcome {
     int installed;
     std::string lines;
@@ -52,7 +52,7 @@ Outcome run(const BytecodeCache* cache, const std::string& chunk) {
     testing::internal::CaptureStderr();
     outcome.installed = cache == nullptr ? addFilesToPreload(L, table) : cache->install(L);
     outcome.lines = testing::internal::GetCapturedStderr();
-    EXPECT_EQ(0, lua_gettop(L));
+    EXPECT_EQ(lua_gettop(L), 0);
     lua_pushcfunction(L, addTraceback);
     luaL_loadbuffer(L, chunk.data(), chunk.size(), "=test");
     lua_pcall(L, 0, 1, 1);
@@ -61,10 +61,10 @@ Outcome run(const BytecodeCache* cache, const std::string& chunk) {
     return outcome;
 }
 
-TEST(BytecodeCacheTest, BehavesAsTheSource) {
+TEST(BytecodeCacheTest, BehavesLikeTheSource) {
     qierr::Status status;
     const BytecodeCache cache(table, &status);
-    ASSERT_EQ(0, status.code);
+    ASSERT_EQ(status.code, 0);
     for (const char* chunk :
          {"return type(require('good').fail)", "return require('good').fail('x')",
           "return require('failing')", "return require('bad')", "return require('worse')",
@@ -77,7 +77,7 @@ TEST(BytecodeCacheTest, BehavesAsTheSource) {
           "package.preload.mine = function() return 'mine' end return require('mine')"}) {
         const Outcome source = run(nullptr, chunk);
         const Outcome bytecode = run(&cache, chunk);
-        EXPECT_EQ(1, bytecode.installed);
+        EXPECT_EQ(bytecode.installed, 1);
         EXPECT_EQ(source.installed, bytecode.installed);
         EXPECT_EQ(source.lines, bytecode.lines);
         if (std::strstr(chunk, "tostring(require") == nullptr) {
@@ -90,7 +90,7 @@ TEST(BytecodeCacheTest, ErrorsNameTheLinesOfTheScripts) {
     qierr::Status status;
     const BytecodeCache cache(table, &status);
     const std::string error = run(&cache, "return require('failing')").result;
-    EXPECT_EQ(0u, error.find("[string \"good.lua\"]:3: attempt to concatenate a nil value\n"))
+    EXPECT_EQ(error.find("[string \"good.lua\"]:3: attempt to concatenate a nil value\n"), 0u)
         << error;
     EXPECT_NE(std::string::npos, error.find("\t[string \"good.lua\"]:3: in function 'fail'\n"
                                             "\t[string \"failing.lua\"]:3: in main chunk\n"
@@ -103,15 +103,15 @@ TEST(BytecodeCacheTest, TheLineOfABadScriptIsWrittenForEachState) {
     const BytecodeCache cache(table, &status);
     for (int state = 0; state < 2; ++state) {
         EXPECT_EQ(
+            run(&cache, "return ''").lines,
             "ERROR: Failed to load \"bad.lua\": [string \"bad.lua\"]:1: unexpected symbol near "
             "'+'\n"
             "ERROR: Failed to load \"worse.lua\": [string \"worse.lua\"]:1: unexpected symbol near "
-            "'='\n",
-            run(&cache, "return ''").lines);
+            "'='\n");
     }
 }
 
-TEST(BytecodeCacheTest, WantOfMemoryAtAnyAllocationIsReported) {
+TEST(BytecodeCacheTest, LackOfMemoryAtAnyAllocationIsReported) {
     const std::int64_t before = FaultyAllocator::liveBlocks();
     std::uint64_t number = 0;
     for (;; ++number) {
@@ -120,12 +120,12 @@ TEST(BytecodeCacheTest, WantOfMemoryAtAnyAllocationIsReported) {
         { const BytecodeCache cache(table, &status); }
         const bool failed = FaultyAllocator::hasFailed();
         FaultyAllocator::succeed();
-        ASSERT_EQ(before, FaultyAllocator::liveBlocks()) << "request " << number;
+        ASSERT_EQ(FaultyAllocator::liveBlocks(), before) << "request " << number;
         if (!failed) {
-            EXPECT_EQ(0, status.code);
+            EXPECT_EQ(status.code, 0);
             break;
         }
-        ASSERT_EQ(-52000, status.code) << "request " << number;
+        ASSERT_EQ(status.code, -52000) << "request " << number;
     }
     EXPECT_LT(100u, number);
 }

@@ -9,18 +9,18 @@ namespace {
 
 using qixlatorlua::LuaRuntime;
 
-// What opening the library of folders does besides.
+// Called in addition when the library of folders is opened.
 int (*openingFolders)(lua_State* L) = nullptr;
-// What adding the embedded scripts answers instead of adding them; 0 for nothing.
+// What adding the embedded scripts returns instead of adding them; 0 to add them.
 int preloadResult = 0;
 
-// No translator is made, and the status tells why.
+// Expects that no translator is made, and that the status says why.
 void expectNoTranslator(LuaRuntime runtime, const std::string& code, const std::string& message,
                         const std::string& debug) {
     const ScriptHost host(runtime);
     qierr::Status status;
-    EXPECT_EQ(nullptr, host.create(host.registration("chunk"), &status));
-    EXPECT_EQ(-52003, status.code);
+    EXPECT_EQ(host.create(host.registration("chunk"), &status), nullptr);
+    EXPECT_EQ(status.code, -52003);
     EXPECT_TRUE(
         reported(status, "\"error_constant\":\"qiapalerr_softwareFaultAPALInternalUseOnly\""))
         << status.json;
@@ -41,7 +41,7 @@ INSTANTIATE_TEST_SUITE_P(Runtimes, LibraryFailuresTest,
                              return runtime.param == LuaRuntime::plain ? "Plain" : "Fast";
                          });
 
-TEST_P(LibraryFailuresTest, ALibraryThatDoesNotOpenIsNamed) {
+TEST_P(LibraryFailuresTest, ALibraryThatCannotBeOpenedIsNamed) {
     openingFolders = [](lua_State* L) {
         lua_pushliteral(L, "folders are not there");
         return lua_error(L);
@@ -60,7 +60,7 @@ TEST_P(LibraryFailuresTest, AStateWithoutATableForPreloadsIsReported) {
                        "\"debug\":\"failed to add embedded modules to preload table\"");
 }
 
-// The other runtime makes the bytecode of these scripts once in the process.
+// The fast runtime compiles these scripts only once per process.
 TEST(EmbeddedScriptFailuresTest, AnEmbeddedScriptThatCannotBeAddedIsReported) {
     preloadResult = 1;
     expectNoTranslator(LuaRuntime::plain, "0", "",

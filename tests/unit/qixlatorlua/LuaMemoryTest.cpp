@@ -49,7 +49,7 @@ TEST_F(LuaMemoryTest, BlocksKeepTheirContentThroughAnySequenceOfRequests) {
             if (kind == 0 || blocks.empty()) {
                 auto* bytes =
                     static_cast<unsigned char*>(LuaArena::allocate(&arena, nullptr, 0, size));
-                ASSERT_EQ(0u, reinterpret_cast<std::uintptr_t>(bytes) % 8);
+                ASSERT_EQ(reinterpret_cast<std::uintptr_t>(bytes) % 8, 0u);
                 std::memset(bytes, filling, size);
                 blocks.push_back({bytes, size, filling});
                 continue;
@@ -73,10 +73,10 @@ TEST_F(LuaMemoryTest, BlocksKeepTheirContentThroughAnySequenceOfRequests) {
             EXPECT_TRUE(isIntact(block, block.size));
         }
     }
-    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
 }
 
-TEST_F(LuaMemoryTest, BlocksThatAreGivenBackAreUsedAgain) {
+TEST_F(LuaMemoryTest, FreedBlocksAreReused) {
     LuaArena arena;
     for (int count = 0; count < 100000; ++count) {
         void* small = LuaArena::allocate(&arena, nullptr, 0, 100);
@@ -87,17 +87,17 @@ TEST_F(LuaMemoryTest, BlocksThatAreGivenBackAreUsedAgain) {
     EXPECT_GT(100000, FaultyAllocator::peakBytes() - FaultyAllocator::liveBytes());
 }
 
-TEST_F(LuaMemoryTest, WantOfMemoryIsANullAndLeavesTheOldBlock) {
+TEST_F(LuaMemoryTest, LackOfMemoryReturnsNullAndKeepsTheOldBlock) {
     LuaArena arena;
     FaultyAllocator::failAt(0, FaultyAllocator::never);
-    EXPECT_EQ(nullptr, LuaArena::allocate(&arena, nullptr, 0, 100));
-    EXPECT_EQ(nullptr, LuaArena::allocate(&arena, nullptr, 0, 1000));
+    EXPECT_EQ(LuaArena::allocate(&arena, nullptr, 0, 100), nullptr);
+    EXPECT_EQ(LuaArena::allocate(&arena, nullptr, 0, 1000), nullptr);
     FaultyAllocator::succeed();
     auto* block = static_cast<char*>(LuaArena::allocate(&arena, nullptr, 0, 1000));
     std::memset(block, 'x', 1000);
     FaultyAllocator::failAt(0, FaultyAllocator::never);
-    EXPECT_EQ(nullptr, LuaArena::allocate(&arena, block, 1000, 100000));
-    EXPECT_EQ('x', block[999]);
+    EXPECT_EQ(LuaArena::allocate(&arena, block, 1000, 100000), nullptr);
+    EXPECT_EQ(block[999], 'x');
 }
 
 TEST_F(LuaMemoryTest, ShrinkingNeverFails) {
@@ -113,20 +113,20 @@ TEST_F(LuaMemoryTest, ShrinkingNeverFails) {
         LuaArena::allocate(&arena, block, 100, 0);
     }
     FaultyAllocator::succeed();
-    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
 }
 
-TEST_F(LuaMemoryTest, ThePlainWayAllocatesEachBlockByItself) {
+TEST_F(LuaMemoryTest, ThePlainRuntimeAllocatesEachBlockByItself) {
     const std::int64_t before = FaultyAllocator::liveBlocks();
     void* first = allocatePlainly(nullptr, nullptr, 0, 10);
     void* second = allocatePlainly(nullptr, nullptr, 0, 10);
-    EXPECT_EQ(before + 2, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before + 2);
     first = allocatePlainly(nullptr, first, 10, 1000);
-    EXPECT_EQ(before + 2, FaultyAllocator::liveBlocks());
-    EXPECT_EQ(nullptr, allocatePlainly(nullptr, first, 1000, 0));
-    EXPECT_EQ(nullptr, allocatePlainly(nullptr, second, 10, 0));
-    EXPECT_EQ(nullptr, allocatePlainly(nullptr, nullptr, 0, 0));
-    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before + 2);
+    EXPECT_EQ(allocatePlainly(nullptr, first, 1000, 0), nullptr);
+    EXPECT_EQ(allocatePlainly(nullptr, second, 10, 0), nullptr);
+    EXPECT_EQ(allocatePlainly(nullptr, nullptr, 0, 0), nullptr);
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
 }
 
 }  // namespace

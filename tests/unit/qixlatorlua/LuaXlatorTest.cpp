@@ -42,10 +42,10 @@ INSTANTIATE_TEST_SUITE_P(Runtimes, LuaXlatorTest,
                          });
 
 TEST_P(LuaXlatorTest, TheScriptGetsCodeLanguageAndEnvironment) {
-    EXPECT_EQ("-1 3 2", host.run("return code .. ' ' .. lang .. ' ' .. ade", &status));
+    EXPECT_EQ(host.run("return code .. ' ' .. lang .. ' ' .. ade", &status), "-1 3 2");
     writeDynamic("return json .. ' ' .. lang .. ' ' .. ade .. ' ' .. format");
-    EXPECT_EQ("{\"a\":1} 3 2 json1", describeJson("{\"a\":1}", "json1", &status));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describeJson("{\"a\":1}", "json1", &status), "{\"a\":1} 3 2 json1");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_P(LuaXlatorTest, LanguageAndEnvironmentAreEightAndFourBitsOfTheAttributes) {
@@ -58,10 +58,10 @@ TEST_P(LuaXlatorTest, LanguageAndEnvironmentAreEightAndFourBitsOfTheAttributes) 
         return ScriptHost::taken(
             xlator->getStaticDesc(xlator, -1, attributes, qixlator_realloc, nullptr, &status));
     };
-    EXPECT_EQ("0 15", seen(0xF00));
-    EXPECT_EQ("255 0", seen(0xFF));
-    EXPECT_EQ("3 2", seen(0xFFFFF203));
-    EXPECT_EQ("0 0", seen(0xFFFFF000));
+    EXPECT_EQ(seen(0xF00), "0 15");
+    EXPECT_EQ(seen(0xFF), "255 0");
+    EXPECT_EQ(seen(0xFFFFF203), "3 2");
+    EXPECT_EQ(seen(0xFFFFF000), "0 0");
     xlator->destroy(xlator);
 }
 
@@ -69,14 +69,15 @@ TEST_P(LuaXlatorTest, TheStructureSizeIsSixteenWhateverThePlatform) {
     writeDynamic("");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
     ASSERT_NE(nullptr, xlator);
-    EXPECT_EQ(16u, xlator->structSize);
+    EXPECT_EQ(xlator->structSize, 16u);
     xlator->destroy(xlator);
 }
 
 TEST_P(LuaXlatorTest, TheScriptKnowsItsNameAndSettings) {
-    EXPECT_EQ("test_name table", host.run("return qixlatorlua_name .. ' ' .. "
-                                          "type(qixlatorlua_settings)",
-                                          &status));
+    EXPECT_EQ(host.run("return qixlatorlua_name .. ' ' .. "
+                       "type(qixlatorlua_settings)",
+                       &status),
+              "test_name table");
     host.write("chunk",
                "return { getStaticDesc = function() return "
                "qixlatorlua_settings.a .. qixlatorlua_settings.b end }");
@@ -86,25 +87,26 @@ TEST_P(LuaXlatorTest, TheScriptKnowsItsNameAndSettings) {
             host.root.locate("\\\\scripts/") + "\"}",
         &status);
     ASSERT_NE(nullptr, xlator) << status.json;
-    EXPECT_EQ("xy", ScriptHost::taken(
-                        xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status)));
+    EXPECT_EQ(
+        ScriptHost::taken(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status)),
+        "xy");
     xlator->destroy(xlator);
 }
 
 TEST_P(LuaXlatorTest, WithoutAPathOnlyEmbeddedModulesAreFound) {
-    EXPECT_EQ(nullptr, host.create("{\"qixlatorlua_xlator\":\"chunk\"}", &status));
-    EXPECT_EQ(-52003, status.code);
+    EXPECT_EQ(host.create("{\"qixlatorlua_xlator\":\"chunk\"}", &status), nullptr);
+    EXPECT_EQ(status.code, -52003);
     qierr::Status second;
     XlatorInterface* xlator = host.create("{\"qixlatorlua_xlator\":\"qimxl_utilities\"}", &second);
     ASSERT_NE(nullptr, xlator);
     xlator->destroy(xlator);
 }
 
-TEST_P(LuaXlatorTest, ARegistrationTextThatDoesNotServeIsReported) {
+TEST_P(LuaXlatorTest, AnUnusableRegistrationTextIsReported) {
     for (const char* text : {"{}", "", "5", "{\"qixlatorlua_xlator\":\"missing\"}", "os.exit(1)"}) {
         qierr::Status failure;
-        EXPECT_EQ(nullptr, host.create(text, &failure)) << text;
-        EXPECT_EQ(-52003, failure.code) << text;
+        EXPECT_EQ(host.create(text, &failure), nullptr) << text;
+        EXPECT_EQ(failure.code, -52003) << text;
         EXPECT_TRUE(
             reported(failure, "\"error_constant\":\"qiapalerr_softwareFaultAPALInternalUseOnly\""));
         EXPECT_TRUE(
@@ -122,16 +124,16 @@ TEST_P(LuaXlatorTest, NothingIsDoneWhenTheStatusIsNegative) {
     qierr::Status creation;
     XlatorInterface* xlator = host.create(host.registration("chunk"), &creation);
     status.code = -1;
-    EXPECT_EQ(nullptr, host.create(host.registration("chunk"), &status));
-    EXPECT_EQ(nullptr,
-              xlator->getDynamicDesc(xlator, "{}", 0, "json1", qixlator_realloc, nullptr, &status));
-    EXPECT_EQ(-1, status.code);
+    EXPECT_EQ(host.create(host.registration("chunk"), &status), nullptr);
+    EXPECT_EQ(xlator->getDynamicDesc(xlator, "{}", 0, "json1", qixlator_realloc, nullptr, &status),
+              nullptr);
+    EXPECT_EQ(status.code, -1);
     xlator->destroy(xlator);
 }
 
 TEST_P(LuaXlatorTest, AnErrorOfTheScriptIsReportedWithATraceback) {
-    EXPECT_EQ("(null)", host.run("error('oops')", &status));
-    EXPECT_EQ(-52003, status.code);
+    EXPECT_EQ(host.run("error('oops')", &status), "(null)");
+    EXPECT_EQ(status.code, -52003);
     EXPECT_TRUE(reported(status, "chunk.lua:2: oops\\nstack traceback:\\n")) << status.json;
     EXPECT_TRUE(reported(status, "\"qixlatorlua_debug\":{\"debug\":\"failed to get static desc\"}"))
         << status.json;
@@ -139,8 +141,8 @@ TEST_P(LuaXlatorTest, AnErrorOfTheScriptIsReportedWithATraceback) {
 
 TEST_P(LuaXlatorTest, AnErrorOfTheDynamicDescriptionIsReported) {
     writeDynamic("return json.x.y");
-    EXPECT_EQ("(null)", describeJson("{}", "json1", &status));
-    EXPECT_EQ(-52003, status.code);
+    EXPECT_EQ(describeJson("{}", "json1", &status), "(null)");
+    EXPECT_EQ(status.code, -52003);
     EXPECT_TRUE(reported(status, "\"internal_error\":{\"api\":\"lua\",\"code\":2,\"string\":\""));
     EXPECT_TRUE(
         reported(status, "\"qixlatorlua_debug\":{\"debug\":\"failed to get dynamic desc\"}"))
@@ -156,32 +158,32 @@ TEST_P(LuaXlatorTest, AFailureOfANativeFunctionCarriesItsStatusText) {
     EXPECT_TRUE(reported(status, "}}\\nstack traceback:\\n")) << status.json;
 }
 
-TEST_P(LuaXlatorTest, AnErrorThatIsNoTextIsStillAFailure) {
-    EXPECT_EQ("(null)", host.run("error({})", &status));
-    EXPECT_EQ(-52003, status.code);
+TEST_P(LuaXlatorTest, AnErrorThatIsNotATextIsAFailureToo) {
+    EXPECT_EQ(host.run("error({})", &status), "(null)");
+    EXPECT_EQ(status.code, -52003);
     host.write("chunk", "error({})");
     qierr::Status second;
-    EXPECT_EQ(nullptr, host.create(host.registration("chunk"), &second));
-    EXPECT_EQ(-52003, second.code);
+    EXPECT_EQ(host.create(host.registration("chunk"), &second), nullptr);
+    EXPECT_EQ(second.code, -52003);
     EXPECT_TRUE(reported(second, "\"internal_error\":{\"api\":\"lua\",\"code\":2,\"string\":\"\"}"))
         << second.json;
 }
 
-TEST_P(LuaXlatorTest, WithoutAHandlerTheMessageStandsAlone) {
+TEST_P(LuaXlatorTest, WithoutAHandlerTheMessageHasNoTraceback) {
     host.write("chunk",
                "qixlatorlua_errHandler = nil\n"
                "return { getStaticDesc = function() error('oops', 0) end }");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
     ASSERT_NE(nullptr, xlator);
-    EXPECT_EQ(nullptr, xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status));
+    EXPECT_EQ(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status), nullptr);
     EXPECT_TRUE(reported(status, "\"string\":\"oops\"}")) << status.json;
     xlator->destroy(xlator);
 }
 
 TEST_P(LuaXlatorTest, AMissingFunctionIsReported) {
     host.write("chunk", "return {}");
-    EXPECT_EQ("(null)", describeJson("{}", "json1", &status));
-    EXPECT_EQ(-52003, status.code);
+    EXPECT_EQ(describeJson("{}", "json1", &status), "(null)");
+    EXPECT_EQ(status.code, -52003);
 }
 
 TEST_P(LuaXlatorTest, ManyFailuresDoNotExhaustTheState) {
@@ -193,10 +195,11 @@ TEST_P(LuaXlatorTest, ManyFailuresDoNotExhaustTheState) {
     for (int count = 0; count < 10000; ++count) {
         qierr::Status failure;
         xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &failure);
-        ASSERT_EQ(-52003, failure.code);
+        ASSERT_EQ(failure.code, -52003);
     }
-    EXPECT_EQ("good", ScriptHost::taken(
-                          xlator->getStaticDesc(xlator, 0, 0, qixlator_realloc, nullptr, &status)));
+    EXPECT_EQ(
+        ScriptHost::taken(xlator->getStaticDesc(xlator, 0, 0, qixlator_realloc, nullptr, &status)),
+        "good");
     xlator->destroy(xlator);
 }
 
@@ -210,12 +213,12 @@ TEST_P(LuaXlatorTest, AFailedCallLeavesTheStackAsItWas) {
     const int before = lua_gettop(L);
     qierr::Status ofStatic;
     xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &ofStatic);
-    EXPECT_EQ(-52003, ofStatic.code);
-    EXPECT_EQ(before, lua_gettop(L));
+    EXPECT_EQ(ofStatic.code, -52003);
+    EXPECT_EQ(lua_gettop(L), before);
     qierr::Status ofDynamic;
     xlator->getDynamicDesc(xlator, "{}", 0, "json1", qixlator_realloc, nullptr, &ofDynamic);
-    EXPECT_EQ(-52003, ofDynamic.code);
-    EXPECT_EQ(before, lua_gettop(L));
+    EXPECT_EQ(ofDynamic.code, -52003);
+    EXPECT_EQ(lua_gettop(L), before);
     xlator->destroy(xlator);
 }
 
@@ -231,15 +234,15 @@ TEST_P(LuaXlatorTest, TheGarbageOfManyCallsIsCollected) {
         ScriptHost::taken(
             xlator->getStaticDesc(xlator, count, 0, qixlator_realloc, nullptr, &status));
     }
-    // Two hundred million bytes went by.
+    // The calls have allocated two hundred million bytes.
     EXPECT_GT(20000000, FaultyAllocator::peakBytes() - before);
     xlator->destroy(xlator);
 }
 
 TEST_P(LuaXlatorTest, ANumberOfTheDynamicDescriptionIsAStatusCode) {
     writeDynamic("return -52029");
-    EXPECT_EQ("(null)", describeJson("{}", "json1", &status));
-    EXPECT_EQ(-52029, status.code);
+    EXPECT_EQ(describeJson("{}", "json1", &status), "(null)");
+    EXPECT_EQ(status.code, -52029);
     EXPECT_TRUE(reported(status, "\"error_constant\":\"(int32_t)lua_tointeger(L, -1)\""))
         << status.json;
     EXPECT_TRUE(
@@ -249,20 +252,20 @@ TEST_P(LuaXlatorTest, ANumberOfTheDynamicDescriptionIsAStatusCode) {
 
 TEST_P(LuaXlatorTest, ZeroIsNeitherTextNorFailure) {
     writeDynamic("return 0");
-    EXPECT_EQ("(null)", describeJson("{}", "json1", &status));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describeJson("{}", "json1", &status), "(null)");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_P(LuaXlatorTest, ATextOfDigitsIsAText) {
     writeDynamic("return '-5'");
-    EXPECT_EQ("-5", describeJson("{}", "json1", &status));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(describeJson("{}", "json1", &status), "-5");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_P(LuaXlatorTest, ANumberOfTheStaticDescriptionIsAText) {
-    EXPECT_EQ("-5", host.run("return -5", &status));
-    EXPECT_EQ("(null)", host.run("return nil", &status));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(host.run("return -5", &status), "-5");
+    EXPECT_EQ(host.run("return nil", &status), "(null)");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_P(LuaXlatorTest, TheCallersAllocationIsUsed) {
@@ -270,7 +273,7 @@ TEST_P(LuaXlatorTest, TheCallersAllocationIsUsed) {
     static int calls;
     calls = 0;
     const auto alloc = [](void* pointer, std::uint32_t size, void* context, qierr_Status* status) {
-        EXPECT_EQ(&calls, context);
+        EXPECT_EQ(context, &calls);
         sizes[calls++] = static_cast<int>(size);
         return qixlator_realloc(pointer, size, nullptr, status);
     };
@@ -278,19 +281,19 @@ TEST_P(LuaXlatorTest, TheCallersAllocationIsUsed) {
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
     ASSERT_NE(nullptr, xlator);
     char* text = xlator->getStaticDesc(xlator, -1, 0, alloc, &calls, &status);
-    EXPECT_STREQ("text", text);
+    EXPECT_STREQ(text, "text");
     alloc(text, 0, &calls, &status);
-    EXPECT_EQ(5, sizes[0]);
-    EXPECT_EQ(2, calls);
+    EXPECT_EQ(sizes[0], 5);
+    EXPECT_EQ(calls, 2);
     xlator->destroy(xlator);
 }
 
-TEST_P(LuaXlatorTest, DestroyingGivesAllMemoryBack) {
+TEST_P(LuaXlatorTest, DestroyingFreesAllMemory) {
     host.run("return 'warm'", &status);
     const std::int64_t before = FaultyAllocator::liveBlocks();
     host.run("local t = {} for i = 1, 1000 do t[i] = ('x'):rep(i) end keep = t return 'x'",
              &status);
-    EXPECT_EQ(before, FaultyAllocator::liveBlocks());
+    EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
 }
 
 }  // namespace

@@ -8,7 +8,7 @@
 
 namespace {
 
-// What the scripts of a translator cannot do, tried by scripts.
+// What the scripts of a translator cannot do, checked by scripts.
 class RestrictionsTest : public testing::Test {
   protected:
     std::string run(const std::string& chunk) {
@@ -38,13 +38,13 @@ TEST_F(RestrictionsTest, PopenChecksItsArgumentsInOrder) {
               errorOf("io.popen('true', {})").find("bad argument #2 to 'popen' (string expected"));
 }
 
-TEST_F(RestrictionsTest, LoadlibAnswersThatItIsAbsent) {
-    EXPECT_EQ("nil dynamic libraries not enabled; check your Lua installation absent",
-              run("local a, b, c = package.loadlib('libc.so.6', 'getpid') "
-                  "return tostring(a) .. ' ' .. b .. ' ' .. c"));
-    EXPECT_EQ("nil dynamic libraries not enabled; check your Lua installation absent",
-              run("local a, b, c = package.loadlib('libc.so.6', '*') "
-                  "return tostring(a) .. ' ' .. b .. ' ' .. c"));
+TEST_F(RestrictionsTest, LoadlibReportsThatItIsAbsent) {
+    EXPECT_EQ(run("local a, b, c = package.loadlib('libc.so.6', 'getpid') "
+                  "return tostring(a) .. ' ' .. b .. ' ' .. c"),
+              "nil dynamic libraries not enabled; check your Lua installation absent");
+    EXPECT_EQ(run("local a, b, c = package.loadlib('libc.so.6', '*') "
+                  "return tostring(a) .. ' ' .. b .. ' ' .. c"),
+              "nil dynamic libraries not enabled; check your Lua installation absent");
 }
 
 TEST_F(RestrictionsTest, LoadlibChecksItsArgumentsInOrder) {
@@ -56,16 +56,16 @@ TEST_F(RestrictionsTest, LoadlibChecksItsArgumentsInOrder) {
         errorOf("package.loadlib('x', {})").find("bad argument #2 to 'loadlib' (string expected"));
 }
 
-TEST_F(RestrictionsTest, ANativeModuleThatIsThereCannotBeLoaded) {
+TEST_F(RestrictionsTest, AnExistingNativeModuleCannotBeLoaded) {
     host.root.write("/native/module.so", "whatever");
     const std::string path = host.root.locate("/native/module.so");
     host.write("paths", "package.cpath = '" + host.root.locate("/native/?.so") + "'");
-    EXPECT_EQ("error loading module 'module' from file '" + path +
-                  "':\n\tdynamic libraries not enabled; check your Lua installation",
-              errorOf("require('paths') and require('module')"));
-    EXPECT_EQ("error loading module 'module.part' from file '" + path +
-                  "':\n\tdynamic libraries not enabled; check your Lua installation",
-              errorOf("require('paths') and require('module.part')"));
+    EXPECT_EQ(errorOf("require('paths') and require('module')"),
+              "error loading module 'module' from file '" + path +
+                  "':\n\tdynamic libraries not enabled; check your Lua installation");
+    EXPECT_EQ(errorOf("require('paths') and require('module.part')"),
+              "error loading module 'module.part' from file '" + path +
+                  "':\n\tdynamic libraries not enabled; check your Lua installation");
 }
 
 TEST_F(RestrictionsTest, TheSearchForNativeModulesIsReportedAsTheInterpretersOwn) {
@@ -76,19 +76,19 @@ TEST_F(RestrictionsTest, TheSearchForNativeModulesIsReportedAsTheInterpretersOwn
         "\n\tno file '/nowhere/a.so'\n\tno file '/else/a/x.so'";
     const std::string error = errorOf("require('paths') and require('a.b')");
     ASSERT_LT(places.size(), error.size());
-    EXPECT_EQ(places, error.substr(error.size() - places.size()));
+    EXPECT_EQ(error.substr(error.size() - places.size()), places);
 }
 
-TEST_F(RestrictionsTest, TheLoadersSeeThePathThatIsSetLast) {
+TEST_F(RestrictionsTest, TheLoadersUseTheCurrentPath) {
     EXPECT_NE(std::string::npos, errorOf("rawset(package, 'cpath', nil) and require('a')")
                                      .find("'package.cpath' must be a string"));
 }
 
 TEST_F(RestrictionsTest, TheSearchPathForNativeModulesIsEmptyAfterTheSetUp) {
-    EXPECT_EQ("[]", run("return '[' .. package.cpath .. ']'"));
+    EXPECT_EQ(run("return '[' .. package.cpath .. ']'"), "[]");
 }
 
-TEST_F(RestrictionsTest, TheDebugPromptIsTheHostsOwn) {
+TEST_F(RestrictionsTest, TheDebugPromptHasTheNameOfTheHost) {
     // Standard input holds two commands and the end of the session.
     std::FILE* input = std::tmpfile();
     std::fputs("answer = 42\nerror('oops', 0)\nerror()\ncont\nnot read\n", input);
@@ -102,15 +102,15 @@ TEST_F(RestrictionsTest, TheDebugPromptIsTheHostsOwn) {
     dup2(savedInput, STDIN_FILENO);
     close(savedInput);
     std::fclose(input);
-    EXPECT_EQ("42", answer);
-    EXPECT_EQ("hlua_debug> hlua_debug> oops\nhlua_debug> (no message)\nhlua_debug> ", prompts);
+    EXPECT_EQ(answer, "42");
+    EXPECT_EQ(prompts, "hlua_debug> hlua_debug> oops\nhlua_debug> (no message)\nhlua_debug> ");
 }
 
-TEST_F(RestrictionsTest, TheOtherLibrariesAreThere) {
-    EXPECT_EQ("table table table table table table table table table table",
-              run("local kinds = {} for _, name in ipairs({'table', 'io', 'os', 'string', 'math', "
+TEST_F(RestrictionsTest, TheOtherLibrariesAreAvailable) {
+    EXPECT_EQ(run("local kinds = {} for _, name in ipairs({'table', 'io', 'os', 'string', 'math', "
                   "'debug', 'lfs', 'stdint', 'cjson', 'qixlatorluautils'}) do "
-                  "kinds[#kinds + 1] = type(require(name)) end return table.concat(kinds, ' ')"));
+                  "kinds[#kinds + 1] = type(require(name)) end return table.concat(kinds, ' ')"),
+              "table table table table table table table table table table");
 }
 
 }  // namespace

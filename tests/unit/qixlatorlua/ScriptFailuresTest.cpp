@@ -11,7 +11,7 @@ namespace {
 
 using qixlatorlua::LuaRuntime;
 
-// Whatever goes wrong in a script becomes one status, and the state is closed.
+// Every failure in a script is reported as one status, and the state is closed.
 class ScriptFailuresTest : public testing::TestWithParam<LuaRuntime> {
   protected:
     ScriptFailuresTest() {
@@ -21,14 +21,14 @@ class ScriptFailuresTest : public testing::TestWithParam<LuaRuntime> {
     }
     ~ScriptFailuresTest() override {
         FaultyAllocator::succeed();
-        EXPECT_EQ(blocks, FaultyAllocator::liveBlocks());
+        EXPECT_EQ(FaultyAllocator::liveBlocks(), blocks);
     }
 
-    // A status that stands for a report of the interpreter: all of its text but the position and
-    // the message.
+    // Expects a status that reports a failure of the interpreter. All of its text is compared
+    // except the position; the message is matched.
     static void expectReport(const qierr_Status& status, const std::string& message,
                              const std::string& debug, int code = LUA_ERRRUN) {
-        ASSERT_EQ(-52003, status.code);
+        ASSERT_EQ(status.code, -52003);
         ASSERT_NE(nullptr, status.json);
         const std::string head =
             "{\"error_constant\":\"qiapalerr_softwareFaultAPALInternalUseOnly\","
@@ -40,8 +40,8 @@ class ScriptFailuresTest : public testing::TestWithParam<LuaRuntime> {
             std::regex_replace(status.json, std::regex("\"line\":[0-9]+"), "\"line\":#",
                                std::regex_constants::format_first_only);
         ASSERT_LE(head.size() + tail.size(), text.size()) << text;
-        EXPECT_EQ(head, text.substr(0, head.size()));
-        EXPECT_EQ(tail, text.substr(text.size() - tail.size()));
+        EXPECT_EQ(text.substr(0, head.size()), head);
+        EXPECT_EQ(text.substr(text.size() - tail.size()), tail);
         const std::string seen = text.substr(head.size(), text.size() - head.size() - tail.size());
         EXPECT_TRUE(std::regex_match(seen, std::regex(message))) << seen;
     }
@@ -49,22 +49,22 @@ class ScriptFailuresTest : public testing::TestWithParam<LuaRuntime> {
     // The chunk is the body of the description of a code.
     void expectFailure(const std::string& chunk, const std::string& message) {
         qierr::Status status;
-        EXPECT_EQ("(null)", host.run(chunk, &status));
+        EXPECT_EQ(host.run(chunk, &status), "(null)");
         expectReport(status, message, "failed to get static desc\"");
     }
 
-    // The registration text is as it stands and, `quoted`, as a JSON string holds it.
+    // `registration` is the registration text; `quoted` is the same inside a JSON string.
     void expectNoTranslator(const std::string& registration, const std::string& quoted,
                             const std::string& message, int code = LUA_ERRRUN) {
         qierr::Status status;
-        EXPECT_EQ(nullptr, host.create(registration, &status)) << registration;
+        EXPECT_EQ(host.create(registration, &status), nullptr) << registration;
         expectReport(
             status, message,
             "lua setupEnv failed\",\"name\":\"test_name\",\"registrationInfo\":\"" + quoted + "\"",
             code);
     }
 
-    // The same for the text that names the module "chunk", which is this script.
+    // The same for a registration text that names the module "chunk", which has this script.
     void expectNoModule(const std::string& script, const std::string& message,
                         int code = LUA_ERRRUN) {
         host.write("chunk", script);
@@ -94,7 +94,7 @@ TEST_P(ScriptFailuresTest, ANumberIsReportedAsAText) {
     expectNoModule("error(5.5, 0)", "5\\.5");
 }
 
-TEST_P(ScriptFailuresTest, OtherValuesAreReportedWithWhatTheHandlerCannotDo) {
+TEST_P(ScriptFailuresTest, OtherValuesAreReportedWithTheFailureOfTheHandler) {
     for (const auto& [value, kind] : {std::pair("nil", "nil"), std::pair("{}", "table"),
                                       std::pair("true", "boolean"), std::pair("print", "function"),
                                       std::pair("coroutine.create(function() end)", "thread")}) {
@@ -131,26 +131,26 @@ TEST_P(ScriptFailuresTest, AHandlerThatFailsIsReported) {
     qierr::Status status;
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
     ASSERT_NE(nullptr, xlator);
-    EXPECT_EQ(nullptr, xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status));
+    EXPECT_EQ(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status), nullptr);
     expectReport(status, "error in error handling", "failed to get static desc\"");
     xlator->destroy(xlator);
 }
 
-TEST_P(ScriptFailuresTest, AScriptThatTakesAllMemoryIsReported) {
+TEST_P(ScriptFailuresTest, AScriptThatExhaustsMemoryIsReported) {
     FaultyAllocator::failAt(20000, FaultyAllocator::never);
     expectFailure("local t = {} while true do t[#t + 1] = ('x'):rep(1000) .. #t end",
                   "not enough memory");
     EXPECT_TRUE(FaultyAllocator::hasFailed());
 }
 
-TEST_P(ScriptFailuresTest, ASetUpThatTakesAllMemoryIsReported) {
+TEST_P(ScriptFailuresTest, ASetUpThatExhaustsMemoryIsReported) {
     FaultyAllocator::failAt(20000, FaultyAllocator::never);
     expectNoModule("local t = {} while true do t[#t + 1] = ('x'):rep(1000) .. #t end",
                    "not enough memory", LUA_ERRMEM);
     EXPECT_TRUE(FaultyAllocator::hasFailed());
 }
 
-TEST_P(ScriptFailuresTest, ARegistrationTextThatIsNoJsonIsReported) {
+TEST_P(ScriptFailuresTest, ARegistrationTextThatIsNotJsonIsReported) {
     for (const char* text : {"", "   ", "x", "{", "[", "{]", "}", "os.exit(1)", "-", "nul"}) {
         expectNoTranslator(text, text, "json: .*");
     }
@@ -159,7 +159,7 @@ TEST_P(ScriptFailuresTest, ARegistrationTextThatIsNoJsonIsReported) {
     expectNoTranslator("{\"a\":1,}", "{\\\"a\\\":1,}", "json: .*");
 }
 
-TEST_P(ScriptFailuresTest, ARegistrationTextThatIsNoObjectIsReported) {
+TEST_P(ScriptFailuresTest, ARegistrationTextThatIsNotAnObjectIsReported) {
     for (const char* text : {"5", "true", "null"}) {
         expectNoTranslator(text, text, ".*attempt to index local 'info' \\(a .* value\\)");
     }
@@ -201,13 +201,13 @@ TEST_P(ScriptFailuresTest, ADeeplyNestedRegistrationTextIsReported) {
     expectNoTranslator(text, text, ".*stack overflow.*");
 }
 
-TEST_P(ScriptFailuresTest, NoRegistrationTextAtAllIsReported) {
+TEST_P(ScriptFailuresTest, ANullRegistrationTextIsReported) {
     qierr::Status status;
-    EXPECT_EQ(nullptr, qixlatorlua::createLuaXlator("test_name", nullptr, GetParam(), &status));
-    EXPECT_EQ(-52003, status.code);
+    EXPECT_EQ(qixlatorlua::createLuaXlator("test_name", nullptr, GetParam(), &status), nullptr);
+    EXPECT_EQ(status.code, -52003);
 }
 
-TEST_P(ScriptFailuresTest, AModuleThatIsNoTranslatorIsReportedWhenItIsAsked) {
+TEST_P(ScriptFailuresTest, AModuleThatIsNotATranslatorIsReportedAtItsFirstUse) {
     for (const char* script : {"", "return 5", "return true", "return {}",
                                "return { getStaticDesc = {}, getDynamicDesc = 5 }"}) {
         host.write("chunk", script);
@@ -215,11 +215,12 @@ TEST_P(ScriptFailuresTest, AModuleThatIsNoTranslatorIsReportedWhenItIsAsked) {
         XlatorInterface* xlator = host.create(host.registration("chunk"), &creation);
         ASSERT_NE(nullptr, xlator) << script;
         qierr::Status first;
-        EXPECT_EQ(nullptr, xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &first));
+        EXPECT_EQ(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &first), nullptr);
         expectReport(first, ".*attempt to (index|call).*", "failed to get static desc\"");
         qierr::Status second;
-        EXPECT_EQ(nullptr, xlator->getDynamicDesc(xlator, "{}", 0, "json1", qixlator_realloc,
-                                                  nullptr, &second));
+        EXPECT_EQ(
+            xlator->getDynamicDesc(xlator, "{}", 0, "json1", qixlator_realloc, nullptr, &second),
+            nullptr);
         expectReport(second, ".*attempt to (index|call).*", "failed to get dynamic desc\"");
         xlator->destroy(xlator);
     }

@@ -26,7 +26,7 @@ class ScriptHost {
         return qixlatorlua::createLuaXlator("test_name", registrationInfo.c_str(), runtime, status);
     }
 
-    // What a translator that consists of this chunk describes the code -1 with: the text that the
+    // The description of the code -1 by a translator that consists of this chunk: the text that the
     // chunk returns. "(null)" when there is none.
     std::string run(const std::string& chunk, qierr_Status* status) const {
         write("chunk", "return { getStaticDesc = function(code, lang, ade)\n" + chunk + "\nend }");

@@ -1,4 +1,4 @@
-"""The written rules about which folder may know which."""
+"""The written rules about which folder may include which."""
 
 import pathlib
 import re
@@ -18,7 +18,7 @@ FLOORS = [
     {"qitrmcwebsvc"},
     {"qitrmcwebsvc/procedure"},
 ]
-# The factory makes the procedures, so it alone looks up.
+# The factory creates the procedures, so it alone includes from the floor above.
 ALLOWED_UPWARDS = {("qitrmcwebsvc/ProcedureFactory.cpp", "qitrmcwebsvc/procedure")}
 
 
@@ -55,7 +55,7 @@ def test_includes_of_the_plug_in_point_downwards():
     assert faults == []
 
 
-def test_the_plug_in_does_not_know_the_simulator_or_the_host():
+def test_the_plug_in_does_not_include_the_simulator_or_the_host():
     known = {path.name for folder in ("simulator", "host") for path in sources(folder)}
     own = {path.name for path in sources("src")}
     for path in sources("src"):
@@ -64,7 +64,7 @@ def test_the_plug_in_does_not_know_the_simulator_or_the_host():
             assert header in own or header not in known - own, f"{path} includes {header}"
 
 
-def test_the_simulator_and_the_host_know_the_plug_in_through_the_c_headers_only():
+def test_the_simulator_and_the_host_include_only_the_c_headers_of_the_plug_in():
     folders = set().union(*FLOORS)
     for folder in ("simulator", "host"):
         for path in sources(folder):

@@ -1,4 +1,4 @@
-"""The documents and the texts of the statuses name the methods as the service knows them."""
+"""The documents and the texts of the statuses name the methods exactly as the service does."""
 
 import pathlib
 import re
@@ -17,9 +17,9 @@ PAGES = ["README.md", "simulator/README.md", *sorted(
     str(path.relative_to(ROOT)) for path in (ROOT / "docs").glob("*.*") if path.suffix in (".md", ".json"))]
 TEXTS = ["share/statuses/catalogue.tsv", "share/statuses/driver.tsv", "simulator/status/statuses.tsv"]
 
-# In a text of any language: a name may stand between letters of another script.
+# In a text of any language: a name may be next to letters of another script.
 NAME = re.compile(r"[A-Za-z]+")
-# A word of this form is meant as the name of a method or of a function.
+# A word of this form is taken for the name of a method or of a function.
 CALL = re.compile(r"(?:abort|close|commit|connect|disconnect|execute|[Gg]et|initialize|read|rename"
                   r"|reserve|reset|[Ss]et|unreserve|write)[A-Z]\w*")
 QUOTED = re.compile(r"`([A-Za-z]+)`")
@@ -45,7 +45,7 @@ def test_there_are_26_methods_of_which_one_begins_with_a_capital():
 
 
 @pytest.mark.parametrize("name", PAGES + TEXTS)
-def test_no_method_is_written_in_other_letters(name):
+def test_no_method_is_written_in_another_letter_case(name):
     """Pages may write a method's name in small letters in links to their sections."""
     text = re.sub(r"\(#\w+\)|#\w+", "", text_of(name))
     wrong = {word for word in NAME.findall(text)

@@ -1,5 +1,5 @@
 """A small reader of explanation files and the searches of the two translators, written from the
-rules of the files and not from the program that reads them."""
+rules of the files, independently of the program that reads them."""
 
 import re
 
@@ -7,7 +7,7 @@ NUMBER = re.compile(rb"\s*([-+]?)(0[xX][0-9a-fA-F]+|0[0-7]*|[1-9][0-9]*)")
 
 
 class BadFile(Exception):
-    """What stops the search of a whole directory."""
+    """An error that stops the search of a whole directory."""
 
 
 def lines_of(path):
@@ -75,7 +75,7 @@ def find_in_errors(shared, language, wanted):
 
 
 def default_translator(shared, language, wanted):
-    """The words of a status without details; None where the translation fails."""
+    """The text of a status without details; None where the translation fails."""
     for attempt in (language, "English"):
         try:
             if text := find_in_errors(shared, attempt, wanted):
@@ -86,7 +86,7 @@ def default_translator(shared, language, wanted):
 
 
 def mxlator(shared, language, wanted):
-    """The words of a status with details."""
+    """The text of a status with details."""
     own = shared / "mierrors" / "qitrmc"
     searches = [lambda: find_in_directory(own / language, wanted),
                 lambda: find_in_directory(own / "English", wanted),

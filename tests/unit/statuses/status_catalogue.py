@@ -43,7 +43,7 @@ TEXTS = gather_texts()
 
 
 def explanation(code, language):
-    """Return the words that a client must find in front of the details."""
+    """Return the text that a client must find in front of the details."""
     return GAPS[language].join(TEXTS[code][language])
 
 

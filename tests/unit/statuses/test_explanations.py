@@ -1,5 +1,5 @@
-"""The explanation files have the form of their reader and give words on the roads of both
-translators."""
+"""The explanation files have the form that their reader expects, and both translators find the
+texts in them."""
 
 import re
 import xml.etree.ElementTree
@@ -12,7 +12,7 @@ from explanation_reader import blocks_of, default_translator, lines_of, mxlator
 NAMES = sorted(name for folder in FOLDERS.values()
                for name in (f"errors/{folder}/qitrmc.txt", f"errors/{folder}/qitrmcsim.txt",
                             f"mierrors/qitrmc/{folder}/qitrmc.txt"))
-# Codes of numbers that belong to everybody; files of other products may explain them as well.
+# Codes with common numbers, which files of other products may explain as well.
 COMMON = [-32700, -32600, -32601, -32602, -32603, -32000, -32001,
           -52000, -52003, -52005, -52006, -52008, -52029]
 
@@ -43,7 +43,7 @@ def test_a_file_consists_of_the_expected_lines_only(shared, name):
 
 
 @pytest.mark.parametrize("name", NAMES)
-def test_no_line_is_longer_than_the_reader_takes_at_once(shared, name):
+def test_no_line_is_longer_than_the_buffer_of_the_reader(shared, name):
     assert all(line.endswith(b"\n") for line in lines_of(shared / name))
 
 
@@ -55,21 +55,21 @@ def test_a_file_opens_in_an_editor_for_xml(shared, name):
 
 
 @pytest.mark.parametrize("code", TEXTS)
-def test_a_status_without_details_gets_its_words(shared, language, code):
+def test_a_status_without_details_gets_its_text(shared, language, code):
     assert default_translator(shared, FOLDERS[language], code) == explanation(code, language)
 
 
 @pytest.mark.parametrize("code", TEXTS)
-def test_a_status_with_details_gets_its_words(shared, language, code):
+def test_a_status_with_details_gets_its_text(shared, language, code):
     assert mxlator(shared, FOLDERS[language], code) == explanation(code, language)
 
 
-def test_an_unknown_code_gets_no_words_of_others(shared):
+def test_an_unknown_code_gets_no_text_of_another_code(shared):
     assert default_translator(shared, "German", -1) is None
     assert mxlator(shared, "German", -1) == "Error description not found"
 
 
-def test_no_code_stands_twice_among_the_shared_errors(shared, language):
+def test_no_code_occurs_twice_among_the_shared_errors(shared, language):
     folder = shared / "errors" / FOLDERS[language]
     codes = codes_in(folder / "qitrmc.txt") + codes_in(folder / "qitrmcsim.txt")
     assert sorted(codes) == sorted(TEXTS)

@@ -1,4 +1,4 @@
-"""No source raises or names a code that has no words."""
+"""No source raises or names a code without a text."""
 
 import re
 import subprocess
@@ -10,7 +10,7 @@ from status_catalogue import CATALOGUE, ROOT, TEXTS
 
 SOURCES = ("src", "simulator", "host", "include")
 SUFFIXES = {".c", ".cpp", ".def", ".h", ".lua", ".py"}
-# Numbers of the ranges that the codes are taken from; the limits of 16 bits are no codes.
+# Numbers in the ranges that the codes are taken from; the limits of 16 bits are not codes.
 CODE = re.compile(r"(?<![\w.])-\s?((?:320|326|327)\d\d|250[89]\d\d|52\d\d\d)(?![\w.]*\d)")
 NO_CODES = {32767, 32768}
 
@@ -37,7 +37,7 @@ def test_the_scan_finds_codes_and_nothing_else(text, codes):
 
 
 @pytest.mark.parametrize("folder", SOURCES)
-def test_every_code_in_the_sources_has_its_words(folder):
+def test_every_code_in_the_sources_has_its_texts(folder):
     files = source_files(ROOT / folder)
     assert files
     unexplained = [(str(path.relative_to(ROOT)), code) for path in files

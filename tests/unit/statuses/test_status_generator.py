@@ -1,4 +1,4 @@
-"""The generator refuses faulty tables and says where and what is wrong."""
+"""The generator refuses faulty tables and reports where and what is wrong."""
 
 import shutil
 
@@ -36,7 +36,7 @@ class Project:
         (self.root / name).write_text("\n".join(lines) + "\n", encoding="utf-8")
 
     def refusal(self):
-        """Run the generator, which must fail and write nothing, and return what it says."""
+        """Run the generator, which must fail and write nothing, and return its message."""
         result = generate("--shared", self.root / "out", "--page", self.root / "page.md",
                           generator=self.root / "share/statuses/make_explanations.py")
         assert result.returncode == 1
@@ -73,7 +73,7 @@ def test_a_faulty_cell_is_named_with_its_line(project, column, value, fault):
     assert f"{CATALOGUE}:3: {fault}" in project.refusal()
 
 
-def test_a_code_that_stands_twice_is_named_with_both_places(project):
+def test_a_repeated_code_is_named_with_both_places(project):
     project.change_cell(CATALOGUE, 4, "code", "-32700")
     assert project.refusal() == [
         f"{CATALOGUE}:4: code -32700 stands already at {CATALOGUE}:2"]
@@ -87,7 +87,7 @@ def test_a_code_of_both_tables_is_named_with_both_places(project):
         f"{SIMULATOR}:{line}: code -250950 stands already at {CATALOGUE}:4"]
 
 
-def test_a_constant_that_stands_twice_is_named_with_both_places(project):
+def test_a_repeated_constant_is_named_with_both_places(project):
     project.change_cell(CATALOGUE, 4, "constant", "parseError")
     assert project.refusal() == [
         f"{CATALOGUE}:4: constant parseError stands already at {CATALOGUE}:2"]

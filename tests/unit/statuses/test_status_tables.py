@@ -1,4 +1,4 @@
-"""The tables hold every code once, with good texts in every language."""
+"""The tables contain every code once, with well-formed texts in every language."""
 
 import re
 import unicodedata
@@ -8,7 +8,7 @@ import pytest
 from status_catalogue import CATALOGUE, DRIVER, FOLDERS, SIMULATOR, TEXTS
 
 # The codes that the service is known to raise, and the constants of the platform codes, which
-# stand in the details of failures.
+# appear in the details of failures.
 SERVICE_CODES = [
     -32700, -32600, -32601, -32602, -32603, -32000, -32001,
     -250800, -250801, -250812, -250819, -250828, -250829, -250832, -250833, -250860, -250901,
@@ -25,7 +25,7 @@ PLATFORM_CONSTANTS = {
 LITERAL = re.compile(r'"[^"]+"|[A-Z][a-z]+\.[A-Za-z.]*[a-z]|[a-z]+_[a-z_]+|[a-z]+[A-Z]\w+|'
                      r"\b(?:JSON-RPC|JSON|UTF-8|NVMEM|ReadOnly|ReadWrite)\b|\d+")
 
-# How the word of the first column is rendered wherever an English text holds it, as in the terms.
+# How the word of the first column is translated wherever an English text contains it.
 GLOSSARY = """
 array       tableau         array           配列         배열       数组
 chassis     châssis         chassis         シャーシ     섀시       机箱
@@ -53,7 +53,7 @@ def texts_in(language):
             yield code, text
 
 
-def test_no_code_and_no_constant_stands_twice():
+def test_no_code_and_no_constant_occurs_twice():
     codes = [row["code"] for row in CATALOGUE + SIMULATOR]
     assert sorted(codes) == sorted(set(codes))
     constants = [row["constant"] for row in CATALOGUE]
@@ -64,12 +64,12 @@ def test_every_code_of_the_simulated_driver_has_its_translations():
     assert {row["code"] for row in DRIVER} == {row["code"] for row in SIMULATOR}
 
 
-def test_the_codes_of_the_service_are_all_there():
+def test_the_codes_of_the_service_are_complete():
     rows = [row for row in CATALOGUE if row["raiser"] in ("json-rpc", "service")]
     assert sorted(int(row["code"]) for row in rows) == sorted(SERVICE_CODES)
 
 
-def test_the_platform_codes_are_all_there_under_their_constants():
+def test_the_platform_codes_are_complete_and_have_their_constants():
     rows = [row for row in CATALOGUE if row["raiser"] == "platform"]
     assert {int(row["code"]): row["constant"] for row in rows} == PLATFORM_CONSTANTS
 
@@ -80,7 +80,7 @@ def test_every_code_has_two_texts_in_every_language():
         assert all(happened and remedy for happened, remedy in texts.values()), code
 
 
-def test_what_happened_tells_the_codes_apart():
+def test_the_first_sentence_is_different_for_each_code():
     for language in FOLDERS:
         for rows in (CATALOGUE, DRIVER):
             happened = [TEXTS[int(row["code"])][language][0] for row in rows]
@@ -154,7 +154,7 @@ def test_chinese_texts_hold_no_kana():
 
 
 @pytest.mark.parametrize("entry", GLOSSARY.strip().split("\n"), ids=lambda entry: entry.split()[0])
-def test_a_word_is_rendered_alike_everywhere(entry):
+def test_a_word_is_translated_the_same_everywhere(entry):
     english, *renderings = entry.split()
     uses = [(code, texts) for code, texts in TEXTS.items()
             if re.search(rf"\b{english}s?\b", LITERAL.sub("", " ".join(texts["eng"])), re.I)]

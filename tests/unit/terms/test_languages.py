@@ -18,7 +18,7 @@ def words_in(path, start, end):
     return re.findall(r'"([A-Za-z]+)"', text.split(start, 1)[1].split(end, 1)[0])
 
 
-def test_the_numbers_count_from_english_on():
+def test_the_numbers_are_consecutive_and_begin_with_english():
     assert [language.number for language in LANGUAGES] == list(range(len(LANGUAGES)))
     assert (LANGUAGES[0].word, LANGUAGES[0].folder) == ("eng", "English")
 
@@ -29,17 +29,17 @@ def test_no_name_is_used_twice(column):
     assert len(set(names)) == len(names)
 
 
-def test_the_script_numbers_the_words_as_the_table():
+def test_the_script_numbers_the_words_like_the_table():
     assert words_in("src/qimxl/mxlator.lua", "ThreeLetterLngStrings = {", "}") == list(WORDS)
 
 
-def test_the_script_knows_the_folder_of_each_word():
+def test_the_script_has_the_folder_of_each_word():
     source = (ROOT / "src/qimxl/qimxl_utilities.lua").read_text(encoding="utf-8")
     names = dict(re.findall(r'^    ([a-z]{3}) = "(\w+)",$', source, re.MULTILINE))
-    del names["zzz"]  # the language of texts that nobody translates
+    del names["zzz"]  # the language of texts that are not translated
     assert names == {language.word: language.folder for language in LANGUAGES}
 
 
-def test_the_reader_of_explanation_files_numbers_the_folders_as_the_table():
+def test_the_reader_of_explanation_files_numbers_the_folders_like_the_table():
     folders = words_in("src/qixlator/qvErrorsParser.cpp", "languageDirectories[] = {", "}")
     assert folders == [language.folder for language in LANGUAGES]

@@ -38,7 +38,7 @@ def run_lua(folder, script):
 
 
 @pytest.mark.parametrize("language", LANGUAGES)
-def test_a_dictionary_answers_each_key_in_lua(tmp_path, language):
+def test_a_dictionary_has_the_text_of_each_key_in_lua(tmp_path, language):
     generate(language, tmp_path / f"commonTerms_{language}.lua")
     keys = sorted(TERMS_BY_KEY)
     (tmp_path / "keys").write_text("\n".join(keys))
@@ -132,7 +132,7 @@ def test_quotes_and_backslashes_reach_lua_unchanged(tables):
     (USAGE_ROW + "reviewed", "unknown remark 'reviewed'"),
     (USAGE_ROW + "english-only", "fra must be empty in an english-only row"),
 ])
-def test_a_faulty_row_is_told_with_file_and_line(tables, row, fault):
+def test_a_faulty_row_is_reported_with_file_and_line(tables, row, fault):
     write_table(tables, "usage_general.tsv", USAGE_ROW.replace("Gain\tGain", "Range\tRange"), row)
     assert f"{tables / 'usage_general.tsv'}:3: {fault}\n" in message_about(tables)
 
@@ -143,7 +143,7 @@ def test_an_auxiliary_term_cannot_be_english_only(tables):
         f"{tables / 'aux_family.tsv'}:2: only usage types may be english-only\n")
 
 
-def test_a_key_in_two_tables_is_told_with_both_places(tables):
+def test_a_key_in_two_tables_is_reported_with_both_places(tables):
     write_table(tables, "usage_general.tsv", USAGE_ROW)
     write_table(tables, "usage_family.tsv", USAGE_ROW)
     assert message_about(tables) == (
@@ -151,31 +151,31 @@ def test_a_key_in_two_tables_is_told_with_both_places(tables):
         f"{tables / 'usage_general.tsv'}:2\n")
 
 
-def test_all_faults_are_told_at_once(tables):
+def test_all_faults_are_reported_at_once(tables):
     write_table(tables, "usage_general.tsv", USAGE_ROW + "x", USAGE_ROW + "y")
     (tables / "aux_general.tsv").write_text("key\teng\n")
     assert message_about(tables).count("\n") == 4
 
 
-def test_bytes_that_are_not_utf_8_are_told_with_file_and_line(tables):
+def test_bytes_that_are_not_utf_8_are_reported_with_file_and_line(tables):
     (tables / "aux_general.tsv").write_bytes("\t".join(HEADER).encode() + b"\nkAux\xff\n")
     assert message_about(tables) == (
         f"{tables / 'aux_general.tsv'}:2: not UTF-8 at byte 5 of the line\n")
 
 
-def test_a_wrong_header_is_told(tables):
+def test_a_wrong_header_is_reported(tables):
     (tables / "aux_family.tsv").write_text("key\teng\tfra\n")
     assert message_about(tables) == (
         f"{tables / 'aux_family.tsv'}:1: the header must name the columns "
         "key, eng, fra, deu, jpn, kor, chs, remark\n")
 
 
-def test_a_missing_table_is_told(tables):
+def test_a_missing_table_is_reported(tables):
     (tables / "aux_family.tsv").unlink()
     assert message_about(tables) == f"{tables / 'aux_family.tsv'}: No such file or directory\n"
 
 
-def test_an_output_that_cannot_be_written_is_told(tables):
+def test_an_output_that_cannot_be_written_is_reported(tables):
     output = tables / "missing" / "out.lua"
     result = generate("eng", output, tables)
     assert (result.returncode, result.stderr) == (1, f"{output}: No such file or directory\n")

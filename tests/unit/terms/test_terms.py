@@ -1,4 +1,4 @@
-"""The term tables hold what the service needs, in good form in every language."""
+"""The term tables contain what the service needs, well-formed in every language."""
 
 import re
 import unicodedata
@@ -49,7 +49,7 @@ def test_57_usage_types_of_the_family_are_english_only():
     assert ENGLISH_ONLY <= {row["key"] for row in ROWS["usage_family.tsv"]}
 
 
-def test_every_text_is_there_except_translations_of_english_only_keys():
+def test_only_translations_of_english_only_keys_are_missing():
     for row in ALL_ROWS:
         assert row["eng"], row["key"]
         for language in LANGUAGES[1:]:
@@ -105,7 +105,7 @@ def test_each_tag_and_phrase_of_the_simulated_driver_has_a_term():
 
 
 @pytest.mark.parametrize("key", FIXED_TEXTS)
-def test_fixed_texts_stand_as_they_must(key):
+def test_fixed_texts_are_unchanged(key):
     assert TERMS_BY_KEY[key]["eng"] == FIXED_TEXTS[key]
 
 
@@ -113,7 +113,7 @@ def test_fixed_texts_stand_as_they_must(key):
 
 ABBREVIATIONS = {"DC", "DMA", "DNS", "FIFO", "FPGA", "ID", "IP", "MAC", "NVMEM", "URL", "UTF"}
 
-# How the word of the first column is rendered wherever an English text holds it.
+# How the word of the first column is translated wherever an English text contains it.
 GLOSSARY = """
 attribute       attribut         attribut       属性       속성       特性
 buffer          tampon           puffer         バッファ   버퍼       缓冲区
@@ -179,7 +179,7 @@ def test_phrases_end_as_their_english_text_does(language, sentence_end, header_e
 
 
 @pytest.mark.parametrize("language", LANGUAGES[1:])
-def test_labels_do_not_end_as_phrases(language):
+def test_labels_do_not_end_like_phrases(language):
     for key, text in own_texts(language):
         assert key.startswith("kAuxTerm") or text[-1] not in ".:。：", (key, text)
 
@@ -214,7 +214,7 @@ def test_chinese_texts_hold_no_kana():
 
 
 @pytest.mark.parametrize("entry", GLOSSARY.strip().split("\n"), ids=lambda entry: entry.split()[0])
-def test_a_word_is_rendered_alike_everywhere(entry):
+def test_a_word_is_translated_the_same_everywhere(entry):
     english, *renderings = entry.split()
     uses = [row for row in ALL_ROWS
             if row["fra"] and re.search(rf"\b{english}s?\b", row["eng"], re.IGNORECASE)]
