@@ -205,32 +205,32 @@ TEST_F(MxlatorTest, AnAttributeIdThatIsNoFiniteNumberIsNotShownAs0x8000000000000
     for (const char* id : {"nan", "inf", "-inf", "INFINITY", "nan(7)", "1e999"}) {
         const std::string text =
             usageItem(usage("kUsageTypeAttributeId", "\"" + std::string(id) + "\"", "\"x\""));
-        EXPECT_EQ("|" + std::string(id) + "\n", text.substr(text.rfind('|')));
+        EXPECT_EQ(text.substr(text.rfind('|')), "|" + std::string(id) + "\n");
         EXPECT_EQ(
-            "usage|x|3\n",
-            usageItem(usage("x", "3", "{\"type\":\"enum\",\"id\":\"" + std::string(id) + "\"}")));
+            usageItem(usage("x", "3", "{\"type\":\"enum\",\"id\":\"" + std::string(id) + "\"}")),
+            "usage|x|3\n");
     }
     const std::string infinite = usageItem(usage("kUsageTypeAttributeId", "1e999", "\"x\""));
-    EXPECT_EQ("|inf\n", infinite.substr(infinite.rfind('|')));
+    EXPECT_EQ(infinite.substr(infinite.rfind('|')), "|inf\n");
 }
 
 TEST_F(MxlatorTest, AWholeNumberIsNotShownWithAnExponent) {
     for (const char* number :
          {"0", "-17", "100000000000000", "123456789012345", "1000000000000000", "9007199254740991",
           "9007199254740992", "-9007199254740991", "-9007199254740992"}) {
-        EXPECT_EQ("usage|x|" + std::string(number) + "\n",
-                  usageItem(usage("x", number, "\"uint64_t\"")));
+        EXPECT_EQ(usageItem(usage("x", number, "\"uint64_t\"")),
+                  "usage|x|" + std::string(number) + "\n");
     }
-    EXPECT_EQ("usage|x|[\"9007199254740991\",\"1\"]\n",
-              usageItem(usage("x", "[9007199254740991,1]", "\"uint64_t\"")));
-    EXPECT_EQ("usage|x|9007199254740991\n",
-              usageItem(usage("x", "9007199254740991", "{\"type\":\"enum\",\"id\":9}")));
+    EXPECT_EQ(usageItem(usage("x", "[9007199254740991,1]", "\"uint64_t\"")),
+              "usage|x|[\"9007199254740991\",\"1\"]\n");
+    EXPECT_EQ(usageItem(usage("x", "9007199254740991", "{\"type\":\"enum\",\"id\":9}")),
+              "usage|x|9007199254740991\n");
 }
 
 TEST_F(MxlatorTest, ANumberThatTheDecoderHasRoundedIsShownRounded) {
-    EXPECT_EQ("usage|x|1.844674407371e+19\n",
-              usageItem(usage("x", "18446744073709551615", "\"uint64_t\"")));
-    EXPECT_EQ("usage|x|0.5\n", usageItem(usage("x", "0.5", "\"double\"")));
+    EXPECT_EQ(usageItem(usage("x", "18446744073709551615", "\"uint64_t\"")),
+              "usage|x|1.844674407371e+19\n");
+    EXPECT_EQ(usageItem(usage("x", "0.5", "\"double\"")), "usage|x|0.5\n");
 }
 
 TEST_F(MxlatorTest, AnEnumWithoutANameIsShownAsItsValue) {

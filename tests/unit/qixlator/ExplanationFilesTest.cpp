@@ -129,21 +129,21 @@ TEST_F(ExplanationFilesTest, CodesMayBeHexadecimal) {
 
 TEST_F(ExplanationFilesTest, ANumberBeyondACodeDoesNotWrapToOne) {
     for (const char* number : {"0xFFFC2C40", "4294716480", "-4295218112", "0x1FFFFFFFFFFFC2C40"}) {
-        EXPECT_EQ("", inFile(document(block(number, "Wrong.\n")), -250816)) << number;
+        EXPECT_EQ(inFile(document(block(number, "Wrong.\n")), -250816), "") << number;
     }
     for (const char* number : {"4294967295", "0xFFFFFFFFFFFFFFFF", "99999999999999999999"}) {
-        EXPECT_EQ("", inFile(document(block(number, "Wrong.\n")), -1)) << number;
+        EXPECT_EQ(inFile(document(block(number, "Wrong.\n")), -1), "") << number;
     }
-    EXPECT_EQ("", inFile(document(block("-99999999999999999999", "Wrong.\n")), 0));
-    EXPECT_EQ("", inFile(document(block("2147483648", "Wrong.\n")), INT32_MIN));
-    EXPECT_EQ("", inFile(document(block("-2147483649", "Wrong.\n")), INT32_MAX));
-    EXPECT_EQ(0, status.code);
+    EXPECT_EQ(inFile(document(block("-99999999999999999999", "Wrong.\n")), 0), "");
+    EXPECT_EQ(inFile(document(block("2147483648", "Wrong.\n")), INT32_MIN), "");
+    EXPECT_EQ(inFile(document(block("-2147483649", "Wrong.\n")), INT32_MAX), "");
+    EXPECT_EQ(status.code, 0);
 }
 
 TEST_F(ExplanationFilesTest, TheFirstAndTheLastCodeAreFound) {
-    EXPECT_EQ("Text.", inFile(document(block("-2147483648", "Text.\n")), INT32_MIN));
-    EXPECT_EQ("Text.", inFile(document(block("-0x80000000", "Text.\n")), INT32_MIN));
-    EXPECT_EQ("Text.", inFile(document(block("0x7FFFFFFF", "Text.\n")), INT32_MAX));
+    EXPECT_EQ(inFile(document(block("-2147483648", "Text.\n")), INT32_MIN), "Text.");
+    EXPECT_EQ(inFile(document(block("-0x80000000", "Text.\n")), INT32_MIN), "Text.");
+    EXPECT_EQ(inFile(document(block("0x7FFFFFFF", "Text.\n")), INT32_MAX), "Text.");
 }
 
 TEST_F(ExplanationFilesTest, TheRestOfATagLineIsIgnored) {
