@@ -20,7 +20,7 @@ import urllib.parse
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
 BUILD_DIR = pathlib.Path(os.environ.get("QITRMC_BUILD_DIR", ROOT / "build" / "dev")).resolve()
-# A plug-in that answers with what it was asked.
+# A plug-in that answers with what it received.
 TEST_PLUGIN = BUILD_DIR / "lib" / "libhost_test_plugin.so"
 
 # Far more than anything here takes: it only ends a test that would otherwise hang.
@@ -108,7 +108,7 @@ class Host:
             connection.close()
 
     def post(self, body, entry="Call", headers=None):
-        """POST of bytes to an entry, which is put into the path as it stands."""
+        """POST of bytes to an entry, which is put into the path unchanged."""
         return self.request("POST", f"/qitrmc/{entry}", body, headers)
 
     def connection(self):

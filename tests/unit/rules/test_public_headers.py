@@ -13,7 +13,7 @@ def code_of(header):
     return re.sub(r"/\*.*?\*/|//[^\n]*", "", header.read_text(), flags=re.DOTALL)
 
 
-def test_public_headers_take_their_types_from_stdint_alone():
+def test_public_headers_use_only_the_types_of_stdint():
     known = {"stdint.h"} | {header.name for header in HEADERS}
     for header in HEADERS:
         included = re.findall(r'^\s*#\s*include\s*["<]([^">]+)[">]', code_of(header), re.MULTILINE)

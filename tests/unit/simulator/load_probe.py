@@ -54,7 +54,7 @@ class LoadProbe:
 
     def load(self, description):
         """None when a description (bytes, text, or a value to be written as JSON) loads, else the
-        JSON pointer of the fault and its words."""
+        JSON pointer of the fault and its message."""
         if not isinstance(description, (bytes, str)):
             description = json.dumps(description)
         if isinstance(description, str):

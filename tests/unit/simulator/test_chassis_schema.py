@@ -1,6 +1,6 @@
-"""Holds the JSON Schema of chassis files and the loader together: what the schema refuses the
-loader refuses, and what the schema takes the loader takes, except for the rules that a schema
-cannot tell."""
+"""Compares the JSON Schema of chassis files with the loader: the loader refuses what the schema
+refuses, and accepts what the schema accepts, except for the rules that a schema cannot
+express."""
 
 import json
 import re
@@ -22,8 +22,8 @@ VALIDATOR = jsonschema.Draft7Validator(SCHEMA)
 SETTINGS = settings(deadline=None, database=None, derandomize=True,
                     suppress_health_check=list(HealthCheck))
 
-# What the loader says where a description follows the schema and is wrong all the same, by the
-# rule. They match the JSON pointer, a blank, and the words.
+# What the loader reports where a description follows the schema but is still wrong, by rule. The
+# patterns match the JSON pointer, a blank, and the message.
 BEYOND_A_SCHEMA = {
     "names differ": r'and there is a device "|has a channel or an area of this name already',
     "names have 64 bytes": r"a name has at most 64 bytes",
@@ -71,7 +71,7 @@ def assert_agreement(probe, description):
 
 
 def members_described(node, path="schema"):
-    """Every place of the schema that tells of a member must have a description."""
+    """Every place of the schema that defines a member must have a description."""
     if isinstance(node, list):
         for item in node:
             yield from members_described(item, path)
@@ -291,7 +291,7 @@ def nested(depth):
     return {"code": 1, **({"causes": [nested(depth - 1)]} if depth else {})}
 
 
-# A description for each rule that a schema cannot tell.
+# A description for each rule that a schema cannot express.
 ONLY_LOADED = {
     "names differ": {"devices": [{"name": "A", "category": 2}, {"name": "a", "category": 2}]},
     "names have 64 bytes": device(name="ä" * 33),

@@ -29,13 +29,13 @@ NESTED = {"code": -9, "causes": [{"code": -8, "details": [{"header": "kA"}]}]}
 
 
 class Fault:
-    """members: of the faults file. trace: a pattern of what the trace shows of a call that it
-    struck. strikes: a pattern of the parameters of the functions that it can strike."""
+    """members: of the faults file. trace: a pattern of the trace line of a call that it
+    affected. parameters: a pattern of the parameters of the functions that it can affect."""
 
-    def __init__(self, members, trace, strikes=""):
+    def __init__(self, members, trace, parameters=""):
         self.members = members
         self.trace = trace
-        self.strikes = strikes
+        self.parameters = parameters
 
 
 TEXT, TEXTS, ARRAY = r"char\*\* ", r"char\*\*\* ", r"\*\* array"
@@ -59,7 +59,7 @@ KINDS = {
 }
 CASES = [(function, kind) for function, parameters in PARAMETERS.items()
          if function not in UNREACHED
-         for kind, fault in KINDS.items() if re.search(fault.strikes, parameters)]
+         for kind, fault in KINDS.items() if re.search(fault.parameters, parameters)]
 
 # The built-in chassis, in which Mod1 has a property of each type that can be written.
 VALUES = {"Bool": True, "Double": 0.5, "Int32": -1, "Int64": -1, "String": "a", "UInt32": 1,
@@ -201,17 +201,17 @@ def test_the_requests_lead_to_every_function_but_those_that_no_method_calls(lead
 
 
 @pytest.mark.parametrize("function, kind", CASES)
-def test_every_fault_of_every_function_strikes_and_is_answered(faulty, client, leading_to, function,
+def test_every_fault_of_every_function_applies_and_is_answered(faulty, client, leading_to, function,
                                                                kind):
     fault = KINDS[kind]
     calls = [line for wanted in leading_to[function]
              for line in calls_behind(faulty, client, wanted,
                                       {"faults": [{"function": function, **fault.members}]})
              if line.startswith(f"{function}(") and f" -> {SESSION_ENDED} " not in line]
-    struck = [line for line in calls if re.search(fault.trace, line)]
-    assert struck
+    affected = [line for line in calls if re.search(fault.trace, line)]
+    assert affected
     # Arrays without elements have no texts that could be replaced.
-    assert struck == calls or kind in ("null_items", "huge_text", "many_null_items")
+    assert affected == calls or kind in ("null_items", "huge_text", "many_null_items")
     with client.session() as session:
         assert devices(client, session) == NAMES
 
