@@ -6,7 +6,7 @@
 #include <utility>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcsharedcmn/resourceNames.h"
+#include "qitrmcsharedcmn/parseUtilities.h"
 #include "qitrmcwebsvc/DriverOwners.h"
 #include "qitrmcwebsvc/findMember.h"
 #include "qitrmcwebsvc/foldedText.h"

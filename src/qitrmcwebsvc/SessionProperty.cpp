@@ -3,7 +3,7 @@
 #include <string_view>
 #include <utility>
 
-#include "qitrmcsharedcmn/resourceNames.h"
+#include "qitrmcsharedcmn/parseUtilities.h"
 #include "qitrmcwebsvc/callDriver.h"
 #include "qitrmcwebsvc/invalidParams.h"
 

@@ -3,7 +3,7 @@
 
 #include "harnesses.h"
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcsharedcmn/resourceNames.h"
+#include "qitrmcsharedcmn/parseUtilities.h"
 
 namespace {
 

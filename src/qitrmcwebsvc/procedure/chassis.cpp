@@ -1,8 +1,8 @@
 #include "qitrmcwebsvc/procedure/chassis.h"
 
 #include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/ResourceUtility.h"
 #include "qitrmcwebsvc/SessionProperty.h"
-#include "qitrmcwebsvc/deviceCategory.h"
 
 namespace nQITRMCWEBSVC100 {
 namespace {

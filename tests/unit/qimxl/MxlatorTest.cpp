@@ -6,7 +6,7 @@
 #include "jsonz/jsonz.h"
 #include "qierr/Writer.h"
 #include "qixlator/Registration.h"
-#include "qixlator/exportedXlators.h"
+#include "qixlator/exported.h"
 #include "qixlator/json1.h"
 #include "qixlator/jsonText.h"
 #include "qixlator/qixlator.h"

@@ -5,7 +5,7 @@
 #include <string>
 
 #include "qitrmcsharedcmn/Exceptions.h"
-#include "qitrmcsharedcmn/resourceNames.h"
+#include "qitrmcsharedcmn/parseUtilities.h"
 
 namespace shared_test {
 

@@ -1,4 +1,4 @@
-#include "qitrmcwebsvc/deviceCategory.h"
+#include "qitrmcwebsvc/ResourceUtility.h"
 
 #include "qierr/Exception.h"
 #include "support/ProcedureFixture.h"

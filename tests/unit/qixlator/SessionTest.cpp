@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "TestXlator.h"
-#include "qixlator/exportedXlators.h"
+#include "qixlator/exported.h"
 #include "qixlator/qixlator.h"
 #include "support/FaultyAllocator.h"
 #include "support/TestRoot.h"

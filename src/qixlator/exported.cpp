@@ -1,4 +1,4 @@
-#include "qixlator/exportedXlators.h"
+#include "qixlator/exported.h"
 
 #include "qixlator/Registration.h"
 #include "qixlator/reportFailure.h"

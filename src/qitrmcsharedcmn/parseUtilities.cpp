@@ -1,4 +1,4 @@
-#include "qitrmcsharedcmn/resourceNames.h"
+#include "qitrmcsharedcmn/parseUtilities.h"
 
 #include <rapidjson/encodings.h>
 #include <rapidjson/memorystream.h>

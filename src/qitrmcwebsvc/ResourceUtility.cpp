@@ -1,4 +1,4 @@
-#include "qitrmcwebsvc/deviceCategory.h"
+#include "qitrmcwebsvc/ResourceUtility.h"
 
 #include "qitrmcwebsvc/SessionProperty.h"
 #include "qitrmcwebsvc/invalidParams.h"
