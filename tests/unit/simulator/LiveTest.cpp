@@ -427,7 +427,7 @@ TEST_F(LiveTest, AnEventThatIsOverAtTheEndOfACommandEndsIt) {
     EXPECT_EQ(status.code, -250941);
 }
 
-TEST_F(LiveTest, AFaultStrikesAndCountsTheCallsOfItsTime) {
+TEST_F(LiveTest, AFaultAppliesToAndCountsTheCallsOfItsTime) {
     const auto codesWith = [&](const std::string& members) {
         const FaultsInForce faults(
             oneFault("\"function\":\"abortSession\",\"status\":{\"code\":-77}," + members));

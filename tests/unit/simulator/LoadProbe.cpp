@@ -1,7 +1,7 @@
 // Reads chassis descriptions, or with the argument "faults" descriptions of faults in the built-in
-// chassis, from standard input, each as its length in decimal digits, a newline
-// and so many bytes, and answers each with a line: "loaded", or the place of the fault as a JSON
-// pointer, a tabulator, what is wrong, "; " and what would be right.
+// chassis, from standard input, each as its length in decimal digits, a newline and that many
+// bytes, and answers each with a line: "loaded", or the JSON pointer of the fault, a tabulator,
+// what is wrong, "; " and what would be right.
 
 #include <cstdio>
 #include <iostream>

@@ -90,8 +90,8 @@ class Client {
         EXPECT_NE(status.code, -250951) << status.text();
     }
 
-    // Until it is closed, or closed already: faults keep sessions open, and so does another client
-    // that aborts a delayed close.
+    // Repeats until the session is closed, because faults keep sessions open, and so does another
+    // client that aborts a delayed close.
     static void close(Handle session) {
         int32_t code = faultCode;
         while (code == faultCode || code == aborted) {

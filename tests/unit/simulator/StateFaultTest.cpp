@@ -389,7 +389,7 @@ TEST_F(StateFaultTest, ACommitSucceedsOnceThereIsRoom) {
     expectByte(2);
 }
 
-TEST_F(StateFaultTest, WhatCannotBeWrittenChangesNothing) {
+TEST_F(StateFaultTest, AChangeThatCannotBeWrittenHasNoEffect) {
     const std::string path = state.file("change-1");
     const std::string reason = "Is a directory";
     EXPECT_EQ(state.run([&] {
