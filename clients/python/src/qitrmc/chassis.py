@@ -181,7 +181,8 @@ class ChassisOperations(Generic[S]):
         owners: Dict[str, str] = {
             module: chassis for chassis, modules in chassis_modules.items() for module in modules}
         devices = await self._devices()
-        others: List[str] = [device for device in devices if device not in {**owners, **chassis_modules}]
+        others: List[str] = [device for device in devices
+                             if device not in owners and device not in chassis_modules]
         found = Table[Module]()
         for name in [*owners, *others]:
             found.append(await self._module(name, owners.get(name), holders))

@@ -1,0 +1,198 @@
+"""What programs see of failures: a class for each status, with what it says."""
+
+import http.server
+import json
+import socket
+import threading
+
+import pytest
+
+from hostlib import BUILD_DIR, ROOT, Host, clean_host
+import qitrmc
+from qitrmc import statuses
+from qitrmc.errors import parsed_details
+
+ERRORS = json.loads((ROOT / "docs" / "openrpc.json").read_text(encoding="utf-8"))["components"]["errors"]
+# Warnings come with a success.
+CODES = [code for code in statuses.BY_CODE if code < 0]
+
+
+def text_of(name):
+    error = ERRORS[name]
+    return error["data"]["qitrmc_message"] if "data" in error else error["message"]
+
+
+@pytest.mark.parametrize("code", CODES)
+def test_a_status_has_its_class(bench, chassis, code):
+    bench.fail("executeCommand", code)
+    with pytest.raises(qitrmc.Error) as caught:
+        chassis.call("executeCommand", command="DMM.Trigger", devices="Mod1")
+    error = caught.value
+    assert type(error) is statuses.BY_CODE[code]
+    assert error.code == code
+    assert error.text == text_of(error.name)
+    assert error.request["method"] == "executeCommand"
+    assert error.request["params"]["command"] == "DMM.Trigger"
+
+
+def test_a_status_that_nobody_knows_is_still_an_error(bench, chassis):
+    bench.fail("executeCommand", -777)
+    with pytest.raises(qitrmc.UnknownStatus) as caught:
+        chassis.call("executeCommand", command="DMM.Trigger", devices="Mod1")
+    assert caught.value.code == -777
+
+
+def test_a_reserved_device_names_its_holders(chassis, held):
+    with pytest.raises(qitrmc.DeviceReserved) as caught:
+        chassis.session("Mod1")
+    assert caught.value.sessions == [held.id]
+    assert caught.value.details == {"Device": "Mod1", "Reserved by Sessions": held.id}
+
+
+def test_details_are_told_apart_by_their_labels():
+    assert parsed_details("Property Name: DMM.Range Requested Value: 1e+09 Minimum Value: 0.1") == {
+        "Property Name": "DMM.Range", "Requested Value": "1e+09", "Minimum Value": "0.1"}
+    assert parsed_details("") == {}
+
+
+@pytest.mark.parametrize("wrong, call, meant", [
+    ("DMM.Rnage", lambda session, name: session["Mod1"][name], "DMM.Range"),
+    ("Range", lambda session, name: session["Mod1"][name], "DMM.Range"),
+    ("DMM.Rnage", lambda session, name: session["Mod1"].set(name, 1.0), "DMM.Range"),
+    ("DMM.Rnage", lambda session, name: session["Mod1"].info(name), "DMM.Range"),
+    ("DMM.SelfTst", lambda session, name: session["Mod1"].run(name), "DMM.SelfTest"),
+    ("Mod1/chan0", lambda session, name: session[name]["DMM.Voltage"], "Mod1/ch0"),
+    ("Nod1", lambda session, name: session[name]["DMM.Range"], "Mod1"),
+    ("getPropety", lambda session, name: session.call(name), "getProperty"),
+])
+def test_a_name_that_is_nearly_right_gets_a_suggestion(held, wrong, call, meant):
+    with pytest.raises(qitrmc.Error) as caught:
+        call(held, wrong)
+    assert caught.value.suggestion.startswith(f"Did you mean {meant}")
+    assert str(caught.value).endswith(caught.value.suggestion)
+
+
+def test_a_device_that_is_nearly_right_gets_a_suggestion_when_a_session_is_opened(chassis):
+    with pytest.raises(qitrmc.Error, match=r"Did you mean Mod2"):
+        chassis.session("Nod2")
+
+
+def test_a_name_that_is_like_nothing_gets_no_suggestion(held):
+    with pytest.raises(qitrmc.UnknownProperty) as caught:
+        held["Mod1"]["Zzzzzzzz"]
+    assert caught.value.suggestion is None
+
+
+def test_an_error_in_a_batch_says_which_request_failed(held):
+    with pytest.raises(qitrmc.UnknownCommand, match=r"Request 2 of the batch \(executeCommand\)") as caught:
+        held.batch(("getProperty", {"property": "Dev.SlotNum", "devices": "Mod1"}),
+                   ("executeCommand", {"command": "DMM.Fire", "devices": "Mod1"}),
+                   ("executeCommand", {"command": "DMM.Trigger", "devices": "Mod1"}))
+    assert caught.value.index == 1
+    assert caught.value.results == [{"data_type": "UInt32", "value": 1}]
+    assert held["Mod1"]["DMM.TriggerCount"] == 0
+
+
+# A service that cannot be asked
+
+
+class Answering(http.server.BaseHTTPRequestHandler):
+    """Answers every request with the status and body of its server."""
+
+    def do_POST(self):
+        self.rfile.read(int(self.headers["Content-Length"]))
+        self.send_response(self.server.status)
+        self.send_header("Content-Length", str(len(self.server.body)))
+        self.end_headers()
+        self.wfile.write(self.server.body)
+
+    def log_message(self, *_):
+        pass
+
+
+def failure_with(status, body):
+    server = http.server.HTTPServer(("127.0.0.1", 0), Answering)
+    server.status, server.body = status, body
+    thread = threading.Thread(target=server.serve_forever)
+    thread.start()
+    try:
+        with qitrmc.connect(f"http://127.0.0.1:{server.server_port}") as chassis:
+            with pytest.raises(qitrmc.Error) as caught:
+                chassis.devices()
+        return caught.value
+    finally:
+        server.shutdown()
+        thread.join()
+        server.server_close()
+
+
+@pytest.mark.parametrize("status, body, kind, says", [
+    (401, b"", qitrmc.PasswordWanted, "wants a user and a password"),
+    (403, b"", qitrmc.PasswordWanted, "wants a user and a password"),
+    (404, b"", qitrmc.NotTheService, "is the address right"),
+    (200, b"<html>", qitrmc.NotTheService, "is the address right"),
+    (200, b"{}", qitrmc.NotTheService, "is the address right"),
+    (502, b"Bad Gateway", qitrmc.ServerFailure, "HTTP 502: Bad Gateway"),
+])
+def test_what_is_not_the_service_is_said_in_one_sentence(status, body, kind, says):
+    error = failure_with(status, body)
+    assert type(error) is kind
+    assert says in str(error)
+    assert "\n" not in str(error)
+
+
+def test_a_service_that_is_down_says_so():
+    with socket.socket() as reserved:
+        reserved.bind(("127.0.0.1", 0))
+        with qitrmc.connect(f"127.0.0.1:{reserved.getsockname()[1]}") as chassis:
+            with pytest.raises(qitrmc.ServiceDown, match="Nothing answers at http://127.0.0.1"):
+                chassis.devices()
+
+
+def test_a_service_that_is_switched_off_says_so():
+    with Host(plugin=BUILD_DIR / "lib" / "libqitrmcsvc_cwd.so") as host:
+        with qitrmc.connect(host.base_url) as chassis:
+            with pytest.raises(qitrmc.SwitchedOff, match="set Enable=1"):
+                chassis.devices()
+
+
+def test_a_lost_connection_in_the_middle_of_a_request_says_so():
+    with socket.create_server(("127.0.0.1", 0)) as server:
+        def hang_up():
+            connection, _ = server.accept()
+            connection.recv(65536)
+            connection.close()
+        thread = threading.Thread(target=hang_up)
+        thread.start()
+        with qitrmc.connect(f"127.0.0.1:{server.getsockname()[1]}") as chassis:
+            with pytest.raises(qitrmc.ConnectionBroken, match="ended before the answer"):
+                chassis.devices()
+        thread.join()
+
+
+def test_an_answer_that_does_not_come_says_so():
+    with socket.create_server(("127.0.0.1", 0)) as server:
+        address = f"127.0.0.1:{server.getsockname()[1]}"
+        with qitrmc.connect(address, timeout=0.05) as chassis:
+            with pytest.raises(qitrmc.NoAnswerInTime):
+                chassis.devices()
+
+
+def test_a_value_that_has_no_form_on_the_wire_is_refused(held):
+    for value in (float("nan"), object()):
+        with pytest.raises(qitrmc.WrongValue):
+            held["Mod1"]["DMM.Range"] = value
+
+
+def test_a_service_that_was_restarted_does_not_know_the_session():
+    with clean_host() as host:
+        address = host.base_url
+        chassis = qitrmc.connect(address)
+        session = chassis.session("Mod1")
+    with clean_host(options=["--listen", address.rpartition("/")[2]]):
+        with pytest.raises(qitrmc.UnknownSession):
+            session["Mod1"]["DMM.Range"]
+        session.close()
+        with chassis.session("Mod1") as again:
+            assert again["Mod1"]["DMM.Range"] == 10.0
+        chassis.close()
