@@ -1,0 +1,59 @@
+"""What the type checker and the linter say of the package."""
+
+import shutil
+import subprocess
+
+import pytest
+
+from hostlib import ROOT
+
+PROJECT = ROOT / "clients" / "python"
+
+
+@pytest.fixture(scope="module")
+def checked(tmp_path_factory):
+    """Runs a checker in the project; what one run found out the next need not."""
+    cache = tmp_path_factory.mktemp("mypy")
+
+    def run(*command):
+        return subprocess.run(command, cwd=PROJECT, capture_output=True, text=True, timeout=600,
+                              env={"PATH": "/usr/bin:/bin", "MYPYPATH": "src", "MYPY_CACHE_DIR": cache})
+    return run
+
+
+def need(program):
+    if shutil.which(program, path="/usr/bin") is None:
+        pytest.skip(f"{program} is not installed")
+
+
+def test_the_type_checker_is_content(checked):
+    need("mypy")
+    mypy = checked("/usr/bin/mypy", "--strict", "-p", "qitrmc")
+    assert (mypy.returncode, mypy.stdout[:7]) == (0, "Success"), mypy.stdout + mypy.stderr
+
+
+def test_the_type_checker_knows_what_operations_return(checked, tmp_path):
+    need("mypy")
+    program = tmp_path / "program.py"
+    program.write_text("import qitrmc\n"
+                       "chassis = qitrmc.connect('x')\n"
+                       "reveal_type(chassis.devices())\n"
+                       "reveal_type(chassis.session('Mod1')['Mod1'].run('x', timeout=1.0))\n"
+                       "reveal_type(chassis.methods.get_module_name(session_id='', slot_number=1))\n"
+                       "async def main() -> None:\n"
+                       "    reveal_type(await qitrmc.connect_async('x').devices())\n"
+                       "chassis.session('Mod1')['Mod1'].run(1)\n")
+    told = [line.rpartition("program.py")[2] for line in
+            checked("/usr/bin/mypy", "--strict", str(program)).stdout.splitlines()]
+    assert [line.partition('"')[2].rstrip('"') for line in told[:4]] == [
+        "builtins.list[builtins.str]", "builtins.float",
+        "TypedDict('qitrmc.calls.GetModuleNameResult', {'present': builtins.bool, 'module'?: builtins.str})",
+        "builtins.list[builtins.str]"]
+    assert 'has incompatible type "int"; expected "str"' in told[4]
+
+
+def test_the_linter_is_content(checked):
+    flake8 = checked("/usr/bin/python3", "-m", "flake8")
+    if "No module named" in flake8.stderr:
+        pytest.skip("flake8 is not installed")
+    assert (flake8.returncode, flake8.stdout) == (0, "")
