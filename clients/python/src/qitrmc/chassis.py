@@ -97,7 +97,7 @@ class ChassisOperations(Generic[S]):
 
     @operation
     async def health(self) -> Health:
-        """Ask each device for its serial number and see what comes."""
+        """Ask each device for its product name and see what comes."""
         return await self._health()
 
     @operation
@@ -192,12 +192,13 @@ class ChassisOperations(Generic[S]):
     async def _module(self, name: str, chassis: Optional[str], holders: bool) -> Module:
         values: Dict[str, Any] = {}
         state = "ready"
-        for property in ("Dev.SlotNum", "Dev.ProductName", "Dev.SerialNum"):
+        # Every device has a product name; one without a slot or serial number has no such property.
+        for property in ("Dev.ProductName", "Dev.SlotNum", "Dev.SerialNum"):
             try:
                 values[property] = await self._read(property, name)
             except StatusError as error:
-                # A device that is in no slot has no slot number.
-                state = error.text.partition(". ")[0] if property != "Dev.SlotNum" or chassis else state
+                if property == "Dev.ProductName":
+                    state = error.text.partition(". ")[0]
         held = tuple(await self._holders(name)) if holders else None
         return Module(name, values.get("Dev.SlotNum"), values.get("Dev.ProductName", ""),
                       values.get("Dev.SerialNum", ""), chassis, state, held)
@@ -221,7 +222,7 @@ class ChassisOperations(Generic[S]):
         faults = {}
         for device in devices:
             try:
-                await self._read("Dev.SerialNum", device)
+                await self._read("Dev.ProductName", device)
             except StatusError as error:
                 faults[device] = error.text.partition(". ")[0]
         return Health(seconds, len(devices), faults)

@@ -1,0 +1,5 @@
+"""The command `qitrmc`."""
+
+from .app import main
+
+__all__ = ["main"]
