@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "host/EntryName.h"
+#include "host/openRpcDocument.h"
 
 namespace host {
 
@@ -12,6 +13,12 @@ namespace {
 
 // Far more than a client has under way by mistake.
 constexpr std::size_t kMostDiscarded = 64 * 1024 * 1024;
+
+constexpr std::string_view kDocumentPath = "/openrpc.json";
+
+bool isGet(std::string_view method) {
+    return method == "GET" || method == "HEAD";
+}
 
 bool isSendable(const ws_Request& response) {
     return !response.incomplete && response.code >= 200 && response.code <= 599 &&
@@ -44,6 +51,11 @@ void Exchange::begin(const char* transport, const char* method, std::string_view
         return;
     if (!admitted)
         return answer(503, "The server is stopping.\n");
+    if (path == kDocumentPath && isGet(method)) {
+        answer(200, openRpcDocument);
+        request.type = "application/json; charset=utf-8";
+        return;
+    }
     std::optional<std::vector<uint32_t>> name = entryNameOfPath(path);
     if (!name)
         return answer(404, "There is nothing here. The service is at /qitrmc/Call.\n");
