@@ -76,3 +76,15 @@ def test_the_commands_of_the_page_are_there():
     from qitrmc.cli import main
     commands = re.findall(r"^    qitrmc (\w+)", PAGE, re.MULTILINE)
     assert len(commands) == 5 and set(commands) <= set(main.commands)
+
+
+def test_the_reference_is_up_to_date(tmp_path):
+    page = tmp_path / "reference.md"
+    subprocess.run([ROOT / "docs" / "make_python_reference.py", "--page", page], check=True, timeout=60)
+    assert page.read_bytes() == (ROOT / "docs" / "python-reference.md").read_bytes()
+
+
+def test_every_public_method_has_a_docstring():
+    reference = (ROOT / "docs" / "python-reference.md").read_text(encoding="utf-8")
+    assert "`run(command, timeout=None)`: Carry out a command" in reference
+    assert not re.search(r"^- `[^`]*`: *$", reference, re.MULTILINE)
