@@ -35,7 +35,7 @@ MOST_REQUESTS_IN_BATCH = 100000
 
 RULES = f"""\
 JSON-RPC 2.0 over HTTP: a client posts one JSON text in UTF-8 to /qitrmc/Call and reads one back, with \
-HTTP status 200 whether it tells of a success or of a failure.
+HTTP status 200 for successes and failures alike.
 
 - There are no notifications: every request has an `id`, a string or a 32-bit integer.
 - `params` is an object; parameters that are not listed are refused.
@@ -105,7 +105,7 @@ def params_of(schema, meanings):
     required = schema.get("required", [])
     params = [{"name": name, "description": meanings[name], "required": name in required,
                "schema": published(member)} for name, member in schema["properties"].items()]
-    # The format wants what must be given in front.
+    # The format requires mandatory parameters in front.
     return sorted(params, key=lambda param: not param["required"])
 
 

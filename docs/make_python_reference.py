@@ -33,7 +33,7 @@ CLASSES = (qitrmc.Chassis, qitrmc.Session, qitrmc.Resource, registers.Registers,
            qitrmc.PropertyInfo, qitrmc.Row, qitrmc.Module, qitrmc.PropertyRow, qitrmc.Health)
 ERRORS = (qitrmc.Error, qitrmc.StatusError, qitrmc.DeviceReserved, qitrmc.UnknownStatus,
           qitrmc.ConnectionFailure, qitrmc.ServiceDown, qitrmc.ConnectionBroken, qitrmc.NoAnswerInTime,
-          qitrmc.NotTheService, qitrmc.SwitchedOff, qitrmc.PasswordWanted, qitrmc.ServerFailure,
+          qitrmc.NotTheService, qitrmc.SwitchedOff, qitrmc.AuthenticationRequired, qitrmc.ServerFailure,
           qitrmc.WrongItem, qitrmc.WrongValue, qitrmc.SessionClosed)
 CONTAINER_METHODS = ("__getitem__", "__setitem__", "__len__")
 

@@ -344,10 +344,10 @@ def test_sim_serves_a_chassis_until_it_is_ended(temporary, end):
     description = ROOT / "simulator" / "chassis" / "small.json"
     with subprocess.Popen([*PROGRAM, "sim", str(description), "--listen", "127.0.0.1:0", "--json"],
                           stdout=subprocess.PIPE, text=True) as running:
-        told = ""
-        while not told.endswith("}\n"):
-            told += running.stdout.readline()
-        url = json.loads(told)["url"]
+        printed_text = ""
+        while not printed_text.endswith("}\n"):
+            printed_text += running.stdout.readline()
+        url = json.loads(printed_text)["url"]
         result = CliRunner().invoke(main, ["--url", url, "health"])
         running.send_signal(end)
         assert running.wait(60) == 0

@@ -1,8 +1,10 @@
 """What programs see of failures: a class for each status, with what it says."""
 
+import contextlib
 import http.server
 import json
 import socket
+import subprocess
 import threading
 
 import pytest
@@ -93,7 +95,7 @@ def test_an_error_in_a_batch_says_which_request_failed(held):
     assert held["Mod1"]["DMM.TriggerCount"] == 0
 
 
-# A service that cannot be asked
+# A service that cannot be reached
 
 
 class Answering(http.server.BaseHTTPRequestHandler):
@@ -110,25 +112,31 @@ class Answering(http.server.BaseHTTPRequestHandler):
         pass
 
 
-def failure_with(status, body):
-    server = http.server.HTTPServer(("127.0.0.1", 0), Answering)
+@contextlib.contextmanager
+def answering(status, body, handler=Answering):
+    """The address of a server that answers so."""
+    server = http.server.HTTPServer(("127.0.0.1", 0), handler)
     server.status, server.body = status, body
-    thread = threading.Thread(target=server.serve_forever)
+    thread = threading.Thread(target=server.serve_forever, args=(0.01,))
     thread.start()
     try:
-        with qitrmc.connect(f"http://127.0.0.1:{server.server_port}") as chassis:
-            with pytest.raises(qitrmc.Error) as caught:
-                chassis.devices()
-        return caught.value
+        yield f"http://127.0.0.1:{server.server_port}"
     finally:
         server.shutdown()
         thread.join()
         server.server_close()
 
 
+def failure_with(status, body):
+    with answering(status, body) as url, qitrmc.connect(url) as chassis:
+        with pytest.raises(qitrmc.Error) as caught:
+            chassis.devices()
+    return caught.value
+
+
 @pytest.mark.parametrize("status, body, kind, says", [
-    (401, b"", qitrmc.PasswordWanted, "wants a user and a password"),
-    (403, b"", qitrmc.PasswordWanted, "wants a user and a password"),
+    (401, b"", qitrmc.AuthenticationRequired, "requires a user and a password"),
+    (403, b"", qitrmc.AuthenticationRequired, "requires a user and a password"),
     (404, b"", qitrmc.NotTheService, "is the address right"),
     (200, b"<html>", qitrmc.NotTheService, "is the address right"),
     (200, b"{}", qitrmc.NotTheService, "is the address right"),
@@ -196,3 +204,50 @@ def test_a_service_that_was_restarted_does_not_know_the_session():
         with chassis.session("Mod1") as again:
             assert again["Mod1"]["DMM.Range"] == 10.0
         chassis.close()
+
+
+# Ways to the service
+
+
+def test_user_password_and_headers_are_sent():
+    seen = []
+
+    class Noting(Answering):
+        def do_POST(self):
+            seen.append((self.headers["Authorization"], self.headers["X-Rack"]))
+            super().do_POST()
+    with answering(401, b"", Noting) as url:
+        with qitrmc.connect(url, auth=("bench", "secret"), headers={"X-Rack": "7"}) as chassis:
+            with pytest.raises(qitrmc.AuthenticationRequired):
+                chassis.devices()
+    assert seen == [("Basic YmVuY2g6c2VjcmV0", "7")]
+
+
+@pytest.fixture(scope="module")
+def certificate(tmp_path_factory):
+    folder = tmp_path_factory.mktemp("tls")
+    subprocess.run(["openssl", "req", "-x509", "-newkey", "rsa:2048", "-nodes", "-days", "2",
+                    "-subj", "/CN=localhost", "-addext", "subjectAltName=IP:127.0.0.1",
+                    "-keyout", folder / "key.pem", "-out", folder / "cert.pem"],
+                   check=True, capture_output=True, timeout=60)
+    return folder
+
+
+def test_a_service_behind_tls_is_reached_with_its_certificate(certificate):
+    options = ["--tls-cert", certificate / "cert.pem", "--tls-key", certificate / "key.pem"]
+    with Host(options=options) as host:
+        with qitrmc.connect(host.base_url, verify=str(certificate / "cert.pem")) as chassis:
+            assert chassis.devices()[0] == "Bench"
+        with qitrmc.connect(host.base_url) as chassis:
+            with pytest.raises(qitrmc.ServiceDown, match="certificate"):
+                chassis.devices()
+
+
+@pytest.mark.parametrize("given, url", [
+    ("rack", "http://rack/qitrmc/Call"),
+    ("rack:8080", "http://rack:8080/qitrmc/Call"),
+    ("https://rack/", "https://rack/qitrmc/Call"),
+    ("http://proxy/racks/7", "http://proxy/racks/7"),
+])
+def test_an_address_is_completed(given, url):
+    assert qitrmc.connect(given).url == url

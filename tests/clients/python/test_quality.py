@@ -43,13 +43,13 @@ def test_the_type_checker_knows_what_operations_return(checked, tmp_path):
                        "async def main() -> None:\n"
                        "    reveal_type(await qitrmc.connect_async('x').devices())\n"
                        "chassis.session('Mod1')['Mod1'].run(1)\n")
-    told = [line.rpartition("program.py")[2] for line in
+    notes = [line.rpartition("program.py")[2] for line in
             checked("/usr/bin/mypy", "--strict", str(program)).stdout.splitlines()]
-    assert [line.partition('"')[2].rstrip('"') for line in told[:4]] == [
+    assert [line.partition('"')[2].rstrip('"') for line in notes[:4]] == [
         "builtins.list[builtins.str]", "builtins.float",
         "TypedDict('qitrmc.calls.GetModuleNameResult', {'present': builtins.bool, 'module'?: builtins.str})",
         "builtins.list[builtins.str]"]
-    assert 'has incompatible type "int"; expected "str"' in told[4]
+    assert 'has incompatible type "int"; expected "str"' in notes[4]
 
 
 def test_the_linter_is_content(checked):

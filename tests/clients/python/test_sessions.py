@@ -86,22 +86,22 @@ def test_the_session_for_reading_ends_with_the_connection(bench):
 def test_a_program_waits_its_turn(bench, chassis, caplog):
     caplog.set_level(logging.WARNING, "qitrmc")
     first = chassis.session("Mod2")
-    told = threading.Event()
+    logged = threading.Event()
     opened = []
 
-    class Told(logging.Handler):
+    class Noticed(logging.Handler):
         def emit(self, record):
-            told.set()
+            logged.set()
 
     def wait():
         with bench.connect() as other, other.session("Mod2", wait=60) as second:
             opened.append(second.id)
-    handler = Told()
+    handler = Noticed()
     logging.getLogger("qitrmc").addHandler(handler)
     thread = threading.Thread(target=wait)
     thread.start()
     try:
-        assert told.wait(60)
+        assert logged.wait(60)
         assert opened == []
         # The one that waits does not hold up the holder.
         assert first["Mod2/ch0"]["PSU.Voltage"] == 0.0
@@ -126,9 +126,9 @@ def test_a_wait_asks_without_a_timeout_of_its_own(bench, chassis):
         before = len(bench.trace)
         with pytest.raises(qitrmc.DeviceReserved):
             chassis.session("Mod2", wait=0.3)
-        asked = [line for line in bench.trace[before:] if "initializeSessionWithDevices" in line]
-        assert len(asked) >= 2
-        assert all("reservationTimeout=0" in line for line in asked), asked
+        sent = [line for line in bench.trace[before:] if "initializeSessionWithDevices" in line]
+        assert len(sent) >= 2
+        assert all("reservationTimeout=0" in line for line in sent), sent
 
 
 def test_force_ends_the_session_that_holds_a_device(chassis):

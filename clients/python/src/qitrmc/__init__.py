@@ -6,8 +6,8 @@
 """
 
 from .chassis import AsyncChassis, Chassis, Health, connect, connect_async
-from .errors import (ConnectionBroken, ConnectionFailure, Error, NoAnswerInTime, NotTheService,
-                     PasswordWanted, ServerFailure, ServiceDown, SessionClosed, StatusError, SwitchedOff,
+from .errors import (AuthenticationRequired, ConnectionBroken, ConnectionFailure, Error, NoAnswerInTime,
+                     NotTheService, ServerFailure, ServiceDown, SessionClosed, StatusError, SwitchedOff,
                      UnknownStatus, WrongItem, WrongValue)
 from .resource import AsyncResource, Resource
 from .session import AsyncSession, Session
@@ -20,10 +20,10 @@ from .watching import Row
 __version__ = "0.1.0"
 
 __all__ = [
-    "AsyncChassis", "AsyncResource", "AsyncSession", "Chassis", "ConnectionBroken", "ConnectionFailure",
-    "Error", "Health", "Module", "NoAnswerInTime", "NotTheService", "PasswordWanted", "PropertyInfo",
-    "PropertyRow", "Resource", "Row", "ServerFailure", "ServiceDown", "Session", "SessionClosed",
-    "StatusError", "SwitchedOff", "Table", "UnknownStatus", "WrongItem", "WrongValue", "connect",
-    "connect_async",
+    "AsyncChassis", "AsyncResource", "AsyncSession", "AuthenticationRequired", "Chassis",
+    "ConnectionBroken", "ConnectionFailure", "Error", "Health", "Module", "NoAnswerInTime",
+    "NotTheService", "PropertyInfo", "PropertyRow", "Resource", "Row", "ServerFailure", "ServiceDown",
+    "Session", "SessionClosed", "StatusError", "SwitchedOff", "Table", "UnknownStatus", "WrongItem",
+    "WrongValue", "connect", "connect_async",
 ]
 __all__ += _status_names

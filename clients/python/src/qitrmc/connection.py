@@ -221,8 +221,8 @@ def http_failure(url: str, response: httpx.Response, request: Mapping[str, Any])
         return errors.SwitchedOff(f"The service at {url} is switched off: set Enable=1 in section "
                                   "WebService of its qitrmc.ini, and start its web server again.", request)
     if status in (httpx.codes.UNAUTHORIZED, httpx.codes.FORBIDDEN, httpx.codes.PROXY_AUTHENTICATION_REQUIRED):
-        return errors.PasswordWanted(f"{url} wants a user and a password, or refuses those given (HTTP "
-                                     f"{status}).", request)
+        return errors.AuthenticationRequired(
+            f"{url} requires a user and a password, or refuses those given (HTTP {status}).", request)
     if status >= httpx.codes.INTERNAL_SERVER_ERROR or status in (400, 413):
         return errors.ServerFailure(f"{url} failed on the request with HTTP {status}: "
                                     f"{response.text.strip()[:200] or response.reason_phrase}", request)

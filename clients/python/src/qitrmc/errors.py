@@ -76,7 +76,7 @@ class Reserved(StatusError):
 
 
 class ConnectionFailure(Error):
-    """The service could not be asked. Whether a request that was under way was carried out is open."""
+    """The service could not be reached. A request that was under way may have been carried out."""
 
 
 class ServiceDown(ConnectionFailure):
@@ -99,8 +99,8 @@ class SwitchedOff(ConnectionFailure):
     """The web server answers, but its service is switched off."""
 
 
-class PasswordWanted(ConnectionFailure):
-    """The server in front of the service wants a user and a password, or refuses those given."""
+class AuthenticationRequired(ConnectionFailure):
+    """The server in front of the service requires a user and a password, or refuses those given."""
 
 
 class ServerFailure(ConnectionFailure):

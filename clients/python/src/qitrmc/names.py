@@ -34,7 +34,7 @@ def device_of(name: str) -> str:
 
 
 class NameBook:
-    """What a chassis lists, as far as it was asked. Shared by the sessions of a chassis."""
+    """What a chassis lists, as far as it was read. Shared by the sessions of a chassis."""
 
     def __init__(self) -> None:
         self._areas: Dict[str, List[str]] = {}
@@ -52,7 +52,7 @@ class NameBook:
         return AREAS if first.partition(":")[0].casefold() in areas else CHANNELS
 
     async def areas_of(self, calls: Calls, session_id: str, device: str) -> List[str]:
-        """The NVMEM areas of a device in small letters. Empty when the device cannot tell."""
+        """The NVMEM areas of a device in small letters. Empty when the device does not list them."""
         folded = device.casefold()
         if folded not in self._areas:
             try:

@@ -32,7 +32,7 @@ class NvmemOperations:
         self._password: Optional[str] = None
 
     def unlock(self, password: Optional[str] = None, serial_number: Optional[str] = None) -> None:
-        """Keep what writing to the area asks for: its password, the serial number of its device."""
+        """Keep what writing to the area requires: its password, the serial number of its device."""
         self._password, self._serial_number = password, serial_number
 
     @operation

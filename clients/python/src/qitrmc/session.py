@@ -163,12 +163,12 @@ def with_session(method: str, params: Any, session_id: str) -> Any:
 async def in_turn(attempt: Callable[[], Awaitable[T]], connection: Connection, wait: float) -> T:
     """Repeat an attempt until its device is free or the wait is over.
 
-    The service is asked without a timeout of its own each time: a request that waits there would
+    Each attempt goes without a timeout of the service: a request that waits there would
     hold up the very session that it waits for.
     """
     deadline = time.monotonic() + wait
     pause = SHORTEST_PAUSE
-    is_told = False
+    is_logged = False
     while True:
         try:
             return await attempt()
@@ -176,14 +176,14 @@ async def in_turn(attempt: Callable[[], Awaitable[T]], connection: Connection, w
             left = deadline - time.monotonic()
             if left <= 0:
                 raise
-            if not is_told:
-                tell(error, wait)
-            is_told = True
+            if not is_logged:
+                log_holders(error, wait)
+            is_logged = True
         await connection.post.pause(min(left, pause * random.uniform(0.5, 1.0)))
         pause = min(2 * pause, LONGEST_PAUSE)
 
 
-def tell(error: Reserved, wait: float) -> None:
+def log_holders(error: Reserved, wait: float) -> None:
     device = error.details.get("Device") or error.details.get("Devices") or "The device"
     holders = ", ".join(error.sessions) or "another session"
     log.warning("%s is held by %s; waiting up to %g s.", device, holders, wait)

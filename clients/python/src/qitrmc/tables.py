@@ -70,7 +70,7 @@ class Module:
     """A device in a slot.
 
     slot is None for a device that has none. state is "ready", or why the device does not answer.
-    holders are the ids of the sessions that hold it for writing; None where it was not asked.
+    holders are the ids of the sessions that hold it for writing; None where that was not found out.
     """
 
     name: str

@@ -1,4 +1,4 @@
-"""Completion of names, which are asked from the chassis."""
+"""Completion of names, which come from the chassis."""
 
 from __future__ import annotations
 
@@ -16,14 +16,14 @@ PATIENCE_SECONDS = 2.0
 METHOD_NAMES = list(METHODS)
 
 
-def asked(context: click.Context, ask: Callable[[Chassis], List[str]]) -> List[str]:
+def answer_of(context: click.Context, query: Callable[[Chassis], List[str]]) -> List[str]:
     """What the chassis of the command line answers; nothing if it does not."""
     options = {name: value for level in (context.parent, context) if level
                for name, value in level.params.items() if value is not None}
     try:
         with connect(url_or_default(options.get("url")), timeout=PATIENCE_SECONDS,
                      auth=credentials(options.get("user"))) as chassis:
-            return ask(chassis)
+            return query(chassis)
     except Error:
         return []
 
@@ -39,7 +39,7 @@ def beginning(names: List[str], incomplete: str) -> List[str]:
 
 def devices(context: click.Context, _: Any, incomplete: str) -> List[str]:
     """Names of devices."""
-    return beginning(asked(context, lambda chassis: chassis.devices()), incomplete)
+    return beginning(answer_of(context, lambda chassis: chassis.devices()), incomplete)
 
 
 def resources(context: click.Context, parameter: Any, incomplete: str) -> List[str]:
@@ -47,7 +47,7 @@ def resources(context: click.Context, parameter: Any, incomplete: str) -> List[s
     device = incomplete.partition("/")[0]
     if "/" not in incomplete:
         return devices(context, parameter, incomplete)
-    return beginning(asked(context, lambda chassis: parts_of(
+    return beginning(answer_of(context, lambda chassis: parts_of(
         chassis, device, "Dev.PhysChans", "Dev.NVMEM.Areas")), incomplete)
 
 
@@ -56,21 +56,21 @@ def areas(context: click.Context, parameter: Any, incomplete: str) -> List[str]:
     device = incomplete.partition("/")[0]
     if "/" not in incomplete:
         return [f"{name}/" for name in devices(context, parameter, incomplete)]
-    return beginning(asked(context, lambda chassis: parts_of(chassis, device, "Dev.NVMEM.Areas")),
+    return beginning(answer_of(context, lambda chassis: parts_of(chassis, device, "Dev.NVMEM.Areas")),
                      incomplete)
 
 
 def properties(context: click.Context, _: Any, incomplete: str) -> List[str]:
     """Properties of the resource that the command line names."""
-    def ask(chassis: Chassis) -> List[str]:
+    def query(chassis: Chassis) -> List[str]:
         with chassis.session() as session:
             return session[context.params["resource"]].properties()
-    return beginning(asked(context, ask), incomplete)
+    return beginning(answer_of(context, query), incomplete)
 
 
 def commands(context: click.Context, _: Any, incomplete: str) -> List[str]:
     """Commands of the resource that the command line names."""
-    def ask(chassis: Chassis) -> List[str]:
+    def query(chassis: Chassis) -> List[str]:
         with chassis.session() as session:
             return session[context.params["resource"]].commands()
-    return beginning(asked(context, ask), incomplete)
+    return beginning(answer_of(context, query), incomplete)

@@ -81,7 +81,7 @@ def common_options(command: Callable[..., Any]) -> Callable[..., Any]:
     @click.option("--fleet", type=click.Path(exists=True, dir_okay=False),
                   help="Run the command on each chassis of this TOML file.")
     @click.option("--user", metavar="USER:PASSWORD",
-                  help="For a server that asks for them (QITRMC_USER).")
+                  help="For a server that requires them (QITRMC_USER).")
     @click.option("--timeout", "patience", type=float, help="Seconds that an answer may take (30).")
     @click.option("--json", "as_json", is_flag=True, help="Write JSON, for scripts.")
     @pass_context

@@ -110,8 +110,8 @@ def nvmem_read(context: Context, area: str, address: int, size: Optional[int]) -
 @click.argument("address", type=NUMBER)
 @click.argument("data", metavar="[HEX]", required=False)
 @click.option("--file", "source", type=click.Path(exists=True, dir_okay=False), help="Write its bytes.")
-@click.option("--password", help="Of the area, where it asks for one.")
-@click.option("--serial", help="Serial number of the device, where the area asks for it.")
+@click.option("--password", help="Of the area, where it requires one.")
+@click.option("--serial", help="Serial number of the device, where the area requires it.")
 @reserving
 @common_options
 def nvmem_write(context: Context, area: str, address: int, data: Optional[str], source: Optional[str],
@@ -122,10 +122,10 @@ def nvmem_write(context: Context, area: str, address: int, data: Optional[str], 
 
     def work(chassis: Chassis) -> Result:
         content = texts.parsed_bytes(data) if data is not None else pathlib.Path(str(source)).read_bytes()
-        with opened(chassis, area, wait, force) as session, progress(area, len(content)) as tell:
+        with opened(chassis, area, wait, force) as session, progress(area, len(content)) as advance:
             memory = session[area].nvmem
             memory.unlock(password, serial)
-            memory.write(address, content, tell)
+            memory.write(address, content, advance)
             memory.commit()
         return Result({"address": address, "size": len(content)}, [[f"{len(content)} bytes written"]])
     context.run(work)
@@ -140,8 +140,8 @@ def nvmem_dump(context: Context, area: str, file: str) -> None:
     with context.connect() as chassis, chassis.session() as session:
         memory = session[area].nvmem
         size = memory.size()
-        with progress(area, size) as tell:
-            pathlib.Path(file).write_bytes(memory.read(0, size, tell))
+        with progress(area, size) as advance:
+            pathlib.Path(file).write_bytes(memory.read(0, size, advance))
     results.show(Result({"file": file, "size": size}, [[f"{size} bytes saved in {file}"]]), context.as_json)
 
 

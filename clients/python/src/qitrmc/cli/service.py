@@ -45,8 +45,8 @@ def sim(context: Context, file: Optional[str], listen: str, time_scale: str) -> 
     from ..testing import chassis  # starts programs, which no other command does
     signal.signal(signal.SIGTERM, lambda *_: sys.exit(0))
     with chassis(file, listen=listen, time_scale=time_scale) as simulated:
-        told = f"A simulated chassis is at {simulated.url}. Ctrl-C ends it."
-        show(Result({"url": simulated.url}, [[told]]), context.as_json)
+        line = f"A simulated chassis is at {simulated.url}. Ctrl-C ends it."
+        show(Result({"url": simulated.url}, [[line]]), context.as_json)
         sys.stdout.flush()
         with contextlib.suppress(KeyboardInterrupt):
             simulated.wait()

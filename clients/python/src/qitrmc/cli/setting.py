@@ -97,10 +97,10 @@ def rename(context: Context, device: str, new_name: str, whole: bool, wait: floa
 
 @click.command()
 @click.argument("device", shell_complete=completion.devices)
-@click.option("--yes", is_flag=True, help="Do not ask.")
+@click.option("--yes", is_flag=True, help="Without a confirmation.")
 @common_options
 def free(context: Context, device: str, yes: bool) -> None:
-    """Close the sessions that hold DEVICE, whoever has them."""
+    """Close all sessions that hold DEVICE, after a confirmation."""
     with context.connect() as chassis:
         holders = chassis.holders(device)
         if not yes:

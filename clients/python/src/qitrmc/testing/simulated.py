@@ -43,7 +43,8 @@ class SimulatedChassis:
         self._folder = pathlib.Path(tempfile.mkdtemp(prefix="qitrmc-"))
         try:
             self._write_faults()
-            command = [os.path.abspath(program or host_program()), "--listen", listen, "--time-scale", str(time_scale),
+            command = [os.path.abspath(program or host_program()),
+                       "--listen", listen, "--time-scale", str(time_scale),
                        "--faults", str(self._folder / "faults.json"),
                        "--trace", str(self._folder / "trace"), *self._chassis_option(description)]
             self._start(command + (["--seed", str(seed)] if seed is not None else []))
