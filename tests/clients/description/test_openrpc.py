@@ -115,7 +115,7 @@ def test_an_error_of_the_service_stands_in_the_data():
     assert ERRORS["deviceReserved"]["code"] == -32000
     assert ERRORS["deviceReserved"]["data"]["qitrmc_code"] == -250811
     assert ERRORS["deviceReserved"]["data"]["qitrmc_message"].startswith(
-        "The device is reserved by another session. Wait until")
+        "The device is reserved by another session. ")
 
 
 def test_an_error_of_json_rpc_stands_in_the_code():
