@@ -63,6 +63,14 @@ def test_a_wrong_item_lists_the_items(held):
     assert held["Mod1"]["DMM.Function"] == 0
 
 
+def test_a_driver_that_does_not_list_the_items_is_helped_out(bench, held):
+    bench.fail("setProperty", qitrmc.ValueNotEnumerated)
+    with pytest.raises(qitrmc.ValueNotEnumerated) as caught:
+        held["Mod1/ch0"]["DMM.Coupling"] = 7
+    bench.restore()
+    assert caught.value.suggestion == "The items of DMM.Coupling are AC (0), DC (1), Ground (2)."
+
+
 def test_items_on_several_resources(held):
     held["Mod1/ch0:1"]["DMM.Coupling"] = ["AC", "Ground"]
     assert [item.name for item in held["Mod1/ch0:1"]["DMM.Coupling"]] == ["AC", "Ground"]

@@ -17,6 +17,9 @@ from .tables import PropertyRow, Table
 from .values import (PropertyInfo, decoded_value, encoded_value, has_names, is_enumerable, property_info)
 from .watching import Row, recorded, rows
 
+# The detail in which a driver names what may have been meant.
+NEAREST = "Nearest Name"
+
 
 class Owner(Protocol):
     """What a resource needs of its session."""
@@ -191,7 +194,7 @@ class ResourceOperations:
 
     async def _list_items(self, error: StatusError, property: str) -> None:
         """Name the items of an enumeration in an error about a value that is none of them."""
-        if isinstance(error, statuses.ValueNotEnumerated):
+        if isinstance(error, statuses.ValueNotEnumerated) and "Allowed Values" not in error.details:
             try:
                 error.suggestion = f"The items of {property} are {(await self._info(property)).limits()}."
             except Error:
@@ -241,6 +244,8 @@ class ResourceOperations:
         """Add a suggestion to an error that is about the resource or about a name of it."""
         if isinstance(error, names.UNKNOWN_RESOURCE):
             await names.suggest_resource(error, self._calls, self._session.id, self.name)
+        elif NEAREST in error.details:
+            error.suggestion = f"Did you mean {error.details[NEAREST]}?"
         elif isinstance(error, unknown):
             try:
                 suggest(error, name, await known())
