@@ -13,6 +13,7 @@ from hostlib import BUILD_DIR, ROOT, Host, clean_host
 import qitrmc
 from qitrmc import statuses
 from qitrmc.errors import parsed_details
+from qitrmc.testing import chassis as simulated
 
 ERRORS = json.loads((ROOT / "docs" / "openrpc.json").read_text(encoding="utf-8"))["components"]["errors"]
 # Warnings come with a success.
@@ -251,3 +252,42 @@ def test_a_service_behind_tls_is_reached_with_its_certificate(certificate):
 ])
 def test_an_address_is_completed(given, url):
     assert qitrmc.connect(given).url == url
+
+
+# A service that goes away in the middle of a session
+
+
+def test_a_session_whose_service_went_down_says_so():
+    with simulated() as bench, bench.connect() as chassis:
+        with pytest.raises(qitrmc.ConnectionFailure):
+            with chassis.session("Mod1") as session:
+                bench.stop()
+                session["Mod1"]["DMM.Range"]
+        with pytest.raises(qitrmc.ServiceDown):
+            chassis.session("Mod1")
+
+
+def test_a_failure_in_a_block_goes_before_that_of_closing():
+    with simulated() as bench, bench.connect() as chassis:
+        with pytest.raises(KeyError):
+            with chassis.session("Mod1"):
+                bench.stop()
+                raise KeyError
+
+
+def test_a_session_that_cannot_be_closed_says_so():
+    with simulated() as bench, bench.connect() as chassis:
+        with pytest.raises(qitrmc.ConnectionFailure):
+            with chassis.session("Mod1"):
+                bench.stop()
+
+
+def test_requests_do_not_wait_for_acknowledgements(chassis):
+    """A request is two small packets; together they would wait 40 ms for each other."""
+    sockets = []
+    client = chassis._connection.post._client
+    client.event_hooks["response"] = [lambda response: sockets.append(
+        response.extensions["network_stream"].get_extra_info("socket"))]
+    chassis.devices()
+    assert len(sockets) == 2
+    assert all(used.getsockopt(socket.IPPROTO_TCP, socket.TCP_NODELAY) for used in sockets)
