@@ -16,7 +16,7 @@ namespace {
 constexpr const char* kIntroduction = R"(Usage: qitrmc-host [OPTION]...
 
 Serves the web service plug-in of an instrument chassis over HTTP, for development and tests.
-The service answers POST requests at /qitrmc/Call.
+The service answers POST requests at /qitrmc/Call; GET /openrpc.json describes it for machines.
 )";
 
 constexpr const char* kNotes =
