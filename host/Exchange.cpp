@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "host/EntryName.h"
+#include "host/RequestTarget.h"
 #include "host/openRpcDocument.h"
 
 namespace host {
@@ -27,8 +28,8 @@ bool isSendable(const ws_Request& response) {
 
 }  // namespace
 
-Exchange::Exchange(Gate& gate, uint32_t maxBody) noexcept
-    : gate(gate), admitted(gate.enter()), maxBody(maxBody) {}
+Exchange::Exchange(Gate& gate, uint32_t maxBody, const Site* site) noexcept
+    : gate(gate), admitted(gate.enter()), maxBody(maxBody), site(site) {}
 
 Exchange::~Exchange() {
     if (admitted)
@@ -57,13 +58,21 @@ void Exchange::begin(const char* transport, const char* method, std::string_view
         return;
     }
     std::optional<std::vector<uint32_t>> name = entryNameOfPath(path);
-    if (!name)
+    if (!name && site != nullptr && site->has(std::string(pathOfTarget(path))))
+        siteRequest = SiteRequest{method, std::string(pathOfTarget(path)), ""};
+    else if (!name)
         return answer(404, "There is nothing here. The service is at /qitrmc/Call.\n");
     if (declaredLength != nullptr && std::strtoull(declaredLength, nullptr, 10) > maxBody)
         return refuseBody();
-    entryName = std::move(*name);
+    if (name)
+        entryName = std::move(*name);
     request.transport = transport;
     request.method = method;
+}
+
+void Exchange::setKnownTag(const char* tag) {
+    if (siteRequest)
+        siteRequest->knownTag = tag;
 }
 
 bool Exchange::take(const char* data, std::size_t size) {
@@ -84,6 +93,8 @@ bool Exchange::take(const char* data, std::size_t size) {
 void Exchange::run(const Plugin& plugin) {
     if (answered)
         return;
+    if (siteRequest)
+        return answerFromSite();
     Entry entry(entryName);
     if (!plugin.run(entry, request) || !isSendable(request))
         fail();
@@ -94,6 +105,14 @@ void Exchange::answer(int code, std::string_view text) {
     request = ws_Request();
     request.code = code;
     request.output = text;
+}
+
+void Exchange::answerFromSite() {
+    SiteResponse response = site->answer(*siteRequest);
+    answer(response.code, response.body);
+    request.type = response.type;
+    for (Header& header : response.headers)
+        responseHeaders.push_back(std::move(header));
 }
 
 void Exchange::refuseBody() {

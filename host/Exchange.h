@@ -10,6 +10,7 @@
 #include "host/OriginPolicy.h"
 #include "host/Plugin.h"
 #include "host/Request.h"
+#include "host/Site.h"
 
 namespace host {
 
@@ -20,8 +21,9 @@ namespace host {
 // is cut off while it writes would often never see the response.
 class Exchange {
   public:
-    // maxBody: the most bytes of body that are kept.
-    Exchange(Gate& gate, uint32_t maxBody) noexcept;
+    // maxBody: the most bytes of body that are kept. site: what the host serves besides the
+    // service; null for nothing. It must outlive the exchange.
+    Exchange(Gate& gate, uint32_t maxBody, const Site* site = nullptr) noexcept;
     ~Exchange();
     Exchange(const Exchange&) = delete;
     Exchange& operator=(const Exchange&) = delete;
@@ -33,11 +35,14 @@ class Exchange {
     void begin(const char* transport, const char* method, std::string_view path,
                const char* declaredLength);
 
+    // Takes in what else the site wants to know of the head, after the rest of it.
+    void setKnownTag(const char* tag);
+
     // Takes in the next piece of the body. False when the client has sent so much beyond the limit
     // that the connection is to be dropped.
     bool take(const char* data, std::size_t size);
 
-    // Has the plug-in serve the request, unless the host has answered it.
+    // Has the plug-in or the site serve the request, unless the host has answered it.
     void run(const Plugin& plugin);
 
     // Whether the host has its response already, without the plug-in.
@@ -51,12 +56,15 @@ class Exchange {
 
   private:
     void answer(int code, std::string_view text);
+    void answerFromSite();
     void refuseBody();
     void fail();
 
     Gate& gate;
     const bool admitted;
     const uint32_t maxBody;
+    const Site* const site;
+    std::optional<SiteRequest> siteRequest;  // of a request that the site answers
     ws_Request request;
     std::vector<uint32_t> entryName;
     std::vector<Header> responseHeaders;

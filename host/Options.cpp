@@ -17,6 +17,7 @@ constexpr const char* kIntroduction = R"(Usage: qitrmc-host [OPTION]...
 
 Serves the web service plug-in of an instrument chassis over HTTP, for development and tests.
 The service answers POST requests at /qitrmc/Call; GET /openrpc.json describes it for machines.
+A page for a browser is at /.
 )";
 
 constexpr const char* kNotes =
@@ -140,6 +141,10 @@ constexpr OptionWithValue kOptionsWithValue[] = {
      "the plug-in (libqitrmcsvc.so in ../lib beside the program's\n"
      "folder, or in it)",
      setPath<&Options::plugin>},
+    {"--web", "DIR",
+     "the page for a browser, served at / (../share/web beside the\n"
+     "program's folder); its files are read once, at the start",
+     setPath<&Options::web>},
     {"--chassis", "FILE",
      "the chassis that the simulated driver shows\n"
      "(QITRMC_SIM_CHASSIS)",

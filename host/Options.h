@@ -12,6 +12,7 @@ struct Options {
     std::string address = "127.0.0.1";    // a name or number, IPv6 without its brackets
     std::string port = "8080";            // decimal; "0" takes a free one
     std::string plugin;                   // path; empty: look beside the program
+    std::string web;                      // folder; empty: look beside the program
     std::string chassis;                  // path; empty: leave the driver's own choice
     std::string state;                    // path; empty: leave the driver's own choice
     std::string faults;                   // path; empty: leave the driver's own choice

@@ -137,11 +137,13 @@ struct Server::Callbacks {
         if (client == nullptr)
             return MHD_NO;
         client->waitForClient();
-        auto* exchange = new Exchange(server.gate, server.settings.maxBody);
+        auto* exchange = new Exchange(server.gate, server.settings.maxBody, &server.site);
         *state = exchange;
         exchange->admit(server.policy.judge(sourceOf(connection, method)));
         exchange->begin(server.settings.tls && server.settings.passTransport ? "https" : "http",
                         method, path, headerOf(connection, MHD_HTTP_HEADER_CONTENT_LENGTH));
+        if (const char* tag = headerOf(connection, MHD_HTTP_HEADER_IF_NONE_MATCH))
+            exchange->setKnownTag(tag);
         // A client that asks before it sends a body can be spared sending it.
         const bool asksFirst = headerOf(connection, MHD_HTTP_HEADER_EXPECT) != nullptr;
         return exchange->isAnswered() && asksFirst ? end(server, connection, *exchange) : MHD_YES;
@@ -164,11 +166,12 @@ struct Server::Callbacks {
 };
 
 Server::Server(const Plugin& plugin, ListenSocket& socket, ServerSettings wanted,
-               const OriginPolicy& policy)
+               const OriginPolicy& policy, const Site& site)
     : plugin(plugin),
       socket(socket),
       settings(std::move(wanted)),
       policy(policy),
+      site(site),
       connections(settings.threads, settings.timeout),
       daemon(startDaemon(), MHD_stop_daemon) {
     if (!daemon) {

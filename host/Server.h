@@ -11,6 +11,7 @@
 #include "host/ListenSocket.h"
 #include "host/OriginPolicy.h"
 #include "host/Plugin.h"
+#include "host/Site.h"
 
 struct MHD_Daemon;
 
@@ -30,10 +31,10 @@ struct ServerSettings {
 // for another one's request.
 class Server {
   public:
-    // Starts to serve. The plug-in, the socket and the policy must outlive the server. Throws
-    // Failure.
+    // Starts to serve. The plug-in, the socket, the policy and the site must outlive the server.
+    // Throws Failure.
     Server(const Plugin& plugin, ListenSocket& socket, ServerSettings settings,
-           const OriginPolicy& policy);
+           const OriginPolicy& policy, const Site& site);
 
     // Cuts the connections that are left. Returns when no request is in the plug-in any more.
     ~Server();
@@ -59,6 +60,7 @@ class Server {
     ListenSocket& socket;
     const ServerSettings settings;
     const OriginPolicy& policy;
+    const Site& site;
     Connections connections;
     Gate gate;
     std::unique_ptr<MHD_Daemon, void (*)(MHD_Daemon*)> daemon;

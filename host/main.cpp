@@ -18,6 +18,8 @@
 #include "host/Plugin.h"
 #include "host/Server.h"
 #include "host/SimulatedDriver.h"
+#include "host/Site.h"
+#include "host/StaticFiles.h"
 
 namespace {
 
@@ -80,6 +82,11 @@ host::OriginPolicy policyOf(const Options& options) {
     return {options.tlsKey.empty() ? "http" : "https", names, options.allowedOrigins};
 }
 
+host::Site siteOf(const Options& options) {
+    const std::string folder = options.web.empty() ? host::findPage() : options.web;
+    return host::Site(folder.empty() ? host::StaticFiles() : host::StaticFiles(folder));
+}
+
 sigset_t endSignals() {
     sigset_t signals;
     sigemptyset(&signals);
@@ -116,10 +123,13 @@ void finishRequests(host::Server& server) {
 
 void serve(const host::Plugin& plugin, host::ListenSocket& socket,
            const host::ServerSettings& settings, const host::OriginPolicy& policy,
-           const std::string& chassis) {
-    host::Server server(plugin, socket, settings, policy);
-    std::printf("Listening on %s://%s/qitrmc/Call\n%s", settings.tls ? "https" : "http",
-                socket.authority().c_str(), chassis.c_str());
+           const host::Site& site, const std::string& chassis) {
+    host::Server server(plugin, socket, settings, policy, site);
+    const std::string url =
+        std::string(settings.tls ? "https" : "http") + "://" + socket.authority();
+    std::printf("Listening on %s/qitrmc/Call\n%s", url.c_str(), chassis.c_str());
+    if (site.hasPage())
+        std::printf("Open %s/ in a browser.\n", url.c_str());
     std::fflush(stdout);
     serveUntilSignal(server);
     finishRequests(server);
@@ -137,12 +147,13 @@ void runHost(const Options& options) {
     takeChargeOfSignals();
     configureDriver(options);
     const host::ServerSettings settings = settingsOf(options);
+    const host::Site site = siteOf(options);
     host::ListenSocket socket(options.address, options.port);
     const host::Plugin plugin(options.plugin.empty() ? host::findPlugin() : options.plugin);
     const std::string chassis = host::startSimulatedDriver();
     plugin.initialize();
     try {
-        serve(plugin, socket, settings, policyOf(options), chassis);
+        serve(plugin, socket, settings, policyOf(options), site, chassis);
     } catch (...) {
         plugin.finalize();
         throw;
