@@ -1,0 +1,3 @@
+import { eng, type Texts } from "./eng.ts";
+
+export const fra: Texts = eng;
