@@ -10,6 +10,11 @@ async function setRange(page, value) {
   await range(page).press("Enter");
 }
 
+// Done when the service has taken the value.
+async function waitUntilSet(page) {
+  await page.locator("form.value-field").filter({ has: range(page) }).getByRole("button").first().waitFor({ state: "detached" });
+}
+
 // The answer to a request that names a session tells whether it is open.
 async function isOpen(host, session_id) {
   const { result } = await host.call("getProperty", { session_id, property: "Session.ReservedDevices" });
@@ -58,7 +63,7 @@ test("lets two pages take turns with a device", async () => {
   await setRange(first, "5");
   await first.getByText("Reserved by this page").waitFor();
   const second = await open(host, "#/module/Mod1");
-  await second.getByText(/Mod1 is in use by _session1 \(Web page \w+\)\./).waitFor();
+  await second.getByText(/Mod1 is in use by _session1 \(another web page\)\./).waitFor();
   await second.getByRole("button", { name: "Wait for it" }).click();
   await second.getByText("Waiting for Mod1…").waitFor();
   await first.getByRole("button", { name: "Release" }).click();
@@ -83,7 +88,7 @@ test("goes on after a restart of the service under an open page", async () => {
   const host = await Host.start();
   const page = await open(host, "#/module/Mod1");
   await setRange(page, "5");
-  await page.getByText("Reserved by this page").waitFor();
+  await waitUntilSet(page);
   await host.stop();
   const again = await Host.start([], host.port);
   await page.getByText("Connected").waitFor();

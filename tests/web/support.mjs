@@ -14,7 +14,7 @@ const require = createRequire(path.join(ROOT, "web/package.json"));
 export const axeSource = () => require.resolve("axe-core/axe.min.js");
 
 // Far more than anything here takes on a busy machine.
-export const PATIENCE = 60_000;
+export const PATIENCE = 30_000;
 // Chromium looks for nothing outside of the machine with these.
 const SWITCHES = ["--disable-gpu", "--disable-quic", "--no-first-run", "--disable-background-networking",
   "--disable-component-update", "--disable-sync"];

@@ -19,7 +19,7 @@ export interface Device {
 
 export interface Holder {
   session: string;
-  comment: string;
+  isPage: boolean; // of another page like this one
   devices: string[];
 }
 

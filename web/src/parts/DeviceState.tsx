@@ -14,7 +14,7 @@ export function Temperature({ device }: { device: Device }) {
 }
 
 export function describeHolder(holder: Holder): string {
-  return holder.comment ? `${holder.session} (${holder.comment})` : holder.session;
+  return holder.isPage ? `${holder.session} (${texts().anotherPage})` : holder.session;
 }
 
 export function useHolder(name: string): Holder | undefined {

@@ -49,8 +49,11 @@ function Pager({ start, size, go }: { start: number; size: number; go: (start: n
 
 function ImportButton({ accept }: { accept: (bytes: Uint8Array) => void }) {
   const read = async (event: Event) => {
-    const file = (event.currentTarget as HTMLInputElement).files?.[0];
-    if (file) accept(new Uint8Array(await file.arrayBuffer()));
+    const field = event.currentTarget as HTMLInputElement;
+    const file = field.files?.[0];
+    if (!file) return;
+    accept(new Uint8Array(await file.arrayBuffer()));
+    field.value = ""; // else the same file could not be chosen again
   };
   return <label class="button">{texts().importFile}<input type="file" class="hidden-file" onChange={read} /></label>;
 }

@@ -4,7 +4,10 @@ import { statusCodes } from "../../../clients/typescript/qitrmc.ts";
 import { current, update } from "../store.ts";
 import { call, requestText, SERVICE, ServiceError } from "./rpc.ts";
 
-const COMMENT = `Web page ${Math.random().toString(36).slice(2, 6)}`;
+// The timeout of the session, in seconds, with a fraction that is this page's own. It marks the
+// session; the comment of a session would tell more, but cannot be read.
+const USUAL_TIMEOUT = 10;
+const MARK = USUAL_TIMEOUT + (1 + Math.floor(Math.random() * 999_998)) / 1_000_000;
 const TIME_BETWEEN_ATTEMPTS = 1000;
 
 let opening: Promise<string> | null = null;
@@ -19,7 +22,7 @@ export function session(): Promise<string> {
 async function openSession(): Promise<string> {
   const { session_id } = await call("initializeSession", {});
   update({ session: session_id, reserved: [] });
-  await call("setProperty", { session_id, property: "Session.Comment", value: COMMENT }).catch(ignoreRefusal);
+  await call("setProperty", { session_id, property: "Session.Timeout", value: MARK }).catch(ignoreRefusal);
   return session_id;
 }
 
@@ -32,13 +35,17 @@ export function forgetSession(): void {
   update({ session: null, reserved: [], waiting: [] });
 }
 
+export function isMark(timeout: unknown): boolean {
+  return typeof timeout === "number" && timeout > USUAL_TIMEOUT && timeout < USUAL_TIMEOUT + 1;
+}
+
 // A restarted service gives the ids of former sessions out again, so an id alone does not tell whose
 // a session is.
 export async function checkSession(): Promise<void> {
   const session_id = await session();
   try {
-    const { value } = await call("getProperty", { session_id, property: "Session.Comment" });
-    if (value !== COMMENT) forgetSession();
+    const { value } = await call("getProperty", { session_id, property: "Session.Timeout" });
+    if (value !== MARK) forgetSession();
   } catch (failure) {
     ignoreRefusal(failure);
     if ((failure as ServiceError).code === statusCodes.unknownSession) forgetSession();

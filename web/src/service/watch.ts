@@ -3,7 +3,7 @@ import { statusCodes, type Methods } from "../../../clients/typescript/qitrmc.ts
 import { current, update, type Device, type Holder } from "../store.ts";
 import { texts } from "../texts/texts.ts";
 import { call, ServiceError } from "./rpc.ts";
-import { checkSession, ignoreRefusal, session } from "./session.ts";
+import { checkSession, ignoreRefusal, isMark, session } from "./session.ts";
 
 const PERIOD = 900;
 const CHASSIS = 1;
@@ -107,16 +107,16 @@ function announceChanges(before: Device[], now: Device[]): void {
 
 const openSessions = new Set<number>();
 let newest = 0;
+let latestOwn = 0;
 
 // Who holds a device is told by the sessions themselves.
 async function watchHolders(): Promise<void> {
   const own = Number((await session()).replace("_session", ""));
-  if (newest === 0 || own < newest) {
+  if (own !== latestOwn) { // at first, and after each restart of the service
     openSessions.clear();
-    newest = own;
+    latestOwn = newest = own;
     for (let id = Math.max(1, own - SESSIONS_BACK); id < own; ++id) openSessions.add(id);
   }
-  newest = Math.max(newest, own);
   const ahead = Array.from({ length: SESSIONS_AHEAD }, (_, i) => newest + 1 + i);
   const ids = [...openSessions, ...ahead].filter((id) => id !== own);
   const holders = await Promise.all(ids.map(holderOf));
@@ -134,6 +134,6 @@ async function holderOf(id: number): Promise<Holder | null> {
   openSessions.add(id);
   newest = Math.max(newest, id);
   if (devices.length === 0) return null;
-  const comment = (await readOf("Session.Comment"))?.value as string | undefined;
-  return { session: session_id, comment: comment ?? "", devices };
+  const timeout = (await readOf("Session.Timeout"))?.value;
+  return { session: session_id, isPage: isMark(timeout), devices };
 }

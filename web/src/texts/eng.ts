@@ -8,6 +8,7 @@ export const eng = {
   slot: "Slot", serial: "Serial number", firmware: "Firmware",
   heldByPage: "Reserved by this page", heldBy: (session: string) => `In use: ${session}`,
   heldByLong: (device: string, holder: string) => `${device} is in use by ${holder}. You can look, but not change anything.`,
+  anotherPage: "another web page",
   reserve: "Reserve", release: "Release", wait: "Wait for it",
   waitingFor: (device: string) => `Waiting for ${device}…`, stopWaiting: "Stop waiting",
   moduleGone: (name: string) => `${name} has been removed.`, moduleAdded: (name: string) => `${name} is there now.`,
