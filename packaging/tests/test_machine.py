@@ -1,0 +1,98 @@
+"""A bare Debian machine gets the packages and nothing else of this project."""
+
+import json
+import re
+
+import pytest
+
+import machine
+import pages
+
+SERVICE = ("libqitrmcsvc", "qitrmc-host", "qitrmc-simulator")
+URL = "http://127.0.0.1:8081/qitrmc/Call"
+SWITCH = "/etc/qinstal/share/qitrmc.ini"
+INSTALL = "apt-get install -qq -y --no-install-recommends ./*.deb >/dev/null"
+SERVE = f"""
+LD_LIBRARY_PATH=/usr/lib/qitrmc/simulator qitrmc-host \\
+  --plugin /usr/lib/qitrmc/plugin/libqitrmcsvc.so --listen 127.0.0.1:8081 >/tmp/host.log 2>&1 &
+call() {{ curl -s --retry 20 --retry-connrefused -w '\\n%{{http_code}}' {URL} -d "$1"; }}
+"""
+OPEN = '{"jsonrpc": "2.0", "id": 1, "method": "initializeSession"}'
+OPENED = '{"jsonrpc":"2.0","id":1,"result":{"session_id":"_session1"}}\n200'
+WRONG = ('{"jsonrpc": "2.0", "id": 1, "method": "closeSession", "params": {"session_id": "_session9"}}')
+
+
+@pytest.fixture
+def installed(debian):
+    found = machine.packages("amd64")
+    debian.bring(*(found[name] for name in SERVICE))
+    debian.output(INSTALL)
+    return debian
+
+
+def test_the_packages_alone_serve_and_find_their_words(installed):
+    answers = installed.output(f"{SERVE} call '{OPEN}'; echo; call '{WRONG}'").split("\n")
+    assert "\n".join(answers[:2]) == OPENED
+    error = json.loads(answers[2])["error"]
+    assert error["code"] == -32000
+    assert "_session9" in json.dumps(error) and "not found" not in error["message"]
+    assert answers[3] == "200"
+
+
+@pytest.mark.parametrize("change", [
+    f"rm {SWITCH}", f"sed -i 's/1/0/' {SWITCH}", f"head -c 4096 /dev/urandom >{SWITCH}",
+    f"rm {SWITCH}; mkdir {SWITCH}"], ids=["absent", "off", "broken", "a folder"])
+def test_without_the_switch_the_service_is_off(installed, change):
+    answer = installed.output(f"{change}; {SERVE} call '{OPEN}'")
+    assert answer.endswith("\n404")
+    assert "disabled" in answer
+
+
+def test_without_explanation_files_failures_are_answered_with_500(installed):
+    answers = installed.output(
+        f"rm -r /usr/local/qinstal; {SERVE} call '{OPEN}'; echo; call '{WRONG}'").split("\n")
+    assert (answers[1], answers[-1]) == ("200", "500")
+
+
+def test_the_stand_in_is_not_found_unless_its_folder_is_named(installed):
+    result = installed.run("qitrmc-host --plugin /usr/lib/qitrmc/plugin/libqitrmcsvc.so --listen 127.0.0.1:0")
+    assert result.returncode == 1
+    assert "libqitrmcapi.so.1" in result.stderr
+
+
+def test_an_upgrade_keeps_the_settings_and_a_purge_removes_them(installed):
+    installed.output(f"""
+      echo '# mine' >>{SWITCH}
+      echo 'OPTIONS=--threads=3' >>/etc/default/qitrmc-host
+      for package in *.deb; do
+        dpkg-deb -R $package new
+        sed -i 's/^Version: .*/&.1/; s/(= \\([0-9.]*\\))/(= \\1.1)/' new/DEBIAN/control
+        dpkg-deb --root-owner-group -b new /tmp/new-$package >/dev/null
+        rm -r new
+      done
+      dpkg -i /tmp/new-*.deb >/dev/null
+      [ "$(tail -n 1 {SWITCH})" = '# mine' ]
+      grep -q threads=3 /etc/default/qitrmc-host
+      {SERVE} [ "$(call '{OPEN}' | tail -n 1)" = 200 ]""")
+    installed.output(f"dpkg -r {' '.join(SERVICE)} >/dev/null; [ -f {SWITCH} ] && ! [ -e /usr/lib/qitrmc ]")
+    installed.output(f"dpkg -P {' '.join(SERVICE)} >/dev/null")
+    left = installed.output("find / -xdev -ipath '*qitrmc*' -not -path '/packages*' -not -path '/tmp/*' "
+                            "-not -path '/proc/*'; find /etc/qinstal /usr/local/qinstal 2>/dev/null || true")
+    assert left == ""
+
+
+def test_the_documented_files_are_those_that_dpkg_lists(installed):
+    for name in SERVICE:
+        listed = set(installed.output(f"dpkg -L {name}").split("\n"))
+        assert pages.documented_files()[name] <= listed
+
+
+def test_the_systemd_units_are_correct_and_hardened(installed):
+    for unit in ("qitrmc-host.service", "qitrmc-host@rack2.service"):
+        result = installed.run(f"systemd-analyze verify --man=no {unit}")
+        assert (result.returncode, result.stdout, result.stderr) == (0, "", ""), unit
+    exposure = installed.output("systemd-analyze security --offline=true --no-pager"
+                                " /lib/systemd/system/qitrmc-host.service")
+    assert float(re.search(r"Overall exposure level.*: ([\d.]+)", exposure)[1]) <= 1.5
+
+
