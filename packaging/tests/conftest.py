@@ -42,10 +42,11 @@ def packages(request, tmp_path_factory):
             for name, path in machine.packages(request.param).items()}
 
 
-@pytest.fixture
+@pytest.fixture(scope="session")
 def debian():
-    """A machine of its own with nothing installed."""
+    """A machine with our packages at hand and nothing installed."""
     if os.geteuid() != 0:
         pytest.skip("a machine in a folder needs root")
-    with machine.machine() as running:
-        yield running
+    with machine.machine() as bare:
+        bare.bring(*machine.packages("amd64").values())
+        yield bare

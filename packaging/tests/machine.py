@@ -17,7 +17,7 @@ PACKAGES = ROOT / "build" / "packages"
 SOURCES = sorted(pathlib.Path("/etc/apt/sources.list.d").glob("*.sources"))
 
 # systemd brings the checker of the units; it does not run here.
-INCLUDED = "curl,systemd"
+INCLUDED = "curl,openssl,systemd"
 
 # Starts the program of a unit as systemctl does, with its settings, but without the hardening.
 SYSTEMCTL = r"""#!/bin/bash
@@ -60,11 +60,15 @@ class Machine:
         stand_in = root / "usr/local/sbin/systemctl"
         stand_in.write_text(SYSTEMCTL)
         stand_in.chmod(0o755)
+        # The scripts of packages start nothing.
+        policy = root / "usr/sbin/policy-rc.d"
+        policy.write_text("#!/bin/sh\nexit 101\n")
+        policy.chmod(0o755)
         (root / "packages").mkdir()
 
-    def bring(self, *paths):
-        """Copies packages into /packages, and into the cache of apt all that they depend on, so that
-        apt needs no network."""
+    def bring(self, *paths, names=()):
+        """Copies packages into /packages, and into the cache of apt all that they and the packages of
+        Debian in `names` depend on, so that apt needs no network."""
         for path in paths:
             shutil.copy(path, self.root / "packages")
         archives = CACHE / "archives"
@@ -80,27 +84,42 @@ class Machine:
             subprocess.run(["apt-get", *options, "update"], check=True)
             (state / "updated").touch()
         subprocess.run(["apt-get", *options, "install", "-y", "--download-only",
-                        "--no-install-recommends", *paths], check=True, stdout=subprocess.DEVNULL)
+                        "--no-install-recommends", *paths, *names], check=True, stdout=subprocess.DEVNULL)
         for path in archives.glob("*.deb"):
             shutil.copy(path, self.root / "var/cache/apt/archives")
         shutil.copytree(state / "lists", self.root / "var/lib/apt/lists", dirs_exist_ok=True)
 
-    def run(self, script):
-        """Runs a script of bash in /packages as root, and ends all that it has started with it.
-        The network is a loopback device that nothing else uses."""
-        inside = ('ip link set lo up && mount -t proc proc "$0/proc" && '
-                  'exec chroot "$0" /bin/bash -euo pipefail -c "cd /packages; $1"')
-        return subprocess.run(
-            ["unshare", "--net", "--mount", "--pid", "--fork", "--kill-child",
-             "bash", "-c", inside, self.root, script],
-            capture_output=True, text=True, timeout=240,
-            env={"PATH": os.environ["PATH"] + ":/usr/sbin:/sbin", "HOME": "/root", "LC_ALL": "C.UTF-8",
-                 "DEBIAN_FRONTEND": "noninteractive"})
+    def run(self, script, keep=False):
+        """Runs a script of bash in /packages as root, on a copy of the machine that is gone afterwards
+        with all that was started, unless it is to be kept. The network is a loopback device that
+        nothing else uses."""
+        copy = ('mount -t tmpfs tmpfs "$2" && mkdir "$2/new" "$2/work" "$2/root" && mount -t overlay '
+                'overlay -o lowerdir="$0",upperdir="$2/new",workdir="$2/work" "$2/root" && set -- '
+                '"$1" "$2/root" && ')
+        inside = ('ip link set lo up && set -- "$1" "${2:-$0}" && ' + ("" if keep else copy)
+                  + 'mount -t proc proc "$2/proc" && '
+                  'exec chroot "$2" /bin/bash -euo pipefail -c "cd /packages; $1"')
+        with tempfile.TemporaryDirectory(prefix="qitrmc-copy-") as place:
+            return subprocess.run(
+                ["unshare", "--net", "--mount", "--pid", "--fork", "--kill-child",
+                 "bash", "-c", inside, self.root, script, *([] if keep else [place])],
+                capture_output=True, text=True, timeout=240,
+                env={"PATH": os.environ["PATH"] + ":/usr/sbin:/sbin", "HOME": "/root",
+                     "LC_ALL": "C.UTF-8", "DEBIAN_FRONTEND": "noninteractive"})
 
-    def output(self, script):
-        result = self.run(script)
+    def output(self, script, keep=False):
+        result = self.run(script, keep)
         assert result.returncode == 0, (script, result.stdout, result.stderr)
         return result.stdout
+
+    def install(self, *names):
+        """Installs packages of ours and of Debian, for good."""
+        found = {**packages("amd64")}
+        ours = [found[name] for name in names if name in found]
+        debian = [name for name in names if name not in found]
+        self.bring(*ours, names=debian)
+        self.output("apt-get install -qq -y --no-install-recommends "
+                    + " ".join([f"./{path.name}" for path in ours] + debian) + " >/dev/null", keep=True)
 
 
 @contextlib.contextmanager

@@ -27,3 +27,8 @@ def commands(heading):
     section = re.search(rf"^## {re.escape(heading)}\n(.*?)(?=^## |\Z)", PAGE, re.MULTILINE | re.DOTALL)
     blocks = re.findall(r"(?:^    .*\n)+", section[1], re.MULTILINE)
     return [re.sub(r"^    ", "", block, flags=re.MULTILINE) for block in blocks]
+
+
+def headings():
+    """The names of all sections."""
+    return re.findall(r"^## (.*)$", PAGE, re.MULTILINE)

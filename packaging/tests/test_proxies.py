@@ -1,0 +1,187 @@
+"""The example configurations of web servers in front of two chassis, as they are shipped."""
+
+import json
+import os
+import shutil
+
+import pytest
+
+import machine
+
+OPEN = '{"jsonrpc": "2.0", "id": 1, "method": "initializeSession"}'
+
+PREPARE = r"""
+mkdir -p /etc/qitrmc-proxy /etc/qitrmc-host
+cd /etc/qitrmc-proxy
+authority() { openssl req -x509 -newkey rsa:2048 -nodes -days 30 -subj "/CN=$1" -keyout $1.key -out $1.pem; }
+client() {
+  openssl req -newkey rsa:2048 -nodes -subj "/CN=$1" -keyout $1.key -out $1.csr
+  openssl x509 -req -in $1.csr -CA $2.pem -CAkey $2.key -CAcreateserial -days 30 -out $1.pem
+}
+{ authority server; authority clients; authority strangers
+  client lab clients; client stranger strangers; } >/dev/null 2>&1
+"""
+
+# Both chassis, and call NAME OPTIONS...: prints the body and the status of a request to rack.example.
+CHASSIS = r"""
+cp /usr/share/doc/qitrmc-host/examples/instance.conf /etc/qitrmc-host/rack2.conf
+systemctl start qitrmc-host
+systemctl start qitrmc-host@rack2
+wait_for() { curl -sk -o /dev/null --retry 50 --retry-delay 0 --retry-max-time 60 --retry-connrefused "$@"; }
+wait_for http://127.0.0.1:8080/
+wait_for http://127.0.0.1:8082/
+cd /etc/qitrmc-proxy
+call() {
+  curl -sk --resolve '*:443:127.0.0.1' -o /tmp/body -w '%{http_code}' "https://$@" >/tmp/status || true
+  cat /tmp/status; echo
+}
+post() { call "$@" -d "$BODY"; }
+known='-u lab:secret'
+"""
+
+NGINX = r"""
+echo "lab:$(openssl passwd -apr1 secret)" >passwords
+cp /proxy/nginx.conf /etc/nginx/conf.d/qitrmc.conf
+nginx
+wait_for --resolve '*:443:127.0.0.1' https://rack.example/
+"""
+HAPROXY = r"""
+cat server.key >>server.pem
+sed "s#\$6\$qitrmc\$INSERT.A.HASH#$(openssl passwd -6 secret)#" /proxy/haproxy.cfg >/etc/haproxy/haproxy.cfg
+haproxy -D -f /etc/haproxy/haproxy.cfg
+wait_for -u lab:secret --retry-all-errors --fail --resolve '*:443:127.0.0.1' https://rack.example/rack2/qitrmc/Call -d '{}'
+"""
+
+
+@pytest.fixture(scope="module", params=["nginx", "haproxy"])
+def proxied(request):
+    """Runs a script on a machine with two chassis and a proxy, and gives its lines."""
+    if os.geteuid() != 0:
+        pytest.skip("a machine in a folder needs root")
+    package, start = {"nginx": ("nginx-light", NGINX), "haproxy": ("haproxy", HAPROXY)}[request.param]
+    with machine.machine() as debian:
+        debian.install("libqitrmcsvc", "qitrmc-host", "qitrmc-simulator", package)
+        shutil.copytree(machine.ROOT / "packaging/proxy", debian.root / "proxy")
+        debian.output(PREPARE, keep=True)
+
+        def run(script):
+            return debian.output(f"{CHASSIS}BODY='{OPEN}'\n{start}{script}").split("\n")[:-1]
+        run.name = request.param
+        yield run
+
+
+def test_strangers_are_kept_out(proxied):
+    assert proxied("""
+      post rack.example/rack1/qitrmc/Call
+      post rack.example/rack1/qitrmc/Call -u lab:wrong
+      post rack.example/rack1/qitrmc/Call -u other:secret
+    """) == ["401", "401", "401"]
+
+
+def test_a_certificate_of_another_authority_is_refused(proxied):
+    answers = proxied("post rack.example/rack1/qitrmc/Call --cert stranger.pem --key stranger.key")
+    assert answers == [{"nginx": "400", "haproxy": "000"}[proxied.name]]
+
+
+def test_a_password_or_a_certificate_lets_through(proxied):
+    answers = proxied("""
+      post rack.example/rack1/qitrmc/Call $known; cat /tmp/body; echo
+      post rack.example/rack1/qitrmc/Call --cert lab.pem --key lab.key; cat /tmp/body; echo
+    """)
+    assert answers[0] == answers[2] == "200"
+    opened = [json.loads(answer)["result"]["session_id"] for answer in answers[1::2]]
+    assert len(set(opened)) == 2
+
+
+def test_each_chassis_is_reached_by_its_path_and_by_its_name(proxied):
+    # Only the first chassis has these devices.
+    answers = proxied("""
+      show() {
+        BODY='{"jsonrpc":"2.0","id":1,"method":"initializeSession","params":{"devices":["'$2'"]}}'
+        post $1/qitrmc/Call $known
+        grep -c session_id /tmp/body || true
+      }
+      show rack.example/rack1 Mod1
+      show rack.example/rack2 Mod1
+      show rack1.example Mod2
+      show rack2.example Mod2
+      post rack.example/qitrmc/Call $known
+      post rack.example/rack3/qitrmc/Call $known
+    """)
+    assert answers == ["200", "1", "200", "0", "200", "1", "200", "0", "404", "404"]
+
+
+def test_foreign_pages_are_refused_and_known_ones_are_not(proxied):
+    assert proxied("""
+      post rack.example/rack1/qitrmc/Call $known -H 'Origin: https://elsewhere.example'
+      post rack.example/rack1/qitrmc/Call $known -H 'Origin: null'
+      post rack.example/rack1/qitrmc/Call $known -H 'Origin: https://rack.example'
+    """) == ["403", "403", "200"]
+
+
+def test_other_methods_are_refused(proxied):
+    assert proxied("""
+      call rack.example/rack1/qitrmc/Call $known
+      call rack.example/rack1/qitrmc/Call $known -X PUT -d x
+    """) == ["403", "403"]
+
+
+def test_a_body_of_16_mib_passes_and_one_byte_more_is_refused(proxied):
+    assert proxied("""
+      { printf %s "$BODY"; head -c $((16777216 - ${#BODY})) /dev/zero | tr '\\0' ' '; } >/tmp/most
+      { cat /tmp/most; printf ' '; } >/tmp/more
+      call rack.example/rack1/qitrmc/Call $known -H Expect: --data-binary @/tmp/most
+      call rack.example/rack1/qitrmc/Call $known -H Expect: --data-binary @/tmp/more
+    """) == ["200", "413"]
+
+
+def test_too_many_requests_are_answered_with_429(proxied):
+    answers = proxied("""
+      printf 'url = "https://rack.example/rack1/qitrmc/Call"\\noutput = /dev/null\\n%.0s' $(seq 400) >/tmp/urls
+      curl -sk --resolve '*:443:127.0.0.1' $known -d "$BODY" -w '%{http_code}\\n' -K /tmp/urls | sort | uniq -c
+    """)
+    counts = {line.split()[1]: int(line.split()[0]) for line in answers}
+    assert set(counts) == {"200", "429"}
+    assert counts["200"] >= 100
+
+
+def test_the_answer_of_an_hour_is_waited_for(proxied):
+    name = {"nginx": "nginx.conf", "haproxy": "haproxy.cfg"}[proxied.name]
+    text = (machine.ROOT / "packaging/proxy" / name).read_text()
+    waits = {"nginx": ["proxy_read_timeout 3700s;"],
+             "haproxy": ["timeout client 3700s", "timeout server 3700s"]}[proxied.name]
+    assert all(wait in text for wait in waits)
+
+
+def test_the_check_notices_what_is_missing(proxied):
+    """Missing explanation files, and a driver that does not answer."""
+    answers = proxied("""
+      check() { /proxy/check-chassis http://127.0.0.1:8080/qitrmc/Call 2>&1 && echo "all is well"; }
+      check
+      mv /usr/local/qinstal /usr/local/away
+      check || true
+      mv /usr/local/away /usr/local/qinstal
+      for process in /proc/[0-9]*; do
+        if tr '\\0' ' ' <$process/cmdline | grep -q '^/usr/bin/qitrmc-host.*127.0.0.1:8080'; then
+          kill -STOP ${process#/proc/}
+        fi
+      done
+      check || true
+    """)
+    assert answers == ["all is well",
+                       "check-chassis: http://127.0.0.1:8080/qitrmc/Call has no explanation files",
+                       "check-chassis: http://127.0.0.1:8080/qitrmc/Call does not answer:"
+                       " look at the server and the driver"]
+
+
+def test_haproxy_takes_out_a_chassis_without_explanations(proxied):
+    if proxied.name != "haproxy":
+        pytest.skip("nginx does not look at the answers of checks")
+    assert proxied("""
+      post rack.example/rack1/qitrmc/Call $known
+      mv /usr/local/qinstal /usr/local/away
+      until [ "$(post rack.example/rack1/qitrmc/Call $known)" = 503 ]; do :; done
+      mv /usr/local/away /usr/local/qinstal
+      until [ "$(post rack.example/rack1/qitrmc/Call $known)" = 200 ]; do :; done
+      echo back
+    """) == ["200", "back"]
