@@ -1,5 +1,5 @@
 // One value that can be changed: its field, what is wrong with the entry, and what the service says.
-import { useState } from "preact/hooks";
+import { useRef, useState } from "preact/hooks";
 import { editable, isArray, itemType, parseEntry, type Information, type Value } from "../service/values.ts";
 import { texts } from "../texts/texts.ts";
 import { useAttempt } from "./useAsync.ts";
@@ -54,7 +54,9 @@ let fields = 0;
 export function ValueField({ label, information, value, pending, write }: Props) {
   const t = texts();
   const [id] = useState(() => `field-${++fields}`);
-  const [draft, setDraft] = useState<string | null>(null);
+  const [draft, showDraft] = useState<string | null>(null);
+  const latest = useRef(draft); // of an entry that is sent before it was drawn
+  const setDraft = (text: string | null) => { latest.current = text; showDraft(text); };
   const [entryFault, setEntryFault] = useState("");
   const { busy, fault, attempt, clear } = useAttempt();
   const shown = draft ?? editable(information, value);
@@ -71,8 +73,9 @@ export function ValueField({ label, information, value, pending, write }: Props)
   const giveUp = () => { setDraft(null); setEntryFault(""); clear(); };
   const send = async (event: Event) => {
     event.preventDefault();
-    if (draft === null || entryFault !== "") return;
-    if (await attempt(() => write(parseEntry(information, draft)))) setDraft(null);
+    const text = latest.current;
+    if (text === null) return;
+    if (await attempt(async () => write(parseEntry(information, text)))) setDraft(null);
   };
   const words = entryFault || fault;
   return (

@@ -2,11 +2,12 @@
 
 export type Json = null | boolean | number | bigint | string | Json[] | { [name: string]: Json };
 
-const TOKENS = /"(?:[^"\\]|\\.)*"|-?\d{16,}(?![\d.eE])/g;
+const TOKENS = /"(?:[^"\\]|\\.)*"|-?\d+(?:\.\d+)?(?:[eE][+-]?\d+)?/g;
+const LONG_INTEGER = /^-?\d{16,}$/;
 const MARK = "\u0001integer:";
 
 function markInteger(token: string): string {
-  const keepsItsValue = token[0] === '"' || Number.isSafeInteger(Number(token));
+  const keepsItsValue = !LONG_INTEGER.test(token) || Number.isSafeInteger(Number(token));
   return keepsItsValue ? token : JSON.stringify(MARK + token);
 }
 
