@@ -79,10 +79,13 @@ TEST(WideString, RefusesSizesBeyond32Bits) {
         GTEST_SKIP() << "such strings do not fit into the address space";
     }
     constexpr std::uintptr_t base = 0x1000;
-    EXPECT_EQ(lineOfRefusal(base, base + std::uintptr_t{4} * 0x3FFFFFFF), 163);
-    EXPECT_EQ(lineOfRefusal(base, base + std::uintptr_t{4} * 0xFFFFFFFE), 163);
-    EXPECT_EQ(lineOfRefusal(base, base + std::uintptr_t{4} * 0xFFFFFFFF), 125);
-    EXPECT_EQ(lineOfRefusal(base, base + std::uintptr_t{4} * 0x100000000), 125);
+    const auto endAfter = [](std::uint64_t characters) {
+        return static_cast<std::uintptr_t>(base + 4 * characters);
+    };
+    EXPECT_EQ(lineOfRefusal(base, endAfter(0x3FFFFFFF)), 163);
+    EXPECT_EQ(lineOfRefusal(base, endAfter(0xFFFFFFFE)), 163);
+    EXPECT_EQ(lineOfRefusal(base, endAfter(0xFFFFFFFF)), 125);
+    EXPECT_EQ(lineOfRefusal(base, endAfter(0x100000000)), 125);
 }
 
 TEST(WideString, RefusesAnEndBeforeItsBegin) {

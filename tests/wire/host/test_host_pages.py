@@ -1,10 +1,9 @@
 """What the host serves besides the service: the files of a page, and the description of the methods."""
 
-import json
 
 import pytest
 
-from hostlib import IDLE_SECONDS, Host, ROOT
+from hostlib import IDLE_SECONDS, Host
 
 POLICY = ("default-src 'none'; script-src 'self'; style-src 'self'; img-src 'self' data: blob:; "
           "connect-src 'self'; base-uri 'none'; form-action 'none'; frame-ancestors 'none'")
@@ -81,10 +80,3 @@ def test_a_folder_that_is_missing_ends_the_start():
     with pytest.raises(AssertionError, match="The folder nowhere of the page cannot be read: No such "
                                              "file or directory. Name a readable folder with --web."):
         Host(options=("--web", "nowhere"))
-
-
-def test_the_description_of_the_service_needs_no_page():
-    with Host() as running:
-        status, headers, body = running.request("GET", "/openrpc.json")
-    assert (status, headers["Content-Type"]) == (200, "application/json")
-    assert json.loads(body) == json.loads((ROOT / "docs" / "openrpc.json").read_text(encoding="utf-8"))
