@@ -11,6 +11,7 @@ test("shows a property with its description, type, limits and unit", async () =>
   const row = page.locator("tr", { hasText: "DMM.Range" });
   await row.getByText("The largest value that can be measured.").waitFor();
   await row.getByText("Double · 0.1 … 1000 · V").waitFor();
+  await field(page, "Mod1 DMM.Range").and(page.locator(":enabled")).waitFor();
   assert.equal(await field(page, "Mod1 DMM.Range").inputValue(), "10");
   assert.deepEqual(await field(page, "Mod1 DMM.Function").locator("option").allInnerTexts(),
     ["Voltage", "Current", "Resistance", "Temperature"]);
@@ -46,6 +47,7 @@ test("checks an entry before it sends it", async () => {
   }
   await field(page, "Mod1 DMM.Range").press("Escape");
   await set.waitFor({ state: "detached" });
+  await field(page, "Mod1 DMM.Range").and(page.locator(":enabled")).waitFor();
   assert.equal(await field(page, "Mod1 DMM.Range").inputValue(), "10");
 });
 

@@ -20,7 +20,7 @@ PATIENCE = 400
 MOST_BYTES = 120 * 1024  # of the whole page, compressed
 
 
-def tests():
+def browser_tests():
     for file in sorted(HERE.glob("*.test.mjs")):
         for name in re.findall(r'^test\("([^"]+)"', file.read_text(encoding="utf-8"), re.MULTILINE):
             yield pytest.param(file.name, name, id=f"{file.name.removesuffix('.test.mjs')}: {name}")
@@ -57,7 +57,7 @@ def results_of(file):
     return {line["name"]: line for line in lines}, node.stderr
 
 
-@pytest.mark.parametrize("file, name", tests())
+@pytest.mark.parametrize("file, name", browser_tests())
 def test_in_a_browser(page, file, name):
     if not CHROMIUM.exists():
         pytest.skip("chromium is not installed")

@@ -1,6 +1,5 @@
 """What the host serves besides the service: the files of a page, and the description of the methods."""
 
-
 import pytest
 
 from hostlib import IDLE_SECONDS, Host

@@ -17,13 +17,14 @@ interface EntryProps {
   information: Information;
   text: string;
   invalid: boolean;
+  disabled: boolean;
   describedBy: string;
   change: (text: string) => void;
 }
 
-function Entry({ label, information, text, invalid, describedBy, change }: EntryProps) {
+function Entry({ label, information, text, invalid, disabled, describedBy, change }: EntryProps) {
   const common = {
-    "aria-label": label, "aria-invalid": invalid, "aria-describedby": describedBy, value: text,
+    "aria-label": label, "aria-invalid": invalid, "aria-describedby": describedBy, value: text, disabled,
     onInput: (event: Event) => change((event.currentTarget as HTMLInputElement).value),
   };
   if (!isArray(information) && information.enum) {
@@ -60,6 +61,8 @@ export function ValueField({ label, information, value, pending, write }: Props)
   const [entryFault, setEntryFault] = useState("");
   const { busy, fault, attempt, clear } = useAttempt();
   const shown = draft ?? editable(information, value);
+  // An entry that begins before the value arrives would be mixed with it.
+  const awaitsValue = value === undefined && information.access !== "WriteOnly";
   const change = (text: string) => {
     clear();
     setDraft(text === editable(information, value) ? null : text);
@@ -81,7 +84,8 @@ export function ValueField({ label, information, value, pending, write }: Props)
   return (
     <form class={`value-field ${pending ? "pending" : ""}`} onSubmit={send} noValidate
           onKeyDown={(event) => { if (event.key === "Escape") giveUp(); }}>
-      <Entry label={label} information={information} text={shown} invalid={words !== ""} describedBy={id} change={change} />
+      <Entry label={label} information={information} text={shown} invalid={words !== ""}
+             disabled={awaitsValue} describedBy={id} change={change} />
       {draft !== null && <button type="submit" class="primary" disabled={busy || entryFault !== ""}>{t.set}</button>}
       {draft !== null && <button type="button" class="plain" onClick={giveUp} aria-label={t.undo} title={t.undo}>✕</button>}
       {pending && <span class="chip pending">{t.pending}</span>}
