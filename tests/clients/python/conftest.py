@@ -2,6 +2,7 @@
 
 import os
 import pathlib
+import signal
 import sys
 
 import pytest
@@ -13,6 +14,9 @@ sys.path.insert(0, str(SOURCES))
 # For programs that tests start.
 os.environ["PYTHONPATH"] = os.pathsep.join(filter(None, [str(SOURCES), os.environ.get("PYTHONPATH")]))
 os.environ["QITRMC_HOST"] = str(BUILD_DIR / "bin" / "qitrmc-host")
+# A shell starts its background jobs with SIGINT ignored, and the programs that tests start would inherit
+# that and not end on Ctrl-C.
+signal.signal(signal.SIGINT, signal.default_int_handler)
 
 import qitrmc  # from the sources
 from qitrmc.testing.pytest_plugin import qitrmc_chassis  # noqa: F401  the package is not installed here
