@@ -57,6 +57,10 @@ class Host:
         command = [str(self.program), "--listen", "127.0.0.1:0"]
         if plugin is not None:
             command += ["--plugin", str(plugin)]
+        if not any(str(option).startswith("--web") for option in options):
+            # Not the page that a build may have.
+            (self.directory / "no-page").mkdir()
+            command += ["--web", "no-page"]
         self._stderr = open(self.directory / "stderr", "wb")
         self.process = subprocess.Popen(
             command + [str(option) for option in options],
