@@ -109,7 +109,8 @@ const openSessions = new Set<number>();
 let newest = 0;
 let latestOwn = 0;
 
-// Who holds a device is told by the sessions themselves.
+// The service does not list its sessions, so the reserved devices are read from each session whose id is
+// near the newest known one.
 async function watchHolders(): Promise<void> {
   const own = Number((await session()).replace("_session", ""));
   if (own !== latestOwn) { // at first, and after each restart of the service
