@@ -7,6 +7,7 @@ find_package(Boost 1.74 REQUIRED)
 find_package(CLI11 REQUIRED)
 pkg_check_modules(utf8proc REQUIRED IMPORTED_TARGET libutf8proc)
 pkg_check_modules(microhttpd REQUIRED IMPORTED_TARGET libmicrohttpd)
+pkg_check_modules(prometheus REQUIRED IMPORTED_TARGET prometheus-cpp-core)
 
 find_path(RAPIDJSON_INCLUDE_DIR rapidjson/document.h REQUIRED)
 add_library(rapidjson INTERFACE)

@@ -1,11 +1,13 @@
 #include "host/Exchange.h"
 
+#include <chrono>
 #include <cstdlib>
 #include <new>
 #include <utility>
 
 #include "host/EntryName.h"
 #include "host/RequestTarget.h"
+#include "host/RpcError.h"
 #include "host/openRpcDocument.h"
 
 namespace host {
@@ -29,9 +31,20 @@ bool isSendable(const ws_Request& response) {
 }  // namespace
 
 Exchange::Exchange(Gate& gate, uint32_t maxBody, const Site* site) noexcept
-    : gate(gate), admitted(gate.enter()), maxBody(maxBody), site(site) {}
+    : gate(gate),
+      admitted(gate.enter()),
+      maxBody(maxBody),
+      site(site),
+      metrics(site == nullptr ? nullptr : site->metrics()) {
+    if (metrics != nullptr)
+        metrics->countBegunRequest();
+}
 
 Exchange::~Exchange() {
+    if (metrics != nullptr) {
+        metrics->countSentBytes(request.output.size());
+        metrics->countEndedRequest(ranPlugin ? Handler::service : Handler::host, outcome());
+    }
     if (admitted)
         gate.leave();
 }
@@ -76,6 +89,8 @@ void Exchange::setKnownTag(const char* tag) {
 }
 
 bool Exchange::take(const char* data, std::size_t size) {
+    if (metrics != nullptr)
+        metrics->countReceivedBytes(size);
     if (!answered && size > maxBody - request.body.size())
         refuseBody();
     if (answered) {
@@ -95,9 +110,25 @@ void Exchange::run(const Plugin& plugin) {
         return;
     if (siteRequest)
         return answerFromSite();
+    runPlugin(plugin);
+}
+
+void Exchange::runPlugin(const Plugin& plugin) {
+    const auto begin = std::chrono::steady_clock::now();
+    ranPlugin = true;
     Entry entry(entryName);
     if (!plugin.run(entry, request) || !isSendable(request))
         fail();
+    if (metrics != nullptr)
+        metrics->countTime(std::chrono::steady_clock::now() - begin);
+}
+
+Outcome Exchange::outcome() const {
+    if (!answered && !ranPlugin)
+        return Outcome::aborted;
+    if (request.code >= 400)
+        return Outcome::httpError;
+    return ranPlugin && hasRpcError(request.output) ? Outcome::rpcError : Outcome::ok;
 }
 
 void Exchange::answer(int code, std::string_view text) {

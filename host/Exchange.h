@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "host/Gate.h"
+#include "host/Metrics.h"
 #include "host/OriginPolicy.h"
 #include "host/Plugin.h"
 #include "host/Request.h"
@@ -22,7 +23,7 @@ namespace host {
 class Exchange {
   public:
     // maxBody: the most bytes of body that are kept. site: what the host serves besides the
-    // service; null for nothing. It must outlive the exchange.
+    // service, and where it counts; null for nothing. It must outlive the exchange.
     Exchange(Gate& gate, uint32_t maxBody, const Site* site = nullptr) noexcept;
     ~Exchange();
     Exchange(const Exchange&) = delete;
@@ -56,6 +57,8 @@ class Exchange {
 
   private:
     void answer(int code, std::string_view text);
+    void runPlugin(const Plugin& plugin);
+    Outcome outcome() const;
     void answerFromSite();
     void refuseBody();
     void fail();
@@ -64,12 +67,14 @@ class Exchange {
     const bool admitted;
     const uint32_t maxBody;
     const Site* const site;
+    Metrics* const metrics;                  // null for not counting
     std::optional<SiteRequest> siteRequest;  // of a request that the site answers
     ws_Request request;
     std::vector<uint32_t> entryName;
     std::vector<Header> responseHeaders;
     std::size_t discarded = 0;
     bool answered = false;
+    bool ranPlugin = false;
 };
 
 }  // namespace host

@@ -17,7 +17,7 @@ constexpr const char* kIntroduction = R"(Usage: qitrmc-host [OPTION]...
 
 Serves the web service plug-in of an instrument chassis over HTTP, for development and tests.
 The service answers POST requests at /qitrmc/Call; GET /openrpc.json describes it for machines.
-A page for a browser is at /.
+A page for a browser is at /, GET /healthz says whether the service works, GET /metrics counts.
 )";
 
 constexpr const char* kNotes =
@@ -216,6 +216,11 @@ void describeFlags(CLI::App& app, Options& options) {
     app.add_flag("--pass-transport", options.passTransport,
                  "shows the plug-in that a request came over HTTPS, which it\n"
                  "refuses; it sees plain HTTP without this option");
+    app.add_flag("--no-health", options.noHealth,
+                 "leaves out /healthz, which says whether the service works");
+    app.add_flag("--no-metrics", options.noMetrics,
+                 "leaves out /metrics, which counts requests in the text\n"
+                 "format of Prometheus");
     app.set_help_flag();
     app.add_flag_callback(
            "-h,--help", [] { throw CLI::CallForHelp(); }, "show this text")

@@ -27,6 +27,8 @@ struct Options {
     std::string tlsCertificate;               // path; both or neither of the two
     std::string tlsKey;
     bool passTransport = false;  // the plug-in sees "https" behind TLS
+    bool noHealth = false;       // no /healthz
+    bool noMetrics = false;      // no /metrics, and nothing is counted
 };
 
 // Every connection takes a thread and a file descriptor, of which a process has 1024.

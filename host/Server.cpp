@@ -94,12 +94,22 @@ struct Server::Callbacks {
     static void onConnection(void* context, MHD_Connection* connection, void** connectionContext,
                              MHD_ConnectionNotificationCode code) {
         Connections& connections = static_cast<Server*>(context)->connections;
+        countConnection(static_cast<Server*>(context)->site.metrics(), code);
         if (code == MHD_CONNECTION_NOTIFY_CLOSED) {
             connections.remove(static_cast<Connection*>(*connectionContext));
             return;
         }
         const auto* info = MHD_get_connection_info(connection, MHD_CONNECTION_INFO_CONNECTION_FD);
         *connectionContext = connections.add(info->connect_fd);
+    }
+
+    static void countConnection(Metrics* metrics, MHD_ConnectionNotificationCode code) {
+        if (metrics == nullptr)
+            return;
+        if (code == MHD_CONNECTION_NOTIFY_CLOSED)
+            metrics->countClosedConnection();
+        else
+            metrics->countOpenedConnection();
     }
 
     // The first line of a request is here. The result becomes the request's first state: none.

@@ -70,4 +70,15 @@ std::string thingsNotGivenBack() {
     return text;
 }
 
+std::optional<uint64_t> countDriverCalls() {
+    void* const driver = loadedDriver();
+    if (driver == nullptr)
+        return std::nullopt;
+    const auto countCalls =
+        functionOf<decltype(qitrmcsim_countCalls)>(driver, "qitrmcsim_countCalls");
+    if (countCalls == nullptr)
+        return std::nullopt;
+    return countCalls();
+}
+
 }  // namespace host

@@ -4,22 +4,6 @@
 
 namespace host {
 
-namespace {
-
-// Everything that the page is made of comes from here. It sets styles from its program, never in
-// its markup, and makes pictures in memory.
-constexpr const char* kContentPolicy =
-    "default-src 'none'; script-src 'self'; style-src 'self'; img-src 'self' data: blob:; "
-    "connect-src 'self'; base-uri 'none'; form-action 'none'; frame-ancestors 'none'";
-
-constexpr const char* kLasting = "public, max-age=31536000, immutable";
-constexpr const char* kAskEachTime = "no-cache";
-
-// The header is a list of tags, or "*" for any.
-bool isKnown(const std::string& knownTags, const std::string& tag) {
-    return knownTags == "*" || knownTags.find(tag) != std::string::npos;
-}
-
 SiteResponse refuseMethod() {
     SiteResponse response;
     response.code = 405;
@@ -29,34 +13,19 @@ SiteResponse refuseMethod() {
     return response;
 }
 
-SiteResponse answerWithFile(const StaticFile& file, const std::string& knownTags) {
-    SiteResponse response;
-    response.headers = {{"ETag", file.tag},
-                        {"Cache-Control", file.isLasting ? kLasting : kAskEachTime},
-                        {"Content-Security-Policy", kContentPolicy},
-                        {"X-Content-Type-Options", "nosniff"},
-                        {"Referrer-Policy", "no-referrer"}};
-    if (isKnown(knownTags, file.tag)) {
-        response.code = 304;
-        return response;
+Site::Site(std::vector<std::unique_ptr<SitePart>> parts, Metrics* metrics)
+    : parts(std::move(parts)), counted(metrics) {}
+
+const SitePart* Site::partWith(const std::string& path) const {
+    for (const std::unique_ptr<SitePart>& part : parts) {
+        if (part->has(path))
+            return part.get();
     }
-    response.type = file.type;
-    response.body = file.content;
-    return response;
-}
-
-}  // namespace
-
-Site::Site(StaticFiles files) : files(std::move(files)) {}
-
-bool Site::has(const std::string& path) const {
-    return files.find(path) != nullptr;
+    return nullptr;
 }
 
 SiteResponse Site::answer(const SiteRequest& request) const {
-    if (request.method != "GET" && request.method != "HEAD")
-        return refuseMethod();
-    return answerWithFile(*files.find(request.path), request.knownTag);
+    return partWith(request.path)->answer(request);
 }
 
 }  // namespace host

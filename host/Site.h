@@ -1,11 +1,10 @@
 #pragma once
 
+#include <memory>
 #include <string>
-#include <string_view>
 #include <vector>
 
 #include "host/OriginPolicy.h"
-#include "host/StaticFiles.h"
 
 namespace host {
 
@@ -23,22 +22,41 @@ struct SiteResponse {
     std::vector<Header> headers;
 };
 
-// What the host serves besides the service: the page in a browser. All functions may be called from
-// any thread.
+// The response to another method than GET and HEAD.
+SiteResponse refuseMethod();
+
+// One thing that the host serves besides the service. All functions may be called from any thread.
+class SitePart {
+  public:
+    virtual ~SitePart() = default;
+
+    virtual bool has(const std::string& path) const = 0;
+
+    // The response to a request for a path that the part has.
+    virtual SiteResponse answer(const SiteRequest& request) const = 0;
+};
+
+class Metrics;
+
+// What the host serves besides the service. All functions may be called from any thread.
 class Site {
   public:
-    explicit Site(StaticFiles files);
+    // When several parts have a path, the first of them answers. metrics: what the host counts in;
+    // null for not counting. It must outlive the site.
+    explicit Site(std::vector<std::unique_ptr<SitePart>> parts, Metrics* metrics = nullptr);
 
-    bool has(const std::string& path) const;
+    bool has(const std::string& path) const { return partWith(path) != nullptr; }
 
     // The response to a request for a path that the site has.
     SiteResponse answer(const SiteRequest& request) const;
 
-    // Whether there is something to look at with a browser.
-    bool hasPage() const { return has("/"); }
+    Metrics* metrics() const { return counted; }
 
   private:
-    const StaticFiles files;
+    const SitePart* partWith(const std::string& path) const;
+
+    const std::vector<std::unique_ptr<SitePart>> parts;
+    Metrics* const counted;
 };
 
 }  // namespace host

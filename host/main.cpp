@@ -8,13 +8,17 @@
 #include <memory>
 #include <optional>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "host/Failure.h"
+#include "host/Health.h"
 #include "host/ListenSocket.h"
+#include "host/Metrics.h"
 #include "host/Options.h"
 #include "host/Origin.h"
 #include "host/OriginPolicy.h"
+#include "host/Page.h"
 #include "host/Plugin.h"
 #include "host/Server.h"
 #include "host/SimulatedDriver.h"
@@ -82,9 +86,20 @@ host::OriginPolicy policyOf(const Options& options) {
     return {options.tlsKey.empty() ? "http" : "https", names, options.allowedOrigins};
 }
 
-host::Site siteOf(const Options& options) {
+host::StaticFiles filesOf(const Options& options) {
     const std::string folder = options.web.empty() ? host::findPage() : options.web;
-    return host::Site(folder.empty() ? host::StaticFiles() : host::StaticFiles(folder));
+    return folder.empty() ? host::StaticFiles() : host::StaticFiles(folder);
+}
+
+host::Site siteOf(const Options& options, host::StaticFiles files, const host::Plugin& plugin,
+                  host::Metrics& metrics) {
+    std::vector<std::unique_ptr<host::SitePart>> parts;
+    if (!options.noHealth)
+        parts.push_back(std::make_unique<host::Health>(plugin));
+    if (!options.noMetrics)
+        parts.push_back(std::make_unique<host::MetricsPage>(metrics));
+    parts.push_back(std::make_unique<host::Page>(std::move(files)));
+    return host::Site(std::move(parts), options.noMetrics ? nullptr : &metrics);
 }
 
 sigset_t endSignals() {
@@ -128,7 +143,7 @@ void serve(const host::Plugin& plugin, host::ListenSocket& socket,
     const std::string url =
         std::string(settings.tls ? "https" : "http") + "://" + socket.authority();
     std::printf("Listening on %s/qitrmc/Call\n%s", url.c_str(), chassis.c_str());
-    if (site.hasPage())
+    if (site.has("/"))
         std::printf("Open %s/ in a browser.\n", url.c_str());
     std::fflush(stdout);
     serveUntilSignal(server);
@@ -147,10 +162,12 @@ void runHost(const Options& options) {
     takeChargeOfSignals();
     configureDriver(options);
     const host::ServerSettings settings = settingsOf(options);
-    const host::Site site = siteOf(options);
+    host::StaticFiles files = filesOf(options);
     host::ListenSocket socket(options.address, options.port);
     const host::Plugin plugin(options.plugin.empty() ? host::findPlugin() : options.plugin);
     const std::string chassis = host::startSimulatedDriver();
+    host::Metrics metrics(host::countDriverCalls);
+    const host::Site site = siteOf(options, std::move(files), plugin, metrics);
     plugin.initialize();
     try {
         serve(plugin, socket, settings, policyOf(options), site, chassis);

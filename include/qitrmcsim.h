@@ -37,6 +37,11 @@ typedef struct {
 /* Gets the current numbers; all are 0 before the start. Any thread may call this. */
 void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts);
 
+/* Returns how many calls of the driver have reached the chassis, successful or not; 0 before the
+ * start. Calls that only free what the driver has allocated do not count. Any thread may call
+ * this. */
+uint64_t qitrmcsim_countCalls(void);
+
 /* ---- Faults --------------------------------------------------------------------------------- */
 
 /*

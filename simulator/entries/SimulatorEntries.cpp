@@ -38,3 +38,13 @@ void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
         // A simulator that did not start has opened nothing.
     }
 }
+
+uint64_t qitrmcsim_countCalls(void) {
+    try {
+        Simulator& simulator = Simulator::instance();
+        const std::lock_guard<std::mutex> lock(simulator.mutex);
+        return simulator.clock.calls();
+    } catch (...) {
+        return 0;  // A simulator that did not start has not been called.
+    }
+}

@@ -22,6 +22,7 @@ int64_t Clock::now() const {
 }
 
 void Clock::noteCall() {
+    ++begun;
     if (scale.byCalls) {
         stepped += callStep;
     }

@@ -17,6 +17,8 @@ class Clock {
     int64_t now() const;
     // A call of the driver begins: by calls, a millisecond has passed.
     void noteCall();
+    // How many calls have begun.
+    uint64_t calls() const { return begun; }
 
     // Whether what takes time is over at once, with the clock moved on by skip().
     bool goesByCalls() const { return scale.byCalls; }
@@ -32,6 +34,7 @@ class Clock {
     Real::time_point start = Real::now();
     // By calls, the time itself in microseconds.
     int64_t stepped = 0;
+    uint64_t begun = 0;
 };
 
 }  // namespace simulator

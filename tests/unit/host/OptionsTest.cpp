@@ -42,6 +42,8 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
     EXPECT_EQ(options.tlsCertificate, "");
     EXPECT_EQ(options.tlsKey, "");
     EXPECT_FALSE(options.passTransport);
+    EXPECT_FALSE(options.noHealth);
+    EXPECT_FALSE(options.noMetrics);
 }
 
 TEST(Options, EachOptionSetsItsOwnField) {
@@ -69,6 +71,13 @@ TEST(Options, EachOptionSetsItsOwnField) {
     EXPECT_EQ(options.tlsCertificate, "cert.pem");
     EXPECT_EQ(options.tlsKey, "key.pem");
     EXPECT_TRUE(options.passTransport);
+}
+
+TEST(Options, HealthAndMetricsAreSwitchedOffSeparately) {
+    EXPECT_TRUE(parseOptions({"--no-health"}).noHealth);
+    EXPECT_FALSE(parseOptions({"--no-health"}).noMetrics);
+    EXPECT_TRUE(parseOptions({"--no-metrics"}).noMetrics);
+    EXPECT_FALSE(parseOptions({"--no-metrics"}).noHealth);
 }
 
 TEST(Options, AValueMayFollowAnEqualsSign) {

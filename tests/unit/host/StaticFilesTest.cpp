@@ -8,13 +8,13 @@
 #include <fstream>
 
 #include "host/Failure.h"
-#include "host/Site.h"
+#include "host/Page.h"
 
 namespace {
 
 namespace fs = std::filesystem;
 
-using host::Site;
+using host::Page;
 using host::SiteRequest;
 using host::SiteResponse;
 using host::StaticFile;
@@ -46,7 +46,7 @@ class StaticFilesTest : public testing::Test {
     }
 
     SiteResponse answer(const SiteRequest& request) const {
-        return Site(StaticFiles(folder)).answer(request);
+        return Page(StaticFiles(folder)).answer(request);
     }
 
     fs::path top;

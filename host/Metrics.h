@@ -1,0 +1,96 @@
+#pragma once
+
+#include <array>
+#include <atomic>
+#include <chrono>
+#include <cstddef>
+#include <cstdint>
+#include <functional>
+#include <optional>
+#include <string>
+
+#include "host/Site.h"
+
+namespace host {
+
+// How a request ended.
+enum class Outcome {
+    ok,
+    rpcError,   // a JSON-RPC error, of any request in case of a batch
+    httpError,  // an HTTP status of 400 or above
+    aborted,    // the client went before the response was ready
+};
+
+// Who answered a request: the plug-in, or the host itself with the page, a refusal and so on.
+enum class Handler { service, host };
+
+// Counts what the host does. All functions may be called from any thread; those that count take a
+// few atomic additions.
+class Metrics {
+  public:
+    using Seconds = std::chrono::duration<double>;
+
+    // The number of calls of the driver so far; nothing when it is unknown.
+    using DriverCalls = std::function<std::optional<uint64_t>()>;
+
+    explicit Metrics(DriverCalls driverCalls) : driverCalls(std::move(driverCalls)) {}
+
+    void countOpenedConnection() noexcept {
+        add(openConnections, 1);
+        add(allConnections, 1);
+    }
+    void countClosedConnection() noexcept { add(openConnections, -1); }
+
+    void countBegunRequest() noexcept { add(inFlight, 1); }
+    void countEndedRequest(Handler handler, Outcome outcome) noexcept {
+        add(inFlight, -1);
+        add(ended[static_cast<std::size_t>(handler)][static_cast<std::size_t>(outcome)], 1);
+    }
+
+    // Of a request to the service: how long the plug-in took.
+    void countTime(Seconds time) noexcept;
+
+    void countReceivedBytes(std::size_t size) noexcept { add(receivedBytes, size); }
+    void countSentBytes(std::size_t size) noexcept { add(sentBytes, size); }
+
+    // All counts in the text format of Prometheus.
+    std::string text() const;
+
+  private:
+    using Count = std::atomic<uint64_t>;
+
+    // The upper bounds of the buckets of the histogram, in seconds.
+    static constexpr std::array<double, 16> kBounds = {
+        50e-6, 100e-6, 250e-6, 500e-6, 1e-3, 2.5e-3, 5e-3, 10e-3,
+        25e-3, 50e-3,  100e-3, 250e-3, 1.0,  5.0,    30.0, 120.0};
+
+    template <typename Number>
+    static void add(Count& count, Number number) noexcept {
+        count.fetch_add(static_cast<uint64_t>(number), std::memory_order_relaxed);
+    }
+
+    Count openConnections{0};
+    Count allConnections{0};
+    Count inFlight{0};
+    Count receivedBytes{0};
+    Count sentBytes{0};
+    std::array<std::array<Count, 4>, 2> ended{};      // by Handler and Outcome
+    std::array<Count, kBounds.size() + 1> buckets{};  // each without those below it
+    Count nanoseconds{0};
+    const DriverCalls driverCalls;
+};
+
+// The counts, for a collector: at /metrics.
+class MetricsPage : public SitePart {
+  public:
+    // The metrics must outlive this.
+    explicit MetricsPage(const Metrics& metrics) : metrics(metrics) {}
+
+    bool has(const std::string& path) const override { return path == "/metrics"; }
+    SiteResponse answer(const SiteRequest& request) const override;
+
+  private:
+    const Metrics& metrics;
+};
+
+}  // namespace host

@@ -1,0 +1,60 @@
+#include "host/RpcError.h"
+
+#include <rapidjson/reader.h>
+
+#include <string_view>
+
+namespace host {
+
+namespace {
+
+// Ends the parse at the first member that decides.
+class ErrorFinder : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, ErrorFinder> {
+  public:
+    bool StartArray() {
+        isBatch = isBatch || depth == 0;
+        ++depth;
+        return true;
+    }
+    bool EndArray(rapidjson::SizeType) { return leave(); }
+    bool StartObject() {
+        ++depth;
+        return true;
+    }
+    bool EndObject(rapidjson::SizeType) { return leave(); }
+
+    bool Key(const char* text, rapidjson::SizeType length, bool) {
+        if (depth != (isBatch ? 2 : 1))
+            return true;
+        const std::string_view name(text, length);
+        found = name == "error";
+        return !found && (isBatch || name != "result");
+    }
+
+    bool hasFound() const { return found; }
+
+  private:
+    bool leave() {
+        --depth;
+        return true;
+    }
+
+    int depth = 0;
+    bool isBatch = false;
+    bool found = false;
+};
+
+// Iterative, so that no nesting in a response can exhaust the stack.
+constexpr unsigned kFlags = rapidjson::kParseIterativeFlag | rapidjson::kParseNumbersAsStringsFlag;
+
+}  // namespace
+
+bool hasRpcError(const std::string& response) {
+    ErrorFinder finder;
+    rapidjson::Reader reader;
+    rapidjson::StringStream stream(response.c_str());
+    reader.Parse<kFlags>(stream, finder);
+    return finder.hasFound();
+}
+
+}  // namespace host

@@ -1,0 +1,111 @@
+#include "host/Metrics.h"
+
+#include <gmock/gmock.h>
+
+#include <thread>
+#include <vector>
+
+namespace {
+
+using host::Handler;
+using host::Metrics;
+using host::MetricsPage;
+using host::Outcome;
+using testing::HasSubstr;
+using testing::Not;
+
+std::optional<uint64_t> noDriver() {
+    return std::nullopt;
+}
+
+TEST(Metrics, CountsRequestsByHandlerAndOutcome) {
+    Metrics metrics(noDriver);
+    metrics.countEndedRequest(Handler::service, Outcome::ok);
+    metrics.countEndedRequest(Handler::service, Outcome::ok);
+    metrics.countEndedRequest(Handler::service, Outcome::rpcError);
+    metrics.countEndedRequest(Handler::host, Outcome::httpError);
+    const std::string text = metrics.text();
+    EXPECT_THAT(text, HasSubstr("# TYPE qitrmc_requests_total counter\n"));
+    const auto expectCount = [&](const char* handler, const char* outcome, const char* count) {
+        EXPECT_THAT(text, HasSubstr(std::string("qitrmc_requests_total{handler=\"") + handler +
+                                    "\",outcome=\"" + outcome + "\"} " + count + "\n"));
+    };
+    expectCount("service", "ok", "2");
+    expectCount("service", "rpc_error", "1");
+    expectCount("service", "http_error", "0");
+    expectCount("service", "aborted", "0");
+    expectCount("host", "ok", "0");
+    expectCount("host", "http_error", "1");
+    expectCount("host", "aborted", "0");
+    EXPECT_THAT(text, Not(HasSubstr("handler=\"host\",outcome=\"rpc_error\"")));
+}
+
+TEST(Metrics, CountsTimesInCumulatedBucketsThatContainTheirBounds) {
+    Metrics metrics(noDriver);
+    metrics.countTime(std::chrono::microseconds(30));
+    metrics.countTime(std::chrono::milliseconds(1));
+    metrics.countTime(std::chrono::seconds(500));
+    const std::string text = metrics.text();
+    const auto expectBucket = [&](const char* bound, const char* count) {
+        EXPECT_THAT(text, HasSubstr(std::string("qitrmc_request_duration_seconds_bucket{le=\"") +
+                                    bound + "\"} " + count + "\n"));
+    };
+    expectBucket("0.0001", "1");
+    expectBucket("0.0005", "1");
+    expectBucket("0.001", "2");
+    expectBucket("120", "2");
+    expectBucket("+Inf", "3");
+    EXPECT_THAT(text, HasSubstr("qitrmc_request_duration_seconds_count 3\n"));
+    EXPECT_THAT(text, HasSubstr("qitrmc_request_duration_seconds_sum 500.00103"));
+}
+
+TEST(Metrics, ShowsWhatIsThereNowAndWhatWasThereInAll) {
+    Metrics metrics(noDriver);
+    metrics.countOpenedConnection();
+    metrics.countOpenedConnection();
+    metrics.countClosedConnection();
+    metrics.countBegunRequest();
+    metrics.countBegunRequest();
+    metrics.countEndedRequest(Handler::service, Outcome::ok);
+    metrics.countReceivedBytes(5000000000);
+    metrics.countSentBytes(20);
+    const std::string text = metrics.text();
+    EXPECT_THAT(text, HasSubstr("\nqitrmc_connections 1\n"));
+    EXPECT_THAT(text, HasSubstr("\nqitrmc_connections_total 2\n"));
+    EXPECT_THAT(text, HasSubstr("\nqitrmc_requests_in_flight 1\n"));
+    EXPECT_THAT(text, HasSubstr("\nqitrmc_request_bytes_total 5000000000\n"));
+    EXPECT_THAT(text, HasSubstr("\nqitrmc_response_bytes_total 20\n"));
+}
+
+TEST(Metrics, HasCallsOfTheDriverOnlyWhenTheyAreKnown) {
+    EXPECT_THAT(Metrics(noDriver).text(), Not(HasSubstr("driver")));
+    const Metrics metrics([] { return std::optional<uint64_t>(7); });
+    EXPECT_THAT(metrics.text(), HasSubstr("\nqitrmc_driver_calls_total 7\n"));
+}
+
+TEST(Metrics, LosesNothingWhenThreadsCountAtOnce) {
+    Metrics metrics(noDriver);
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 4; ++i) {
+        threads.emplace_back([&metrics] {
+            for (int n = 0; n < 10000; ++n)
+                metrics.countTime(std::chrono::microseconds(1));
+        });
+    }
+    metrics.text();
+    for (std::thread& thread : threads)
+        thread.join();
+    EXPECT_THAT(metrics.text(), HasSubstr("qitrmc_request_duration_seconds_count 40000\n"));
+}
+
+TEST(MetricsPage, CanOnlyBeRead) {
+    const Metrics metrics(noDriver);
+    const MetricsPage page(metrics);
+    EXPECT_TRUE(page.has("/metrics"));
+    EXPECT_FALSE(page.has("/metrics/"));
+    EXPECT_EQ(page.answer({"GET", "/metrics", ""}).code, 200);
+    EXPECT_EQ(page.answer({"HEAD", "/metrics", ""}).code, 200);
+    EXPECT_EQ(page.answer({"POST", "/metrics", ""}).code, 405);
+}
+
+}  // namespace
