@@ -72,7 +72,7 @@ void Exchange::begin(const char* transport, const char* method, std::string_view
     }
     std::optional<std::vector<uint32_t>> name = entryNameOfPath(path);
     if (!name && site != nullptr && site->has(std::string(pathOfTarget(path))))
-        siteRequest = SiteRequest{method, std::string(pathOfTarget(path)), ""};
+        siteRequest = SiteRequest{method, std::string(pathOfTarget(path))};
     else if (!name)
         return answer(404, "There is nothing here. The service is at /qitrmc/Call.\n");
     if (declaredLength != nullptr && std::strtoull(declaredLength, nullptr, 10) > maxBody)
@@ -83,9 +83,9 @@ void Exchange::begin(const char* transport, const char* method, std::string_view
     request.method = method;
 }
 
-void Exchange::setKnownTag(const char* tag) {
-    if (siteRequest)
-        siteRequest->knownTag = tag;
+void Exchange::describeToSite(const char* knownTag, bool isLocal) {
+    siteRequest->knownTag = knownTag == nullptr ? "" : knownTag;
+    siteRequest->isLocal = isLocal;
 }
 
 bool Exchange::take(const char* data, std::size_t size) {
@@ -139,6 +139,7 @@ void Exchange::answer(int code, std::string_view text) {
 }
 
 void Exchange::answerFromSite() {
+    siteRequest->body = std::move(request.body);
     SiteResponse response = site->answer(*siteRequest);
     answer(response.code, response.body);
     request.type = response.type;

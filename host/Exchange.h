@@ -36,8 +36,12 @@ class Exchange {
     void begin(const char* transport, const char* method, std::string_view path,
                const char* declaredLength);
 
-    // Takes in what else the site wants to know of the head, after the rest of it.
-    void setKnownTag(const char* tag);
+    // Whether the site answers, which then needs describeToSite() too.
+    bool isForSite() const { return siteRequest.has_value(); }
+
+    // Takes in what else the site wants to know. knownTag: the value of the header "If-None-Match",
+    // null without it. isLocal: whether the client is at a loopback address.
+    void describeToSite(const char* knownTag, bool isLocal);
 
     // Takes in the next piece of the body. False when the client has sent so much beyond the limit
     // that the connection is to be dropped.

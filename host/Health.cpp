@@ -45,12 +45,7 @@ SiteResponse Health::answer(const SiteRequest& request) const {
     if (request.method != "GET" && request.method != "HEAD")
         return refuseMethod();
     const std::string fault = faultOf(plugin);
-    SiteResponse response;
-    response.code = fault.empty() ? 200 : 503;
-    response.type = "text/plain; charset=utf-8";
-    response.body = (fault.empty() ? "The service works." : fault) + "\n";
-    response.headers = {{"Cache-Control", "no-store"}};
-    return response;
+    return fault.empty() ? textResponse(200, "The service works.") : textResponse(503, fault);
 }
 
 }  // namespace host

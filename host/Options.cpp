@@ -221,6 +221,9 @@ void describeFlags(CLI::App& app, Options& options) {
     app.add_flag("--no-metrics", options.noMetrics,
                  "leaves out /metrics, which counts requests in the text\n"
                  "format of Prometheus");
+    app.add_flag("--no-panel", options.noPanel,
+                 "leaves out /simulator/, by which clients on this machine pull\n"
+                 "modules of the simulated chassis, set faults and see the trace");
     app.set_help_flag();
     app.add_flag_callback(
            "-h,--help", [] { throw CLI::CallForHelp(); }, "show this text")

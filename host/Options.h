@@ -28,6 +28,7 @@ struct Options {
     std::string tlsKey;
     bool passTransport = false;  // the plug-in sees "https" behind TLS
     bool noHealth = false;       // no /healthz
+    bool noPanel = false;        // no /simulator/
     bool noMetrics = false;      // no /metrics, and nothing is counted
 };
 

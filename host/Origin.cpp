@@ -110,15 +110,28 @@ bool isLoopback(const std::string& canonicalHost) {
     return canonicalHost == "localhost" || canonicalHost == "::1";
 }
 
-std::string localAddress(int socket) {
+namespace {
+
+// get: getsockname or getpeername.
+std::string addressFrom(int (*get)(int, sockaddr*, socklen_t*), int socket) {
     sockaddr_storage address = {};
     socklen_t length = sizeof address;
     char host[NI_MAXHOST] = "";
-    getsockname(socket, reinterpret_cast<sockaddr*>(&address), &length);
+    get(socket, reinterpret_cast<sockaddr*>(&address), &length);
     getnameinfo(reinterpret_cast<const sockaddr*>(&address), length, host, sizeof host, nullptr, 0,
                 NI_NUMERICHOST);
     // A link-local address comes with the name of its interface, which no client sends.
     return canonicalHost(std::string_view(host, std::strcspn(host, "%"))).value_or("");
+}
+
+}  // namespace
+
+std::string localAddress(int socket) {
+    return addressFrom(getsockname, socket);
+}
+
+std::string remoteAddress(int socket) {
+    return addressFrom(getpeername, socket);
 }
 
 }  // namespace host

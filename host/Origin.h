@@ -45,4 +45,7 @@ bool isLoopback(const std::string& canonicalHost);
 // The host of the socket's own end, empty when it cannot be told.
 std::string localAddress(int socket);
 
+// The host of the other end.
+std::string remoteAddress(int socket);
+
 }  // namespace host

@@ -53,6 +53,11 @@ std::string localAddressOf(MHD_Connection* connection) {
     return localAddress(info->connect_fd);
 }
 
+std::string remoteAddressOf(MHD_Connection* connection) {
+    const auto* info = MHD_get_connection_info(connection, MHD_CONNECTION_INFO_CONNECTION_FD);
+    return remoteAddress(info->connect_fd);
+}
+
 Source sourceOf(MHD_Connection* connection, const char* method) {
     Source source;
     source.method = method;
@@ -152,8 +157,10 @@ struct Server::Callbacks {
         exchange->admit(server.policy.judge(sourceOf(connection, method)));
         exchange->begin(server.settings.tls && server.settings.passTransport ? "https" : "http",
                         method, path, headerOf(connection, MHD_HTTP_HEADER_CONTENT_LENGTH));
-        if (const char* tag = headerOf(connection, MHD_HTTP_HEADER_IF_NONE_MATCH))
-            exchange->setKnownTag(tag);
+        if (exchange->isForSite()) {
+            exchange->describeToSite(headerOf(connection, MHD_HTTP_HEADER_IF_NONE_MATCH),
+                                     isLoopback(remoteAddressOf(connection)));
+        }
         // A client that asks before it sends a body can be spared sending it.
         const bool asksFirst = headerOf(connection, MHD_HTTP_HEADER_EXPECT) != nullptr;
         return exchange->isAnswered() && asksFirst ? end(server, connection, *exchange) : MHD_YES;

@@ -12,11 +12,6 @@ namespace host {
 
 namespace {
 
-template <typename Function>
-Function* functionOf(void* library, const char* name) {
-    return reinterpret_cast<Function*>(dlsym(library, name));
-}
-
 // Null when the plug-in has not loaded the driver. The plug-in keeps it loaded, so no reference to
 // it stays here.
 void* loadedDriver() {
@@ -26,6 +21,11 @@ void* loadedDriver() {
     return driver;
 }
 
+template <typename Function>
+Function* find(const char* name) {
+    return reinterpret_cast<Function*>(driverFunction(name));
+}
+
 void addCount(std::string& text, uint32_t count, const char* things) {
     if (count != 0)
         text += (text.empty() ? "" : ", ") + std::to_string(count) + " " + things;
@@ -33,13 +33,14 @@ void addCount(std::string& text, uint32_t count, const char* things) {
 
 }  // namespace
 
-std::string startSimulatedDriver() {
+void* driverFunction(const char* name) {
     void* const driver = loadedDriver();
-    if (driver == nullptr)
-        return "";
-    const auto start = functionOf<decltype(qitrmcsim_start)>(driver, "qitrmcsim_start");
-    const auto freeString =
-        functionOf<decltype(nQITRMCAPI100_freeString)>(driver, "nQITRMCAPI100_freeString");
+    return driver == nullptr ? nullptr : dlsym(driver, name);
+}
+
+std::string startSimulatedDriver() {
+    const auto start = find<decltype(qitrmcsim_start)>("qitrmcsim_start");
+    const auto freeString = find<decltype(nQITRMCAPI100_freeString)>("nQITRMCAPI100_freeString");
     if (start == nullptr || freeString == nullptr)
         return "";
     char* text = nullptr;
@@ -52,11 +53,8 @@ std::string startSimulatedDriver() {
 }
 
 std::string thingsNotGivenBack() {
-    void* const driver = loadedDriver();
-    if (driver == nullptr)
-        return "";
     const auto countOutstanding =
-        functionOf<decltype(qitrmcsim_countOutstanding)>(driver, "qitrmcsim_countOutstanding");
+        find<decltype(qitrmcsim_countOutstanding)>("qitrmcsim_countOutstanding");
     if (countOutstanding == nullptr)
         return "";
     qitrmcsim_Outstanding counts;
@@ -71,11 +69,7 @@ std::string thingsNotGivenBack() {
 }
 
 std::optional<uint64_t> countDriverCalls() {
-    void* const driver = loadedDriver();
-    if (driver == nullptr)
-        return std::nullopt;
-    const auto countCalls =
-        functionOf<decltype(qitrmcsim_countCalls)>(driver, "qitrmcsim_countCalls");
+    const auto countCalls = find<decltype(qitrmcsim_countCalls)>("qitrmcsim_countCalls");
     if (countCalls == nullptr)
         return std::nullopt;
     return countCalls();

@@ -6,7 +6,10 @@
 
 namespace host {
 
-// All of them do nothing when the plug-in has loaded another driver than the simulated one.
+// A function of the driver that the plug-in has loaded; null when there is none of that name.
+void* driverFunction(const char* name);
+
+// All that follow do nothing when the plug-in has loaded another driver than the simulated one.
 
 // Starts the simulated driver and returns what it says of its chassis. Throws Failure when the
 // chassis cannot be loaded.

@@ -4,12 +4,21 @@
 
 namespace host {
 
-SiteResponse refuseMethod() {
+SiteResponse textResponse(int code, const std::string& line) {
+    SiteResponse response;
+    response.code = code;
+    response.type = "text/plain; charset=utf-8";
+    response.body = line + "\n";
+    response.headers = {{"Cache-Control", "no-store"}};
+    return response;
+}
+
+SiteResponse refuseMethod(const char* allowed, const char* text) {
     SiteResponse response;
     response.code = 405;
     response.type = "text/plain";
-    response.body = "This can only be read, with GET.\n";
-    response.headers = {{"Allow", "GET, HEAD"}};
+    response.body = text;
+    response.headers = {{"Allow", allowed}};
     return response;
 }
 

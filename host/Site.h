@@ -11,8 +11,10 @@ namespace host {
 // A request for something that the host has besides the service.
 struct SiteRequest {
     std::string method;
-    std::string path;      // without query; escapes as they came
-    std::string knownTag;  // the header "If-None-Match"
+    std::string path;           // without query; escapes as they came
+    std::string knownTag = "";  // the header "If-None-Match"
+    bool isLocal = false;       // the client is on this machine, at a loopback address
+    std::string body = "";
 };
 
 struct SiteResponse {
@@ -22,8 +24,12 @@ struct SiteResponse {
     std::vector<Header> headers;
 };
 
-// The response to another method than GET and HEAD.
-SiteResponse refuseMethod();
+// A response with a line of text.
+SiteResponse textResponse(int code, const std::string& line);
+
+// The response to a method that the part does not take. allowed: those that it does take.
+SiteResponse refuseMethod(const char* allowed = "GET, HEAD",
+                          const char* text = "This can only be read, with GET.\n");
 
 // One thing that the host serves besides the service. All functions may be called from any thread.
 class SitePart {

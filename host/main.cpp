@@ -22,6 +22,7 @@
 #include "host/Plugin.h"
 #include "host/Server.h"
 #include "host/SimulatedDriver.h"
+#include "host/SimulatorPanel.h"
 #include "host/Site.h"
 #include "host/StaticFiles.h"
 
@@ -98,6 +99,10 @@ host::Site siteOf(const Options& options, host::StaticFiles files, const host::P
         parts.push_back(std::make_unique<host::Health>(plugin));
     if (!options.noMetrics)
         parts.push_back(std::make_unique<host::MetricsPage>(metrics));
+    std::unique_ptr<host::SitePart> panel =
+        options.noPanel ? nullptr : host::SimulatorPanel::find();
+    if (panel)
+        parts.push_back(std::move(panel));
     parts.push_back(std::make_unique<host::Page>(std::move(files)));
     return host::Site(std::move(parts), options.noMetrics ? nullptr : &metrics);
 }

@@ -56,6 +56,34 @@ uint64_t qitrmcsim_countCalls(void);
  */
 int32_t qitrmcsim_setFaults(const char* json, char** reason);
 
+/* ---- Observation ------------------------------------------------------------------------------
+ *
+ * These set *json to a JSON text, to be freed with nQITRMCAPI100_freeString, and return 0; or they
+ * set it to null and return a negative status code: -250952 if the simulator cannot start, -250950
+ * if memory runs out. Any thread may call them.
+ */
+
+/* The faults in force, as the text that was set or that the file had. */
+int32_t qitrmcsim_getFaults(char** json);
+
+/*
+ * All devices of the description, those that have been pulled too: an array of objects with
+ * "name", "state" ("present", "pulled" or "connection_lost"), "product" where it is known, of a
+ * module "slot" and "chassis", and "registers": an array of objects with "address", "size" in
+ * bytes, "width" in bits where only one is allowed, and "name" and "description" where the chassis
+ * file has them.
+ */
+int32_t qitrmcsim_describeDevices(char** json);
+
+/*
+ * The lines of the trace from a number on, without their ends: {"next": 17, "lines": ["..."]}.
+ * Lines are numbered from 0; "next" is the number of the first one that is not there yet, to be
+ * passed in the next call. Lines are kept from the first call of this until ten seconds after the
+ * last one, the latest 2000; this slows down the driver's functions a little. It does not depend on
+ * QITRMC_SIM_TRACE.
+ */
+int32_t qitrmcsim_readTrace(uint64_t from, char** json);
+
 #ifdef __cplusplus
 }
 #endif

@@ -133,14 +133,14 @@ void readShown(const Node& node, const Chassis& chassis, Device& device, Registe
 
 void readRegisterBlock(const Node& node, const Chassis& chassis, Device& device) {
     node.expectMembers(members::registerBlock);
-    // For those who read the file.
-    node.ifPresent("name", [](const Node& name) {
-        if (name.text().empty()) {
+    RegisterBlock block;
+    node.ifPresent("name", [&](const Node& name) {
+        block.name = name.text();
+        if (block.name.empty()) {
             name.fail("is empty", "must be what people call the registers");
         }
     });
-    node.ifPresent("description", [](const Node& text) { text.text(); });
-    RegisterBlock block;
+    node.ifPresent("description", [&](const Node& text) { block.description = text.text(); });
     block.address = node.member("address", "the first address").unsignedNumber(0, UINT32_MAX);
     block.initial = readBytes(node);
     block.bytes = block.initial;

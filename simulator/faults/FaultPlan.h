@@ -73,6 +73,8 @@ struct DeviceEvent {
 struct FaultPlan {
     bool isEmpty() const { return faults.empty() && events.empty(); }
 
+    // The description that this was read from.
+    std::string text = "{}";
     uint32_t seed = 0;
     std::vector<Fault> faults;
     std::vector<DeviceEvent> events;

@@ -205,6 +205,7 @@ FaultPlan readFaults(std::string_view text, const Chassis& chassis) {
     const Node root(document);
     root.expectMembers(members::faults);
     FaultPlan plan;
+    plan.text = text;
     root.ifPresent("$schema", [](const Node& schema) { schema.text(); });
     root.ifPresent("seed",
                    [&](const Node& seed) { plan.seed = seed.unsignedNumber(0, UINT32_MAX); });

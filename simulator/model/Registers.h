@@ -13,6 +13,9 @@ struct Resource;
 // A run of registers of one device. Wider registers are the bytes of the narrower ones, the lowest
 // byte first.
 struct RegisterBlock {
+    // For people; may be empty.
+    std::string name;
+    std::string description;
     uint32_t address = 0;
     bool readable = true;
     bool writable = true;
@@ -50,11 +53,13 @@ class Registers {
 
     void reset();
 
+    // In the order of their addresses.
+    const std::vector<RegisterBlock>& all() const { return blocks; }
+
   private:
     // The first block behind an address.
     size_t firstBehind(uint32_t address) const;
 
-    // In the order of their addresses.
     std::vector<RegisterBlock> blocks;
 };
 

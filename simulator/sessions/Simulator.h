@@ -54,7 +54,7 @@ struct Simulator {
     std::mutex mutex;
     const std::unique_ptr<Chassis> chassis;
     LastingState lasting;
-    const Trace trace;
+    Trace trace;
     Clock clock;
     Waits waits;
     Sessions sessions;

@@ -58,7 +58,12 @@ Trace::~Trace() {
     }
 }
 
-void Trace::note(const Call& call, const qierr_Status& status, Time begin) const noexcept {
+void Trace::writeLine(const std::string& line) const {
+    // A trace that cannot be written has nobody to tell.
+    [[maybe_unused]] const ssize_t written = write(file, line.data(), line.size());
+}
+
+void Trace::note(const Call& call, const qierr_Status& status, Time begin) noexcept {
     const Time end = Clock::now();
     try {
         const long long now = microseconds(start, end);
@@ -66,10 +71,12 @@ void Trace::note(const Call& call, const qierr_Status& status, Time begin) const
         std::snprintf(head, sizeof head, "%lld.%06lld t%u ", now / million, now % million,
                       threadNumber());
         char tail[48];
-        std::snprintf(tail, sizeof tail, " [%lld us]\n", microseconds(begin, end));
+        std::snprintf(tail, sizeof tail, " [%lld us]", microseconds(begin, end));
         const std::string line = head + callText(call, status) + tail;
-        // A trace that cannot be written has nobody to tell.
-        [[maybe_unused]] const ssize_t written = write(file, line.data(), line.size());
+        latest.keep(line);
+        if (file >= 0) {
+            writeLine(line + "\n");
+        }
     } catch (const std::bad_alloc&) {
     }
 }

@@ -3,6 +3,7 @@
 #include <chrono>
 
 #include "trace/Call.h"
+#include "trace/TraceMemory.h"
 
 namespace simulator {
 
@@ -20,11 +21,16 @@ class Trace {
     Trace& operator=(const Trace&) = delete;
     ~Trace();
 
-    bool isOn() const { return file >= 0; }
+    bool isOn() const { return file >= 0 || latest.isOn(); }
     // Notes a call that began at a time and has ended now.
-    void note(const Call& call, const qierr_Status& status, Time begin) const noexcept;
+    void note(const Call& call, const qierr_Status& status, Time begin) noexcept;
+
+    // The same lines, without their ends.
+    TraceMemory latest;
 
   private:
+    void writeLine(const std::string& line) const;
+
     const Time start;
     const int file;
 };

@@ -44,6 +44,7 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
     EXPECT_FALSE(options.passTransport);
     EXPECT_FALSE(options.noHealth);
     EXPECT_FALSE(options.noMetrics);
+    EXPECT_FALSE(options.noPanel);
 }
 
 TEST(Options, EachOptionSetsItsOwnField) {
@@ -73,11 +74,12 @@ TEST(Options, EachOptionSetsItsOwnField) {
     EXPECT_TRUE(options.passTransport);
 }
 
-TEST(Options, HealthAndMetricsAreSwitchedOffSeparately) {
+TEST(Options, HealthMetricsAndPanelAreSwitchedOffSeparately) {
     EXPECT_TRUE(parseOptions({"--no-health"}).noHealth);
     EXPECT_FALSE(parseOptions({"--no-health"}).noMetrics);
     EXPECT_TRUE(parseOptions({"--no-metrics"}).noMetrics);
     EXPECT_FALSE(parseOptions({"--no-metrics"}).noHealth);
+    EXPECT_TRUE(parseOptions({"--no-panel"}).noPanel);
 }
 
 TEST(Options, AValueMayFollowAnEqualsSign) {

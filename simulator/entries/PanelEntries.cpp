@@ -1,0 +1,145 @@
+// What the simulator tells those who watch it while clients use it.
+
+#include <rapidjson/stringbuffer.h>
+#include <rapidjson/writer.h>
+
+#include <mutex>
+#include <new>
+
+#include "entries/Lending.h"
+#include "sessions/Simulator.h"
+#include "status/Refusal.h"
+
+using namespace simulator;
+
+namespace {
+
+using Writer = rapidjson::Writer<rapidjson::StringBuffer>;
+
+void writeMember(Writer& writer, const char* name, const std::string& text) {
+    if (!text.empty()) {
+        writer.Key(name);
+        writer.String(text);
+    }
+}
+
+void writeMember(Writer& writer, const char* name, uint32_t number) {
+    writer.Key(name);
+    writer.Uint(number);
+}
+
+const char* stateOf(const Device& device) {
+    switch (device.absence) {
+        case Absence::none:
+            return "present";
+        case Absence::connectionLost:
+            return "connection_lost";
+        case Absence::removed:
+            return "pulled";
+    }
+    return "";
+}
+
+void writeRegisters(Writer& writer, const Registers& registers) {
+    writer.Key("registers");
+    writer.StartArray();
+    for (const RegisterBlock& block : registers.all()) {
+        writer.StartObject();
+        writeMember(writer, "address", block.address);
+        writeMember(writer, "size", block.size());
+        if (block.width != 0) {
+            writeMember(writer, "width", 8 * block.width);
+        }
+        writeMember(writer, "name", block.name);
+        writeMember(writer, "description", block.description);
+        writer.EndObject();
+    }
+    writer.EndArray();
+}
+
+// Null for a device that is not in a slot.
+const Device* chassisOf(const Chassis& chassis, const Device& module) {
+    for (const auto& device : chassis.devices()) {
+        for (const Device* other : device->modules) {
+            if (other == &module) {
+                return device.get();
+            }
+        }
+    }
+    return nullptr;
+}
+
+void writeDevice(Writer& writer, const Chassis& chassis, const Device& device) {
+    writer.StartObject();
+    writeMember(writer, "name", device.name);
+    writeMember(writer, "state", std::string(stateOf(device)));
+    const Property* product = device.properties.find("Dev.ProductName");
+    writeMember(writer, "product", product == nullptr ? "" : firstText(product->value));
+    if (const Device* rack = chassisOf(chassis, device)) {
+        writeMember(writer, "slot", device.slot);
+        writeMember(writer, "chassis", rack->name);
+    }
+    writeRegisters(writer, device.registers);
+    writer.EndObject();
+}
+
+std::string describeDevices(Simulator& simulator) {
+    rapidjson::StringBuffer text;
+    Writer writer(text);
+    const std::lock_guard<std::mutex> lock(simulator.mutex);
+    writer.StartArray();
+    for (const auto& device : simulator.chassis->devices()) {
+        writeDevice(writer, *simulator.chassis, *device);
+    }
+    writer.EndArray();
+    return text.GetString();
+}
+
+std::string traceFrom(Simulator& simulator, uint64_t from) {
+    const TraceMemory::Lines lines = simulator.trace.latest.read(from);
+    rapidjson::StringBuffer text;
+    Writer writer(text);
+    writer.StartObject();
+    writer.Key("next");
+    writer.Uint64(lines.next);
+    writer.Key("lines");
+    writer.StartArray();
+    for (const std::string& line : lines.lines) {
+        writer.String(line);
+    }
+    writer.EndArray();
+    writer.EndObject();
+    return text.GetString();
+}
+
+// Lends the text that describe(simulator) returns.
+template <typename Describe>
+int32_t lendDescription(char** json, Describe describe) {
+    *json = nullptr;
+    try {
+        *json = lendText(describe(Simulator::instance()));
+        return 0;
+    } catch (const Refusal& refusal) {
+        return refusal.code();
+    } catch (...) {
+        return code::outOfMemory.number;
+    }
+}
+
+}  // namespace
+
+int32_t qitrmcsim_getFaults(char** json) {
+    return lendDescription(json, [](Simulator& simulator) {
+        const std::lock_guard<std::mutex> lock(simulator.mutex);
+        simulator.faults.refresh();
+        return simulator.faults.plan()->text;
+    });
+}
+
+int32_t qitrmcsim_describeDevices(char** json) {
+    return lendDescription(json, describeDevices);
+}
+
+int32_t qitrmcsim_readTrace(uint64_t from, char** json) {
+    return lendDescription(json, [&](Simulator& simulator) { return traceFrom(simulator, from); });
+}
