@@ -57,6 +57,20 @@ test("says who holds a device, waits for it on demand and never takes it by forc
   await page.getByRole("button", { name: "Reserve" }).waitFor();
 });
 
+test("learns from a refusal who holds a device, however many sessions there were meanwhile", async () => {
+  const host = await Host.start();
+  const page = await open(host, "#/module/Mod1");
+  await range(page).waitFor();
+  await page.route("**/qitrmc/Call", (route) => route.abort());
+  for (let i = 0; i < 40; ++i)
+    await host.call("closeSession", { session_id: (await host.call("initializeSession")).result.session_id });
+  const { result: { session_id } } = await host.call("initializeSession", { devices: "Mod1" });
+  await page.unroute("**/qitrmc/Call");
+  await page.getByText("Connected").waitFor();
+  await setRange(page, "5");
+  await page.getByText(`Mod1 is in use by ${session_id}.`).waitFor();
+});
+
 test("lets two pages take turns with a device", async () => {
   const host = await Host.start();
   const first = await open(host, "#/module/Mod1");

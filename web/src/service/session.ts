@@ -61,10 +61,19 @@ export function closeSessionWithPage(): void {
   });
 }
 
+// The numbers of sessions that refusals have named as holders of a device.
+export const namedHolders = new Set<number>();
+
+function noteHolders(failure: unknown): never {
+  if (isReserved(failure))
+    for (const [, id] of (failure as ServiceError).message.matchAll(/_session(\d+)/g)) namedHolders.add(Number(id));
+  throw failure;
+}
+
 export async function reserve(device: string): Promise<void> {
   if (current().reserved.includes(device)) return;
   const session_id = await session();
-  await call("reserveDevices", { session_id, devices: device, access: "ReadWrite" });
+  await call("reserveDevices", { session_id, devices: device, access: "ReadWrite" }).catch(noteHolders);
   update({ reserved: [...current().reserved, device] });
 }
 

@@ -3,7 +3,7 @@ import { statusCodes, type Methods } from "../../../clients/typescript/qitrmc.ts
 import { current, update, type Device, type Holder } from "../store.ts";
 import { texts } from "../texts/texts.ts";
 import { call, ServiceError } from "./rpc.ts";
-import { checkSession, ignoreRefusal, isMark, session } from "./session.ts";
+import { checkSession, ignoreRefusal, isMark, namedHolders, session } from "./session.ts";
 
 const PERIOD = 900;
 const CHASSIS = 1;
@@ -110,7 +110,8 @@ let newest = 0;
 let latestOwn = 0;
 
 // The service does not list its sessions, so the reserved devices are read from each session whose id is
-// near the newest known one.
+// near the newest known one. A reservation for reading in a batch would name the holders too, but a batch
+// keeps the requests of all clients waiting until one that goes on has ended, which may take long.
 async function watchHolders(): Promise<void> {
   const own = Number((await session()).replace("_session", ""));
   if (own !== latestOwn) { // at first, and after each restart of the service
@@ -118,10 +119,17 @@ async function watchHolders(): Promise<void> {
     latestOwn = newest = own;
     for (let id = Math.max(1, own - SESSIONS_BACK); id < own; ++id) openSessions.add(id);
   }
+  namedHolders.forEach(noteSession);
+  namedHolders.clear();
   const ahead = Array.from({ length: SESSIONS_AHEAD }, (_, i) => newest + 1 + i);
   const ids = [...openSessions, ...ahead].filter((id) => id !== own);
   const holders = await Promise.all(ids.map(holderOf));
   update({ holders: holders.filter((holder): holder is Holder => holder !== null) });
+}
+
+function noteSession(id: number): void {
+  openSessions.add(id);
+  newest = Math.max(newest, id);
 }
 
 async function holderOf(id: number): Promise<Holder | null> {
@@ -132,8 +140,7 @@ async function holderOf(id: number): Promise<Holder | null> {
     openSessions.delete(id);
     return null;
   }
-  openSessions.add(id);
-  newest = Math.max(newest, id);
+  noteSession(id);
   if (devices.length === 0) return null;
   const timeout = (await readOf("Session.Timeout"))?.value;
   return { session: session_id, isPage: isMark(timeout), devices };
