@@ -62,6 +62,16 @@ const VIEWS = {
     await page.locator("pre.answer").waitFor();
     await page.evaluate(() => scrollTo(0, 0));
   },
+  simulator: async (page, host) => {
+    await page.goto(`${host.url}/#/simulator`);
+    await page.getByRole("button", { name: "Pull Mod2" }).click();
+    await page.getByLabel("Resource").fill("Mod1");
+    await page.getByLabel("Status code").fill("-250977");
+    await page.getByRole("button", { name: "Add fault" }).click();
+    await page.locator(".rows code").waitFor();
+    await page.locator("pre.trace").getByText("getGenericProperty").first().waitFor();
+    await page.evaluate(() => scrollTo(0, 0));
+  },
   memory: async (page, host) => {
     await page.goto(`${host.url}/#/module/Mod1/memory`);
     await page.getByLabel("Byte at 0010", { exact: true }).fill("48");

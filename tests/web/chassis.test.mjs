@@ -1,9 +1,8 @@
 // The drawing of the chassis.
 import assert from "node:assert/strict";
-import { rename, writeFile } from "node:fs/promises";
 import path from "node:path";
 import test from "node:test";
-import { chassisFile, Host, open, ROOT, temporaryFolder } from "./support.mjs";
+import { chassisFile, Host, open, ROOT } from "./support.mjs";
 
 test("shows each module in its slot and empty slots as empty", async () => {
   const page = await open(await Host.start());
@@ -23,31 +22,35 @@ test("opens a module with a click", async () => {
   assert.match(page.url(), /#\/module\/Mod2$/);
 });
 
-test("shows a pulled module, its return and a lost connection", async () => {
-  const faults = path.join(await temporaryFolder(), "faults.json");
-  const setFaults = async (events) => {
-    await writeFile(faults + ".new", JSON.stringify({ events }));
-    await rename(faults + ".new", faults);
-  };
-  const page = await open(await Host.start(["--faults", faults]));
+// What the page promises for changes that others make.
+const TWO_SECONDS = { timeout: 2000 };
+
+async function setEvents(host, events) {
+  const { status } = await fetch(`${host.url}/simulator/faults`, { method: "POST", body: JSON.stringify({ events }) });
+  assert.equal(status, 204);
+}
+
+test("shows within two seconds that a module is pulled, added or does not answer", async () => {
+  const host = await Host.start();
+  const page = await open(host);
   const slot = page.locator(".slots > li").nth(1);
   await slot.getByText("Power supply").waitFor();
-  await setFaults([{ device: "Mod2", event: "pulled" }]);
-  await slot.getByText("Empty").waitFor();
+  await setEvents(host, [{ device: "Mod2", event: "pulled" }]);
+  await slot.getByText("Empty").waitFor(TWO_SECONDS);
   await page.getByText("Mod2 has been removed.").waitFor();
-  await setFaults([]);
-  await slot.getByText("Power supply").waitFor();
-  await setFaults([{ device: "Mod2", event: "connection_lost" }]);
-  await slot.getByText("Not answering").waitFor();
+  await setEvents(host, []);
+  await slot.getByText("Power supply").waitFor(TWO_SECONDS);
+  await setEvents(host, [{ device: "Mod2", event: "connection_lost" }]);
+  await slot.getByText("Not answering").waitFor(TWO_SECONDS);
 });
 
-test("shows a new name", async () => {
+test("shows a new name within two seconds", async () => {
   const host = await Host.start();
   const page = await open(host);
   await page.getByRole("link", { name: "Mod5" }).waitFor();
   const { result: { session_id } } = await host.call("initializeSession");
   await host.call("renameDevice", { session_id, device: "Mod5", new_device_name: "Relays" });
-  await page.getByRole("link", { name: "Relays" }).waitFor();
+  await page.getByRole("link", { name: "Relays" }).waitFor(TWO_SECONDS);
 });
 
 test("shows who holds a module", async () => {

@@ -1,10 +1,11 @@
 // Registers of a device by address and width, to read, write and watch.
-import { useState } from "preact/hooks";
+import { useEffect, useState } from "preact/hooks";
 import { useAttempt, usePeriodic } from "../parts/useAsync.ts";
 import { call } from "../service/rpc.ts";
 import { reserve, session } from "../service/session.ts";
+import { describeRegisters, type Registers } from "../service/simulator.ts";
 import { parseInteger } from "../service/values.ts";
-import type { Device } from "../store.ts";
+import { useStore, type Device } from "../store.ts";
 import { texts } from "../texts/texts.ts";
 
 type Width = 8 | 16 | 32 | 64;
@@ -22,6 +23,7 @@ const WIDTHS: Width[] = [8, 16, 32, 64];
 const WATCH_PERIOD = 500;
 const MOST_ADDRESS = 2n ** 32n - 1n;
 const MOST_ROWS = 256n;
+const MOST_AT_ONCE = 16; // with a click on a name
 
 function hexOf(value: bigint | number, bits: number): string {
   return "0x" + value.toString(16).toUpperCase().padStart(bits / 4, "0");
@@ -44,8 +46,22 @@ async function writeRow(device: string, row: Row, text: string): Promise<void> {
   await call("writeRegister", { session_id: await session(), device, address: row.address, size: row.width, data: data as number });
 }
 
-function RegisterRow({ device, row, replace, remove }: {
-  device: string; row: Row; replace: (row: Row) => void; remove: () => void;
+function useDescription(device: string): Registers[] {
+  const simulated = useStore((state) => state.simulated);
+  const [blocks, setBlocks] = useState<Registers[]>([]);
+  useEffect(() => void describeRegisters(device).then(setBlocks, () => setBlocks([])), [device, simulated]);
+  return blocks;
+}
+
+function RegisterName({ blocks, address }: { blocks: Registers[]; address: number }) {
+  const block = blocks.find((one) => one.address <= address && address < one.address + one.size);
+  if (!block?.name) return <td />;
+  const offset = address - block.address;
+  return <td>{block.name}{offset > 0 && ` + ${offset}`}{block.description && <small class="description">{block.description}</small>}</td>;
+}
+
+function RegisterRow({ device, blocks, row, replace, remove }: {
+  device: string; blocks: Registers[]; row: Row; replace: (row: Row) => void; remove: () => void;
 }) {
   const t = texts();
   const [text, setText] = useState("");
@@ -63,6 +79,7 @@ function RegisterRow({ device, row, replace, remove }: {
   return (
     <tr class={row.changed ? "changed" : ""}>
       <th scope="row" class="mono">{name}</th>
+      {blocks.length > 0 && <RegisterName blocks={blocks} address={row.address} />}
       <td>{row.width}</td>
       <td class="mono">{row.value === null ? "–" : hexOf(row.value, row.width)}{row.changed && <span class="chip pending">{t.changed}</span>}</td>
       <td class="mono number">{row.value === null ? "–" : String(row.value)}</td>
@@ -113,9 +130,26 @@ function AddForm({ add }: { add: (address: number, count: number, width: Width) 
   );
 }
 
+// The registers that have names, to be read with a click.
+function NamedRegisters({ blocks, add }: { blocks: Registers[]; add: (address: number, count: number, width: Width) => Promise<void> }) {
+  const read = ({ address, size, width }: Registers) => {
+    const bits = width ?? (size % 4 === 0 && address % 4 === 0 ? 32 : 8);
+    return add(address, Math.min(size / (bits / 8), MOST_AT_ONCE), bits);
+  };
+  return (
+    <div class="toolbar">
+      {blocks.filter(({ name }) => name).map((block) => (
+        <button type="button" key={block.address} title={block.description} onClick={() => void read(block)}>{block.name}</button>
+      ))}
+    </div>
+  );
+}
+
 export function RegistersTab({ device }: { device: Device }) {
   const t = texts();
   const [rows, setRows] = useState<Row[]>([]);
+  const blocks = useDescription(device.name);
+  const heads = [t.address, ...(blocks.length > 0 ? [t.name] : []), t.width, t.hexadecimal, t.decimal, t.write, ""];
   const replace = (row: Row) => setRows((old) => old.map((one) => (sameRegister(one, row) ? row : one)));
   const add = async (first: number, count: number, width: Width) => {
     const wanted = Array.from({ length: count }, (_, i): Row => ({
@@ -132,13 +166,14 @@ export function RegistersTab({ device }: { device: Device }) {
   return (
     <>
       <AddForm add={add} />
+      <NamedRegisters blocks={blocks} add={add} />
       {rows.length === 0 ? <p class="quiet">{t.noRegisters}</p> : (
         <div class="scroll" tabIndex={0} role="group" aria-label={t.registers}>
           <table class="grid registers">
-            <thead><tr>{[t.address, t.width, t.hexadecimal, t.decimal, t.write, ""].map((head) => <th scope="col" key={head}>{head}</th>)}</tr></thead>
+            <thead><tr>{heads.map((head) => <th scope="col" key={head}>{head}</th>)}</tr></thead>
             <tbody>
               {rows.map((row) => (
-                <RegisterRow key={`${row.address} ${row.width}`} device={device.name} row={row} replace={replace}
+                <RegisterRow key={`${row.address} ${row.width}`} device={device.name} blocks={blocks} row={row} replace={replace}
                              remove={() => setRows((old) => old.filter((one) => !sameRegister(one, row)))} />
               ))}
             </tbody>

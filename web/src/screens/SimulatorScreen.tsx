@@ -1,47 +1,46 @@
 // What the simulated chassis does wrong on purpose, and what is called in its driver.
-import { useState } from "preact/hooks";
+import { useEffect, useRef, useState } from "preact/hooks";
 import { useAttempt, usePeriodic } from "../parts/useAsync.ts";
-import { readFaults, readTrace, setFaults, type Event, type Fault, type Faults } from "../service/simulator.ts";
+import {
+  readDevices, readFaults, readTrace, setFaults,
+  type Event, type Fault, type Faults, type SimulatedDevice, type Trace,
+} from "../service/simulator.ts";
 import { parseDecimal, parseInteger } from "../service/values.ts";
-import { useStore } from "../store.ts";
 import { texts } from "../texts/texts.ts";
 
 const PERIOD = 1000;
-const MOST_TRACE = 20_000;
-
-function eventOf(faults: Faults, device: string): Event["event"] | null {
-  return faults.events?.find((event) => event.device === device)?.event ?? null;
-}
+const MOST_LINES = 1000;
 
 function withEvent(faults: Faults, device: string, event: Event["event"] | null): Faults {
   const others = (faults.events ?? []).filter((one) => one.device !== device);
   return { ...faults, events: event === null ? others : [...others, { device, event }] };
 }
 
-function Modules({ faults, apply }: { faults: Faults; apply: (faults: Faults) => void }) {
+function ModuleRow({ module, faults, apply }: { module: SimulatedDevice; faults: Faults; apply: (faults: Faults) => void }) {
   const t = texts();
-  const devices = useStore((state) => state.devices);
-  const present = devices.filter((device) => device.slot !== null).map((device) => device.name);
-  const names = [...new Set([...present, ...(faults.events ?? []).map((event) => event.device)])].sort();
+  const { name, state } = module;
+  const words = { present: t.ready, pulled: t.pulled, connection_lost: t.notAnswering }[state];
+  const button = (text: string, event: Event["event"] | null, kind: string) => (
+    <button type="button" class={kind} aria-label={`${text} ${name}`} onClick={() => apply(withEvent(faults, name, event))}>{text}</button>
+  );
+  return (
+    <li>
+      <span class="quiet">{t.slot} {module.slot}</span>
+      <strong>{name}</strong>
+      <span>{module.product}</span>
+      <span class={state === "present" ? "chip own" : "chip held"}>{words}</span>
+      {state === "present" ? [button(t.pull, "pulled", ""), button(t.cutConnection, "connection_lost", "")] : button(t.putBack, null, "primary")}
+    </li>
+  );
+}
+
+function Modules({ devices, faults, apply }: { devices: SimulatedDevice[]; faults: Faults; apply: (faults: Faults) => void }) {
+  const modules = devices.filter((device) => device.slot !== undefined).sort((one, other) => one.slot! - other.slot!);
   return (
     <section class="panel">
-      <h2>{t.modules}</h2>
+      <h2>{texts().modules}</h2>
       <ul class="rows">
-        {names.map((name) => {
-          const event = eventOf(faults, name);
-          return (
-            <li key={name}>
-              <strong>{name}</strong>
-              <span class={event ? "chip held" : "chip own"}>{event === "pulled" ? t.pulled : event ? t.notAnswering : t.ready}</span>
-              {event === null ? (
-                <>
-                  <button type="button" onClick={() => apply(withEvent(faults, name, "pulled"))} aria-label={`${t.pull} ${name}`}>{t.pull}</button>
-                  <button type="button" onClick={() => apply(withEvent(faults, name, "connection_lost"))} aria-label={`${t.cutConnection} ${name}`}>{t.cutConnection}</button>
-                </>
-              ) : <button type="button" class="primary" onClick={() => apply(withEvent(faults, name, null))} aria-label={`${t.putBack} ${name}`}>{t.putBack}</button>}
-            </li>
-          );
-        })}
+        {modules.map((module) => <ModuleRow key={module.name} module={module} faults={faults} apply={apply} />)}
       </ul>
     </section>
   );
@@ -97,15 +96,22 @@ function FaultList({ faults, apply }: { faults: Faults; apply: (faults: Faults) 
 
 function TracePanel() {
   const t = texts();
-  const [trace, setTrace] = useState<{ text: string; end: number } | null>({ text: "", end: -1 });
+  const [trace, setTrace] = useState<Trace>({ lines: [], next: 0 });
+  const [paused, setPaused] = useState(false);
+  const view = useRef<HTMLPreElement>(null);
   usePeriodic(PERIOD, async () => {
-    const more = await readTrace(trace?.end ?? -1);
-    setTrace((old) => more && { text: ((old?.text ?? "") + more.text).slice(-MOST_TRACE), end: more.end });
+    if (paused) return;
+    const { lines, next } = await readTrace(trace.next);
+    setTrace((old) => ({ lines: [...old.lines, ...lines].slice(-MOST_LINES), next }));
   }, []);
+  useEffect(() => { view.current!.scrollTop = view.current!.scrollHeight; }, [trace]);
   return (
     <section class="panel">
-      <h2>{t.trace}</h2>
-      {trace === null ? <p class="quiet">{t.noTrace}</p> : <pre class="trace" tabIndex={0}>{trace.text}</pre>}
+      <div class="toolbar">
+        <h2>{t.trace}</h2>
+        <button type="button" onClick={() => setPaused(!paused)}>{paused ? t.goOn : t.pause}</button>
+      </div>
+      <pre class="trace" tabIndex={0} role="region" aria-label={t.trace} ref={view}>{trace.lines.join("\n")}</pre>
     </section>
   );
 }
@@ -113,18 +119,23 @@ function TracePanel() {
 export function SimulatorScreen() {
   const t = texts();
   const [faults, setShown] = useState<Faults>({});
+  const [devices, setDevices] = useState<SimulatedDevice[]>([]);
   const { fault, attempt } = useAttempt();
-  usePeriodic(PERIOD, async () => setShown(await readFaults()), []);
+  const show = async () => {
+    setShown(await readFaults());
+    setDevices(await readDevices());
+  };
+  usePeriodic(PERIOD, show, []);
   const change = async (wanted: Faults) => {
     await setFaults(wanted);
-    setShown(await readFaults());
+    await show();
   };
   const apply = (wanted: Faults) => void attempt(() => change(wanted));
   return (
     <>
       <h1>{t.simulator}</h1>
       {fault && <p class="banner bad" role="alert">{fault}</p>}
-      <Modules faults={faults} apply={apply} />
+      <Modules devices={devices} faults={faults} apply={apply} />
       <section class="panel">
         <h2>{t.faults}</h2>
         <FaultForm add={(added) => change({ ...faults, faults: [...(faults.faults ?? []), added] })} />

@@ -1,5 +1,5 @@
-// What the host of a simulated chassis offers on its own machine: its faults and its trace.
-import { update } from "../store.ts";
+// What the host of a simulated chassis offers on its own machine: its devices, its faults and its trace.
+import { current, update } from "../store.ts";
 
 export interface Event {
   device: string;
@@ -19,17 +19,48 @@ export interface Faults {
   events?: Event[];
 }
 
+export interface Registers {
+  address: number;
+  size: number; // in bytes
+  width?: 8 | 16 | 32 | 64; // the only one that is allowed, in bits
+  name?: string;
+  description?: string;
+}
+
+export interface SimulatedDevice {
+  name: string;
+  product?: string;
+  state: "present" | "pulled" | "connection_lost";
+  slot?: number; // of a module
+  registers: Registers[];
+}
+
+const DEVICES = "/simulator/devices";
 const FAULTS = "/simulator/faults";
 
+async function get<Content>(path: string): Promise<Content> {
+  const response = await fetch(path);
+  if (!response.ok) throw new Error(await response.text());
+  return response.json();
+}
+
 export async function findSimulator(): Promise<void> {
-  const response = await fetch(FAULTS).catch(() => null);
+  const response = await fetch(DEVICES, { method: "HEAD" }).catch(() => null);
   update({ simulated: response !== null && response.ok });
 }
 
-export async function readFaults(): Promise<Faults> {
-  const response = await fetch(FAULTS);
-  if (!response.ok) throw new Error(await response.text());
-  return response.json();
+export function readDevices(): Promise<SimulatedDevice[]> {
+  return get(DEVICES);
+}
+
+// What the chassis file says of the registers of a device; nothing without the simulated chassis.
+export async function describeRegisters(device: string): Promise<Registers[]> {
+  if (!current().simulated) return [];
+  return (await readDevices()).find(({ name }) => name === device)?.registers ?? [];
+}
+
+export function readFaults(): Promise<Faults> {
+  return get(FAULTS);
 }
 
 export async function setFaults(faults: Faults): Promise<void> {
@@ -38,13 +69,10 @@ export async function setFaults(faults: Faults): Promise<void> {
 }
 
 export interface Trace {
-  text: string;
-  end: number; // where the next piece begins
+  lines: string[];
+  next: number; // the number of the first line that is not there yet
 }
 
-// Null when the host writes no trace.
-export async function readTrace(from: number): Promise<Trace | null> {
-  const response = await fetch(`/simulator/trace?from=${from}`);
-  if (!response.ok) return null;
-  return { text: await response.text(), end: Number(response.headers.get("X-Trace-End")) };
+export function readTrace(from: number): Promise<Trace> {
+  return get(`/simulator/trace/${from}`);
 }

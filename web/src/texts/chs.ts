@@ -31,7 +31,7 @@ export const chs: Texts = {
   method: "方法", required: "必填", send: "发送", request: "请求", answer: "响应", history: "历史",
   copyAsCurl: "复制为 curl", copyAsPython: "复制为 Python", copied: "已复制",
   address: "地址", width: "位宽", count: "数量", hexadecimal: "十六进制", decimal: "十进制",
-  read: "读取", write: "写入", watch: "监视", remove: "移除", changed: "已变化", readRegisters: "读取寄存器",
+  name: "名称", read: "读取", write: "写入", watch: "监视", remove: "移除", changed: "已变化", readRegisters: "读取寄存器",
   noRegisters: "输入地址以读取寄存器。",
   area: "区域", password: "密码", previous: "上一页", next: "下一页", importFile: "导入", exportFile: "导出",
   fileTooLong: (size) => `文件比区域长，该区域有 ${size} 字节。`,
@@ -40,5 +40,4 @@ export const chs: Texts = {
   modules: "模块", pulled: "已拔出", pull: "拔出", cutConnection: "断开连接", putBack: "恢复",
   faults: "故障", driverFunction: "函数", resource: "资源", statusCode: "状态码", everyCall: "每第 n 次调用",
   delay: "延迟 (s)", strike: "添加故障", clear: "清除", trace: "跟踪",
-  noTrace: "没有写入跟踪。请用 --trace 和文件启动主机。",
 };

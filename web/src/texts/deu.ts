@@ -31,7 +31,7 @@ export const deu: Texts = {
   method: "Methode", required: "erforderlich", send: "Senden", request: "Anfrage", answer: "Antwort", history: "Verlauf",
   copyAsCurl: "Als curl kopieren", copyAsPython: "Als Python kopieren", copied: "Kopiert",
   address: "Adresse", width: "Breite", count: "Anzahl", hexadecimal: "Hexadezimal", decimal: "Dezimal",
-  read: "Lesen", write: "Schreiben", watch: "Beobachten", remove: "Entfernen", changed: "geändert", readRegisters: "Register lesen",
+  name: "Name", read: "Lesen", write: "Schreiben", watch: "Beobachten", remove: "Entfernen", changed: "geändert", readRegisters: "Register lesen",
   noRegisters: "Eine Adresse eingeben, um Register zu lesen.",
   area: "Bereich", password: "Kennwort", previous: "Zurück", next: "Weiter", importFile: "Importieren", exportFile: "Exportieren",
   fileTooLong: (size) => `Die Datei ist länger als der Bereich, der ${size} Bytes hat.`,
@@ -40,5 +40,4 @@ export const deu: Texts = {
   modules: "Module", pulled: "Gezogen", pull: "Ziehen", cutConnection: "Verbindung trennen", putBack: "Zurücksetzen",
   faults: "Fehler", driverFunction: "Funktion", resource: "Ressource", statusCode: "Statuscode", everyCall: "Jeder n-te Aufruf",
   delay: "Verzögerung (s)", strike: "Fehler hinzufügen", clear: "Löschen", trace: "Aufzeichnung",
-  noTrace: "Es wird nichts aufgezeichnet. Den Host mit --trace und einer Datei starten.",
 };

@@ -29,7 +29,7 @@ export const eng = {
   method: "Method", required: "required", send: "Send", request: "Request", answer: "Answer", history: "History",
   copyAsCurl: "Copy as curl", copyAsPython: "Copy as Python", copied: "Copied",
   address: "Address", width: "Width", count: "Count", hexadecimal: "Hexadecimal", decimal: "Decimal",
-  read: "Read", write: "Write", watch: "Watch", remove: "Remove", changed: "changed", readRegisters: "Read registers",
+  name: "Name", read: "Read", write: "Write", watch: "Watch", remove: "Remove", changed: "changed", readRegisters: "Read registers",
   noRegisters: "Enter an address to read registers.",
   area: "Area", password: "Password", previous: "Previous", next: "Next", importFile: "Import", exportFile: "Export",
   fileTooLong: (size: string) => `The file is longer than the area, which has ${size} bytes.`,
@@ -38,7 +38,6 @@ export const eng = {
   modules: "Modules", pulled: "Pulled", pull: "Pull", cutConnection: "Cut connection", putBack: "Put back",
   faults: "Faults", driverFunction: "Function", resource: "Resource", statusCode: "Status code", everyCall: "Every call no.",
   delay: "Delay (s)", strike: "Add fault", clear: "Clear", trace: "Trace",
-  noTrace: "No trace is written. Start the host with --trace and a file.",
 };
 
 export type Texts = typeof eng;

@@ -31,7 +31,7 @@ export const fra: Texts = {
   method: "Méthode", required: "obligatoire", send: "Envoyer", request: "Requête", answer: "Réponse", history: "Historique",
   copyAsCurl: "Copier en curl", copyAsPython: "Copier en Python", copied: "Copié",
   address: "Adresse", width: "Largeur", count: "Nombre", hexadecimal: "Hexadécimal", decimal: "Décimal",
-  read: "Lire", write: "Écrire", watch: "Surveiller", remove: "Retirer", changed: "modifié", readRegisters: "Lire les registres",
+  name: "Nom", read: "Lire", write: "Écrire", watch: "Surveiller", remove: "Retirer", changed: "modifié", readRegisters: "Lire les registres",
   noRegisters: "Saisir une adresse pour lire des registres.",
   area: "Zone", password: "Mot de passe", previous: "Précédent", next: "Suivant", importFile: "Importer", exportFile: "Exporter",
   fileTooLong: (size) => `Le fichier dépasse la zone, qui compte ${size} octets.`,
@@ -40,5 +40,4 @@ export const fra: Texts = {
   modules: "Modules", pulled: "Retiré", pull: "Retirer", cutConnection: "Couper la liaison", putBack: "Remettre",
   faults: "Défauts", driverFunction: "Fonction", resource: "Ressource", statusCode: "Code d’état", everyCall: "Chaque n-ième appel",
   delay: "Délai (s)", strike: "Ajouter un défaut", clear: "Effacer", trace: "Trace",
-  noTrace: "Aucune trace n’est écrite. Démarrer l’hôte avec --trace et un fichier.",
 };

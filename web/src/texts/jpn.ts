@@ -31,7 +31,7 @@ export const jpn: Texts = {
   method: "メソッド", required: "必須", send: "送信", request: "要求", answer: "応答", history: "履歴",
   copyAsCurl: "curl としてコピー", copyAsPython: "Python としてコピー", copied: "コピーしました",
   address: "アドレス", width: "幅", count: "個数", hexadecimal: "16進", decimal: "10進",
-  read: "読み取り", write: "書き込み", watch: "監視", remove: "削除", changed: "変化", readRegisters: "レジスタを読む",
+  name: "名前", read: "読み取り", write: "書き込み", watch: "監視", remove: "削除", changed: "変化", readRegisters: "レジスタを読む",
   noRegisters: "アドレスを入力するとレジスタを読み取れます。",
   area: "領域", password: "パスワード", previous: "前へ", next: "次へ", importFile: "インポート", exportFile: "エクスポート",
   fileTooLong: (size) => `ファイルが領域（${size} バイト）より長いです。`,
@@ -40,5 +40,4 @@ export const jpn: Texts = {
   modules: "モジュール", pulled: "取り外し済み", pull: "取り外す", cutConnection: "接続を切る", putBack: "元に戻す",
   faults: "障害", driverFunction: "関数", resource: "リソース", statusCode: "ステータスコード", everyCall: "n 回ごと",
   delay: "遅延 (s)", strike: "障害を追加", clear: "消去", trace: "トレース",
-  noTrace: "トレースは書かれていません。--trace とファイルを指定してホストを起動してください。",
 };

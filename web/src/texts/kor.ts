@@ -31,7 +31,7 @@ export const kor: Texts = {
   method: "메서드", required: "필수", send: "보내기", request: "요청", answer: "응답", history: "기록",
   copyAsCurl: "curl로 복사", copyAsPython: "Python으로 복사", copied: "복사됨",
   address: "주소", width: "너비", count: "개수", hexadecimal: "16진수", decimal: "10진수",
-  read: "읽기", write: "쓰기", watch: "감시", remove: "제거", changed: "변경됨", readRegisters: "레지스터 읽기",
+  name: "이름", read: "읽기", write: "쓰기", watch: "감시", remove: "제거", changed: "변경됨", readRegisters: "레지스터 읽기",
   noRegisters: "주소를 입력하면 레지스터를 읽습니다.",
   area: "영역", password: "암호", previous: "이전", next: "다음", importFile: "가져오기", exportFile: "내보내기",
   fileTooLong: (size) => `파일이 영역(${size}바이트)보다 깁니다.`,
@@ -40,5 +40,4 @@ export const kor: Texts = {
   modules: "모듈", pulled: "분리됨", pull: "분리", cutConnection: "연결 끊기", putBack: "되돌리기",
   faults: "오류", driverFunction: "함수", resource: "리소스", statusCode: "상태 코드", everyCall: "n번째 호출마다",
   delay: "지연 (s)", strike: "오류 추가", clear: "지우기", trace: "추적",
-  noTrace: "추적이 기록되지 않습니다. --trace와 파일로 호스트를 시작하십시오.",
 };
