@@ -55,6 +55,13 @@ def test_a_release_has_packages_sources_changes_and_checksums_and_is_the_same_tw
     assert made(tagged) == first
 
 
+def test_packages_for_every_architecture_are_the_same_whoever_makes_them():
+    made = [{path.name: path.read_bytes() for path in (machine.PACKAGES / architecture).glob("*_all.deb")}
+            for architecture in ARCHITECTURES]
+    assert made[0]
+    assert made[0] == made[1]
+
+
 @pytest.mark.parametrize("break_it, message", [
     (lambda folder: (folder / "README.md").write_text("x"), "not committed"),
     (lambda folder: git(folder, "commit", "-q", "--allow-empty", "-m", "More"), "not checked out"),
