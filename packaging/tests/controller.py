@@ -17,6 +17,8 @@ LIBRARIES = ("lib/arm-linux-gnueabi", "usr/lib/arm-linux-gnueabi")
 PLUGIN = "/usr/lib/qitrmc/plugin/libqitrmcsvc.so"
 # Where the emulator puts the memory of the program, so that it can be told from its own.
 MEMORY_START = 0x200000000
+# An empty folder of the root, served in place of the page.
+NO_PAGE = "/srv"
 
 
 def make(root):
@@ -26,6 +28,7 @@ def make(root):
         for path in (CROSS / "sysroot" / folder).glob("*.so*"):
             shutil.copy(path, root / folder, follow_symlinks=False)
     shutil.copy(CROSS / "sysroot/lib/ld-linux.so.3", root / "lib", follow_symlinks=False)
+    (root / NO_PAGE[1:]).mkdir()
     shutil.copy(EMULATOR, root / "emulator")
     for path in machine.packages("armel").values():
         subprocess.run(["dpkg-deb", "-x", path, root], check=True)
@@ -43,4 +46,4 @@ def serve(command, folder):
     program.write_text("#!/bin/sh\nexport LD_LIBRARY_PATH=/usr/lib/qitrmc/simulator:/usr/lib/qitrmc/host\n"
                        f'exec {" ".join(command)} "$@"\n')
     program.chmod(0o755)
-    return hostlib.Host(build_dir=folder, plugin=PLUGIN)
+    return hostlib.Host(build_dir=folder, plugin=PLUGIN, options=["--web", NO_PAGE])
