@@ -47,9 +47,11 @@ wait_for --resolve '*:443:127.0.0.1' https://rack.example/
 """
 HAPROXY = r"""
 cat server.key >>server.pem
+cp /proxy/too-large.lua /etc/haproxy
 sed "s#\$6\$qitrmc\$INSERT.A.HASH#$(openssl passwd -6 secret)#" /proxy/haproxy.cfg >/etc/haproxy/haproxy.cfg
 haproxy -D -f /etc/haproxy/haproxy.cfg
-wait_for -u lab:secret --retry-all-errors --fail --resolve '*:443:127.0.0.1' https://rack.example/rack2/qitrmc/Call -d '{}'
+# From another address, since the requests of each are counted.
+wait_for --interface 127.0.0.2 -u lab:secret --retry-all-errors --fail --resolve '*:443:127.0.0.1' https://rack.example/rack2/qitrmc/Call -d '{}'
 """
 
 
@@ -131,8 +133,10 @@ def test_a_body_of_16_mib_passes_and_one_byte_more_is_refused(proxied):
       { printf %s "$BODY"; head -c $((16777216 - ${#BODY})) /dev/zero | tr '\\0' ' '; } >/tmp/most
       { cat /tmp/most; printf ' '; } >/tmp/more
       call rack.example/rack1/qitrmc/Call $known -H Expect: --data-binary @/tmp/most
-      call rack.example/rack1/qitrmc/Call $known -H Expect: --data-binary @/tmp/more
-    """) == ["200", "413"]
+      for time in 1 2 3 4 5 6 7 8; do
+        call rack.example/rack1/qitrmc/Call $known -H Expect: --data-binary @/tmp/more
+      done
+    """) == ["200", *["413"] * 8]
 
 
 def test_too_many_requests_are_answered_with_429(proxied):
