@@ -1,7 +1,6 @@
 #include "qitrmcwebsvc/RequestResource.h"
 
 #include <algorithm>
-#include <array>
 #include <optional>
 #include <utility>
 
@@ -10,6 +9,7 @@
 #include "qitrmcwebsvc/DriverOwners.h"
 #include "qitrmcwebsvc/findMember.h"
 #include "qitrmcwebsvc/foldedText.h"
+#include "qitrmcwebsvc/resourceTokens.h"
 
 namespace nQITRMCWEBSVC100 {
 
@@ -26,15 +26,6 @@ constexpr std::pair<const char*, ResourceKind> resourceMembers[] = {
     {"physical_channel", ResourceKind::PhysicalChannel},
     {"nvmem_area", ResourceKind::NvmemArea},
 };
-
-// Names for lists that the driver maintains. They are not checked against the driver's names.
-constexpr std::array<const char*, 5> tokens = {"$ConnectedDevices", "$DefaultDevices",
-                                               "$DefaultNVMEMAreas", "$DefaultPhysChans",
-                                               "$ReservedDevices"};
-
-bool isToken(const std::string& name) {
-    return std::find(tokens.begin(), tokens.end(), name) != tokens.end();
-}
 
 [[noreturn]] void refuseName(const std::string& name) {
     BasicError error(qierr::codes::invalidResourceName, QITRMC_HERE);
@@ -71,8 +62,9 @@ class KnownNames {
 RequestResource::RequestResource(const JsonValue& params) {
     for (const auto& [member, kind] : resourceMembers) {
         const JsonValue* const value = findMember(params, member);
-        if (value == nullptr)
+        if (value == nullptr) {
             continue;
+        }
         readNames(*value);
         resourceKind = kind;
         return;
@@ -82,10 +74,11 @@ RequestResource::RequestResource(const JsonValue& params) {
 RequestResource::RequestResource(const JsonValue& params, nQITRMCAPI100_Session driverSession,
                                  ResourceKind defaultKind)
     : RequestResource(params) {
-    if (resourceKind != ResourceKind::None)
+    if (resourceKind != ResourceKind::None) {
         validateResourceNames(driverSession);
-    else
+    } else {
         applyDefault(defaultKind);
+    }
 }
 
 RequestResource::RequestResource(const JsonValue& params, const SessionContext& session)
@@ -99,17 +92,20 @@ void RequestResource::readNames(const JsonValue& value) {
     const auto append = [&](const JsonValue& text) {
         const std::string list(text.GetString(), text.GetStringLength());
         // The driver reads a list up to its first NUL, so the names after it would be ignored.
-        if (list.find('\0') != std::string::npos)
+        if (list.find('\0') != std::string::npos) {
             refuseName(list);
+        }
         appendExpanded(resourceNames, list, NameKind::Path);
     };
-    if (value.IsString())
+    if (value.IsString()) {
         append(value);
-    else if (value.IsArray())
-        for (const JsonValue& element : value.GetArray())
+    } else if (value.IsArray()) {
+        for (const JsonValue& element : value.GetArray()) {
             append(element);
-    else
+        }
+    } else {
         throw InternalError("Invalid data type for the name of resource(s)", QITRMC_HERE);
+    }
 }
 
 void RequestResource::validateResourceNames(nQITRMCAPI100_Session driverSession) const {
@@ -117,32 +113,27 @@ void RequestResource::validateResourceNames(nQITRMCAPI100_Session driverSession)
     const char* property =
         resourceKind == ResourceKind::PhysicalChannel ? "Dev.PhysChans" : "Dev.NVMEM.Areas";
     std::optional<KnownNames> known;
-    if (areDevices)
+    if (areDevices) {
         known.emplace(driverSession);
+    }
     for (const std::string& name : resourceNames) {
-        if (isToken(name))
+        // The driver's names do not contain the tokens.
+        if (propertyOfToken(name) != nullptr) {
             continue;
-        if (!areDevices)
+        }
+        if (!areDevices) {
             known.emplace(driverSession, name.substr(0, name.find('/')), property);
-        if (!known->contains(name))
+        }
+        if (!known->contains(name)) {
             refuseName(name);
+        }
     }
 }
 
 void RequestResource::applyDefault(ResourceKind defaultKind) {
     resourceKind = defaultKind;
-    switch (defaultKind) {
-        case ResourceKind::Device:
-            resourceNames.push_back("$DefaultDevices");
-            break;
-        case ResourceKind::PhysicalChannel:
-            resourceNames.push_back("$DefaultPhysChans");
-            break;
-        case ResourceKind::NvmemArea:
-            resourceNames.push_back("$DefaultNVMEMAreas");
-            break;
-        case ResourceKind::None:
-            break;
+    if (const char* token = defaultTokenOf(defaultKind)) {
+        resourceNames.push_back(token);
     }
 }
 

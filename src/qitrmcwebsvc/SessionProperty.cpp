@@ -1,11 +1,11 @@
 #include "qitrmcwebsvc/SessionProperty.h"
 
-#include <string_view>
 #include <utility>
 
 #include "qitrmcsharedcmn/parseUtilities.h"
 #include "qitrmcwebsvc/callDriver.h"
 #include "qitrmcwebsvc/invalidParams.h"
+#include "qitrmcwebsvc/resourceTokens.h"
 
 namespace nQITRMCWEBSVC100 {
 
@@ -16,27 +16,6 @@ namespace {
 // The numbers of the data types: the scalar types, followed by their array types in the same order.
 constexpr std::int32_t firstScalarType = 1;
 constexpr std::int32_t scalarTypeCount = 7;
-
-// A token in a list of resources, and the session property whose contents replace it.
-struct Token {
-    std::string_view token;
-    const char* property;
-};
-constexpr Token tokens[] = {
-    {"$ConnectedDevices", "Session.ConnectedDevices"},
-    {"$DefaultDevices", "Session.DefaultDevices"},
-    {"$DefaultNVMEMAreas", "Session.DefaultNVMEMAreas"},
-    {"$DefaultPhysChans", "Session.DefaultPhysChans"},
-    {"$ReservedDevices", "Session.ReservedDevices"},
-};
-
-// Null for a name that is not a token.
-const char* propertyBehindToken(const std::string& name) {
-    for (const Token& candidate : tokens)
-        if (candidate.token == name)
-            return candidate.property;
-    return nullptr;
-}
 
 PropertyCategory categoryOf(ResourceKind kind) {
     switch (kind) {
@@ -59,8 +38,9 @@ SessionProperty::SessionProperty(std::shared_ptr<SessionContext> session, std::s
     : session(std::move(session)), name(std::move(name)) {
     decideCategory(resources.kind());
     this->resources = resources.names();
-    if (isOnResources())
+    if (isOnResources()) {
         expandTokens();
+    }
     joinedResources = compressNames(this->resources, NameKind::Path);
     open();
     type = metaInt32("Prop.DataType");
@@ -130,9 +110,10 @@ bool SessionProperty::isOnResources() const {
 void SessionProperty::expandTokens() {
     std::vector<std::string> expanded;
     for (std::string& resource : resources) {
-        if (resource.empty())
+        if (resource.empty()) {
             continue;
-        const char* property = propertyBehindToken(resource);
+        }
+        const char* property = propertyOfToken(resource);
         if (property == nullptr) {
             expanded.push_back(std::move(resource));
             continue;
@@ -146,24 +127,27 @@ void SessionProperty::expandTokens() {
 }
 
 void SessionProperty::open() {
-    if (driverDefined)
+    if (driverDefined) {
         callDriver(nQITRMCAPI100_openDriverDefinedProperty, session->driverSession, name.c_str(),
                    handle.out());
-    else
+    } else {
         callDriver(nQITRMCAPI100_openGenericProperty, session->driverSession,
                    resources.empty() ? "" : resources.front().c_str(), name.c_str(), handle.out());
+    }
 }
 
 void SessionProperty::spreadOverResources() {
-    if (!isOnResources() || resources.size() < 2)
+    if (!isOnResources() || resources.size() < 2) {
         return;
+    }
     if (isArray()) {
         BasicError error(qierr::codes::arrayOnSeveralResources, QITRMC_HERE);
         addUsageString(error.details(), "kUsageTypeDevices", joinedResources.c_str());
         throw error;
     }
-    if (isScalar())
+    if (isScalar()) {
         type += scalarTypeCount;
+    }
 }
 
 }  // namespace nQITRMCWEBSVC100

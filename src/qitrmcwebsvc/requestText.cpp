@@ -7,6 +7,8 @@
 #include <optional>
 #include <system_error>
 
+#include <rapidjson/error/en.h>
+
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcwebsvc/exponentGuard.h"
 
@@ -22,8 +24,9 @@ namespace {
 double nearestDouble(const char* text, const char* textEnd, double approximation) {
     double value = 0.0;
     const std::errc failure = std::from_chars(text, textEnd, value).ec;
-    if (failure == std::errc())
+    if (failure == std::errc()) {
         return value;
+    }
     const bool tooBig = std::fabs(approximation) > 1.0;
     return std::copysign(tooBig ? std::numeric_limits<double>::infinity() : 0.0, approximation);
 }
@@ -85,54 +88,12 @@ class GuardedDocument {
     bool sawInfinity = false;
 };
 
-const char* parseErrorText(rapidjson::ParseErrorCode code) {
-    switch (code) {
-        case rapidjson::kParseErrorNone:
-            return "No error.";
-        case rapidjson::kParseErrorDocumentEmpty:
-            return "The document is empty.";
-        case rapidjson::kParseErrorDocumentRootNotSingular:
-            return "The document root must not be followed by other values.";
-        case rapidjson::kParseErrorValueInvalid:
-            return "Invalid value.";
-        case rapidjson::kParseErrorObjectMissName:
-            return "Missing a name for object member.";
-        case rapidjson::kParseErrorObjectMissColon:
-            return "Missing a colon after a name of object member.";
-        case rapidjson::kParseErrorObjectMissCommaOrCurlyBracket:
-            return "Missing a comma or '}' after an object member.";
-        case rapidjson::kParseErrorArrayMissCommaOrSquareBracket:
-            return "Missing a comma or ']' after an array element.";
-        case rapidjson::kParseErrorStringUnicodeEscapeInvalidHex:
-            return "Incorrect hex digit after \\u escape in string.";
-        case rapidjson::kParseErrorStringUnicodeSurrogateInvalid:
-            return "The surrogate pair in string is invalid.";
-        case rapidjson::kParseErrorStringEscapeInvalid:
-            return "Invalid escape character in string.";
-        case rapidjson::kParseErrorStringMissQuotationMark:
-            return "Missing a closing quotation mark in string.";
-        case rapidjson::kParseErrorStringInvalidEncoding:
-            return "Invalid encoding in string.";
-        case rapidjson::kParseErrorNumberTooBig:
-            return "Number too big to be stored in double.";
-        case rapidjson::kParseErrorNumberMissFraction:
-            return "Miss fraction part in number.";
-        case rapidjson::kParseErrorNumberMissExponent:
-            return "Miss exponent in number.";
-        case rapidjson::kParseErrorTermination:
-            return "Terminate parsing due to Handler error.";
-        case rapidjson::kParseErrorUnspecificSyntaxError:
-            return "Unspecific syntax error.";
-        default:
-            return "Unknown error.";
-    }
-}
-
 }  // namespace
 
 void parseRequestText(const std::string& body, JsonDocument& document) {
-    if (holdsUncountableNumber(body))
+    if (holdsUncountableNumber(body)) {
         throw std::bad_alloc();
+    }
     const std::optional<std::string> guardedBody = withSafeExponents(body.c_str());
     const std::string& text = guardedBody ? *guardedBody : body;
     rapidjson::StringStream stream(text.c_str());
@@ -142,13 +103,15 @@ void parseRequestText(const std::string& body, JsonDocument& document) {
         return !reader.Parse<rapidjson::kParseDefaultFlags>(stream, handler).IsError();
     };
     document.Populate(parse);
-    if (!reader.HasParseError())
+    if (!reader.HasParseError()) {
         return;
+    }
     const auto code =
         handler.numberTooBig() ? rapidjson::kParseErrorNumberTooBig : reader.GetParseErrorCode();
     BasicError error(qierr::codes::parseError, QITRMC_HERE);
-    addUsageUInt32(addUsageString(error.details(), "kUsageTypeDetails", parseErrorText(code)),
-                   "kUsageTypeOffset", static_cast<std::uint32_t>(reader.GetErrorOffset()));
+    addUsageUInt32(
+        addUsageString(error.details(), "kUsageTypeDetails", rapidjson::GetParseError_En(code)),
+        "kUsageTypeOffset", static_cast<std::uint32_t>(reader.GetErrorOffset()));
     throw error;
 }
 
