@@ -1,25 +1,16 @@
 #include "host/RequestTarget.h"
 
+#include "common/digits.h"
+
 namespace host {
 
-namespace {
-
-int hexDigit(char c) {
-    if (c >= '0' && c <= '9')
-        return c - '0';
-    if (c >= 'a' && c <= 'f')
-        return c - 'a' + 10;
-    if (c >= 'A' && c <= 'F')
-        return c - 'A' + 10;
-    return -1;
-}
-
-}  // namespace
+using common::hexDigit;
 
 std::string_view pathOfTarget(std::string_view target) {
     const std::size_t scheme = target.find("://");
-    if (target.empty() || target.front() == '/' || scheme == std::string_view::npos)
+    if (target.empty() || target.front() == '/' || scheme == std::string_view::npos) {
         return target;
+    }
     const std::size_t path = target.find('/', scheme + 3);
     return path == std::string_view::npos ? std::string_view("/") : target.substr(path);
 }

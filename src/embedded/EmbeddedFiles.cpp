@@ -5,8 +5,10 @@
 #include <string>
 
 const char* embeddedText(const char* name) {
-    for (const EmbeddedFile& file : embeddedFiles())
-        if (std::strcmp(file.name, name) == 0)
+    for (const EmbeddedFile& file : embeddedFiles()) {
+        if (std::strcmp(file.name, name) == 0) {
             return file.data;
+        }
+    }
     throw std::out_of_range(std::string("no embedded file ") + name);
 }

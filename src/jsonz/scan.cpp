@@ -11,19 +11,6 @@ const char* skipWhiteSpace(const char* position) {
     return position;
 }
 
-int hexDigit(char c) {
-    if (isDigit(c)) {
-        return c - '0';
-    }
-    if (c >= 'a' && c <= 'f') {
-        return c - 'a' + 10;
-    }
-    if (c >= 'A' && c <= 'F') {
-        return c - 'A' + 10;
-    }
-    return -1;
-}
-
 const char* fail(jsonz_value* value, const char* position, jsonz_error error) {
     *value = jsonz_value{};
     value->position = position;

@@ -1,5 +1,6 @@
 #pragma once
 
+#include "common/digits.h"
 #include "jsonz/jsonz.h"
 
 // Functions that read single tokens and containers, shared by the sources of this folder.
@@ -7,12 +8,8 @@ namespace jsonz {
 
 const char* skipWhiteSpace(const char* position);
 
-inline bool isDigit(char c) {
-    return c >= '0' && c <= '9';
-}
-
-// The value of a hexadecimal digit, or -1.
-int hexDigit(char c);
+using common::hexDigit;
+using common::isDigit;
 
 // Reads a string, number or keyword at `position`, which must not be white space. Always fills
 // `value`; returns the position after the token, or null.

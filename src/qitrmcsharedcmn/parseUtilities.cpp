@@ -6,11 +6,14 @@
 #include <algorithm>
 #include <charconv>
 
+#include "common/digits.h"
 #include "qitrmcsharedcmn/Exceptions.h"
 
 namespace nQITRMCSHAREDCMN100 {
 
 namespace {
+
+using common::isDigit;
 
 constexpr std::uint32_t largestRange = 1024;
 
@@ -18,10 +21,6 @@ constexpr std::uint32_t largestRange = 1024;
     BasicError error(qierr::codes::invalidResourceName, position);
     addUsageString(error.details(), "kUsageTypeRequestedValue", checkUtf8(name).c_str());
     throw error;
-}
-
-bool isDigit(char c) {
-    return c >= '0' && c <= '9';
 }
 
 bool hasSlash(const std::string& name) {

@@ -7,12 +7,12 @@
 
 #include <rapidjson/allocators.h>
 
-#include "qitrmcwebsvc/ThrowingAllocator.h"
+#include "common/ThrowingAllocator.h"
 
 // The library's default allocator returns null on failure, and the library writes through that
 // pointer. Some parts, such as the stack of a deep copy and the compiled patterns of a schema,
 // always use the default allocator. Therefore the default is replaced.
-#define CrtAllocator ::nQITRMCWEBSVC100::ThrowingAllocator
+#define CrtAllocator ::common::ThrowingAllocator
 #include <rapidjson/document.h>
 #include <rapidjson/pointer.h>
 #include <rapidjson/reader.h>
@@ -23,10 +23,11 @@
 
 namespace nQITRMCWEBSVC100 {
 
+using common::ThrowingAllocator;
 using JsonEncoding = rapidjson::UTF8<>;
-using JsonPool = rapidjson::MemoryPoolAllocator<ThrowingAllocator>;
-using JsonValue = rapidjson::GenericValue<JsonEncoding, JsonPool>;
-using JsonDocument = rapidjson::GenericDocument<JsonEncoding, JsonPool, ThrowingAllocator>;
+using JsonAllocator = rapidjson::MemoryPoolAllocator<ThrowingAllocator>;
+using JsonValue = rapidjson::GenericValue<JsonEncoding, JsonAllocator>;
+using JsonDocument = rapidjson::GenericDocument<JsonEncoding, JsonAllocator, ThrowingAllocator>;
 using JsonReader = rapidjson::GenericReader<JsonEncoding, JsonEncoding, ThrowingAllocator>;
 using JsonBuffer = rapidjson::GenericStringBuffer<JsonEncoding, ThrowingAllocator>;
 using JsonWriter = rapidjson::Writer<JsonBuffer, JsonEncoding, JsonEncoding, ThrowingAllocator>;

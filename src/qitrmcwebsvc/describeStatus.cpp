@@ -1,12 +1,11 @@
 #include "qitrmcwebsvc/describeStatus.h"
 
-#include <utf8proc.h>
-
 #include <algorithm>
 #include <cstdint>
 #include <memory>
 #include <string_view>
 
+#include "common/utf8.h"
 #include "qihtl/String.h"
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qixlator/json1.h"
@@ -45,13 +44,8 @@ std::string withValidUtf8(std::string_view text) {
     std::string valid;
     valid.reserve(text.size());
     while (!text.empty()) {
-        utf8proc_int32_t codePoint = 0;
-        const auto length =
-            utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(text.data()),
-                             static_cast<utf8proc_ssize_t>(text.size()), &codePoint);
-        const std::size_t taken = length > 0 ? static_cast<std::size_t>(length) : 1;
-        valid += length > 0 ? text.substr(0, taken) : std::string_view("\xef\xbf\xbd");
-        text.remove_prefix(taken);
+        const common::Utf8Character character = common::takeCharacter(text);
+        valid += character.isValid() ? character.bytes : "\xef\xbf\xbd";
     }
     return valid;
 }

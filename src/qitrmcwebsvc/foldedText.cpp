@@ -5,6 +5,8 @@
 #include <array>
 #include <cstddef>
 
+#include "common/utf8.h"
+
 namespace nQITRMCWEBSVC100 {
 namespace {
 
@@ -16,8 +18,9 @@ class FoldedCodePoints {
     bool atEnd() const { return next == count && text.empty(); }
 
     utf8proc_int32_t take() {
-        if (next == count)
+        if (next == count) {
             foldOne();
+        }
         return folded[next++];
     }
 
@@ -28,19 +31,14 @@ class FoldedCodePoints {
     void foldOne() {
         next = 0;
         count = 1;
-        utf8proc_int32_t codePoint = 0;
-        const auto length =
-            utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(text.data()),
-                             static_cast<utf8proc_ssize_t>(text.size()), &codePoint);
-        if (length <= 0) {
-            folded[0] = strayByteBase + static_cast<unsigned char>(text.front());
-            text.remove_prefix(1);
+        const common::Utf8Character character = common::takeCharacter(text);
+        if (!character.isValid()) {
+            folded[0] = strayByteBase + static_cast<unsigned char>(character.bytes.front());
             return;
         }
-        text.remove_prefix(static_cast<std::size_t>(length));
         int boundary = 0;
         count = static_cast<std::size_t>(utf8proc_decompose_char(
-            codePoint, folded.data(), static_cast<utf8proc_ssize_t>(folded.size()),
+            character.codePoint, folded.data(), static_cast<utf8proc_ssize_t>(folded.size()),
             UTF8PROC_CASEFOLD, &boundary));
     }
 
@@ -64,8 +62,9 @@ bool dropEqualAscii(std::string_view& left, std::string_view& right) {
     std::size_t same = 0;
     while (same < left.size() && same < right.size() && isAscii(left[same]) &&
            isAscii(right[same])) {
-        if (foldAscii(left[same]) != foldAscii(right[same]))
+        if (foldAscii(left[same]) != foldAscii(right[same])) {
             return false;
+        }
         ++same;
     }
     left.remove_prefix(same);
@@ -76,13 +75,16 @@ bool dropEqualAscii(std::string_view& left, std::string_view& right) {
 }  // namespace
 
 bool equalFolded(std::string_view left, std::string_view right) {
-    if (!dropEqualAscii(left, right))
+    if (!dropEqualAscii(left, right)) {
         return false;
+    }
     FoldedCodePoints leftPoints(left);
     FoldedCodePoints rightPoints(right);
-    while (!leftPoints.atEnd() && !rightPoints.atEnd())
-        if (leftPoints.take() != rightPoints.take())
+    while (!leftPoints.atEnd() && !rightPoints.atEnd()) {
+        if (leftPoints.take() != rightPoints.take()) {
             return false;
+        }
+    }
     return leftPoints.atEnd() && rightPoints.atEnd();
 }
 

@@ -26,8 +26,9 @@ std::vector<std::string> schemaNames() {
 #define QITRMC_METHOD(name, Class, schema) byMethod[name] = schema;
 #include "qitrmcwebsvc/methods.def"
     std::vector<std::string> names = {"definitions.json"};
-    for (const auto& [method, schema] : byMethod)
+    for (const auto& [method, schema] : byMethod) {
         names.push_back(schema);
+    }
     return names;
 }
 
@@ -44,8 +45,9 @@ std::string contentOf(const std::string& path) {
 
 TEST(EmbeddedFiles, BeginWithTheSchemasInTableOrder) {
     std::vector<std::string> names;
-    for (const EmbeddedFile& file : embeddedFiles())
+    for (const EmbeddedFile& file : embeddedFiles()) {
         names.push_back(file.name);
+    }
     const std::vector<std::string> expected = schemaNames();
     ASSERT_GE(names.size(), expected.size());
     names.resize(expected.size());
@@ -54,8 +56,9 @@ TEST(EmbeddedFiles, BeginWithTheSchemasInTableOrder) {
 
 TEST(EmbeddedFiles, HoldEachSchemaExactlyAsInItsSourceFile) {
     for (const EmbeddedFile& file : embeddedFiles()) {
-        if (!isJson(file.name))
+        if (!isJson(file.name)) {
             continue;
+        }
         const std::string source = contentOf(EMBEDDED_SOURCES "/schemas/" + std::string(file.name));
         ASSERT_FALSE(source.empty()) << file.name;
         EXPECT_EQ(std::string(file.data, file.size), source) << file.name;
@@ -63,8 +66,9 @@ TEST(EmbeddedFiles, HoldEachSchemaExactlyAsInItsSourceFile) {
 }
 
 TEST(EmbeddedFiles, AreReadableAsCTexts) {
-    for (const EmbeddedFile& file : embeddedFiles())
+    for (const EmbeddedFile& file : embeddedFiles()) {
         EXPECT_EQ(file.size, std::strlen(file.data)) << file.name;
+    }
 }
 
 TEST(EmbeddedText, FindsAFileByItsExactName) {

@@ -1,7 +1,8 @@
 #include <gtest/gtest.h>
 
-#include <string>
+#include <string_view>
 
+#include "FixtureConstants.h"
 #include "embedded/EmbeddedFiles.h"
 
 namespace {
@@ -10,17 +11,24 @@ const EmbeddedFile& fileAt(int index) {
     return embeddedFiles().begin()[index];
 }
 
+// The content of the fixture; it includes a NUL before a digit and what looks like a trigraph.
+constexpr char awkward[] =
+    "quote \" backslash \\ trigraph ?\?= percent %s\r\n"
+    "nul \0"
+    "7 digit after, escape \x1b"
+    "1, tab\t\n"
+    "\xe3\x81\x82\xff\x7f\n"
+    "\rlast line without an end";
+constexpr std::string_view expected(awkward, sizeof(awkward) - 1);
+
 TEST(EmbeddingGenerator, KeepsEveryByteOfAFile) {
-    // The content of the fixture; it includes a NUL before a digit and what looks like a trigraph.
-    const char expected[] =
-        "quote \" backslash \\ trigraph ?\?= percent %s\r\n"
-        "nul \0"
-        "7 digit after, escape \x1b"
-        "1, tab\t\n"
-        "\xe3\x81\x82\xff\x7f\n"
-        "\rlast line without an end";
     const EmbeddedFile& file = fileAt(0);
-    EXPECT_EQ(std::string(file.data, file.size), std::string(expected, sizeof(expected) - 1));
+    EXPECT_EQ(std::string_view(file.data, file.size), expected);
+}
+
+TEST(EmbeddingGenerator, KeepsEveryByteInAConstant) {
+    EXPECT_EQ(embedded::awkward, expected);
+    EXPECT_EQ(embedded::empty, "");
 }
 
 TEST(EmbeddingGenerator, NamesAFileWithoutItsFolder) {
@@ -38,8 +46,9 @@ TEST(EmbeddingGenerator, EmbedsAnEmptyFile) {
 }
 
 TEST(EmbeddingGenerator, PutsANulAfterEachFile) {
-    for (const EmbeddedFile& file : embeddedFiles())
+    for (const EmbeddedFile& file : embeddedFiles()) {
         EXPECT_EQ(file.data[file.size], '\0') << file.name;
+    }
 }
 
 }  // namespace

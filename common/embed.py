@@ -1,5 +1,10 @@
 #!/usr/bin/python3
-"""Writes the table of embedded files as one C++ source: embed.py OUTPUT FILE..."""
+"""Embeds files in a program.
+
+embed.py table OUTPUT FILE...      a source with the table of embedded/EmbeddedFiles.h
+embed.py constants OUTPUT FILE...  a header with a text for each file, in the namespace embedded; the
+                                   text of bench.json is embedded::bench
+"""
 
 import sys
 from pathlib import Path
@@ -46,9 +51,24 @@ def table(paths: list[Path]) -> str:
     )
 
 
+def constant(name: str, data: bytes) -> str:
+    return f"inline constexpr std::string_view {name}(\n{literal(data)},\n    {len(data)});\n"
+
+
+def constants(paths: list[Path]) -> str:
+    definitions = "\n".join(constant(path.stem, path.read_bytes()) for path in paths)
+    return (
+        "#pragma once\n\n#include <string_view>\n\n"
+        f"namespace embedded {{\n\n{definitions}\n}}  // namespace embedded\n"
+    )
+
+
+FORMS = {"table": table, "constants": constants}
+
+
 def main() -> None:
-    output, *inputs = map(Path, sys.argv[1:])
-    output.write_text(table(inputs), encoding="ascii")
+    form, output, *inputs = sys.argv[1:]
+    Path(output).write_text(FORMS[form](list(map(Path, inputs))), encoding="ascii")
 
 
 if __name__ == "__main__":
