@@ -249,8 +249,9 @@ REGISTER(32)
 REGISTER(64)
 
 DEFINE(getNvmemBytes, Session, Name, std::uint32_t, std::uint8_t* buffer, std::uint32_t size) {
-    if (size != 0)
+    if (size != 0) {
         std::memset(buffer, 90, size);
+    }
 }
 IDLE(setNvmemBytes, Session, Name, std::uint32_t, const std::uint8_t*, std::uint32_t, Name, Name)
 IDLE(commitNvmemGeneric, Session, Name)

@@ -12,8 +12,9 @@
 namespace {
 
 void parse(rapidjson::Document& document, const char* text) {
-    if (document.Parse(text).HasParseError())
+    if (document.Parse(text).HasParseError()) {
         throw std::runtime_error("not a JSON text");
+    }
 }
 
 }  // namespace
@@ -48,11 +49,13 @@ std::size_t JsonBaseline::run() const {
     rapidjson::Document document;
     document.Parse(request.c_str());
     bool valid = !document.HasParseError();
-    if (document.IsArray())
-        for (const auto& element : document.GetArray())
+    if (document.IsArray()) {
+        for (const auto& element : document.GetArray()) {
             valid = valid && documents->isValid(element);
-    else
+        }
+    } else {
         valid = valid && documents->isValid(document);
+    }
     rapidjson::StringBuffer text;
     rapidjson::Writer<rapidjson::StringBuffer> writer(text);
     documents->response.Accept(writer);

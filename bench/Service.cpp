@@ -10,8 +10,9 @@ std::string Service::openSession(const std::string& devices) {
     const std::string response = answer(
         request("initializeSession", devices.empty() ? "" : R"("devices":")" + devices + '"'));
     const std::size_t begin = response.find("_session");
-    if (begin == std::string::npos)
+    if (begin == std::string::npos) {
         throw std::runtime_error("no session: " + response);
+    }
     return response.substr(begin, response.find('"', begin) - begin);
 }
 

@@ -26,8 +26,9 @@ std::string ofSeventeenDigits(std::mt19937_64& random) {
 std::string arrayOf1000(MakeLiteral make) {
     std::mt19937_64 random(1);
     std::string text = "[" + make(random);
-    for (int i = 1; i < 1000; ++i)
+    for (int i = 1; i < 1000; ++i) {
         text += "," + make(random);
+    }
     return text + "]";
 }
 

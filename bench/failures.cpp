@@ -1,5 +1,5 @@
 // Measures the production of the text of a failure: with the translator of the service, and for
-// comparison with LuaRuntime::plain, which compiles every script for each failure. Both are called
+// comparison with LuaRuntime::Plain, which compiles every script for each failure. Both are called
 // through describeStatus. "peakBytes" is the maximum memory in use during one call, "keptBytes" the
 // memory that the process keeps afterwards.
 
@@ -45,8 +45,9 @@ void* qihtl_realloc(void* block, std::size_t size) {
         return nullptr;
     }
     void* const moved = std::realloc(block, size);
-    if (moved != nullptr)
+    if (moved != nullptr) {
         account(static_cast<std::int64_t>(::malloc_usable_size(moved)) - oldSize);
+    }
     return moved;
 }
 
@@ -57,7 +58,7 @@ namespace {
 XlatorInterface* createPlain(const char*, const char*, qierr_Status* status) {
     return qixlatorlua::createLuaXlator(
         fastName, qixlator::localRegistrations().find(fastName)->registrationInfo,
-        qixlatorlua::LuaRuntime::plain, status);
+        qixlatorlua::LuaRuntime::Plain, status);
 }
 
 const qixlator::XlatorRegistration plainRegistration(qixlator::localRegistrations(), plainName,
@@ -79,12 +80,14 @@ std::string describe(const char* translator) {
 
 void failure(benchmark::State& state, const char* translator) {
     if (describe(translator).find("_session7") == std::string::npos ||
-        describe(fastName) != describe(plainName))
+        describe(fastName) != describe(plainName)) {
         state.SkipWithError("the words are not those expected");
+    }
     const std::int64_t before = liveBytes;
     peakBytes = before;
-    for (auto _ : state)
+    for (auto _ : state) {
         benchmark::DoNotOptimize(describe(translator));
+    }
     state.counters["peakBytes"] = static_cast<double>(peakBytes - before);
     state.counters["keptBytes"] =
         static_cast<double>(qixlatorlua::BytecodeCache::ofEmbeddedFiles()->size());

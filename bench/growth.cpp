@@ -13,8 +13,9 @@ using Count = std::int64_t;
 
 std::string repeated(const std::string& text, Count count, const char* separator = "") {
     std::string all;
-    for (Count i = 0; i < count; ++i)
+    for (Count i = 0; i < count; ++i) {
         all += (i == 0 ? "" : separator) + text;
+    }
     return all;
 }
 
@@ -165,20 +166,23 @@ void runGrowth(benchmark::State& state, const Case& measured) {
     Service service;
     const std::string session = R"("session_id":")" + service.openSession("Mod1") + '"';
     const std::string request = measured.make(session, state.range(0));
-    if (isSuccess(service.answer(request)) != measured.succeeds)
+    if (isSuccess(service.answer(request)) != measured.succeeds) {
         state.SkipWithError("another outcome than expected");
-    for (auto _ : state)
+    }
+    for (auto _ : state) {
         benchmark::DoNotOptimize(service.answer(request));
+    }
     state.SetComplexityN(state.range(0));
 }
 
 const bool registered = [] {
-    for (const Case& measured : cases)
+    for (const Case& measured : cases) {
         benchmark::RegisterBenchmark((std::string("growth/") + measured.name).c_str(), runGrowth,
                                      measured)
             ->RangeMultiplier(4)
             ->Range(measured.first, measured.last)
             ->Complexity();
+    }
     return true;
 }();
 

@@ -36,21 +36,25 @@ const Case cases[] = {
 std::string textOf(const Case& measured, const std::string& session) {
     const std::string one =
         Service::request(measured.method, R"("session_id":")" + session + '"' + measured.params);
-    if (measured.elements == 0)
+    if (measured.elements == 0) {
         return one;
+    }
     std::string batch;
-    for (int i = 0; i < measured.elements; ++i)
+    for (int i = 0; i < measured.elements; ++i) {
         batch += (i == 0 ? "[" : ",") + one;
+    }
     return batch + "]";
 }
 
 void runService(benchmark::State& state, const Case& measured) {
     Service service;
     const std::string text = textOf(measured, service.openSession("Mod1"));
-    if (!isSuccess(service.answer(text)))
+    if (!isSuccess(service.answer(text))) {
         state.SkipWithError(service.answer(text).c_str());
-    for (auto _ : state)
+    }
+    for (auto _ : state) {
         benchmark::DoNotOptimize(service.answer(text));
+    }
 }
 
 void runBaseline(benchmark::State& state, const Case& measured) {
@@ -59,10 +63,12 @@ void runBaseline(benchmark::State& state, const Case& measured) {
     const std::string response = service.answer(text);
     const JsonBaseline baseline(measured.schemaFile, text, response);
     // The baseline prints the numbers of these responses in the same form as the service.
-    if (baseline.run() != response.size())
+    if (baseline.run() != response.size()) {
         state.SkipWithError("the floor does not print the response");
-    for (auto _ : state)
+    }
+    for (auto _ : state) {
         benchmark::DoNotOptimize(baseline.run());
+    }
 }
 
 const bool registered = [] {

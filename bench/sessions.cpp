@@ -14,8 +14,9 @@ namespace {
 class Sessions {
   public:
     Sessions(std::size_t count, const char* devices) {
-        for (std::size_t i = 0; i < count; ++i)
+        for (std::size_t i = 0; i < count; ++i) {
             ids.push_back(service.openSession(devices));
+        }
     }
 
     std::string answerNext() {
@@ -34,10 +35,12 @@ class Sessions {
 
 void sessionsGetProperty(benchmark::State& state, const char* devices) {
     Sessions sessions(static_cast<std::size_t>(state.range(0)), devices);
-    if (!isSuccess(sessions.answerNext()))
+    if (!isSuccess(sessions.answerNext())) {
         state.SkipWithError("no success");
-    for (auto _ : state)
+    }
+    for (auto _ : state) {
         benchmark::DoNotOptimize(sessions.answerNext());
+    }
 }
 
 void sessionsOpenAndClose(benchmark::State& state, const char* devices) {

@@ -10,14 +10,14 @@ namespace host {
 
 namespace {
 
-constexpr std::chrono::seconds kLongestWayIn(1);
-constexpr uint32_t kPatienceWhenFull = 2;
-constexpr uint32_t kNotWaiting = 0;
+constexpr std::chrono::seconds longestWayIn(1);
+constexpr std::uint32_t patienceWhenFull = 2;
+constexpr std::uint32_t notWaiting = 0;
 
-uint32_t secondsNow() noexcept {
+std::uint32_t secondsNow() noexcept {
     using namespace std::chrono;
     const auto now = duration_cast<seconds>(steady_clock::now().time_since_epoch());
-    return static_cast<uint32_t>(now.count()) + 1;  // never kNotWaiting
+    return static_cast<std::uint32_t>(now.count()) + 1;  // never notWaiting
 }
 
 }  // namespace
@@ -29,15 +29,15 @@ void Connection::waitForClient() noexcept {
 }
 
 void Connection::workForClient() noexcept {
-    waitingSince.store(kNotWaiting, std::memory_order_relaxed);
+    waitingSince.store(notWaiting, std::memory_order_relaxed);
 }
 
-Connections::Connections(uint32_t most, uint32_t patience) noexcept
+Connections::Connections(std::uint32_t most, std::uint32_t patience) noexcept
     : most(most), patience(patience) {}
 
 bool Connections::waitForPlace() noexcept {
     std::unique_lock<std::mutex> lock(mutex);
-    changed.wait_for(lock, kLongestWayIn, [this] { return closed || !placeKept; });
+    changed.wait_for(lock, longestWayIn, [this] { return closed || !placeKept; });
     changed.wait(lock, [this] { return closed || open.size() < most; });
     placeKept = true;
     return !closed;
@@ -64,8 +64,9 @@ Connection* Connections::add(int socket) noexcept {
 }
 
 void Connections::remove(Connection* connection) noexcept {
-    if (connection == nullptr)
+    if (connection == nullptr) {
         return;
+    }
     const std::lock_guard<std::mutex> lock(mutex);
     open.erase(connection->self);
     changed.notify_one();
@@ -74,12 +75,13 @@ void Connections::remove(Connection* connection) noexcept {
 void Connections::shutOverdue() noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
     const bool full = open.size() >= most;
-    const uint32_t limit = full ? std::min(patience, kPatienceWhenFull) : patience;
-    const uint32_t now = secondsNow();
+    const std::uint32_t limit = full ? std::min(patience, patienceWhenFull) : patience;
+    const std::uint32_t now = secondsNow();
     for (const Connection& connection : open) {
-        const uint32_t since = connection.waitingSince.load(std::memory_order_relaxed);
-        if (since != kNotWaiting && since < now && now - since > limit)
+        const std::uint32_t since = connection.waitingSince.load(std::memory_order_relaxed);
+        if (since != notWaiting && since < now && now - since > limit) {
             shutdown(connection.socket, SHUT_RDWR);
+        }
     }
 }
 

@@ -22,7 +22,8 @@ class Connection {
   private:
     friend class Connections;
     const int socket;
-    std::atomic<uint32_t> waitingSince;  // in seconds of the steady clock; 0 while the host works
+    std::atomic<std::uint32_t>
+        waitingSince;  // in seconds of the steady clock; 0 while the host works
     std::list<Connection>::iterator self;
 };
 
@@ -32,7 +33,7 @@ class Connections {
   public:
     // most: how many connections the host takes at once. patience: how many seconds it waits for a
     // client's step.
-    Connections(uint32_t most, uint32_t patience) noexcept;
+    Connections(std::uint32_t most, std::uint32_t patience) noexcept;
 
     // Waits until fewer connections are open than the host takes, and keeps that place for the next
     // add(). When the client that had the place before was never added, it waits a second for it.
@@ -53,8 +54,8 @@ class Connections {
     void shutOverdue() noexcept;
 
   private:
-    const uint32_t most;
-    const uint32_t patience;
+    const std::uint32_t most;
+    const std::uint32_t patience;
     std::mutex mutex;
     std::condition_variable changed;
     bool placeKept = false;

@@ -14,16 +14,16 @@ namespace host {
 // `path` is the target of the request without its query: a path, or the absolute form that clients
 // send to proxies. A "%" without two hexadecimal digits stands for itself; a byte that is not part
 // of UTF-8 text becomes U+FFFD.
-std::optional<std::vector<uint32_t>> entryNameOfPath(std::string_view path);
+std::optional<std::vector<std::uint32_t>> entryNameOfPath(std::string_view path);
 
 // The entry object that a plug-in is given. It must not outlive `name` and stays where it is made.
 class Entry : public ws_Entry {
   public:
-    explicit Entry(const std::vector<uint32_t>& name);
+    explicit Entry(const std::vector<std::uint32_t>& name);
     Entry(const Entry&) = delete;
     Entry& operator=(const Entry&) = delete;
 
-    const std::vector<uint32_t>& name;
+    const std::vector<std::uint32_t>& name;
 };
 
 }  // namespace host

@@ -15,9 +15,9 @@ namespace host {
 namespace {
 
 // Far more than a client has under way by mistake.
-constexpr std::size_t kMostDiscarded = 64 * 1024 * 1024;
+constexpr std::size_t mostDiscarded = 64 * 1024 * 1024;
 
-constexpr std::string_view kDocumentPath = "/openrpc.json";
+constexpr std::string_view documentPath = "/openrpc.json";
 
 bool isGet(std::string_view method) {
     return method == "GET" || method == "HEAD";
@@ -30,55 +30,64 @@ bool isSendable(const ws_Request& response) {
 
 }  // namespace
 
-Exchange::Exchange(Gate& gate, uint32_t maxBody, const Site* site) noexcept
+Exchange::Exchange(Gate& gate, std::uint32_t maxBody, const Site* site) noexcept
     : gate(gate),
       admitted(gate.enter()),
       maxBody(maxBody),
       site(site),
       metrics(site == nullptr ? nullptr : site->metrics()) {
-    if (metrics != nullptr)
+    if (metrics != nullptr) {
         metrics->countBegunRequest();
+    }
 }
 
 Exchange::~Exchange() {
     if (metrics != nullptr) {
         metrics->countSentBytes(request.output.size());
-        metrics->countEndedRequest(ranPlugin ? Handler::service : Handler::host, outcome());
+        metrics->countEndedRequest(ranPlugin ? Handler::Service : Handler::Host, outcome());
     }
-    if (admitted)
+    if (admitted) {
         gate.leave();
+    }
 }
 
 void Exchange::admit(Verdict verdict) {
     responseHeaders = std::move(verdict.headers);
-    if (!verdict.refusal.empty())
+    if (!verdict.refusal.empty()) {
         return answer(403, verdict.refusal);
-    if (!verdict.isPreflight)
+    }
+    if (!verdict.isPreflight) {
         return;
+    }
     answer(204, "");
     request.type.clear();
 }
 
 void Exchange::begin(const char* transport, const char* method, std::string_view path,
                      const char* declaredLength) {
-    if (answered)
+    if (answered) {
         return;
-    if (!admitted)
+    }
+    if (!admitted) {
         return answer(503, "The server is stopping.\n");
-    if (path == kDocumentPath && isGet(method)) {
+    }
+    if (path == documentPath && isGet(method)) {
         answer(200, openRpcDocument);
         request.type = "application/json; charset=utf-8";
         return;
     }
-    std::optional<std::vector<uint32_t>> name = entryNameOfPath(path);
-    if (!name && site != nullptr && site->has(std::string(pathOfTarget(path))))
+    std::optional<std::vector<std::uint32_t>> name = entryNameOfPath(path);
+    if (!name && site != nullptr && site->has(std::string(pathOfTarget(path)))) {
         siteRequest = SiteRequest{method, std::string(pathOfTarget(path))};
-    else if (!name)
+    } else if (!name) {
         return answer(404, "There is nothing here. The service is at /qitrmc/Call.\n");
-    if (declaredLength != nullptr && std::strtoull(declaredLength, nullptr, 10) > maxBody)
+    }
+    if (declaredLength != nullptr && std::strtoull(declaredLength, nullptr, 10) > maxBody) {
         return refuseBody();
-    if (name)
+    }
+    if (name) {
         entryName = std::move(*name);
+    }
     request.transport = transport;
     request.method = method;
 }
@@ -89,13 +98,15 @@ void Exchange::describeToSite(const char* knownTag, bool isLocal) {
 }
 
 bool Exchange::take(const char* data, std::size_t size) {
-    if (metrics != nullptr)
+    if (metrics != nullptr) {
         metrics->countReceivedBytes(size);
-    if (!answered && size > maxBody - request.body.size())
+    }
+    if (!answered && size > maxBody - request.body.size()) {
         refuseBody();
+    }
     if (answered) {
         discarded += size;
-        return discarded <= kMostDiscarded;
+        return discarded <= mostDiscarded;
     }
     try {
         request.body.append(data, size);
@@ -106,10 +117,12 @@ bool Exchange::take(const char* data, std::size_t size) {
 }
 
 void Exchange::run(const Plugin& plugin) {
-    if (answered)
+    if (answered) {
         return;
-    if (siteRequest)
+    }
+    if (siteRequest) {
         return answerFromSite();
+    }
     runPlugin(plugin);
 }
 
@@ -117,18 +130,22 @@ void Exchange::runPlugin(const Plugin& plugin) {
     const auto begin = std::chrono::steady_clock::now();
     ranPlugin = true;
     Entry entry(entryName);
-    if (!plugin.run(entry, request) || !isSendable(request))
+    if (!plugin.run(entry, request) || !isSendable(request)) {
         fail();
-    if (metrics != nullptr)
+    }
+    if (metrics != nullptr) {
         metrics->countTime(std::chrono::steady_clock::now() - begin);
+    }
 }
 
 Outcome Exchange::outcome() const {
-    if (!answered && !ranPlugin)
-        return Outcome::aborted;
-    if (request.code >= 400)
-        return Outcome::httpError;
-    return ranPlugin && hasRpcError(request.output) ? Outcome::rpcError : Outcome::ok;
+    if (!answered && !ranPlugin) {
+        return Outcome::Aborted;
+    }
+    if (request.code >= 400) {
+        return Outcome::HttpError;
+    }
+    return ranPlugin && hasRpcError(request.output) ? Outcome::RpcError : Outcome::Ok;
 }
 
 void Exchange::answer(int code, std::string_view text) {
@@ -143,8 +160,9 @@ void Exchange::answerFromSite() {
     SiteResponse response = site->answer(*siteRequest);
     answer(response.code, response.body);
     request.type = response.type;
-    for (Header& header : response.headers)
+    for (Header& header : response.headers) {
         responseHeaders.push_back(std::move(header));
+    }
 }
 
 void Exchange::refuseBody() {

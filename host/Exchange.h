@@ -24,7 +24,7 @@ class Exchange {
   public:
     // maxBody: the most bytes of body that are kept. site: what the host serves besides the
     // service, and where it counts; null for nothing. It must outlive the exchange.
-    Exchange(Gate& gate, uint32_t maxBody, const Site* site = nullptr) noexcept;
+    Exchange(Gate& gate, std::uint32_t maxBody, const Site* site = nullptr) noexcept;
     ~Exchange();
     Exchange(const Exchange&) = delete;
     Exchange& operator=(const Exchange&) = delete;
@@ -69,12 +69,12 @@ class Exchange {
 
     Gate& gate;
     const bool admitted;
-    const uint32_t maxBody;
+    const std::uint32_t maxBody;
     const Site* const site;
     Metrics* const metrics;                  // null for not counting
     std::optional<SiteRequest> siteRequest;  // of a request that the site answers
     ws_Request request;
-    std::vector<uint32_t> entryName;
+    std::vector<std::uint32_t> entryName;
     std::vector<Header> responseHeaders;
     std::size_t discarded = 0;
     bool answered = false;

@@ -21,8 +21,9 @@ class Gate {
     // The end of a request that was let in.
     void leave() {
         const std::lock_guard<std::mutex> lock(mutex);
-        if (--inFlight == 0)
+        if (--inFlight == 0) {
             empty.notify_all();
+        }
     }
 
     void close() {
@@ -44,7 +45,7 @@ class Gate {
   private:
     std::mutex mutex;
     std::condition_variable empty;
-    uint32_t inFlight = 0;
+    std::uint32_t inFlight = 0;
     bool shut = false;
 };
 

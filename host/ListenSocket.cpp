@@ -49,8 +49,9 @@ ListenSocket::ListenSocket(const std::string& address, const std::string& port)
     : where(urlAuthority(address, port)) {
     const AddressList found = resolve(address, port, where);
     socket = ::socket(found->ai_family, SOCK_STREAM | SOCK_CLOEXEC, 0);
-    if (socket < 0)
+    if (socket < 0) {
         failToListen(where, errno);
+    }
     // A host that is started again need not wait for connections of the last one to fade.
     const int on = 1;
     setsockopt(socket, SOL_SOCKET, SO_REUSEADDR, &on, sizeof on);
@@ -66,8 +67,9 @@ ListenSocket::~ListenSocket() {
 }
 
 void ListenSocket::listen() {
-    if (::listen(socket, SOMAXCONN) != 0)
+    if (::listen(socket, SOMAXCONN) != 0) {
         failToListen(where, errno);
+    }
 }
 
 int ListenSocket::accept(sockaddr_storage& address, socklen_t& length) noexcept {

@@ -15,14 +15,14 @@ namespace host {
 
 // How a request ended.
 enum class Outcome {
-    ok,
-    rpcError,   // a JSON-RPC error, of any request in case of a batch
-    httpError,  // an HTTP status of 400 or above
-    aborted,    // the client went before the response was ready
+    Ok,
+    RpcError,   // a JSON-RPC error, of any request in case of a batch
+    HttpError,  // an HTTP status of 400 or above
+    Aborted,    // the client went before the response was ready
 };
 
 // Who answered a request: the plug-in, or the host itself with the page, a refusal and so on.
-enum class Handler { service, host };
+enum class Handler { Service, Host };
 
 // Counts what the host does. All functions may be called from any thread; those that count take a
 // few atomic additions.
@@ -31,7 +31,7 @@ class Metrics {
     using Seconds = std::chrono::duration<double>;
 
     // The number of calls of the driver so far; nothing when it is unknown.
-    using DriverCalls = std::function<std::optional<uint64_t>()>;
+    using DriverCalls = std::function<std::optional<std::uint64_t>()>;
 
     explicit Metrics(DriverCalls driverCalls) : driverCalls(std::move(driverCalls)) {}
 
@@ -57,16 +57,16 @@ class Metrics {
     std::string text() const;
 
   private:
-    using Count = std::atomic<uint64_t>;
+    using Count = std::atomic<std::uint64_t>;
 
     // The upper bounds of the buckets of the histogram, in seconds.
-    static constexpr std::array<double, 16> kBounds = {
-        50e-6, 100e-6, 250e-6, 500e-6, 1e-3, 2.5e-3, 5e-3, 10e-3,
-        25e-3, 50e-3,  100e-3, 250e-3, 1.0,  5.0,    30.0, 120.0};
+    static constexpr std::array<double, 16> bounds = {50e-6, 100e-6, 250e-6, 500e-6, 1e-3,   2.5e-3,
+                                                      5e-3,  10e-3,  25e-3,  50e-3,  100e-3, 250e-3,
+                                                      1.0,   5.0,    30.0,   120.0};
 
     template <typename Number>
     static void add(Count& count, Number number) noexcept {
-        count.fetch_add(static_cast<uint64_t>(number), std::memory_order_relaxed);
+        count.fetch_add(static_cast<std::uint64_t>(number), std::memory_order_relaxed);
     }
 
     Count openConnections{0};
@@ -74,8 +74,8 @@ class Metrics {
     Count inFlight{0};
     Count receivedBytes{0};
     Count sentBytes{0};
-    std::array<std::array<Count, 4>, 2> ended{};      // by Handler and Outcome
-    std::array<Count, kBounds.size() + 1> buckets{};  // each without those below it
+    std::array<std::array<Count, 4>, 2> ended{};     // by Handler and Outcome
+    std::array<Count, bounds.size() + 1> buckets{};  // each without those below it
     Count nanoseconds{0};
     const DriverCalls driverCalls;
 };

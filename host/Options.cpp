@@ -13,22 +13,22 @@ namespace host {
 
 namespace {
 
-constexpr const char* kIntroduction = R"(Usage: qitrmc-host [OPTION]...
+constexpr const char* introduction = R"(Usage: qitrmc-host [OPTION]...
 
 Serves the web service plug-in of an instrument chassis over HTTP, for development and tests.
 The service answers POST requests at /qitrmc/Call; GET /openrpc.json describes it for machines.
 A page for a browser is at /, GET /healthz says whether the service works, GET /metrics counts.
 )";
 
-constexpr const char* kNotes =
+constexpr const char* notes =
     R"(SIGTERM and SIGINT end the host after the requests in flight; a second signal ends it at once.
 Exit status: 0 after a normal end, 1 when it cannot serve, 2 for a wrong command line.)";
 
-constexpr const char* kVersionText = "qitrmc-host " QITRMC_VERSION "\n";
+constexpr const char* versionText = "qitrmc-host " QITRMC_VERSION "\n";
 
-uint32_t parseNumber(const std::string& option, const std::string& text, uint32_t least,
-                     uint32_t most) {
-    uint32_t number = 0;
+std::uint32_t parseNumber(const std::string& option, const std::string& text, std::uint32_t least,
+                          std::uint32_t most) {
+    std::uint32_t number = 0;
     const char* end = text.data() + text.size();
     const auto [stop, error] = std::from_chars(text.data(), end, number);
     if (error != std::errc() || stop != end || number < least || number > most) {
@@ -41,8 +41,9 @@ uint32_t parseNumber(const std::string& option, const std::string& text, uint32_
 // Takes the brackets off an IPv6 address. Empty when `text` is not an address as one writes it in
 // front of a port.
 std::string parseAddress(const std::string& text) {
-    if (text.size() > 2 && text.front() == '[' && text.back() == ']')
+    if (text.size() > 2 && text.front() == '[' && text.back() == ']') {
         return text.substr(1, text.size() - 2);
+    }
     return text.find_first_of("[]:") == std::string::npos ? text : std::string();
 }
 
@@ -53,27 +54,27 @@ void setListen(Options& options, const std::string& option, const std::string& t
         throw UsageError(option + " takes ADDR:PORT, such as 127.0.0.1:8080 or [::1]:8080, not \"" +
                          text + "\".");
     }
-    const uint32_t port = parseNumber(option + " ADDR:PORT", text.substr(colon + 1), 0, 65535);
+    const std::uint32_t port = parseNumber(option + " ADDR:PORT", text.substr(colon + 1), 0, 65535);
     options.address = address;
     options.port = std::to_string(port);
 }
 
 void setThreads(Options& options, const std::string& option, const std::string& text) {
-    options.threads = parseNumber(option, text, 1, kMostThreads);
+    options.threads = parseNumber(option, text, 1, mostThreads);
 }
 
 void setMaxBody(Options& options, const std::string& option, const std::string& text) {
-    options.maxBody = parseNumber(option, text, 1, std::numeric_limits<uint32_t>::max());
+    options.maxBody = parseNumber(option, text, 1, std::numeric_limits<std::uint32_t>::max());
 }
 
 void setTimeout(Options& options, const std::string& option, const std::string& text) {
-    options.timeout = parseNumber(option, text, 1, kLongestTimeout);
+    options.timeout = parseNumber(option, text, 1, longestTimeout);
 }
 
 // The driver reads the texts that follow, so they are only looked at here.
 
 void setSeed(Options& options, const std::string& option, const std::string& text) {
-    uint64_t seed = 0;
+    std::uint64_t seed = 0;
     const char* end = text.data() + text.size();
     const auto [stop, error] = std::from_chars(text.data(), end, seed);
     if (error != std::errc() || stop != end) {
@@ -87,8 +88,8 @@ void setTimeScale(Options& options, const std::string& option, const std::string
     double factor = 0.0;
     const char* end = text.data() + text.size();
     const auto [stop, error] = std::from_chars(text.data(), end, factor);
-    const bool isFactor = error == std::errc() && stop == end && factor >= kSmallestTimeScale &&
-                          factor <= kLargestTimeScale;
+    const bool isFactor = error == std::errc() && stop == end && factor >= smallestTimeScale &&
+                          factor <= largestTimeScale;
     if (!isFactor && text != "calls") {
         throw UsageError(option +
                          " takes a number from 0.001 to 1000000 or the word calls, not \"" + text +
@@ -99,8 +100,9 @@ void setTimeScale(Options& options, const std::string& option, const std::string
 
 template <std::string Options::*path>
 void setPath(Options& options, const std::string& option, const std::string& text) {
-    if (text.empty())
+    if (text.empty()) {
         throw UsageError(option + " takes a path, not an empty text.");
+    }
     options.*path = text;
 }
 
@@ -132,7 +134,7 @@ struct OptionWithValue {
     void (*set)(Options& options, const std::string& option, const std::string& text);
 };
 
-constexpr OptionWithValue kOptionsWithValue[] = {
+constexpr OptionWithValue optionsWithValue[] = {
     {"--listen", "ADDR:PORT",
      "where to listen (127.0.0.1:8080); port 0 takes a free one,\n"
      "an IPv6 address stands in brackets",
@@ -200,10 +202,11 @@ constexpr OptionWithValue kOptionsWithValue[] = {
 };
 
 void describeOptionsWithValue(CLI::App& app, Options& options) {
-    for (const OptionWithValue& option : kOptionsWithValue) {
+    for (const OptionWithValue& option : optionsWithValue) {
         const auto take = [&options, &option](const CLI::results_t& values) {
-            for (const std::string& value : values)
+            for (const std::string& value : values) {
                 option.set(options, option.name, value);
+            }
             return true;
         };
         app.add_option(option.name, take, option.description)
@@ -235,7 +238,7 @@ void describeFlags(CLI::App& app, Options& options) {
 
 struct HelpLayout : CLI::Formatter {
     HelpLayout() { column_width(24); }
-    std::string make_usage(const CLI::App*, std::string) const override { return kIntroduction; }
+    std::string make_usage(const CLI::App*, std::string) const override { return introduction; }
 };
 
 // The parser takes the argument behind "--name=" for the value; it is the empty text.
@@ -245,15 +248,17 @@ std::vector<std::string> withEmptyValues(const std::vector<std::string>& argumen
         const bool isEmptyValue = argument.rfind("--", 0) == 0 && !argument.empty() &&
                                   argument.find('=') == argument.size() - 1;
         separated.push_back(isEmptyValue ? argument.substr(0, argument.size() - 1) : argument);
-        if (isEmptyValue)
+        if (isEmptyValue) {
             separated.emplace_back();
+        }
     }
     return separated;
 }
 
 void requireBothTlsFiles(const Options& options) {
-    if (options.tlsCertificate.empty() != options.tlsKey.empty())
+    if (options.tlsCertificate.empty() != options.tlsKey.empty()) {
         throw UsageError("--tls-cert and --tls-key are given together or not at all.");
+    }
 }
 
 }  // namespace
@@ -262,7 +267,7 @@ Options parseOptions(const std::vector<std::string>& arguments) {
     Options options;
     CLI::App app;
     app.formatter(std::make_shared<HelpLayout>());
-    app.footer(kNotes);
+    app.footer(notes);
     describeOptionsWithValue(app, options);
     describeFlags(app, options);
     std::vector<std::string> backwards = withEmptyValues(arguments);
@@ -272,7 +277,7 @@ Options parseOptions(const std::vector<std::string>& arguments) {
     } catch (const CLI::CallForHelp&) {
         options.notice = app.help();
     } catch (const CLI::CallForVersion&) {
-        options.notice = kVersionText;
+        options.notice = versionText;
     } catch (const CLI::ExtrasError&) {
         throw UsageError("Unknown argument \"" + app.remaining().front() + "\". Try --help.");
     } catch (const CLI::ParseError& error) {

@@ -12,47 +12,52 @@ namespace host {
 
 namespace {
 
-constexpr std::string_view kLetters = "abcdefghijklmnopqrstuvwxyz";
-constexpr std::string_view kDigits = "0123456789";
+constexpr std::string_view letters = "abcdefghijklmnopqrstuvwxyz";
+constexpr std::string_view digits = "0123456789";
 
 // Whatever the locale says.
 std::string lowerCase(std::string_view text) {
     std::string lower(text);
-    for (char& c : lower)
+    for (char& c : lower) {
         c = c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
+    }
     return lower;
 }
 
 bool consistsOf(std::string_view text, std::string_view set, std::string_view furtherSet) {
     return !text.empty() && std::all_of(text.begin(), text.end(), [&](char c) {
-        return set.find(c) != set.npos || kDigits.find(c) != kDigits.npos ||
+        return set.find(c) != set.npos || digits.find(c) != digits.npos ||
                furtherSet.find(c) != furtherSet.npos;
     });
 }
 
 std::optional<std::string> canonicalIpv6(const std::string& text) {
     in6_addr address;
-    if (inet_pton(AF_INET6, text.c_str(), &address) != 1)
+    if (inet_pton(AF_INET6, text.c_str(), &address) != 1) {
         return std::nullopt;
+    }
     char canonical[INET6_ADDRSTRLEN] = "";
-    if (IN6_IS_ADDR_V4MAPPED(&address))
+    if (IN6_IS_ADDR_V4MAPPED(&address)) {
         inet_ntop(AF_INET, &address.s6_addr[12], canonical, sizeof canonical);
-    else
+    } else {
         inet_ntop(AF_INET6, &address, canonical, sizeof canonical);
+    }
     return canonical;
 }
 
-std::optional<uint32_t> parsePort(std::string_view text) {
-    uint32_t port = 0;
+std::optional<std::uint32_t> parsePort(std::string_view text) {
+    std::uint32_t port = 0;
     const auto [stop, error] = std::from_chars(text.data(), text.data() + text.size(), port);
-    if (error != std::errc() || stop != text.data() + text.size() || port > 65535)
+    if (error != std::errc() || stop != text.data() + text.size() || port > 65535) {
         return std::nullopt;
+    }
     return port;
 }
 
-uint32_t defaultPort(std::string_view scheme) {
-    if (scheme == "http")
+std::uint32_t defaultPort(std::string_view scheme) {
+    if (scheme == "http") {
         return 80;
+    }
     return scheme == "https" ? 443 : 0;
 }
 
@@ -72,41 +77,48 @@ Parts partsOf(std::string_view text) {
 
 std::optional<std::string> canonicalHost(std::string_view text) {
     const std::string host = lowerCase(text);
-    if (host.find(':') != host.npos)
+    if (host.find(':') != host.npos) {
         return canonicalIpv6(host);
-    return consistsOf(host, kLetters, "-._") ? std::optional(host) : std::nullopt;
+    }
+    return consistsOf(host, letters, "-._") ? std::optional(host) : std::nullopt;
 }
 
 std::optional<Authority> parseAuthority(std::string_view text, std::string_view scheme) {
     auto [host, port] = partsOf(text);
     const bool bracketed = host.size() > 2 && host.front() == '[' && host.back() == ']';
-    if (bracketed)
+    if (bracketed) {
         host = host.substr(1, host.size() - 2);
-    if (bracketed != (host.find(':') != host.npos))
+    }
+    if (bracketed != (host.find(':') != host.npos)) {
         return std::nullopt;
+    }
     const std::optional<std::string> name = canonicalHost(host);
-    const std::optional<uint32_t> number =
+    const std::optional<std::uint32_t> number =
         port.size() < 2 ? defaultPort(scheme) : parsePort(port.substr(1));
-    if (!name || !number)
+    if (!name || !number) {
         return std::nullopt;
+    }
     return Authority{*name, *number};
 }
 
 std::optional<Origin> parseOrigin(std::string_view text) {
     const std::size_t end = text.find("://");
-    if (end == text.npos)
+    if (end == text.npos) {
         return std::nullopt;
+    }
     const std::string scheme = lowerCase(text.substr(0, end));
     const std::optional<Authority> authority = parseAuthority(text.substr(end + 3), scheme);
-    if (!authority || !consistsOf(scheme, kLetters, "+-."))
+    if (!authority || !consistsOf(scheme, letters, "+-.")) {
         return std::nullopt;
+    }
     return Origin{scheme, *authority};
 }
 
 bool isLoopback(const std::string& canonicalHost) {
     in_addr address;
-    if (inet_pton(AF_INET, canonicalHost.c_str(), &address) == 1)
+    if (inet_pton(AF_INET, canonicalHost.c_str(), &address) == 1) {
         return ntohl(address.s_addr) >> 24 == 127;
+    }
     return canonicalHost == "localhost" || canonicalHost == "::1";
 }
 

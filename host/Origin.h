@@ -12,7 +12,7 @@ namespace host {
 // IPv4 address within IPv6 is an IPv4 address.
 struct Authority {
     std::string host;
-    uint32_t port = 0;
+    std::uint32_t port = 0;
 
     bool operator==(const Authority& other) const {
         return host == other.host && port == other.port;

@@ -10,7 +10,7 @@ namespace host {
 namespace {
 
 // How many seconds a browser may rely on a preflight.
-constexpr const char* kPreflightLifetime = "600";
+constexpr const char* preflightLifetime = "600";
 
 bool contains(const std::vector<std::string>& list, const std::string& text) {
     return std::find(list.begin(), list.end(), text) != list.end();
@@ -34,7 +34,7 @@ void addPreflightHeaders(std::vector<Header>& headers, const Source& source) {
     headers.push_back({"Access-Control-Allow-Methods", "POST"});
     headers.push_back({"Access-Control-Allow-Headers",
                        source.wantedHeaders.empty() ? "Content-Type" : source.wantedHeaders});
-    headers.push_back({"Access-Control-Max-Age", kPreflightLifetime});
+    headers.push_back({"Access-Control-Max-Age", preflightLifetime});
 }
 
 Verdict refuse(const std::string& text) {
@@ -49,53 +49,63 @@ void Source::takeHeader(std::string_view name, std::string_view value) {
     const auto isNamed = [&](const char* other) {
         return strcasecmp(std::string(name).c_str(), other) == 0;
     };
-    if (isNamed("Host"))
+    if (isNamed("Host")) {
         hosts.emplace_back(value);
-    else if (isNamed("Origin"))
+    } else if (isNamed("Origin")) {
         origins.emplace_back(value);
-    else if (isNamed("Access-Control-Request-Method"))
+    } else if (isNamed("Access-Control-Request-Method")) {
         wantedMethod = value;
-    else if (isNamed("Access-Control-Request-Headers"))
+    } else if (isNamed("Access-Control-Request-Headers")) {
         wantedHeaders = value;
+    }
 }
 
 OriginPolicy::OriginPolicy(std::string scheme, std::vector<std::string> hostNames,
                            const std::vector<std::string>& allowed)
     : scheme(std::move(scheme)), hostNames(std::move(hostNames)) {
-    for (const std::string& origin : allowed)
+    for (const std::string& origin : allowed) {
         allowedOrigins.push_back(parseOrigin(origin).value());
+    }
 }
 
 Verdict OriginPolicy::judge(const Source& source) const {
-    if (source.hosts.size() > 1 || source.origins.size() > 1)
+    if (source.hosts.size() > 1 || source.origins.size() > 1) {
         return refuse("A request has one Host and at most one Origin.\n");
+    }
     const std::string refusal = refusalOfHost(source);
-    if (!refusal.empty())
+    if (!refusal.empty()) {
         return refuse(refusal);
-    if (source.origins.empty())
+    }
+    if (source.origins.empty()) {
         return {};
+    }
     const std::string& origin = source.origins.front();
-    if (!isAllowed(origin))
+    if (!isAllowed(origin)) {
         return isOwnOrigin(source, origin) ? Verdict() : refuse(foreignOriginText(origin));
+    }
     Verdict verdict;
     verdict.headers = headersFor(origin);
     verdict.isPreflight = source.method == "OPTIONS" && !source.wantedMethod.empty();
-    if (verdict.isPreflight)
+    if (verdict.isPreflight) {
         addPreflightHeaders(verdict.headers, source);
+    }
     return verdict;
 }
 
 // Only clients of HTTP/1.0 that are no browsers send no host.
 std::string OriginPolicy::refusalOfHost(const Source& source) const {
-    if (source.hosts.empty())
+    if (source.hosts.empty()) {
         return "";
+    }
     const std::string& text = source.hosts.front();
     const std::optional<Authority> authority = parseAuthority(text, scheme);
-    if (!authority)
+    if (!authority) {
         return "The Host \"" + text +
                "\" is not a name or address. Send the one that stands in the URL.\n";
-    if (isOwnHost(source, authority->host))
+    }
+    if (isOwnHost(source, authority->host)) {
         return "";
+    }
     return "Requests to the host name " + authority->host +
            " are not taken. Use an address of this machine, or start the host with --host-name " +
            authority->host + ".\n";

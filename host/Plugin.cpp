@@ -14,7 +14,7 @@ namespace {
 
 namespace fs = std::filesystem;
 
-constexpr const char* kFileName = "libqitrmcsvc.so";
+constexpr const char* fileName = "libqitrmcsvc.so";
 
 void* load(const std::string& path) {
     std::error_code error;
@@ -65,10 +65,11 @@ void callGuarded(void (*function)(), const char* name) {
 
 std::string findPlugin() {
     const fs::path folder = fs::read_symlink("/proc/self/exe").parent_path();
-    const fs::path candidates[] = {folder.parent_path() / "lib" / kFileName, folder / kFileName};
+    const fs::path candidates[] = {folder.parent_path() / "lib" / fileName, folder / fileName};
     for (const fs::path& candidate : candidates) {
-        if (fs::exists(candidate))
+        if (fs::exists(candidate)) {
             return candidate;
+        }
     }
     throw Failure("There is no plug-in at " + candidates[0].string() + " nor at " +
                   candidates[1].string() + ". Build it, or name another with --plugin.");

@@ -24,8 +24,9 @@ class ErrorFinder : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, Error
     bool EndObject(rapidjson::SizeType) { return leave(); }
 
     bool Key(const char* text, rapidjson::SizeType length, bool) {
-        if (depth != (isBatch ? 2 : 1))
+        if (depth != (isBatch ? 2 : 1)) {
             return true;
+        }
         const std::string_view name(text, length);
         found = name == "error";
         return !found && (isBatch || name != "result");
@@ -45,7 +46,7 @@ class ErrorFinder : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, Error
 };
 
 // Iterative, so that no nesting in a response can exhaust the stack.
-constexpr unsigned kFlags = rapidjson::kParseIterativeFlag | rapidjson::kParseNumbersAsStringsFlag;
+constexpr unsigned flags = rapidjson::kParseIterativeFlag | rapidjson::kParseNumbersAsStringsFlag;
 
 }  // namespace
 
@@ -53,7 +54,7 @@ bool hasRpcError(const std::string& response) {
     ErrorFinder finder;
     rapidjson::Reader reader;
     rapidjson::StringStream stream(response.c_str());
-    reader.Parse<kFlags>(stream, finder);
+    reader.Parse<flags>(stream, finder);
     return finder.hasFound();
 }
 

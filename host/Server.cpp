@@ -15,11 +15,11 @@ namespace host {
 namespace {
 
 // A quarter of what a main thread has; 512 of them fit a 32-bit address space.
-constexpr std::size_t kStackSize = 2 * 1024 * 1024;
+constexpr std::size_t stackSize = 2 * 1024 * 1024;
 
 // The library closes a connection beyond its limit at once, so its limit stays above ours: a client
 // that finds all places taken waits with the system. That is why this server accepts by itself.
-constexpr unsigned kPlacesInPassing = 16;
+constexpr unsigned placesInPassing = 16;
 
 Connection* connectionOf(MHD_Connection* connection) {
     const auto* info = MHD_get_connection_info(connection, MHD_CONNECTION_INFO_SOCKET_CONTEXT);
@@ -64,8 +64,9 @@ Source sourceOf(MHD_Connection* connection, const char* method) {
     source.localAddress = localAddressOf(connection);
     HeaderReader reader{source};
     MHD_get_connection_values(connection, MHD_HEADER_KIND, takeHeader, &reader);
-    if (reader.ranOutOfMemory)
+    if (reader.ranOutOfMemory) {
         throw std::bad_alloc();
+    }
     return source;
 }
 
@@ -79,15 +80,19 @@ MHD_Result send(MHD_Connection* connection, const Exchange& exchange, bool isLas
     const auto addHeader = [&](const char* name, const char* value) {
         return MHD_add_response_header(response.get(), name, value) == MHD_YES;
     };
-    if (!response)
+    if (!response) {
         return MHD_NO;
-    if (!answer.type.empty() && !addHeader(MHD_HTTP_HEADER_CONTENT_TYPE, answer.type.c_str()))
+    }
+    if (!answer.type.empty() && !addHeader(MHD_HTTP_HEADER_CONTENT_TYPE, answer.type.c_str())) {
         return MHD_NO;
-    if (isLast && !addHeader(MHD_HTTP_HEADER_CONNECTION, "close"))
+    }
+    if (isLast && !addHeader(MHD_HTTP_HEADER_CONNECTION, "close")) {
         return MHD_NO;
+    }
     for (const Header& header : exchange.headers()) {
-        if (!addHeader(header.name, header.value.c_str()))
+        if (!addHeader(header.name, header.value.c_str())) {
             return MHD_NO;
+        }
     }
     return MHD_queue_response(connection, static_cast<unsigned>(answer.code), response.get());
 }
@@ -109,18 +114,21 @@ struct Server::Callbacks {
     }
 
     static void countConnection(Metrics* metrics, MHD_ConnectionNotificationCode code) {
-        if (metrics == nullptr)
+        if (metrics == nullptr) {
             return;
-        if (code == MHD_CONNECTION_NOTIFY_CLOSED)
+        }
+        if (code == MHD_CONNECTION_NOTIFY_CLOSED) {
             metrics->countClosedConnection();
-        else
+        } else {
             metrics->countOpenedConnection();
+        }
     }
 
     // The first line of a request is here. The result becomes the request's first state: none.
     static void* onRequestLine(void*, const char*, MHD_Connection* connection) {
-        if (Connection* client = connectionOf(connection))
+        if (Connection* client = connectionOf(connection)) {
             client->waitForClient();
+        }
         return nullptr;
     }
 
@@ -134,10 +142,12 @@ struct Server::Callbacks {
         Server& server = *static_cast<Server*>(context);
         const auto exchange = static_cast<Exchange*>(*state);
         try {
-            if (exchange == nullptr)
+            if (exchange == nullptr) {
                 return begin(server, connection, path, method, state);
-            if (*size == 0)
+            }
+            if (*size == 0) {
                 return end(server, connection, *exchange);
+            }
             const std::size_t taken = *size;
             *size = 0;
             return exchange->take(data, taken) ? MHD_YES : MHD_NO;
@@ -149,8 +159,9 @@ struct Server::Callbacks {
     static MHD_Result begin(Server& server, MHD_Connection* connection, const char* path,
                             const char* method, void** state) {
         Connection* client = connectionOf(connection);
-        if (client == nullptr)
+        if (client == nullptr) {
             return MHD_NO;
+        }
         client->waitForClient();
         auto* exchange = new Exchange(server.gate, server.settings.maxBody, &server.site);
         *state = exchange;
@@ -177,8 +188,9 @@ struct Server::Callbacks {
     static void onEnd(void*, MHD_Connection* connection, void** state, MHD_RequestTerminationCode) {
         delete static_cast<Exchange*>(*state);
         *state = nullptr;
-        if (Connection* client = connectionOf(connection))
+        if (Connection* client = connectionOf(connection)) {
             client->waitForClient();
+        }
     }
 };
 
@@ -210,14 +222,14 @@ MHD_Daemon* Server::startDaemon() {
         {MHD_OPTION_HTTPS_MEM_CERT, 0, const_cast<char*>(settings.tlsCertificate.c_str())},
         {MHD_OPTION_HTTPS_MEM_KEY, 0, const_cast<char*>(settings.tlsKey.c_str())},
         {MHD_OPTION_END, 0, nullptr}};
-    return MHD_start_daemon(flags, 0, nullptr, nullptr, Callbacks::onRequest, this,            //
-                            MHD_OPTION_CONNECTION_LIMIT, settings.threads + kPlacesInPassing,  //
-                            MHD_OPTION_THREAD_STACK_SIZE, kStackSize,                          //
-                            MHD_OPTION_SIGPIPE_HANDLED_BY_APP, 1,                              //
-                            MHD_OPTION_NOTIFY_CONNECTION, Callbacks::onConnection, this,       //
-                            MHD_OPTION_URI_LOG_CALLBACK, Callbacks::onRequestLine, this,       //
-                            MHD_OPTION_UNESCAPE_CALLBACK, Callbacks::keepEscapes, this,        //
-                            MHD_OPTION_NOTIFY_COMPLETED, Callbacks::onEnd, this,               //
+    return MHD_start_daemon(flags, 0, nullptr, nullptr, Callbacks::onRequest, this,           //
+                            MHD_OPTION_CONNECTION_LIMIT, settings.threads + placesInPassing,  //
+                            MHD_OPTION_THREAD_STACK_SIZE, stackSize,                          //
+                            MHD_OPTION_SIGPIPE_HANDLED_BY_APP, 1,                             //
+                            MHD_OPTION_NOTIFY_CONNECTION, Callbacks::onConnection, this,      //
+                            MHD_OPTION_URI_LOG_CALLBACK, Callbacks::onRequestLine, this,      //
+                            MHD_OPTION_UNESCAPE_CALLBACK, Callbacks::keepEscapes, this,       //
+                            MHD_OPTION_NOTIFY_COMPLETED, Callbacks::onEnd, this,              //
                             MHD_OPTION_ARRAY, settings.tls ? tlsOptions : &tlsOptions[2],
                             MHD_OPTION_END);
 }
@@ -231,8 +243,9 @@ void Server::acceptClients() noexcept {
         sockaddr_storage address;
         socklen_t length;
         const int client = socket.accept(address, length);
-        if (client >= 0)
+        if (client >= 0) {
             MHD_add_connection(daemon.get(), client, reinterpret_cast<sockaddr*>(&address), length);
+        }
     }
 }
 
@@ -244,8 +257,9 @@ void Server::stopAccepting() {
     gate.close();
     connections.close();
     socket.stopListening();
-    if (acceptor.joinable())
+    if (acceptor.joinable()) {
         acceptor.join();
+    }
 }
 
 bool Server::waitForRequests(std::chrono::milliseconds time) {

@@ -18,10 +18,10 @@ struct MHD_Daemon;
 namespace host {
 
 struct ServerSettings {
-    uint32_t threads = 0;  // most connections at once
-    uint32_t maxBody = 0;  // bytes
-    uint32_t timeout = 0;  // seconds
-    bool tls = false;      // HTTPS with these two, both PEM text
+    std::uint32_t threads = 0;  // most connections at once
+    std::uint32_t maxBody = 0;  // bytes
+    std::uint32_t timeout = 0;  // seconds
+    bool tls = false;           // HTTPS with these two, both PEM text
     std::string tlsCertificate;
     std::string tlsKey;
     bool passTransport = false;  // the plug-in sees "https" behind TLS, else always "http"

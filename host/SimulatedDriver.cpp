@@ -16,8 +16,9 @@ namespace {
 // it stays here.
 void* loadedDriver() {
     void* const driver = dlopen("libqitrmcapi.so.1", RTLD_NOW | RTLD_NOLOAD);
-    if (driver != nullptr)
+    if (driver != nullptr) {
         dlclose(driver);
+    }
     return driver;
 }
 
@@ -26,9 +27,10 @@ Function* find(const char* name) {
     return reinterpret_cast<Function*>(driverFunction(name));
 }
 
-void addCount(std::string& text, uint32_t count, const char* things) {
-    if (count != 0)
+void addCount(std::string& text, std::uint32_t count, const char* things) {
+    if (count != 0) {
         text += (text.empty() ? "" : ", ") + std::to_string(count) + " " + things;
+    }
 }
 
 }  // namespace
@@ -41,8 +43,9 @@ void* driverFunction(const char* name) {
 std::string startSimulatedDriver() {
     const auto start = find<decltype(qitrmcsim_start)>("qitrmcsim_start");
     const auto freeString = find<decltype(nQITRMCAPI100_freeString)>("nQITRMCAPI100_freeString");
-    if (start == nullptr || freeString == nullptr)
+    if (start == nullptr || freeString == nullptr) {
         return "";
+    }
     char* text = nullptr;
     if (start(&text) != 0) {
         throw Failure(
@@ -55,8 +58,9 @@ std::string startSimulatedDriver() {
 std::string thingsNotGivenBack() {
     const auto countOutstanding =
         find<decltype(qitrmcsim_countOutstanding)>("qitrmcsim_countOutstanding");
-    if (countOutstanding == nullptr)
+    if (countOutstanding == nullptr) {
         return "";
+    }
     qitrmcsim_Outstanding counts;
     countOutstanding(&counts);
     std::string text;
@@ -68,10 +72,11 @@ std::string thingsNotGivenBack() {
     return text;
 }
 
-std::optional<uint64_t> countDriverCalls() {
+std::optional<std::uint64_t> countDriverCalls() {
     const auto countCalls = find<decltype(qitrmcsim_countCalls)>("qitrmcsim_countCalls");
-    if (countCalls == nullptr)
+    if (countCalls == nullptr) {
         return std::nullopt;
+    }
     return countCalls();
 }
 

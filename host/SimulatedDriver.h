@@ -20,6 +20,6 @@ std::string startSimulatedDriver();
 std::string thingsNotGivenBack();
 
 // The calls of the simulated driver so far; nothing with another driver.
-std::optional<uint64_t> countDriverCalls();
+std::optional<std::uint64_t> countDriverCalls();
 
 }  // namespace host

@@ -11,9 +11,9 @@ namespace host {
 
 namespace {
 
-constexpr const char* kDevices = "/simulator/devices";
-constexpr const char* kFaults = "/simulator/faults";
-constexpr std::string_view kTrace = "/simulator/trace/";
+constexpr const char* devicesPath = "/simulator/devices";
+constexpr const char* faultsPath = "/simulator/faults";
+constexpr std::string_view tracePath = "/simulator/trace/";
 
 template <typename Function>
 Function function(const char* name) {
@@ -21,13 +21,15 @@ Function function(const char* name) {
 }
 
 // The number at the end of the path of a trace; nothing for another path.
-std::optional<uint64_t> traceNumber(const std::string& path) {
-    if (path.rfind(kTrace, 0) != 0)
+std::optional<std::uint64_t> traceNumber(const std::string& path) {
+    if (path.rfind(tracePath, 0) != 0) {
         return std::nullopt;
-    uint64_t number = 0;
+    }
+    std::uint64_t number = 0;
     const char* end = path.data() + path.size();
-    const auto [stop, error] = std::from_chars(path.data() + kTrace.size(), end, number);
-    return error == std::errc() && stop == end ? std::optional<uint64_t>(number) : std::nullopt;
+    const auto [stop, error] = std::from_chars(path.data() + tracePath.size(), end, number);
+    return error == std::errc() && stop == end ? std::optional<std::uint64_t>(number)
+                                               : std::nullopt;
 }
 
 }  // namespace
@@ -45,37 +47,43 @@ SimulatorPanel::SimulatorPanel()
       readTrace(function<decltype(readTrace)>("qitrmcsim_readTrace")) {}
 
 bool SimulatorPanel::has(const std::string& path) const {
-    return path == kDevices || path == kFaults || traceNumber(path).has_value();
+    return path == devicesPath || path == faultsPath || traceNumber(path).has_value();
 }
 
 SiteResponse SimulatorPanel::answer(const SiteRequest& request) const {
-    if (!request.isLocal)
+    if (!request.isLocal) {
         return textResponse(403, "The simulated chassis is changed from its own machine alone.");
-    if (request.method == "GET" || request.method == "HEAD")
+    }
+    if (request.method == "GET" || request.method == "HEAD") {
         return read(request.path);
-    if (request.path != kFaults)
+    }
+    if (request.path != faultsPath) {
         return refuseMethod();
-    if (request.method != "POST")
+    }
+    if (request.method != "POST") {
         return refuseMethod("GET, HEAD, POST", "Faults are read with GET and set with POST.\n");
+    }
     return setFaults(request.body);
 }
 
 SiteResponse SimulatorPanel::read(const std::string& path) const {
     char* json = nullptr;
-    int32_t code = 0;
-    if (path == kDevices)
+    std::int32_t code = 0;
+    if (path == devicesPath) {
         code = describeDevices(&json);
-    else if (path == kFaults)
+    } else if (path == faultsPath) {
         code = getFaults(&json);
-    else
+    } else {
         code = readTrace(*traceNumber(path), &json);
+    }
     return respond(code, json);
 }
 
-SiteResponse SimulatorPanel::respond(int32_t code, char* json) const {
+SiteResponse SimulatorPanel::respond(std::int32_t code, char* json) const {
     const std::unique_ptr<char, decltype(freeString)> owner(json, freeString);
-    if (code != 0)
+    if (code != 0) {
         return textResponse(500, "The simulated chassis failed: " + std::to_string(code) + ".");
+    }
     SiteResponse response;
     response.type = "application/json; charset=utf-8";
     response.body = json;
@@ -85,10 +93,11 @@ SiteResponse SimulatorPanel::respond(int32_t code, char* json) const {
 
 SiteResponse SimulatorPanel::setFaults(const std::string& json) const {
     char* reason = nullptr;
-    const int32_t code = replaceFaults(json.c_str(), &reason);
+    const std::int32_t code = replaceFaults(json.c_str(), &reason);
     const std::unique_ptr<char, decltype(freeString)> owner(reason, freeString);
-    if (code != 0)
+    if (code != 0) {
         return textResponse(400, reason != nullptr ? reason : std::to_string(code));
+    }
     SiteResponse response;
     response.code = 204;
     return response;

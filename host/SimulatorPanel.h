@@ -32,7 +32,7 @@ class SimulatorPanel : public SitePart {
 
     SiteResponse read(const std::string& path) const;
     SiteResponse setFaults(const std::string& json) const;
-    SiteResponse respond(int32_t code, char* json) const;
+    SiteResponse respond(std::int32_t code, char* json) const;
 
     decltype(nQITRMCAPI100_freeString)* const freeString;
     decltype(qitrmcsim_describeDevices)* const describeDevices;

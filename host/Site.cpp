@@ -27,8 +27,9 @@ Site::Site(std::vector<std::unique_ptr<SitePart>> parts, Metrics* metrics)
 
 const SitePart* Site::partWith(const std::string& path) const {
     for (const std::unique_ptr<SitePart>& part : parts) {
-        if (part->has(path))
+        if (part->has(path)) {
             return part.get();
+        }
     }
     return nullptr;
 }

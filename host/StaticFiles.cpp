@@ -18,19 +18,19 @@ namespace {
 namespace fs = std::filesystem;
 
 // A page has a hundredth of this; somebody's home folder has more.
-constexpr std::size_t kMostBytes = 64 * 1024 * 1024;
+constexpr std::size_t mostBytes = 64 * 1024 * 1024;
 
 // The build gives the files here names that hold a hash of their content.
-constexpr std::string_view kLastingFolder = "/assets/";
+constexpr std::string_view lastingFolder = "/assets/";
 
-constexpr const char* kFolders[] = {"share/web", "share/qitrmc/web"};
+constexpr const char* folders[] = {"share/web", "share/qitrmc/web"};
 
 struct TypeOfEnding {
     const char* ending;
     const char* type;
 };
 
-constexpr TypeOfEnding kTypes[] = {
+constexpr TypeOfEnding types[] = {
     {".css", "text/css; charset=utf-8"},
     {".html", "text/html; charset=utf-8"},
     {".ico", "image/x-icon"},
@@ -43,18 +43,20 @@ constexpr TypeOfEnding kTypes[] = {
 };
 
 std::string typeOf(const fs::path& path) {
-    for (const TypeOfEnding& known : kTypes) {
-        if (path.extension() == known.ending)
+    for (const TypeOfEnding& known : types) {
+        if (path.extension() == known.ending) {
             return known.type;
+        }
     }
     return "application/octet-stream";
 }
 
 // FNV-1a over 64 bits: it tells contents apart, it protects nothing.
 std::string tagOf(const std::string& content) {
-    uint64_t hash = 14695981039346656037u;
-    for (const char c : content)
+    std::uint64_t hash = 14695981039346656037u;
+    for (const char c : content) {
         hash = (hash ^ static_cast<unsigned char>(c)) * 1099511628211u;
+    }
     char text[19];
     std::snprintf(text, sizeof text, "\"%016llx\"", static_cast<unsigned long long>(hash));
     return text;
@@ -79,8 +81,9 @@ bool isHidden(const fs::path& path) {
 // What the iterator goes on to from here.
 bool isServed(fs::recursive_directory_iterator& entry) {
     const bool hidden = isHidden(entry->path());
-    if (hidden && entry->is_directory())
+    if (hidden && entry->is_directory()) {
         entry.disable_recursion_pending();
+    }
     return !hidden && fs::is_regular_file(entry->symlink_status());
 }
 
@@ -90,11 +93,12 @@ StaticFiles::StaticFiles(const std::string& folder) {
     std::size_t bytes = 0;
     try {
         for (fs::recursive_directory_iterator entry(folder), end; entry != end; ++entry) {
-            if (!isServed(entry))
+            if (!isServed(entry)) {
                 continue;
+            }
             StaticFile file;
             bytes += entry->file_size();
-            if (bytes > kMostBytes) {
+            if (bytes > mostBytes) {
                 throw Failure("The folder " + folder +
                               " has more than 64 MiB. Name the folder of a web page with --web.");
             }
@@ -103,7 +107,7 @@ StaticFiles::StaticFiles(const std::string& folder) {
             file.tag = tagOf(file.content);
             const std::string name =
                 "/" + entry->path().lexically_relative(folder).generic_string();
-            file.isLasting = name.rfind(kLastingFolder, 0) == 0;
+            file.isLasting = name.rfind(lastingFolder, 0) == 0;
             files.emplace(name, std::move(file));
         }
     } catch (const fs::filesystem_error& error) {
@@ -114,8 +118,9 @@ StaticFiles::StaticFiles(const std::string& folder) {
 
 const StaticFile* StaticFiles::find(std::string_view path) const {
     std::string name = percentDecoded(path);
-    if (!name.empty() && name.back() == '/')
+    if (!name.empty() && name.back() == '/') {
         name += "index.html";
+    }
     const auto found = files.find(name);
     return found == files.end() ? nullptr : &found->second;
 }
@@ -123,10 +128,11 @@ const StaticFile* StaticFiles::find(std::string_view path) const {
 std::string findPage() {
     std::error_code error;
     const fs::path program = fs::read_symlink("/proc/self/exe", error);
-    for (const char* folder : kFolders) {
+    for (const char* folder : folders) {
         const fs::path path = program.parent_path().parent_path() / folder;
-        if (fs::is_directory(path, error))
+        if (fs::is_directory(path, error)) {
             return path.string();
+        }
     }
     return "";
 }

@@ -32,7 +32,7 @@ using host::Failure;
 using host::Options;
 
 // How often overdue connections are looked for.
-constexpr timespec kTick = {1, 0};
+constexpr timespec tick = {1, 0};
 
 // `what` names the file in the failure, `option` says where its path came from.
 std::string readFile(const std::string& path, const std::string& what, const std::string& option) {
@@ -40,8 +40,9 @@ std::string readFile(const std::string& path, const std::string& what, const std
                                                              std::fclose);
     std::string text;
     char piece[4096];
-    while (file && !std::feof(file.get()) && !std::ferror(file.get()))
+    while (file && !std::feof(file.get()) && !std::ferror(file.get())) {
         text.append(piece, std::fread(piece, 1, sizeof piece, file.get()));
+    }
     if (!file || std::ferror(file.get())) {
         throw Failure("The " + what + " " + path + " cannot be read: " + std::strerror(errno) +
                       ". Name a readable file with " + option + ".");
@@ -50,14 +51,16 @@ std::string readFile(const std::string& path, const std::string& what, const std
 }
 
 void setEnvironment(const char* name, const std::string& value) {
-    if (!value.empty())
+    if (!value.empty()) {
         setenv(name, value.c_str(), 1);
+    }
 }
 
 // The simulated driver, which the plug-in loads, reads these.
 void configureDriver(const Options& options) {
-    if (!options.chassis.empty())
+    if (!options.chassis.empty()) {
         readFile(options.chassis, "chassis file", "--chassis");
+    }
     setEnvironment("QITRMC_SIM_CHASSIS", options.chassis);
     setEnvironment("QITRMC_SIM_STATE", options.state);
     setEnvironment("QITRMC_SIM_FAULTS", options.faults);
@@ -82,8 +85,9 @@ host::ServerSettings settingsOf(const Options& options) {
 
 host::OriginPolicy policyOf(const Options& options) {
     std::vector<std::string> names = options.hostNames;
-    if (const std::optional<std::string> name = host::canonicalHost(options.address))
+    if (const std::optional<std::string> name = host::canonicalHost(options.address)) {
         names.push_back(*name);
+    }
     return {options.tlsKey.empty() ? "http" : "https", names, options.allowedOrigins};
 }
 
@@ -95,14 +99,17 @@ host::StaticFiles filesOf(const Options& options) {
 host::Site siteOf(const Options& options, host::StaticFiles files, const host::Plugin& plugin,
                   host::Metrics& metrics) {
     std::vector<std::unique_ptr<host::SitePart>> parts;
-    if (!options.noHealth)
+    if (!options.noHealth) {
         parts.push_back(std::make_unique<host::Health>(plugin));
-    if (!options.noMetrics)
+    }
+    if (!options.noMetrics) {
         parts.push_back(std::make_unique<host::MetricsPage>(metrics));
+    }
     std::unique_ptr<host::SitePart> panel =
         options.noPanel ? nullptr : host::SimulatorPanel::find();
-    if (panel)
+    if (panel) {
         parts.push_back(std::move(panel));
+    }
     parts.push_back(std::make_unique<host::Page>(std::move(files)));
     return host::Site(std::move(parts), options.noMetrics ? nullptr : &metrics);
 }
@@ -128,8 +135,9 @@ void takeChargeOfSignals() {
 
 void serveUntilSignal(host::Server& server) {
     const sigset_t signals = endSignals();
-    while (sigtimedwait(&signals, nullptr, &kTick) < 0)
+    while (sigtimedwait(&signals, nullptr, &tick) < 0) {
         server.shutOverdueConnections();
+    }
 }
 
 // From here on a signal has its default effect: it ends the process.
@@ -137,8 +145,9 @@ void finishRequests(host::Server& server) {
     const sigset_t signals = endSignals();
     pthread_sigmask(SIG_UNBLOCK, &signals, nullptr);
     server.stopAccepting();
-    while (!server.waitForRequests(std::chrono::seconds(kTick.tv_sec)))
+    while (!server.waitForRequests(std::chrono::seconds(tick.tv_sec))) {
         server.shutOverdueConnections();
+    }
 }
 
 void serve(const host::Plugin& plugin, host::ListenSocket& socket,
@@ -148,8 +157,9 @@ void serve(const host::Plugin& plugin, host::ListenSocket& socket,
     const std::string url =
         std::string(settings.tls ? "https" : "http") + "://" + socket.authority();
     std::printf("Listening on %s/qitrmc/Call\n%s", url.c_str(), chassis.c_str());
-    if (site.has("/"))
+    if (site.has("/")) {
         std::printf("Open %s/ in a browser.\n", url.c_str());
+    }
     std::fflush(stdout);
     serveUntilSignal(server);
     finishRequests(server);
@@ -185,10 +195,11 @@ void runHost(const Options& options) {
 }
 
 void perform(const Options& options) {
-    if (options.notice.empty())
+    if (options.notice.empty()) {
         runHost(options);
-    else
+    } else {
         std::fputs(options.notice.c_str(), stdout);
+    }
 }
 
 }  // namespace

@@ -7,14 +7,16 @@
 
 namespace {
 
-constexpr int kRead = 0;
-constexpr int kNotRead = 1;
+constexpr int read = 0;
+constexpr int notRead = 1;
 
 const std::string* findVariable(const ws_Request& request, std::string_view name) {
-    if (name == "REQUEST_TRANSPORT")
+    if (name == "REQUEST_TRANSPORT") {
         return &request.transport;
-    if (name == "REQUEST_METHOD")
+    }
+    if (name == "REQUEST_METHOD") {
         return &request.method;
+    }
     return nullptr;
 }
 
@@ -36,32 +38,34 @@ void extendResponse(ws_Request& request, Write write) noexcept {
 extern "C" {
 
 int ReadRequestVariable_C_REST_QI_QVWS_(ws_Request* request, const char* name, char* buffer,
-                                        uint32_t* size) {
+                                        std::uint32_t* size) {
     const std::string* value = findVariable(*request, name);
     if (value == nullptr) {
         *size = 0;
-        return kNotRead;
+        return notRead;
     }
     const std::size_t needed = value->size() + 1;
     if (*size < needed) {
-        *size = static_cast<uint32_t>(needed);
-        return kNotRead;
+        *size = static_cast<std::uint32_t>(needed);
+        return notRead;
     }
     std::memcpy(buffer, value->c_str(), needed);
-    return kRead;
+    return read;
 }
 
-int ReadPostData_C_REST_QI_QVWS_(ws_Request* request, char* buffer, uint32_t* size) {
+int ReadPostData_C_REST_QI_QVWS_(ws_Request* request, char* buffer, std::uint32_t* size) {
     const std::string& body = request->body;
     if (*size < body.size()) {
-        *size = static_cast<uint32_t>(body.size());
-        return kNotRead;
+        *size = static_cast<std::uint32_t>(body.size());
+        return notRead;
     }
-    if (!body.empty())
+    if (!body.empty()) {
         std::memcpy(buffer, body.data(), body.size());
-    if (*size > body.size())
+    }
+    if (*size > body.size()) {
         buffer[body.size()] = '\0';
-    return kRead;
+    }
+    return read;
 }
 
 void SetHTTPResponseCode_QI_QVWS_(ws_Request* request, int code) {
@@ -72,7 +76,7 @@ void SetHTTPResponseMimeType_C_REST_QI_QVWS_(ws_Request* request, const char* ty
     extendResponse(*request, [&] { request->type = type; });
 }
 
-void WriteOutput_C_REST_QI_QVWS_(ws_Request* request, const char* data, uint32_t length) {
+void WriteOutput_C_REST_QI_QVWS_(ws_Request* request, const char* data, std::uint32_t length) {
     extendResponse(*request, [&] { request->output.append(data, length); });
 }
 

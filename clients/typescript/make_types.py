@@ -131,7 +131,7 @@ AT_MOST_ONE = """\
 export type AtMostOne<Choice> =
   | { [Name in keyof Choice]: Pick<Choice, Name> & { [Other in Exclude<keyof Choice, Name>]?: never } }[keyof Choice]
   | { [Name in keyof Choice]?: never };
-"""
+"""  # noqa: E501
 
 
 def types_text():

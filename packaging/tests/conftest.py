@@ -1,7 +1,6 @@
 """The packages under test, which scripts/package has made."""
 
 import os
-import pathlib
 import subprocess
 
 import pytest

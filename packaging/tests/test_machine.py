@@ -111,5 +111,3 @@ def test_the_systemd_units_are_correct_and_hardened(installed):
     exposure = installed.output("systemd-analyze security --offline=true --no-pager"
                                 " /lib/systemd/system/qitrmc-host.service")
     assert float(re.search(r"Overall exposure level.*: ([\d.]+)", exposure)[1]) <= 1.5
-
-

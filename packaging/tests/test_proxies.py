@@ -52,7 +52,7 @@ sed "s#\$6\$qitrmc\$INSERT.A.HASH#$(openssl passwd -6 secret)#" /proxy/haproxy.c
 haproxy -D -f /etc/haproxy/haproxy.cfg
 # From another address, since the requests of each are counted.
 wait_for --interface 127.0.0.2 -u lab:secret --retry-all-errors --fail --resolve '*:443:127.0.0.1' https://rack.example/rack2/qitrmc/Call -d '{}'
-"""
+"""  # noqa: E501
 
 
 @pytest.fixture(scope="module", params=["nginx", "haproxy"])
@@ -143,7 +143,7 @@ def test_too_many_requests_are_answered_with_429(proxied):
     answers = proxied("""
       printf 'url = "https://rack.example/rack1/qitrmc/Call"\\noutput = /dev/null\\n%.0s' $(seq 400) >/tmp/urls
       curl -sk --resolve '*:443:127.0.0.1' $known -d "$BODY" -w '%{http_code}\\n' -K /tmp/urls | sort | uniq -c
-    """)
+    """)  # noqa: E501
     counts = {line.split()[1]: int(line.split()[0]) for line in answers}
     assert set(counts) == {"200", "429"}
     assert counts["200"] >= 100

@@ -39,6 +39,7 @@ MARKUP = re.compile(r"[<>&]")
 # The limit includes the line feed. The reader splits longer lines and looks for tags in the pieces.
 LONGEST_LINE = 1023
 
+
 def text_columns(languages):
     return [f"{language}_{part}" for language in languages for part in ("happened", "remedy")]
 

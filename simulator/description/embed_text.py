@@ -16,7 +16,7 @@ def main():
     lines = ["#pragma once\n\n#include <string_view>\n\nnamespace simulator::embedded {\n"]
     for file in map(Path, files):
         text = file.read_text(encoding="utf-8")
-        pieces = [text[start : start + PIECE] for start in range(0, len(text), PIECE)]
+        pieces = [text[start:start + PIECE] for start in range(0, len(text), PIECE)]
         literals = "\n".join(f'R"~~~({piece})~~~"' for piece in pieces)
         lines.append(f"\ninline constexpr std::string_view {file.stem} =\n{literals};\n")
     lines.append("\n}  // namespace simulator::embedded\n")

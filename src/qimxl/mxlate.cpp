@@ -18,7 +18,7 @@ constexpr const char* registrationText =
     "\"MIErrorsDir\":\"$_qiShared32Dir/mierrors\"}}";
 
 XlatorInterface* create(const char* name, const char* registrationInfo, qierr_Status* status) {
-    return qixlatorlua::createLuaXlator(name, registrationInfo, qixlatorlua::LuaRuntime::fast,
+    return qixlatorlua::createLuaXlator(name, registrationInfo, qixlatorlua::LuaRuntime::Fast,
                                         status);
 }
 

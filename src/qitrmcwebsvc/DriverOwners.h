@@ -66,8 +66,9 @@ class DriverArray {
     // allocated with malloc. The elements are not initialised.
     explicit DriverArray(std::uint32_t count)
         : array(static_cast<Element*>(std::malloc(count * sizeof(Element)))), count(count) {
-        if (array == nullptr && count != 0)
+        if (array == nullptr && count != 0) {
             throw std::bad_alloc();
+        }
     }
     ~DriverArray() { nQITRMCAPI100_freeArray(array); }
     DriverArray(const DriverArray&) = delete;
@@ -111,8 +112,9 @@ class DriverHandle {
   public:
     DriverHandle() = default;
     ~DriverHandle() {
-        if (handle == 0)
+        if (handle == 0) {
             return;
+        }
         qierr::Status status;
         close(handle, &status);
     }

@@ -10,11 +10,13 @@ namespace nQITRMCWEBSVC100 {
 namespace {
 
 std::int32_t numberOf(const JsonValue& value, const std::string& enumerationName) {
-    if (value.IsInt())
+    if (value.IsInt()) {
         return value.GetInt();
-    if (value.IsString())
+    }
+    if (value.IsString()) {
         return nQITRMCAPI100_translateStaticEnumStringToValue(enumerationName.c_str(),
                                                               value.GetString());
+    }
     throw nQITRMCSHAREDCMN100::InternalError("Fail to parse enum type.", QITRMC_HERE);
 }
 

@@ -19,8 +19,9 @@ const JsonValue* resolve(const JsonValue& schema, const std::string& pointerText
 }
 
 const JsonValue* memberOfObject(const JsonValue* object, const std::string& name) {
-    if (!object || !object->IsObject())
+    if (!object || !object->IsObject()) {
         return nullptr;
+    }
     return findMember(*object, name.c_str());
 }
 
@@ -33,32 +34,38 @@ std::string filledIn(const char* descriptionName, const std::string& value) {
 // The value of the failed keyword in the schema.
 const JsonValue& keywordValue(const JsonValue& schema, const SchemaFailure& failure) {
     const JsonValue* const value = resolve(schema, failure.schemaPointer + "/" + failure.keyword);
-    if (!value)
+    if (!value) {
         throw InternalError("Invalid schema format.", QITRMC_HERE);
+    }
     return *value;
 }
 
 std::string stringOf(const JsonValue& value) {
-    if (!value.IsString())
+    if (!value.IsString()) {
         throw InternalError("Invalid schema format.", QITRMC_HERE);
+    }
     return value.GetString();
 }
 
 std::string enumEntry(const JsonValue& entry) {
-    if (entry.IsInt())
+    if (entry.IsInt()) {
         return std::to_string(entry.GetInt());
-    if (entry.IsString())
+    }
+    if (entry.IsString()) {
         return entry.GetString();
+    }
     throw InternalError("Unsupported data type for enums.", QITRMC_HERE);
 }
 
 std::string joined(const JsonValue& array, std::string (*textOf)(const JsonValue&)) {
-    if (!array.IsArray())
+    if (!array.IsArray()) {
         throw InternalError("Invalid schema format.", QITRMC_HERE);
+    }
     std::string text;
     for (const JsonValue& entry : array.GetArray()) {
-        if (&entry != array.Begin())
+        if (&entry != array.Begin()) {
             text += ", ";
+        }
         text += textOf(entry);
     }
     return text;
@@ -68,18 +75,24 @@ std::string describeKeyword(const JsonValue& schema, const SchemaFailure& failur
     const std::string& keyword = failure.keyword;
     const auto value = [&]() -> const JsonValue& { return keywordValue(schema, failure); };
 
-    if (keyword == "type")
+    if (keyword == "type") {
         return filledIn("WrongParameterType", stringOf(value()));
-    if (keyword == "required")
+    }
+    if (keyword == "required") {
         return filledIn("ParameterRequired", joined(value(), stringOf));
-    if (keyword == "enum")
+    }
+    if (keyword == "enum") {
         return filledIn("InvalidEnumItem", joined(value(), enumEntry));
-    if (keyword == "additionalProperties")
+    }
+    if (keyword == "additionalProperties") {
         return getErrorDescription("UnsupportedParams");
-    if (keyword == "minimum")
+    }
+    if (keyword == "minimum") {
         return filledIn("LessThanMinValue", compactJson(value()));
-    if (keyword == "maximum")
+    }
+    if (keyword == "maximum") {
         return filledIn("GreaterThanMaxValue", compactJson(value()));
+    }
     return "";
 }
 
@@ -87,12 +100,14 @@ std::string describeKeyword(const JsonValue& schema, const SchemaFailure& failur
 
 std::string describeFailure(const JsonValue& schema, const SchemaFailure& failure) {
     const JsonValue* const broken = resolve(schema, failure.schemaPointer);
-    if (!memberOfObject(broken, failure.keyword))
+    if (!memberOfObject(broken, failure.keyword)) {
         return "";
+    }
 
     const JsonValue* const name = memberOfObject(broken, failure.keyword + "ErrorDescription");
-    if (name && name->IsString())
+    if (name && name->IsString()) {
         return getErrorDescription(name->GetString());
+    }
     return describeKeyword(schema, failure);
 }
 

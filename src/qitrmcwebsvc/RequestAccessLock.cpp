@@ -4,8 +4,9 @@ namespace nQITRMCWEBSVC100 {
 
 void RequestAccessLock::lockShared() {
     std::unique_lock<std::mutex> hold(mutex);
-    while (writers > 0)
+    while (writers > 0) {
         readersCondition.wait(hold);
+    }
     ++readers;
 }
 
@@ -14,8 +15,9 @@ void RequestAccessLock::lockExclusive() {
     ++writers;
     // Waits once without checking the condition again, so that a batch does not have to wait for
     // the slowest of the earlier requests. Shared holders may remain.
-    if (writers > 1 || readers > 0)
+    if (writers > 1 || readers > 0) {
         writersCondition.wait(hold);
+    }
 }
 
 void RequestAccessLock::unlockShared() {
@@ -31,10 +33,11 @@ void RequestAccessLock::unlockExclusive() {
 }
 
 void RequestAccessLock::wakeWaiters() {
-    if (writers > 0)
+    if (writers > 0) {
         writersCondition.notify_one();
-    else
+    } else {
         readersCondition.notify_all();
+    }
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -13,9 +13,10 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-void addDefaultParamsToObject(JsonValue& value, JsonPool& allocator) {
-    if (value.IsObject() && !value.HasMember("params"))
+void addDefaultParamsToObject(JsonValue& value, JsonAllocator& allocator) {
+    if (value.IsObject() && !value.HasMember("params")) {
         value.AddMember("params", JsonValue(rapidjson::kObjectType), allocator);
+    }
 }
 
 // An element of a few bytes can cause a response of hundreds of bytes, while the exclusive lock is
@@ -27,9 +28,10 @@ bool isBatch(const JsonValue& root) {
 }
 
 // The id of a request, of whatever type, or null if there is none.
-JsonValue copyId(const JsonValue& requestValue, JsonPool& allocator) {
-    if (!requestValue.IsObject())
+JsonValue copyId(const JsonValue& requestValue, JsonAllocator& allocator) {
+    if (!requestValue.IsObject()) {
         return JsonValue();
+    }
     const JsonValue* const id = findMember(requestValue, "id");
     return id == nullptr ? JsonValue() : JsonValue(*id, allocator);
 }
@@ -45,15 +47,16 @@ void setErrorFromCurrentException(SingleResponse& response) {
 class SkippedError {
   public:
     void setOn(SingleResponse& response) {
-        if (error.IsNull())
+        if (error.IsNull()) {
             error = make(*response.getAllocator());
+        }
         JsonValue copy(error, *response.getAllocator());
         response.setError(std::move(copy));
     }
 
   private:
-    static JsonValue make(JsonPool& pool) {
-        SingleResponse response(&pool);
+    static JsonValue make(JsonAllocator& allocator) {
+        SingleResponse response(&allocator);
         response.setError(*BasicError(qierr::codes::skipped, QITRMC_HERE).status());
         return std::move(response.getValue()["error"]);
     }
@@ -64,8 +67,9 @@ class SkippedError {
 }  // namespace
 
 RequestHandler::RequestHandler() {
-    for (const Method& method : methodTable)
+    for (const Method& method : methodTable) {
         procedures.emplace(method.name, (procedureFactory.*method.make)());
+    }
 }
 
 std::string RequestHandler::handleRequest(const std::string& body) {
@@ -95,16 +99,18 @@ void RequestHandler::answer(const std::string& body, JsonDocument& responseDocum
     }
 }
 
-void RequestHandler::addDefaultParams(JsonValue& value, JsonPool& allocator) const {
-    if (value.IsArray())
-        for (JsonValue& element : value.GetArray())
+void RequestHandler::addDefaultParams(JsonValue& value, JsonAllocator& allocator) const {
+    if (value.IsArray()) {
+        for (JsonValue& element : value.GetArray()) {
             addDefaultParamsToObject(element, allocator);
-    else
+        }
+    } else {
         addDefaultParamsToObject(value, allocator);
+    }
 }
 
 bool RequestHandler::handleSingleRequest(JsonValue& requestValue, JsonValue& responseValue,
-                                         JsonPool& allocator) {
+                                         JsonAllocator& allocator) {
     SingleResponse response(copyId(requestValue, allocator), &allocator);
     bool succeeded = true;
     try {
@@ -120,7 +126,7 @@ bool RequestHandler::handleSingleRequest(JsonValue& requestValue, JsonValue& res
 
 // After the first failure, the remaining requests are answered with an error and not executed.
 void RequestHandler::handleBatchRequest(JsonValue& requests, JsonValue& responseValue,
-                                        JsonPool& allocator) {
+                                        JsonAllocator& allocator) {
     responseValue.SetArray();
     bool carryOn = true;
     SkippedError skippedError;

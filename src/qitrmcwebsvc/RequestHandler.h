@@ -30,10 +30,11 @@ class RequestHandler {
 
   private:
     void answer(const std::string& body, JsonDocument& responseDocument);
-    void addDefaultParams(JsonValue& value, JsonPool& allocator) const;
+    void addDefaultParams(JsonValue& value, JsonAllocator& allocator) const;
     bool handleSingleRequest(JsonValue& requestValue, JsonValue& responseValue,
-                             JsonPool& allocator);
-    void handleBatchRequest(JsonValue& requests, JsonValue& responseValue, JsonPool& allocator);
+                             JsonAllocator& allocator);
+    void handleBatchRequest(JsonValue& requests, JsonValue& responseValue,
+                            JsonAllocator& allocator);
     std::shared_ptr<IProcedure> getProcedure(const std::string& method) const;
 
     ProcedureFactory procedureFactory;

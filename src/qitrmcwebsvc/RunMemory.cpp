@@ -8,8 +8,9 @@ namespace nQITRMCWEBSVC100 {
 RunMemory::RunMemory() noexcept : ring{&ring, &ring} {}
 
 RunMemory::~RunMemory() {
-    while (ring.next != &ring)
+    while (ring.next != &ring) {
         Free(ring.next + 1);
+    }
 }
 
 void* RunMemory::Malloc(std::size_t size) {
@@ -21,22 +22,26 @@ void* RunMemory::Realloc(void* block, std::size_t, std::size_t newSize) {
         Free(block);
         return nullptr;
     }
-    if (newSize > static_cast<std::size_t>(-1) - sizeof(Link))
+    if (newSize > static_cast<std::size_t>(-1) - sizeof(Link)) {
         throw std::bad_alloc();
+    }
     Link* const old = block ? linkOf(block) : nullptr;
     Link* const link = static_cast<Link*>(std::realloc(old, sizeof(Link) + newSize));
-    if (!link)
+    if (!link) {
         throw std::bad_alloc();
-    if (!old)
+    }
+    if (!old) {
         *link = {ring.previous, &ring};
+    }
     link->previous->next = link;
     link->next->previous = link;
     return link + 1;
 }
 
 void RunMemory::Free(void* block) noexcept {
-    if (!block)
+    if (!block) {
         return;
+    }
     Link* const link = linkOf(block);
     link->previous->next = link->next;
     link->next->previous = link->previous;

@@ -22,14 +22,15 @@ bool isUnreserved(char c) {
 void appendEscaped(std::string& text, char c) {
     constexpr const char* hexDigits = "0123456789ABCDEF";
     const auto byte = static_cast<unsigned char>(c);
-    if (c == '~')
+    if (c == '~') {
         text += "~0";
-    else if (c == '/')
+    } else if (c == '/') {
         text += "~1";
-    else if (isUnreserved(c))
+    } else if (isUnreserved(c)) {
         text += c;
-    else
+    } else {
         text += {'%', hexDigits[byte >> 4], hexDigits[byte & 15]};
+    }
 }
 
 // Replaces the JSON library's function, which reads past the end of a name that ends in a truncated
@@ -39,8 +40,9 @@ std::string uriFragment(const JsonPointer& pointer) {
     for (std::size_t i = 0; i < pointer.GetTokenCount(); ++i) {
         const JsonPointer::Token& token = pointer.GetTokens()[i];
         text += '/';
-        for (rapidjson::SizeType at = 0; at < token.length; ++at)
+        for (rapidjson::SizeType at = 0; at < token.length; ++at) {
             appendEscaped(text, token.name[at]);
+        }
     }
     return text;
 }
@@ -56,7 +58,7 @@ bool mayEndInTruncatedUtf8(const JsonValue& text) {
 }  // namespace
 
 SchemaRun::SchemaRun(const JsonSchemaDocument& schema)
-    : validator(*new (memory.Malloc(sizeof(Validator))) Validator(schema, &memory)) {}
+    : validator(*new(memory.Malloc(sizeof(Validator))) Validator(schema, &memory)) {}
 
 bool SchemaRun::accepts(const JsonValue& request) {
     return visit(request, 1);
@@ -64,14 +66,18 @@ bool SchemaRun::accepts(const JsonValue& request) {
 
 bool SchemaRun::visit(const JsonValue& value, int depth) {
     const bool isContainer = value.IsObject() || value.IsArray();
-    if (isContainer && depth >= depthPassedAsNull)
+    if (isContainer && depth >= depthPassedAsNull) {
         return validator.Null();
-    if (value.IsObject())
+    }
+    if (value.IsObject()) {
         return visitObject(value, depth);
-    if (value.IsArray())
+    }
+    if (value.IsArray()) {
         return visitArray(value, depth);
-    if (value.IsString() && mayEndInTruncatedUtf8(value))
+    }
+    if (value.IsString() && mayEndInTruncatedUtf8(value)) {
         return visitTruncatedText(value);
+    }
     return value.Accept(validator);
 }
 
@@ -84,22 +90,26 @@ bool SchemaRun::visitTruncatedText(const JsonValue& text) {
 }
 
 bool SchemaRun::visitObject(const JsonValue& object, int depth) {
-    if (!validator.StartObject())
+    if (!validator.StartObject()) {
         return false;
+    }
     for (const auto& member : object.GetObject()) {
         if (!validator.Key(member.name.GetString(), member.name.GetStringLength(), false) ||
-            !visit(member.value, depth + 1))
+            !visit(member.value, depth + 1)) {
             return false;
+        }
     }
     return validator.EndObject(object.MemberCount());
 }
 
 bool SchemaRun::visitArray(const JsonValue& array, int depth) {
-    if (!validator.StartArray())
+    if (!validator.StartArray()) {
         return false;
+    }
     for (const JsonValue& element : array.GetArray()) {
-        if (!visit(element, depth + 1))
+        if (!visit(element, depth + 1)) {
             return false;
+        }
     }
     return validator.EndArray(array.Size());
 }

@@ -12,8 +12,9 @@ using nQITRMCSHAREDCMN100::BasicError;
 using nQITRMCSHAREDCMN100::InternalError;
 
 void requireParamsObject(const SingleRequest& request) {
-    if (request.getParams().IsObject())
+    if (request.getParams().IsObject()) {
         return;
+    }
     BasicError error(qierr::codes::invalidRequest, QITRMC_HERE);
     addUsageString(error.details(), "kUsageTypeInvalidMember", "params");
     throw error;
@@ -28,13 +29,15 @@ SchemaValidator::SchemaValidator(const char* schemaText, const char* definitions
     : schemaDocument(std::make_shared<JsonDocument>()),
       definitionsDocument(std::make_shared<JsonDocument>()) {
     schemaDocument->Parse(schemaText);
-    if (schemaDocument->HasParseError() || !schemaDocument->IsObject())
+    if (schemaDocument->HasParseError() || !schemaDocument->IsObject()) {
         throw InternalError("Fail to parse schema.", QITRMC_HERE);
+    }
 
     definitionsDocument->Parse(definitionsText);
     if (definitionsDocument->HasParseError() || !definitionsDocument->IsObject() ||
-        !definitionsDocument->HasMember("definitions"))
+        !definitionsDocument->HasMember("definitions")) {
         throw InternalError("Fail to parse definition schema.", QITRMC_HERE);
+    }
 
     schemaDocument->AddMember("definitions", (*definitionsDocument)["definitions"],
                               schemaDocument->GetAllocator());
@@ -43,16 +46,18 @@ SchemaValidator::SchemaValidator(const char* schemaText, const char* definitions
 
 void SchemaValidator::validate(const SingleRequest& request) {
     requireParamsObject(request);
-    if (!schemaDocument || !compiledSchema)
+    if (!schemaDocument || !compiledSchema) {
         throw InternalError("Fail to initialize validator.", QITRMC_HERE);
+    }
 
     std::unique_lock<std::mutex> lock(validationMutex);
     SchemaRun run(*compiledSchema);
     const bool accepted = run.accepts(request.getRequest());
     lock.unlock();
 
-    if (!accepted)
+    if (!accepted) {
         throwInvalidParams(*schemaDocument, run.failure());
+    }
 }
 
 }  // namespace nQITRMCWEBSVC100

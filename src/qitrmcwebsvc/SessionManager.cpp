@@ -28,9 +28,11 @@ constexpr std::pair<ResourceKind, OpenSession> openFunctions[] = {
 };
 
 OpenSession openFunction(ResourceKind kind) {
-    for (const auto& [candidate, function] : openFunctions)
-        if (candidate == kind)
+    for (const auto& [candidate, function] : openFunctions) {
+        if (candidate == kind) {
             return function;
+        }
+    }
     throw InternalError("Unsupported resource type", QITRMC_HERE);
 }
 
@@ -45,10 +47,11 @@ std::string sessionIdOf(nQITRMCAPI100_Session session) {
 std::set<std::string> devicesOf(ResourceKind kind, const std::vector<std::string>& names) {
     std::set<std::string> devices;
     for (const std::string& name : names) {
-        if (kind == ResourceKind::Device)
+        if (kind == ResourceKind::Device) {
             devices.insert(name);
-        else if (kind == ResourceKind::PhysicalChannel || kind == ResourceKind::NvmemArea)
+        } else if (kind == ResourceKind::PhysicalChannel || kind == ResourceKind::NvmemArea) {
             devices.insert(name.substr(0, name.find('/')));
+        }
     }
     return devices;
 }
@@ -101,14 +104,17 @@ std::string SessionManager::createSession() {
 std::string SessionManager::createSession(ResourceKind kind, const std::vector<std::string>& names,
                                           std::int32_t access, const std::string& reservationGroup,
                                           double reservationTimeout, bool forceReserve) {
-    if (kind == ResourceKind::None)
+    if (kind == ResourceKind::None) {
         throw InternalError("Unsupported resource type", QITRMC_HERE);
+    }
     std::lock_guard<std::recursive_mutex> hold(mutex);
     const DeviceSet devices = devicesOf(kind, names);
-    if (forceReserve)
+    if (forceReserve) {
         closeSessionsReserving(devices);
-    if (sessions.size() == maxSessionsWithResources)
+    }
+    if (sessions.size() == maxSessionsWithResources) {
         throw BasicError(qierr::codes::tooManySessions, QITRMC_HERE);
+    }
     const std::string joinedNames = compressNames(names, NameKind::Path);
     const OpenSession open = openFunction(kind);
     SessionContext context{kind, access, 0};
@@ -118,8 +124,9 @@ std::string SessionManager::createSession(ResourceKind kind, const std::vector<s
              reservationGroup.c_str(), reservationTimeout, &status);
         reportReservingSessions(devices, &status);
     }
-    if (context.driverSession == 0)
+    if (context.driverSession == 0) {
         throw InternalError("Fail to initialize session.", QITRMC_HERE);
+    }
     return addSession(context);
 }
 
@@ -177,8 +184,9 @@ std::string SessionManager::addSession(const SessionContext& context) {
 
 // On failure, the sessions that were already closed stay closed, and the others stay open.
 void SessionManager::closeSessionsReserving(const DeviceSet& devices) {
-    if (devices.empty())
+    if (devices.empty()) {
         return;
+    }
     for (auto entry = sessions.begin(); entry != sessions.end();) {
         const nQITRMCAPI100_Session session = entry->second->driverSession;
         const auto next = std::next(entry);
@@ -194,22 +202,27 @@ void SessionManager::closeSessionsReserving(const DeviceSet& devices) {
 std::vector<std::string> SessionManager::findSessionsReserving(const DeviceSet& devices) {
     std::lock_guard<std::recursive_mutex> hold(mutex);
     std::vector<std::string> ids;
-    if (devices.empty())
+    if (devices.empty()) {
         return ids;
-    for (const auto& [id, context] : sessions)
+    }
+    for (const auto& [id, context] : sessions) {
         if (sessionHoldsAnyDevice(context->driverSession, devices) &&
-            (context->access == 3 || context->access == 2))
+            (context->access == 3 || context->access == 2)) {
             ids.push_back(id);
+        }
+    }
     return ids;
 }
 
 void SessionManager::reportReservingSessions(const DeviceSet& devices, qierr_Status* status) {
-    if (status->code != qierr::codes::deviceReserved)
+    if (status->code != qierr::codes::deviceReserved) {
         return;
+    }
     const std::vector<std::string> ids = findSessionsReserving(devices);
-    if (!ids.empty())
+    if (!ids.empty()) {
         addUsageStringArray(qierr_orderedData(translatorName, status),
                             "kUsageTypeReservedBySessions", ids);
+    }
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -32,14 +32,16 @@ auto SessionProperty::choose(const Functions<Values...>& functions) const {
     const bool ofSession = propertyCategory == PropertyCategory::Session;
     const bool isGeneric = isOnResources() || (ofSession && functions.genericServesSession);
     const auto scoped = ofSession ? functions.session : functions.system;
-    if (!isGeneric && scoped == nullptr)
+    if (!isGeneric && scoped == nullptr) {
         throw InternalError("Unsupported property category.", QITRMC_HERE);
+    }
     return [this, isGeneric, scoped, generic = functions.generic](Values... values) {
-        if (isGeneric)
+        if (isGeneric) {
             callDriver(generic, session->driverSession, joinedResources.c_str(), name.c_str(),
                        values...);
-        else
+        } else {
             callDriver(scoped, session->driverSession, name.c_str(), values...);
+        }
     };
 }
 
@@ -203,8 +205,9 @@ void SessionProperty::setStringArray(const std::vector<std::string>& values) {
          nQITRMCAPI100_setSessionPropertyStringArray});
     std::vector<const char*> texts;
     texts.reserve(values.size());
-    for (const std::string& value : values)
+    for (const std::string& value : values) {
         texts.push_back(value.c_str());
+    }
     write(texts.data(), static_cast<std::uint32_t>(texts.size()));
 }
 

@@ -18,20 +18,24 @@ using nQITRMCSHAREDCMN100::BasicError;
 }
 
 void checkEnvelope(const JsonValue& value) {
-    if (!value.IsObject() || value.ObjectEmpty())
+    if (!value.IsObject() || value.ObjectEmpty()) {
         throw BasicError(qierr::codes::invalidRequest, QITRMC_HERE);
+    }
 
     const JsonValue* const id = findMember(value, "id");
-    if (!id || !(id->IsInt() || id->IsString()))
+    if (!id || !(id->IsInt() || id->IsString())) {
         throwInvalidMember("id", QITRMC_HERE);
+    }
 
     const JsonValue* const version = findMember(value, "jsonrpc");
-    if (!version || !version->IsString() || std::strcmp(version->GetString(), "2.0") != 0)
+    if (!version || !version->IsString() || std::strcmp(version->GetString(), "2.0") != 0) {
         throwInvalidMember("jsonrpc", QITRMC_HERE);
+    }
 
     const JsonValue* const method = findMember(value, "method");
-    if (!method || !method->IsString())
+    if (!method || !method->IsString()) {
         throwInvalidMember("method", QITRMC_HERE);
+    }
 }
 
 }  // namespace

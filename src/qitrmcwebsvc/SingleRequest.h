@@ -10,9 +10,9 @@ namespace nQITRMCWEBSVC100 {
 // "2.0", and "method" is a string. The other members are not checked here.
 class SingleRequest {
   public:
-    // Checks the envelope and moves `value` into this object. Its memory remains in the pool of its
-    // document, which must outlive this object. On failure throws BasicError invalidRequest, with
-    // `value` unchanged.
+    // Checks the envelope and moves `value` into this object. Its memory belongs to the allocator
+    // of its document, which must outlive this object. On failure throws BasicError invalidRequest,
+    // with `value` unchanged.
     explicit SingleRequest(JsonValue& value);
     virtual ~SingleRequest() = default;
 

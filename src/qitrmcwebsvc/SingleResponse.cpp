@@ -29,9 +29,9 @@ std::string describeServerError() {
 
 }  // namespace
 
-SingleResponse::SingleResponse(JsonPool* allocator) : SingleResponse(JsonValue(), allocator) {}
+SingleResponse::SingleResponse(JsonAllocator* allocator) : SingleResponse(JsonValue(), allocator) {}
 
-SingleResponse::SingleResponse(const JsonValue& id, JsonPool* allocator)
+SingleResponse::SingleResponse(const JsonValue& id, JsonAllocator* allocator)
     : response(rapidjson::kObjectType), allocator(allocator) {
     response.AddMember("jsonrpc", "2.0", *allocator);
     JsonValue copiedId(id, *allocator);

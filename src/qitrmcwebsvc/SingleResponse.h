@@ -8,15 +8,15 @@ namespace nQITRMCWEBSVC100 {
 
 // One JSON-RPC response under construction: an envelope with an id, and later a result or an error.
 //
-// Its values are allocated in a pool that it does not own and that must outlive them. Used by one
-// thread. A procedure must set its result last, since an error that is set later would be added
+// Its values are allocated by an allocator that it does not own and that must outlive them. Used by
+// one thread. A procedure must set its result last, since an error that is set later would be added
 // beside the result.
 class SingleResponse {
   public:
     // With a null id.
-    explicit SingleResponse(JsonPool* allocator);
+    explicit SingleResponse(JsonAllocator* allocator);
     // With a deep copy of the id, of whatever type.
-    SingleResponse(const JsonValue& id, JsonPool* allocator);
+    SingleResponse(const JsonValue& id, JsonAllocator* allocator);
     virtual ~SingleResponse() = default;
     SingleResponse(const SingleResponse&) = delete;
     SingleResponse& operator=(const SingleResponse&) = delete;
@@ -33,12 +33,12 @@ class SingleResponse {
 
     // The whole response, to be moved out.
     JsonValue& getValue() { return response; }
-    // The pool in which a procedure builds its result.
-    JsonPool* getAllocator() const { return allocator; }
+    // The allocator with which a procedure builds its result.
+    JsonAllocator* getAllocator() const { return allocator; }
 
   private:
     JsonValue response;
-    JsonPool* allocator;
+    JsonAllocator* allocator;
 };
 
 }  // namespace nQITRMCWEBSVC100

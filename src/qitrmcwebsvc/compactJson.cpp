@@ -31,8 +31,9 @@ class GuardedWriter : public JsonWriter {
 
   private:
     static void expectRoomFor(Length length) {
-        if (length > longestText)
+        if (length > longestText) {
             throw std::bad_alloc();
+        }
     }
 };
 

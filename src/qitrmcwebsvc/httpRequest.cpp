@@ -18,13 +18,15 @@ int readText(std::uint32_t firstSize, std::string& out, Read read) {
     std::string buffer(firstSize, '\0');
     std::uint32_t size = firstSize;
     int result = read(buffer.data(), &size);
-    if (result != 0 && size == 0)
+    if (result != 0 && size == 0) {
         return result;
+    }
     if (result != 0) {
         buffer.resize(size);
         result = read(buffer.data(), &size);
-        if (result != 0)
+        if (result != 0) {
             return result;
+        }
     }
     buffer.erase(std::find(buffer.begin(), buffer.end(), '\0'), buffer.end());
     out = std::move(buffer);

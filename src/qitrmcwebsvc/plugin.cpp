@@ -35,8 +35,9 @@ struct IniFileOwner {
 
 bool readSwitch() {
     const std::unique_ptr<IniFile, IniFileOwner> file(IniFile_create());
-    if (!file)
+    if (!file) {
         throw std::bad_alloc();
+    }
     const std::string path = std::string(qisysq_installRoot()) + "/etc/qinstal/share/qitrmc.ini";
     // If the file cannot be read, the file object stays empty and the service is disabled.
     IniFile_load(file.get(), path.c_str());
@@ -63,18 +64,23 @@ bool cameThroughCall(const ws_Entry* entry) {
 // Checks the HTTP request and, if it is acceptable, processes its body. The checks have a fixed
 // order, which decides the response to a request that fails several of them.
 void serve(ws_Entry* entry, ws_Request* request) {
-    if (!variableIs(request, "REQUEST_TRANSPORT", "http"))
+    if (!variableIs(request, "REQUEST_TRANSPORT", "http")) {
         return refuse(request, httpNotFound, "Only HTTP protocol is supported.");
-    if (!variableIs(request, "REQUEST_METHOD", "POST"))
+    }
+    if (!variableIs(request, "REQUEST_METHOD", "POST")) {
         return refuse(request, httpNotFound, "Only HTTP POST request is supported.");
-    if (!cameThroughCall(entry))
+    }
+    if (!cameThroughCall(entry)) {
         return SetHTTPResponseCode_QI_QVWS_(request, httpNotFound);
+    }
     std::string body;
-    if (readPostBody(request, body) != 0)
+    if (readPostBody(request, body) != 0) {
         return SetHTTPResponseCode_QI_QVWS_(request, httpBadRequest);
+    }
     // If the last qitrmcInit failed, the flag is set but there is no request handler.
-    if (!requestHandler)
+    if (!requestHandler) {
         return SetHTTPResponseCode_QI_QVWS_(request, httpServerError);
+    }
     const std::string response = requestHandler->handleRequest(body);
     SetHTTPResponseMimeType_C_REST_QI_QVWS_(request, "application/json; charset=utf-8");
     writeOutput(request, response);
@@ -84,8 +90,9 @@ void serve(ws_Entry* entry, ws_Request* request) {
 
 QITRMC_EXPORT void qitrmcInit() {
     webServiceEnabled = readSwitch();
-    if (webServiceEnabled)
+    if (webServiceEnabled) {
         requestHandler = std::make_unique<RequestHandler>();
+    }
 }
 
 QITRMC_EXPORT void qitrmcPause() {}
@@ -97,9 +104,10 @@ QITRMC_EXPORT void qitrmcFinalize() {
 }
 
 QITRMC_EXPORT void qitrmcRun(ws_Entry* entry, ws_Request* request) {
-    if (!webServiceEnabled)
+    if (!webServiceEnabled) {
         return refuse(request, httpNotFound,
                       "QI-TRMC web server is disabled. Please enable it in QI-DESK.");
+    }
     try {
         serve(entry, request);
     } catch (const std::exception&) {

@@ -60,9 +60,11 @@ class ListedNames : public DriverStringArray {
 std::set<std::string> propertyNames(nQITRMCAPI100_Session session, PropertyCategory category) {
     const ListedNames listed(session, nameListOf(category));
     std::set<std::string> names;
-    for (const char* name : listed)
-        if (!isHidden(name))
+    for (const char* name : listed) {
+        if (!isHidden(name)) {
             names.emplace(name);
+        }
+    }
     return names;
 }
 

@@ -15,8 +15,9 @@ const std::map<std::string, std::string> descriptions = {
 
 std::string getErrorDescription(const std::string& name) {
     const auto found = descriptions.find(name);
-    if (found == descriptions.end())
+    if (found == descriptions.end()) {
         throw nQITRMCSHAREDCMN100::InternalError("Fail to get error description", QITRMC_HERE);
+    }
     return found->second;
 }
 

@@ -66,7 +66,7 @@ int preloadProtected(lua_State* L) {
 }
 
 bool preloadScripts(lua_State* L, LuaRuntime runtime, qierr_Status* status) {
-    Preload preload{runtime == LuaRuntime::fast ? BytecodeCache::ofEmbeddedFiles() : nullptr, 0};
+    Preload preload{runtime == LuaRuntime::Fast ? BytecodeCache::ofEmbeddedFiles() : nullptr, 0};
     const int result = lua_cpcall(L, preloadProtected, &preload);
     if (result != 0 || preload.result != 0) {
         reportLuaFailure(L, result, "failed to add embedded modules to preload table", status);
@@ -100,7 +100,7 @@ const char* messageOnTop(lua_State* L, char* buffer, std::size_t size) {
 }  // namespace
 
 lua_State* openState(LuaRuntime runtime, qierr_Status* status) {
-    lua_State* L = runtime == LuaRuntime::fast ? newFastState() : newPlainState();
+    lua_State* L = runtime == LuaRuntime::Fast ? newFastState() : newPlainState();
     if (L == nullptr) {
         reportNoState(status);
         return nullptr;

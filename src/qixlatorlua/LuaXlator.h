@@ -17,10 +17,10 @@ struct LuaXlator : XlatorInterface {
 // standard error are the same for both.
 enum class LuaRuntime {
     // Compiles every script and allocates each block separately.
-    plain,
+    Plain,
     // Loads a script as bytecode when it is required, and allocates from an arena. The bytecode is
     // compiled once in the process; if there is no memory for it, every script is compiled.
-    fast,
+    Fast,
 };
 
 // Creates a translator: opens a state with the libraries and embedded scripts and configures it

@@ -10,8 +10,9 @@ constexpr std::int32_t highest = std::numeric_limits<std::int32_t>::max();
 std::string nested(const std::string& opening, const std::string& inside,
                    const std::string& closing) {
     std::string text = inside;
-    for (int depth = 0; depth < 1000; ++depth)
+    for (int depth = 0; depth < 1000; ++depth) {
         text = opening + text + closing;
+    }
     return text;
 }
 
@@ -188,8 +189,9 @@ TEST_F(OddDriverTest, SessionHandle0IsAnErrorForASessionWithResources) {
     for (const char* kind : {"devices", "physical_channels", "nvmem_areas"}) {
         for (const char* function :
              {"initializeSessionWithDevices", "initializeSessionWithPhysChans",
-              "initializeSessionWithNvmemAreas"})
+              "initializeSessionWithNvmemAreas"}) {
             driver.give(function, std::uint64_t{0});
+        }
         EXPECT_EQ(outcomesOfPost(call(open, std::string("{\"") + kind + R"(":"A/b"})")),
                   Outcomes{-250800});
         sessions.answerCalls();

@@ -15,10 +15,12 @@ constexpr int threadCount = 8;
 
 void onAllThreads(const std::function<void(int thread)>& work) {
     std::vector<std::thread> threads;
-    for (int thread = 0; thread < threadCount; ++thread)
+    for (int thread = 0; thread < threadCount; ++thread) {
         threads.emplace_back(work, thread);
-    for (std::thread& thread : threads)
+    }
+    for (std::thread& thread : threads) {
         thread.join();
+    }
 }
 
 // The handle of the session in a response to an opening request.
@@ -49,8 +51,9 @@ class Client {
         for (int sent = 0; sent < count; ++sent) {
             (this->*actions[random() % std::size(actions)])();
             // All clients together stay below the limit of the service.
-            if (open.size() > 8)
+            if (open.size() > 8) {
                 closeOne();
+            }
         }
     }
     const std::set<Handle>& sessions() const { return open; }
@@ -81,10 +84,11 @@ class Client {
     void openContested() {
         const Outcomes outcomes =
             send(request("initializeSession", R"({"devices":"contested","access":"ReadWrite"})"));
-        if (outcomes == Outcomes{0})
+        if (outcomes == Outcomes{0}) {
             noteOpened();
-        else
+        } else {
             EXPECT_EQ(outcomes, Outcomes{ModelledSessions::deviceReserved});
+        }
     }
     void abortOne() {
         EXPECT_EQ(send(requestFor("abortSession", anyOpen())), Outcomes{orUnknown()});
@@ -141,8 +145,9 @@ TEST_F(LoadTest, EveryClientSeesOnlyItsOwnSessions) {
         known[static_cast<std::size_t>(thread)] = client.sessions();
     });
     std::vector<Handle> all;
-    for (const std::set<Handle>& each : known)
+    for (const std::set<Handle>& each : known) {
         all.insert(all.end(), each.begin(), each.end());
+    }
     std::sort(all.begin(), all.end());
     EXPECT_EQ(sessions.open(), all);
     expectSoundService();
@@ -155,8 +160,9 @@ TEST_F(LoadTest, ASessionIsClosedOnceHoweverManyTry) {
     onAllThreads([&](int thread) {
         for (const Handle handle : handles) {
             std::string body = callFor("closeSession", handle);
-            if (thread % 2 != 0)
+            if (thread % 2 != 0) {
                 body = "[" + body + "]";
+            }
             const Outcomes outcomes = outcomesOfPost(body);
             closed += outcomes == Outcomes{0} ? 1 : 0;
             EXPECT_TRUE(outcomes == Outcomes{0} || outcomes == Outcomes{-250833});
@@ -168,8 +174,9 @@ TEST_F(LoadTest, ASessionIsClosedOnceHoweverManyTry) {
 
 TEST_F(LoadTest, ADeviceThatAllClientsForceEndsUpWithOneSession) {
     onAllThreads([&](int) {
-        for (int i = 0; i < 50; ++i)
+        for (int i = 0; i < 50; ++i) {
             openSession(R"({"devices":"contested","force_reserve":true})");
+        }
     });
     EXPECT_EQ(sessions.opened(), Handle{threadCount * 50});
     EXPECT_EQ(sessions.open().size(), 1u);
@@ -185,14 +192,17 @@ TEST_F(LoadTest, ConcurrentBatchesDoNotInterleave) {
             callFor("abortSession", handles[static_cast<std::size_t>(thread)]);
         const std::string batch =
             "[" + abort + "," + abort + "," + abort + "," + abort + "," + abort + "]";
-        for (int i = 0; i < 50; ++i)
+        for (int i = 0; i < 50; ++i) {
             EXPECT_EQ(outcomesOfPost(batch), Outcomes(elements, 0));
+        }
     });
     const Calls calls = driver.takeCalls();
     ASSERT_EQ(calls.size(), std::size_t{threadCount * 50 * elements});
-    for (std::size_t first = 0; first < calls.size(); first += elements)
-        for (std::size_t i = 1; i < elements; ++i)
+    for (std::size_t first = 0; first < calls.size(); first += elements) {
+        for (std::size_t i = 1; i < elements; ++i) {
             ASSERT_EQ(calls[first + i], calls[first]);
+        }
+    }
 }
 
 }  // namespace

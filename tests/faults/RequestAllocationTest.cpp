@@ -147,10 +147,11 @@ class RequestAllocationTest : public ServiceTest, public testing::WithParamInter
             struck = fault.hasStruck();
         }
         const Outcomes outcomes = outcomesOf(request.done);
-        if (struck)
+        if (struck) {
             EXPECT_TRUE(isExcused(outcomes)) << testing::PrintToString(outcomes);
-        else
+        } else {
             EXPECT_EQ(outcomes, scenario.undisturbed);
+        }
         return struck;
     }
 
@@ -158,13 +159,15 @@ class RequestAllocationTest : public ServiceTest, public testing::WithParamInter
     // element may fail so, and then the elements after it are skipped, or the whole batch may.
     bool isExcused(const Outcomes& outcomes) const {
         if (outcomes == Outcomes{httpServerError} || outcomes == Outcomes{outOfMemory} ||
-            lacksWords(outcomes))
+            lacksWords(outcomes)) {
             return true;
+        }
         const auto [outcome, undisturbed] =
             std::mismatch(outcomes.begin(), outcomes.end(), scenario.undisturbed.begin(),
                           scenario.undisturbed.end());
-        if (outcomes.size() != scenario.undisturbed.size())
+        if (outcomes.size() != scenario.undisturbed.size()) {
             return false;
+        }
         return outcome == outcomes.end() ||
                (*outcome == outOfMemory && std::all_of(outcome + 1, outcomes.end(),
                                                        [](auto code) { return code == skipped; }));
@@ -180,8 +183,9 @@ TEST_P(RequestAllocationTest, SucceedsOrFailsAsAWholeAndLeavesTheServiceUsable) 
     outcomesOfPost("{}");
     for (bool struck = true; struck && successes < limit && !HasFailure(); ++successes) {
         SCOPED_TRACE("allocation " + std::to_string(successes + 1));
-        for (const std::string& body : scenario.before)
+        for (const std::string& body : scenario.before) {
             ASSERT_EQ(outcomesOfPost(body), Outcomes{0});
+        }
         struck = postWithFault(forLatestSession(scenario.body), successes);
         expectSoundService();
     }
@@ -193,12 +197,12 @@ TEST_P(RequestAllocationTest, SucceedsOrFailsAsAWholeAndLeavesTheServiceUsable) 
 std::string nameOf(const testing::TestParamInfo<Parameter>& info) {
     const auto& [extent, scenario] = info.param;
     return std::string(scenario.name) +
-           (extent == AllocationFault::Extent::one ? "_OneFails" : "_AllFailFromThere");
+           (extent == AllocationFault::Extent::One ? "_OneFails" : "_AllFailFromThere");
 }
 
 INSTANTIATE_TEST_SUITE_P(Faults, RequestAllocationTest,
-                         testing::Combine(testing::Values(AllocationFault::Extent::one,
-                                                          AllocationFault::Extent::allFromThere),
+                         testing::Combine(testing::Values(AllocationFault::Extent::One,
+                                                          AllocationFault::Extent::AllFromThere),
                                           testing::ValuesIn(scenarios)),
                          nameOf);
 

@@ -47,9 +47,11 @@ class ServiceTest : public DriverTest {
     // Whether a request failed because its failure could not be described: because memory ran out,
     // because of a fault in a status, or because there is no text for the code.
     static bool lacksWords(const Outcomes& outcomes) {
-        for (const std::int32_t code : {-52000, -52003, -52005, -52006})
-            if (QITRMC_WORDS_MAY_FAIL && outcomes == Outcomes{code})
+        for (const std::int32_t code : {-52000, -52003, -52005, -52006}) {
+            if (QITRMC_WORDS_MAY_FAIL && outcomes == Outcomes{code}) {
                 return true;
+            }
+        }
         return false;
     }
 
@@ -70,8 +72,9 @@ class ServiceTest : public DriverTest {
 
     // How a body was answered, once it is certain that the response is either complete or absent.
     static Outcomes outcomesOf(const Lines& done) {
-        if (done == Lines{"code 500"})
+        if (done == Lines{"code 500"}) {
             return {httpServerError};
+        }
         const std::string write = "write ";
         EXPECT_EQ(done.size(), 2u);
         EXPECT_EQ(done.front(), "type application/json; charset=utf-8");
@@ -88,8 +91,9 @@ class ServiceTest : public DriverTest {
     void expectSoundService() {
         EXPECT_EQ(driver.outstanding(), 0);
         EXPECT_EQ(outcomesOfPost("[" + call("initializeSession", "{}") + "]"), Outcomes{0});
-        for (const ModelledSessions::Handle session : sessions.open())
+        for (const ModelledSessions::Handle session : sessions.open()) {
             EXPECT_EQ(outcomesOfPost(callFor("closeSession", session)), Outcomes{0});
+        }
         EXPECT_EQ(sessions.open(), std::vector<ModelledSessions::Handle>{});
         driver.takeCalls();
     }

@@ -16,7 +16,7 @@ const std::vector<std::string> disabled = {
 class StartAllocationTest : public ServiceTest,
                             public testing::WithParamInterface<AllocationFault::Extent> {
   protected:
-    enum class Start { done, outOfMemory };
+    enum class Start { Done, OutOfMemory };
 
     // Initialises with one fault. Returns how that ended if the fault was reached.
     std::optional<Start> startWithFault(int successes) {
@@ -26,20 +26,18 @@ class StartAllocationTest : public ServiceTest,
         __lsan::ScopedDisabler expected;
 #endif
         AllocationFault fault(successes, GetParam());
-        Start start = Start::done;
+        Start start = Start::Done;
         try {
             qitrmcInit();
         } catch (const std::bad_alloc&) {
-            start = Start::outOfMemory;
+            start = Start::OutOfMemory;
         }
         return fault.hasStruck() ? std::make_optional(start) : std::nullopt;
     }
 
     // The next allocation to fail. The validators of all methods are built alike, so the later
     // allocations are tried at increasing intervals.
-    static int after(int successes) {
-        return successes + 1 + successes / 50;
-    }
+    static int after(int successes) { return successes + 1 + successes / 50; }
 
     const std::string open = call("initializeSession", "{}");
 };
@@ -50,15 +48,17 @@ TEST_P(StartAllocationTest, FailsWhenMemoryRunsOutAndCanBeRepeated) {
         SCOPED_TRACE("allocation " + std::to_string(successes + 1));
         qitrmcFinalize();
         const std::optional<Start> start = startWithFault(successes);
-        if (!start)
+        if (!start) {
             break;
+        }
         ++tried;
         // When memory for the configuration runs out, the service stays disabled. Without a handler
         // it cannot respond, but must not crash.
-        if (*start == Start::outOfMemory)
+        if (*start == Start::OutOfMemory) {
             EXPECT_EQ(outcomesOfPost(open), Outcomes{httpServerError});
-        else
+        } else {
             EXPECT_EQ(post(open), disabled);
+        }
         qitrmcInit();
         expectSoundService();
         ASSERT_FALSE(HasFailure());
@@ -75,7 +75,7 @@ TEST_P(StartAllocationTest, IsEnabledBeforeItHasAHandler) {
     ASSERT_EQ(post(open), disabled);
     root.write(configuration, "[WebService]\nEnable=1\n");
     // The configuration takes fewer allocations than this, the handler many more.
-    ASSERT_EQ(startWithFault(200), Start::outOfMemory);
+    ASSERT_EQ(startWithFault(200), Start::OutOfMemory);
     EXPECT_EQ(outcomesOfPost(open), Outcomes{httpServerError});
     qitrmcInit();
     expectSoundService();
@@ -84,16 +84,16 @@ TEST_P(StartAllocationTest, IsEnabledBeforeItHasAHandler) {
 TEST_P(StartAllocationTest, KeepsTheRunningHandlerWhenThereIsNoMemoryForANewOne) {
     EXPECT_EQ(outcomesOfPost(open), Outcomes{0});
     // The configuration takes fewer allocations than this, the handler many more.
-    ASSERT_EQ(startWithFault(200), Start::outOfMemory);
+    ASSERT_EQ(startWithFault(200), Start::OutOfMemory);
     EXPECT_EQ(outcomesOfPost(callFor("closeSession", sessions.opened())), Outcomes{0});
     expectSoundService();
 }
 
 INSTANTIATE_TEST_SUITE_P(Faults, StartAllocationTest,
-                         testing::Values(AllocationFault::Extent::one,
-                                         AllocationFault::Extent::allFromThere),
+                         testing::Values(AllocationFault::Extent::One,
+                                         AllocationFault::Extent::AllFromThere),
                          [](const auto& info) {
-                             return info.param == AllocationFault::Extent::one ? "OneFails"
+                             return info.param == AllocationFault::Extent::One ? "OneFails"
                                                                                : "AllFailFromThere";
                          });
 

@@ -27,9 +27,11 @@ const std::map<std::string, void (*)(std::string_view)> harnesses = {
 // The inputs of all harnesses, each as "<harness>/<file>".
 std::vector<std::string> inputs() {
     std::vector<std::string> all;
-    for (const auto& entry : files::recursive_directory_iterator(QITRMC_CORPUS))
-        if (entry.is_regular_file())
+    for (const auto& entry : files::recursive_directory_iterator(QITRMC_CORPUS)) {
+        if (entry.is_regular_file()) {
             all.push_back(files::relative(entry.path(), QITRMC_CORPUS).string());
+        }
+    }
     std::sort(all.begin(), all.end());
     return all;
 }
@@ -46,8 +48,9 @@ TEST_P(CorpusTest, PassesItsHarness) {
     ASSERT_EQ(harnesses.count(harness), 1u) << "no such harness: " << harness;
     const std::string content = contentOf(GetParam());
     // Twice, because the first run must leave no state behind.
-    for (int run = 0; run < 2; ++run)
+    for (int run = 0; run < 2; ++run) {
         EXPECT_NO_THROW(harnesses.at(harness)(content));
+    }
 }
 
 INSTANTIATE_TEST_SUITE_P(Hostile, CorpusTest, testing::ValuesIn(inputs()), [](const auto& info) {

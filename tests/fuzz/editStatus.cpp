@@ -28,8 +28,9 @@ bool isJson(const char* text) {
 }
 
 void readString(const jsonz_value& value) {
-    if (value.type != jsonz_typeString)
+    if (value.type != jsonz_typeString) {
         return;
+    }
     auto output = std::make_unique<char[]>(value.length + 1);
     const char* const end = jsonz_unescape(value.text, value.length, output.get());
     fuzz::require(end == nullptr || *end == '\0', "an unescaped text has no end");
@@ -49,22 +50,26 @@ void read(const char* text) {
     std::size_t length = 0;
     jsonz_getString(text, nullptr, &length);
     jsonz_endOfContainer(text);
-    for (const char* key : {"", "translator", "translator_info", "a"})
-        if (const char* const found = jsonz_findMember(text, key))
+    for (const char* key : {"", "translator", "translator_info", "a"}) {
+        if (const char* const found = jsonz_findMember(text, key)) {
             fuzz::require(text < found && found <= last, "a member lies elsewhere");
+        }
+    }
     int elements = 0;
     for (const char* at = jsonz_firstElement(text); at != nullptr && elements < 1000; ++elements) {
         jsonz_value element;
-        if (jsonz_readValue(at, &element) == nullptr)
+        if (jsonz_readValue(at, &element) == nullptr) {
             break;
+        }
         readString(element);
         at = jsonz_nextElement(jsonz_readValue(at, nullptr));
     }
 }
 
 void requireSoundBuffer(const qierr_Status& status) {
-    if (status.json == nullptr)
+    if (status.json == nullptr) {
         return;
+    }
     const std::size_t length = std::strlen(status.json);
     fuzz::require(length + 2 <= status.capacity, "no room for the end of the text");
     const char* const last = status.json + status.capacity - 1;
@@ -89,8 +94,9 @@ void edit(const char* text, const char* addition) {
     requireSoundBuffer(status);
     // An array takes no members.
     const qierr_Writer atEnd = qierr_Status_writerAtEnd(&status);
-    if (atEnd.pos != nullptr && *atEnd.pos == '}')
+    if (atEnd.pos != nullptr && *atEnd.pos == '}') {
         qierr_Writer_addString(atEnd, addition, addition);
+    }
     requireSoundBuffer(status);
     fuzz::require(!wasJson || isJson(status.json), "a sound text was spoilt");
 }

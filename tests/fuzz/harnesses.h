@@ -15,8 +15,9 @@ class Finding : public std::logic_error {
 };
 
 inline void require(bool holds, const char* what) {
-    if (!holds)
+    if (!holds) {
         throw Finding(what);
+    }
 }
 
 // The body of a request, answered by the whole service on a driver that keeps sessions.

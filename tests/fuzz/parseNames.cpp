@@ -29,14 +29,16 @@ std::size_t commasIn(const std::string& text) {
 }  // namespace
 
 void fuzz::parseNames(std::string_view input) {
-    if (input.empty())
+    if (input.empty()) {
         return;
+    }
     const NameKind kind = input[0] == '0' ? NameKind::Plain : NameKind::Path;
     const std::string text(input.substr(1));
 
     const std::optional<Names> names = unlessRefused([&] { return expandNames(text, kind); });
-    if (!names)
+    if (!names) {
         return;
+    }
     require(names->size() > commasIn(text), "a part of the list is missing");
     require(names->size() <= std::max(maxNamesWithRanges, commasIn(text) + 1), "too many names");
 

@@ -33,9 +33,11 @@ struct Destroy {
 
 void requireSoundLines(const IniFile& file) {
     fuzz::require(file.firstBadLine == -1 || file.firstBadLine > 0, "a line without a number");
-    for (const IniSection& section : file.sections)
-        for (const IniEntry& entry : section.entries)
+    for (const IniSection& section : file.sections) {
+        for (const IniEntry& entry : section.entries) {
             fuzz::require(entry.line > 0 && !entry.key.empty(), "an entry from nowhere");
+        }
+    }
 }
 
 void requireSoundNumbers(const IniFile& file) {
@@ -55,8 +57,9 @@ void requireSoundNumbers(const IniFile& file) {
 }  // namespace
 
 void fuzz::readIni(std::string_view input) {
-    if (input.empty())
+    if (input.empty()) {
         return;
+    }
     const MemoryFile content(input.substr(1));
     const std::unique_ptr<IniFile, Destroy> file(IniFile_create());
     const auto settings = static_cast<unsigned char>(input[0]);

@@ -28,9 +28,10 @@ std::map<std::string, Checked, std::less<>> checkedSchemas() {
     std::map<std::string, Checked, std::less<>> all;
     for (const EmbeddedFile& file : embeddedFiles()) {
         const std::string name = file.name;
-        if (name.compare(0, prefix.size(), prefix) == 0)
+        if (name.compare(0, prefix.size(), prefix) == 0) {
             all.try_emplace(name.substr(prefix.size(), name.size() - prefix.size() - suffix.size()),
                             file.data);
+        }
     }
     return all;
 }
@@ -38,14 +39,17 @@ std::map<std::string, Checked, std::less<>> checkedSchemas() {
 // What holds for every accepted request, whichever engine checked it.
 void requireConformity(const JsonValue& params, const JsonValue& schema) {
     fuzz::require(params.IsObject(), "params of a wrong type were accepted");
-    for (const auto& member : params.GetObject())
+    for (const auto& member : params.GetObject()) {
         fuzz::require(schema["properties"].HasMember(member.name),
                       "an unknown member was accepted");
+    }
     const auto required = schema.FindMember("required");
-    if (required == schema.MemberEnd())
+    if (required == schema.MemberEnd()) {
         return;
-    for (const JsonValue& name : required->value.GetArray())
+    }
+    for (const JsonValue& name : required->value.GetArray()) {
         fuzz::require(params.HasMember(name), "a missing member was accepted");
+    }
 }
 
 void validate(Checked& checked, const SingleRequest& request) {
@@ -65,8 +69,9 @@ void fuzz::validateSchema(std::string_view input) {
     const std::size_t newline = input.find('\n');
     static auto schemas = checkedSchemas();
     const auto checked = schemas.find(input.substr(0, newline));
-    if (checked == schemas.end() || newline == input.npos)
+    if (checked == schemas.end() || newline == input.npos) {
         return;
+    }
     JsonDocument document;
     std::unique_ptr<SingleRequest> request;
     try {

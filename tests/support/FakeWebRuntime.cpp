@@ -15,8 +15,9 @@ int fill(const std::string& text, char* buffer, std::uint32_t* size) {
         return tooSmall;
     }
     std::memcpy(buffer, text.data(), text.size());
-    if (text.size() < *size)
+    if (text.size() < *size) {
         buffer[text.size()] = '\0';
+    }
     return 0;
 }
 
@@ -44,20 +45,22 @@ FakeEntry::FakeEntry(const std::u32string& entryName) : name(entryName) {
 extern "C" {
 
 int ReadRequestVariable_C_REST_QI_QVWS_(ws_Request* request, const char* name, char* buffer,
-                                        uint32_t* size) {
+                                        std::uint32_t* size) {
     const FaultFree spared;
     request->variableBufferSizes.push_back(*size);
     const auto found = request->variables.find(name);
     return found == request->variables.end() ? fail(size) : fill(found->second, buffer, size);
 }
 
-int ReadPostData_C_REST_QI_QVWS_(ws_Request* request, char* buffer, uint32_t* size) {
+int ReadPostData_C_REST_QI_QVWS_(ws_Request* request, char* buffer, std::uint32_t* size) {
     const FaultFree spared;
     request->bodyBufferSizes.push_back(*size);
-    if (!request->bodyReadable)
+    if (!request->bodyReadable) {
         return fail(size);
-    if (request->bodyFailsForGood && request->bodyBufferSizes.size() == 2)
+    }
+    if (request->bodyFailsForGood && request->bodyBufferSizes.size() == 2) {
         return tooSmall;
+    }
     return fill(request->body, buffer, size);
 }
 
@@ -71,7 +74,7 @@ void SetHTTPResponseMimeType_C_REST_QI_QVWS_(ws_Request* request, const char* ty
     request->done.push_back(std::string("type ") + type);
 }
 
-void WriteOutput_C_REST_QI_QVWS_(ws_Request* request, const char* data, uint32_t length) {
+void WriteOutput_C_REST_QI_QVWS_(ws_Request* request, const char* data, std::uint32_t length) {
     const FaultFree spared;
     request->done.push_back("write " + std::string(data, length));
 }

@@ -44,11 +44,13 @@ void ModelledSessions::answerCalls() {
     };
     answer("initializeSessionWithoutResources", [this](const auto&) { return openOn({}); });
     for (const char* call : {"initializeSessionWithDevices", "initializeSessionWithPhysChans",
-                             "initializeSessionWithNvmemAreas"})
+                             "initializeSessionWithNvmemAreas"}) {
         answer(call, [this](const auto& text) { return openOn(devicesIn(text)); });
+    }
     answer("closeSession", [this](const auto& text) { return closeOf(text); });
-    for (const char* call : {"abortSession", "reserveDevices", "unreserveDevices"})
+    for (const char* call : {"abortSession", "reserveDevices", "unreserveDevices"}) {
         answer(call, [this](const auto& text) { return check(text); });
+    }
     answer("getSessionPropertyStringArray", [this](const auto& text) { return reservedBy(text); });
     const std::string access = "translateStaticEnumStringToValue(\"ReservationAccess\", ";
     driver.give(access + "\"ReadOnly\")", std::int64_t{1});
@@ -64,8 +66,9 @@ void ModelledSessions::warn(std::int32_t code, std::string json) {
 std::vector<ModelledSessions::Handle> ModelledSessions::open() const {
     std::lock_guard<std::mutex> hold(mutex);
     std::vector<Handle> handles;
-    for (const auto& [handle, devices] : sessions)
+    for (const auto& [handle, devices] : sessions) {
         handles.push_back(handle);
+    }
     return handles;
 }
 
@@ -89,9 +92,11 @@ Reply ModelledSessions::success(RecordingDriver::Value value) const {
 
 Reply ModelledSessions::openOn(const Devices& devices) {
     std::lock_guard<std::mutex> hold(mutex);
-    for (const std::string& device : devices)
-        if (isReserved(device))
+    for (const std::string& device : devices) {
+        if (isReserved(device)) {
             return refusal(deviceReserved);
+        }
+    }
     sessions[++lastHandle] = devices;
     return success(std::uint64_t{lastHandle});
 }
@@ -106,15 +111,17 @@ Reply ModelledSessions::closeOf(const std::string& call) {
 Reply ModelledSessions::reservedBy(const std::string& call) {
     Reply reply = check(call);
     std::lock_guard<std::mutex> hold(mutex);
-    if (reply.code >= 0)
+    if (reply.code >= 0) {
         reply.value = sessions[handleIn(call)];
+    }
     return reply;
 }
 
 Reply ModelledSessions::check(const std::string& call) {
     std::lock_guard<std::mutex> hold(mutex);
-    if (sessions.count(handleIn(call)) != 0)
+    if (sessions.count(handleIn(call)) != 0) {
         return success({});
+    }
     ++strayCalls;
     return refusal(notOpen);
 }

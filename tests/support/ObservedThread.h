@@ -22,8 +22,9 @@ class ObservedThread {
     ~ObservedThread() { join(); }
 
     void join() {
-        if (thread.joinable())
+        if (thread.joinable()) {
             thread.join();
+        }
     }
 
     bool hasEnded() const { return ended; }
@@ -31,8 +32,9 @@ class ObservedThread {
     // Returns true once the thread is blocked in a wait, false once it has ended.
     bool waitUntilBlocked() const {
         for (int sleeping = 0; sleeping < 200; ::sched_yield()) {
-            if (ended)
+            if (ended) {
                 return false;
+            }
             sleeping = isSleeping() ? sleeping + 1 : 0;
         }
         return true;
@@ -40,8 +42,9 @@ class ObservedThread {
 
   private:
     bool isSleeping() const {
-        if (id == 0)
+        if (id == 0) {
             return false;
+        }
         std::ifstream file("/proc/self/task/" + std::to_string(id.load()) + "/stat");
         std::string line;
         std::getline(file, line);

@@ -19,8 +19,9 @@ std::atomic<int> failuresLeft{0};
 std::atomic<int> successesLeft{0};
 
 std::string text(const JsonValue& value) {
-    if (value.IsString())
+    if (value.IsString()) {
         return value.GetString();
+    }
     JsonBuffer buffer;
     JsonWriter writer(buffer);
     value.Accept(writer);
@@ -34,14 +35,16 @@ std::string member(const JsonValue& item, const char* name) {
 }
 
 std::string describedItem(const JsonValue& item) {
-    if (item.HasMember("usage"))
+    if (item.HasMember("usage")) {
         return " " + member(item, "usage") + "=" + member(item, "value");
+    }
     return " comment=" + member(item, "comment");
 }
 
 void failIfAsked() {
-    if (failuresLeft == 0 || successesLeft-- > 0)
+    if (failuresLeft == 0 || successesLeft-- > 0) {
         return;
+    }
     --failuresLeft;
     qierr::Status status;
     qierr_Status_setCode(&status, -52006);
@@ -61,10 +64,13 @@ std::string nQITRMCWEBSVC100::describeStatus(const qierr_Status& status) {
     JsonDocument details;
     details.Parse<rapidjson::kParseIterativeFlag>(status.json != nullptr ? status.json : "{}");
     const JsonValue* items = JsonPointer("/translator_info/ordered_data").Get(details);
-    if (items == nullptr || !items->IsArray())
+    if (items == nullptr || !items->IsArray()) {
         return description;
-    for (const JsonValue& item : items->GetArray())
-        if (item.IsObject())
+    }
+    for (const JsonValue& item : items->GetArray()) {
+        if (item.IsObject()) {
             description += describedItem(item);
+        }
+    }
     return description;
 }

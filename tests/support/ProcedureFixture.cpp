@@ -27,9 +27,11 @@ std::string written(const qierr_Status& status) {
 }
 
 std::shared_ptr<IProcedure> make(ProcedureFactory& factory, const std::string& name) {
-    for (const Method& method : methodTable)
-        if (method.name == name)
+    for (const Method& method : methodTable) {
+        if (method.name == name) {
             return (factory.*method.make)();
+        }
+    }
     throw std::out_of_range(name);
 }
 
@@ -37,8 +39,9 @@ std::shared_ptr<IProcedure> make(ProcedureFactory& factory, const std::string& n
 
 void ProcedureFixture::SetUp() {
     DriverTest::SetUp();
-    for (const char* suffix : {"outResources", "Devices", "PhysChans", "NvmemAreas"})
+    for (const char* suffix : {"outResources", "Devices", "PhysChans", "NvmemAreas"}) {
         give(std::string("initializeSessionWith") + suffix, std::uint64_t{7});
+    }
     const auto giveList = [this](const std::string& name, Texts names) {
         give("getSystemPropertyStringArray(7, \"" + name + "\")", std::move(names));
     };
@@ -57,9 +60,10 @@ void ProcedureFixture::SetUp() {
     give("openDriverDefinedProperty", std::uint64_t{21});
     give("openGenericProperty", std::uint64_t{22});
     give("openGenericCommand", std::uint64_t{31});
-    for (int i = 0; i < 14; ++i)
+    for (int i = 0; i < 14; ++i) {
         give("translateStaticEnumValueToString(\"DataType\", " + std::to_string(i + 1) + ")",
              std::string(dataTypeNames[i]));
+    }
     factory = std::make_unique<ProcedureFactory>();
 }
 
@@ -105,23 +109,26 @@ void ProcedureFixture::fail(const std::string& call, std::int32_t code, const st
 }
 
 void ProcedureFixture::failLater(const std::string& call, int earlier, std::int32_t code) {
-    if (earlier == 0)
+    if (earlier == 0) {
         return fail(call, code);
+    }
     const auto standing =
         given.count(call) != 0 ? given.find(call) : given.find(call.substr(0, call.find('(')));
     RecordingDriver::Reply reply =
         standing != given.end() ? standing->second : RecordingDriver::Reply{};
     reply.during = [this, call, code, left = std::make_shared<int>(earlier)] {
-        if (--*left == 0)
+        if (--*left == 0) {
             fail(call, code);
+        }
     };
     driver.reply(call, reply);
 }
 
 void ProcedureFixture::giveDataType(std::int32_t number) {
-    for (const char* handle : {"21", "22"})
+    for (const char* handle : {"21", "22"}) {
         give("getPropertyPropertyInt32(" + std::string(handle) + ", \"Prop.DataType\")",
              std::int64_t{number});
+    }
 }
 
 Texts afterOpening(const Texts& calls) {

@@ -58,8 +58,9 @@ RecordingDriver::Reply RecordingDriver::record(const std::string& name,
             }
         }
     }
-    if (reply.during)
+    if (reply.during) {
         reply.during();
+    }
     return reply.workedOut ? reply.workedOut(call) : reply;
 }
 
@@ -103,8 +104,9 @@ Array<Element> arrayOf(const Element* elements, std::uint32_t count) {
 template <typename Element>
 std::string written(const Array<Element>& array) {
     std::string text = array.elements == nullptr ? "null" : "[";
-    for (std::uint32_t i = 0; array.elements != nullptr && i < array.count; ++i)
+    for (std::uint32_t i = 0; array.elements != nullptr && i < array.count; ++i) {
         text += (i != 0 ? "," : "") + written(array.elements[i]);
+    }
     return array.elements == nullptr ? text : text + "]";
 }
 
@@ -118,8 +120,9 @@ std::string list(const Arguments&... arguments) {
 
 Reply called(const char* name, const std::string& arguments, qierr_Status* status) {
     Reply reply = RecordingDriver::instance().record(name, arguments);
-    if (reply.code != 0 && qierr_Status_setCode(status, reply.code) && !reply.json.empty())
+    if (reply.code != 0 && qierr_Status_setCode(status, reply.code) && !reply.json.empty()) {
         qierr_Status_setJson(status, reply.json.c_str());
+    }
     return reply;
 }
 
@@ -130,10 +133,11 @@ Number numberIn(const Reply& reply) {
     return std::visit(
         [](const auto& value) -> Number {
             using Held = std::decay_t<decltype(value)>;
-            if constexpr (std::is_arithmetic_v<Held>)
+            if constexpr (std::is_arithmetic_v<Held>) {
                 return static_cast<Number>(value);
-            else
+            } else {
                 return Number{};
+            }
         },
         reply.value);
 }
@@ -153,8 +157,9 @@ void give(const Reply& reply, Number* out) {
 void give(const Reply& reply, char** out) {
     const auto* text = std::get_if<std::string>(&reply.value);
     *out = text != nullptr ? lentText(*text) : nullptr;
-    if (text != nullptr)
+    if (text != nullptr) {
         RecordingDriver::instance().lend();
+    }
 }
 
 template <typename Number>
@@ -170,8 +175,9 @@ void giveArray(const Reply& reply, Number** out, std::uint32_t* count) {
                 if constexpr (std::is_arithmetic_v<typename Held::value_type>) {
                     *out = static_cast<Number*>(std::malloc((values.size() + 1) * sizeof(Number)));
                     *count = 0;
-                    for (auto value : values)
+                    for (auto value : values) {
                         (*out)[(*count)++] = static_cast<Number>(value);
+                    }
                     RecordingDriver::instance().lend();
                 }
             }
@@ -184,12 +190,14 @@ void giveArray(const Reply& reply, char*** out, std::uint32_t* count) {
     const FaultFree spared;
     *out = nullptr;
     *count = reply.countOfNoArray;
-    if (texts == nullptr)
+    if (texts == nullptr) {
         return;
+    }
     *count = 0;
     *out = static_cast<char**>(std::malloc((texts->size() + 1) * sizeof(char*)));
-    for (const std::string& text : *texts)
+    for (const std::string& text : *texts) {
         (*out)[(*count)++] = lentText(text);
+    }
     RecordingDriver::instance().lend();
 }
 
@@ -217,8 +225,9 @@ void nQITRMCAPI100_freeArray(void* array) {
 void nQITRMCAPI100_freeStringArray(char** array, std::uint32_t count) {
     RecordingDriver::instance().record("freeStringArray", array == nullptr ? "null" : list(count));
     RecordingDriver::instance().takeBack(array);
-    for (std::uint32_t i = 0; array != nullptr && i < count; ++i)
+    for (std::uint32_t i = 0; array != nullptr && i < count; ++i) {
         std::free(array[i]);
+    }
     std::free(array);
 }
 
@@ -411,8 +420,9 @@ DEFINE(getNvmemBytes, SESSION, const char* area, std::uint32_t address, std::uin
         list(session, area, address) + (buffer == nullptr ? ", null, " : ", ") + written(size),
         status);
     const auto* bytes = std::get_if<std::vector<std::uint64_t>>(&reply.value);
-    for (std::uint32_t i = 0; bytes != nullptr && i < size && i < bytes->size(); ++i)
+    for (std::uint32_t i = 0; bytes != nullptr && i < size && i < bytes->size(); ++i) {
         buffer[i] = static_cast<std::uint8_t>((*bytes)[i]);
+    }
 }
 DEFINE(setNvmemBytes, SESSION, const char* area, std::uint32_t address, const std::uint8_t* bytes,
        std::uint32_t size, const char* serialNumber, const char* password) {

@@ -15,7 +15,7 @@ namespace {
 
 struct Fault {
     bool armed = false;
-    AllocationFault::Extent extent = AllocationFault::Extent::one;
+    AllocationFault::Extent extent = AllocationFault::Extent::One;
     int successesLeft = 0;
     bool struck = false;
 };
@@ -23,10 +23,12 @@ struct Fault {
 thread_local Fault fault;
 
 bool strikes() {
-    if (!fault.armed || FaultFree::isActive())
+    if (!fault.armed || FaultFree::isActive()) {
         return false;
-    if (fault.struck)
-        return fault.extent == AllocationFault::Extent::allFromThere;
+    }
+    if (fault.struck) {
+        return fault.extent == AllocationFault::Extent::AllFromThere;
+    }
     fault.struck = fault.successesLeft-- == 0;
     return fault.struck;
 }
@@ -61,8 +63,9 @@ void* __wrap_realloc(void* block, std::size_t size) {
 }
 
 void* operator new(std::size_t size) {
-    if (void* const block = std::malloc(size == 0 ? 1 : size))
+    if (void* const block = std::malloc(size == 0 ? 1 : size)) {
         return block;
+    }
     throw std::bad_alloc();
 }
 

@@ -5,7 +5,7 @@
 // hold a FaultFree are exempt.
 class AllocationFault {
   public:
-    enum class Extent { one, allFromThere };
+    enum class Extent { One, AllFromThere };
 
     // The first `successes` allocations from now on work, the next fails.
     AllocationFault(int successes, Extent extent);

@@ -187,7 +187,8 @@ def descriptions(draw, moving=False):
         device |= draw(st.fixed_dictionaries({}, optional={"connect_seconds": TIMES,
                                                            "reachable": st.booleans()}))
     return {"enums": enums, "devices": [chassis, *alone], **draw(st.fixed_dictionaries({}, optional={
-        "$schema": TEXTS, "seed": st.integers(0, 2**64 - 1), "first_session_handle": st.integers(1, 2**32 - 1),
+        "$schema": TEXTS, "seed": st.integers(0, 2**64 - 1),
+        "first_session_handle": st.integers(1, 2**32 - 1),
         "driver_properties": st.fixed_dictionaries({}, optional={
             "system": st.fixed_dictionaries({"Sys.Own": st.just({"type": "Bool", "value": True})}),
             "device": st.fixed_dictionaries({"Dev.Own": properties(enums)})}),

@@ -20,22 +20,28 @@ bool has(const std::string& call, const char* part) {
 }
 
 RecordingDriver::Reply systemTexts(const std::string& call) {
-    if (has(call, "\"Sys.Devices\""))
+    if (has(call, "\"Sys.Devices\"")) {
         return texts({"Mod1", "Bench"});
-    if (has(call, "\"Sys.SessionProperties\""))
+    }
+    if (has(call, "\"Sys.SessionProperties\"")) {
         return texts({"Session.Timeout", "Session.ReservedDevices"});
-    if (has(call, "\"Sys.SystemProperties\""))
+    }
+    if (has(call, "\"Sys.SystemProperties\"")) {
         return texts({"Sys.Delay", "Sys.Devices", "Sys.Ticks", "Sys.Simulated"});
+    }
     return texts({"Dev.Name", "Dev.Temperature", "PhysChan.Range", "NVMEM.Size"});
 }
 
 RecordingDriver::Reply genericTexts(const std::string& call) {
-    if (has(call, "\"Dev.PhysChans\""))
+    if (has(call, "\"Dev.PhysChans\"")) {
         return texts({"Mod1/ch0"});
-    if (has(call, "\"Dev.NVMEM.Areas\""))
+    }
+    if (has(call, "\"Dev.NVMEM.Areas\"")) {
         return texts({"Mod1/user"});
-    if (has(call, "\"Dev.Modules\""))
+    }
+    if (has(call, "\"Dev.Modules\"")) {
         return texts({"Mod1"});
+    }
     return texts({"one text of an array", "another text of an array"});
 }
 

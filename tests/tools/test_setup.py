@@ -29,7 +29,8 @@ def setup(tmp_path):
         (programs / name).symlink_to(shutil.which(name))
 
     def run(**env):
-        subprocess.run([SCRIPT], cwd=tmp_path, check=True, capture_output=True, env={"PATH": str(programs), **env})
+        subprocess.run([SCRIPT], cwd=tmp_path, check=True, capture_output=True,
+                       env={"PATH": str(programs), **env})
         commands = tmp_path / "commands"
         return commands.read_text().splitlines() if commands.exists() else []
 

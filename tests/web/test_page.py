@@ -31,7 +31,8 @@ def fault_of_building():
     """Why the page is not there; empty when it is."""
     if shutil.which("npm") is None:
         return "npm is not installed"
-    built = subprocess.run([ROOT / "scripts" / "page", PAGE], capture_output=True, text=True, timeout=PATIENCE)
+    built = subprocess.run([ROOT / "scripts" / "page", PAGE], capture_output=True, text=True,
+                           timeout=PATIENCE)
     return built.stderr.strip() if built.returncode else ""
 
 
@@ -50,7 +51,8 @@ def page():
 def results_of(file):
     """By name what came of each test of the file."""
     node = subprocess.run(
-        ["node", "--test-reporter", HERE / "reporter.mjs", "--test-reporter-destination", "stdout", HERE / file],
+        ["node", "--test-reporter", HERE / "reporter.mjs", "--test-reporter-destination", "stdout",
+         HERE / file],
         capture_output=True, text=True, timeout=PATIENCE,
         env={**os.environ, "QITRMC_BUILD_DIR": str(BUILD_DIR), "QITRMC_PAGE": str(PAGE)})
     lines = [json.loads(line) for line in node.stdout.splitlines() if line.startswith("{")]
@@ -67,8 +69,8 @@ def test_in_a_browser(page, file, name):
 
 
 def test_the_types_are_right(page):
-    tsc = subprocess.run(["node_modules/.bin/tsc", "--noEmit"], cwd=ROOT / "web", capture_output=True, text=True,
-                         timeout=PATIENCE)
+    tsc = subprocess.run(["node_modules/.bin/tsc", "--noEmit"], cwd=ROOT / "web", capture_output=True,
+                         text=True, timeout=PATIENCE)
     assert tsc.stdout == ""
 
 

@@ -18,8 +18,9 @@ char lowered(char c) {
 
 std::string lowered(std::string_view text) {
     std::string result(text);
-    for (char& c : result)
+    for (char& c : result) {
         c = lowered(c);
+    }
     return result;
 }
 
@@ -46,8 +47,9 @@ std::size_t distance(const std::string& left, const std::string& right) {
 // A text that is part of a name counts as equal to it.
 std::size_t distanceToName(const std::string& given, std::string_view name) {
     const std::string whole = lowered(name);
-    if (whole.find(given) != std::string::npos)
+    if (whole.find(given) != std::string::npos) {
         return 0;
+    }
     return std::min(distance(given, whole), distance(given, lowered(withoutGroup(name))));
 }
 
@@ -56,9 +58,11 @@ std::vector<Entry> nearest(std::vector<std::pair<std::int64_t, Entry>> distances
     std::stable_sort(distances.begin(), distances.end(),
                      [](const auto& left, const auto& right) { return left.first < right.first; });
     std::vector<Entry> entries;
-    for (const auto& [apart, entry] : distances)
-        if (entries.size() < mostSuggestions)
+    for (const auto& [apart, entry] : distances) {
+        if (entries.size() < mostSuggestions) {
             entries.push_back(entry);
+        }
+    }
     return entries;
 }
 
@@ -72,9 +76,11 @@ const std::vector<Entry>& catalogue() {
 }
 
 const Entry* findCode(std::int32_t code) {
-    for (const Entry& entry : catalogue())
-        if (entry.code == code)
+    for (const Entry& entry : catalogue()) {
+        if (entry.code == code) {
             return &entry;
+        }
+    }
     return nullptr;
 }
 
@@ -82,18 +88,21 @@ const Entry* findName(std::string_view name) {
     const std::string wanted = lowered(name);
     const Entry* shortened = nullptr;
     for (const Entry& entry : catalogue()) {
-        if (lowered(entry.name) == wanted)
+        if (lowered(entry.name) == wanted) {
             return &entry;
-        if (shortened == nullptr && lowered(withoutGroup(entry.name)) == wanted)
+        }
+        if (shortened == nullptr && lowered(withoutGroup(entry.name)) == wanted) {
             shortened = &entry;
+        }
     }
     return shortened;
 }
 
 std::vector<Entry> nearestCodes(std::int32_t code) {
     std::vector<std::pair<std::int64_t, Entry>> distances;
-    for (const Entry& entry : catalogue())
+    for (const Entry& entry : catalogue()) {
         distances.emplace_back(std::abs(std::int64_t{entry.code} - code), entry);
+    }
     return nearest(std::move(distances));
 }
 
@@ -102,8 +111,9 @@ std::vector<Entry> similarNames(std::string_view name) {
     std::vector<std::pair<std::int64_t, Entry>> distances;
     for (const Entry& entry : catalogue()) {
         const std::size_t apart = distanceToName(given, entry.name);
-        if (apart <= given.size() / 3)
+        if (apart <= given.size() / 3) {
             distances.emplace_back(apart, entry);
+        }
     }
     return nearest(std::move(distances));
 }

@@ -59,12 +59,15 @@ void addOptions(CLI::App& app, Options& options) {
 
 void checkOptions(const Options& options) {
     const bool listing = options.list || options.search;
-    if (options.list && options.search)
+    if (options.list && options.search) {
         throw UsageError("--list and --search do not go together.");
-    if (listing && !options.status.empty())
+    }
+    if (listing && !options.status.empty()) {
         throw UsageError("--list and --search go with no code, name or JSON text.");
-    if (!listing && options.status.empty())
+    }
+    if (!listing && options.status.empty()) {
         throw UsageError("Give a code, a name or a JSON text.");
+    }
 }
 
 }  // namespace explain

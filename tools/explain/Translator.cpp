@@ -13,8 +13,9 @@ namespace {
 void fill(const Question& question, qierr_Status* status) {
     qierr_Status_setCode(status, question.code);
     if (!question.details.empty() &&
-        qierr_Status_setJson(status, question.details.c_str()) == nullptr)
+        qierr_Status_setJson(status, question.details.c_str()) == nullptr) {
         throw std::bad_alloc();
+    }
 }
 
 }  // namespace
@@ -22,8 +23,9 @@ void fill(const Question& question, qierr_Status* status) {
 Translator::Translator(std::uint32_t language) : language(language) {
     qierr::Status failure;
     session.reset(qixlator_createSession(&failure));
-    if (session == nullptr)
+    if (session == nullptr) {
         throw std::bad_alloc();
+    }
 }
 
 Translation Translator::translate(const Question& question, bool formatted, bool debug) {
@@ -36,8 +38,9 @@ Translation Translator::translate(const Question& question, bool formatted, bool
     qierr::Status failure;
     qihtl::String text;
     layOut(session.get(), &status, language, flags, &text, &failure);
-    if (failure.code < 0)
+    if (failure.code < 0) {
         return {failure.code, {}};
+    }
     return {0, {text.c_str(), text.length()}};
 }
 

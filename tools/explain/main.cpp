@@ -19,9 +19,10 @@ using namespace explain;
 // The message for a code that no explanation file has.
 std::string messageWithoutText(std::int32_t code, Translator& translator) {
     const std::string number = std::to_string(code);
-    if (const Entry* const entry = findCode(code))
+    if (const Entry* const entry = findCode(code)) {
         return "The explanation files have no text for " + number + " (" +
                std::string(entry->name) + "). Look whether they are installed.";
+    }
     return "The code " + number +
            " is unknown here. A driver has codes of its own, which its documentation explains.\n"
            "The nearest known codes are:" +
@@ -31,11 +32,13 @@ std::string messageWithoutText(std::int32_t code, Translator& translator) {
 // The message in addition to a translation or in place of it; empty on success.
 std::string warningAbout(const Question& question, const Translation& translation,
                          Translator& translator) {
-    if (translator.explanation(question.code).empty())
+    if (translator.explanation(question.code).empty()) {
         return messageWithoutText(question.code, translator);
-    if (translation.failure != 0)
+    }
+    if (translation.failure != 0) {
         return "The details cannot be put into words (code " + std::to_string(translation.failure) +
                "). Give the code alone to see what it means.";
+    }
     return {};
 }
 
@@ -48,23 +51,26 @@ void explainStatus(const Options& options, Translator& translator) {
     const Translation translation =
         translator.translate(question, options.formatted, options.debug);
     const std::string warning = warningAbout(question, translation, translator);
-    if (translation.failure != 0)
+    if (translation.failure != 0) {
         throw Failure(warning);
+    }
     std::printf("%s\n", translation.text.c_str());
-    if (!warning.empty())
+    if (!warning.empty()) {
         complain(warning);
+    }
 }
 
 void run(const Options& options) {
     checkOptions(options);
     Translator translator(options.language.empty() ? languageOfEnvironment()
                                                    : languageOfWord(options.language));
-    if (options.list)
+    if (options.list) {
         std::fputs(listAll(translator).c_str(), stdout);
-    else if (options.search)
+    } else if (options.search) {
         std::fputs(listMatches(options.word, translator).c_str(), stdout);
-    else
+    } else {
         explainStatus(options, translator);
+    }
 }
 
 int refuse(const std::string& text) {

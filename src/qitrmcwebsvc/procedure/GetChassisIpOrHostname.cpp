@@ -27,13 +27,13 @@ void GetChassisIpOrHostname::run(const JsonValue& params, SingleResponse& respon
     const auto device = params.FindMember("device");
     const char* name = device == params.MemberEnd() ? nullptr : device->value.GetString();
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
     for (const auto& [key, property] : identityProperties) {
         DriverString text;
         callDriver(nQITRMCAPI100_getDevicePropertyString, session->driverSession, name, property,
                    text.out());
-        result.AddMember(rapidjson::StringRef(key), textValue(text.copy(), pool), pool);
+        result.AddMember(rapidjson::StringRef(key), textValue(text.copy(), allocator), allocator);
     }
     response.setResult(std::move(result));
 }

@@ -12,7 +12,7 @@ namespace nQITRMCWEBSVC100 {
 namespace {
 
 // Sorted by key, which is the order of the result.
-constexpr std::pair<const char*, const char*> CommandInfoKeys[] = {
+constexpr std::pair<const char*, const char*> commandInfoKeys[] = {
     {"description", "Cmd.Descr"},
     {"document", "Cmd.Doc"},
 };
@@ -28,15 +28,16 @@ void GetCommandInformation::run(const JsonValue& params, SingleResponse& respons
     callDriver(nQITRMCAPI100_openGenericCommand, session->driverSession,
                resource.joinedNames().c_str(), command.c_str(), handle.out());
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
-    for (const auto& [key, attribute] : CommandInfoKeys) {
+    for (const auto& [key, attribute] : commandInfoKeys) {
         DriverString text;
         callDriver(nQITRMCAPI100_getCommandPropertyString, handle.get(), attribute, text.out());
-        if (text.get() == nullptr)
+        if (text.get() == nullptr) {
             throw nQITRMCSHAREDCMN100::InternalError("Fail to get command information.",
                                                      QITRMC_HERE);
-        result.AddMember(rapidjson::StringRef(key), textValue(text.get(), pool), pool);
+        }
+        result.AddMember(rapidjson::StringRef(key), textValue(text.get(), allocator), allocator);
     }
     response.setResult(std::move(result));
 }

@@ -11,10 +11,12 @@ namespace nQITRMCWEBSVC100 {
 namespace {
 
 const char* listPropertyOf(ResourceKind kind) {
-    if (kind == ResourceKind::Device)
+    if (kind == ResourceKind::Device) {
         return "Dev.Commands";
-    if (kind == ResourceKind::PhysicalChannel)
+    }
+    if (kind == ResourceKind::PhysicalChannel) {
         return "PhysChan.Commands";
+    }
     throwInvalidParams("MustSpecifyOneOfDevicePhyChannel", QITRMC_HERE);
 }
 
@@ -29,11 +31,11 @@ void GetCommandList::run(const JsonValue& params, SingleResponse& response) cons
     callDriver(nQITRMCAPI100_getGenericPropertyStringArray, session->driverSession,
                resource.joinedNames().c_str(), property, names.outArray(), names.outCount());
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue commands(rapidjson::kArrayType);
-    appendTexts(commands, names, pool);
+    appendTexts(commands, names, allocator);
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("commands", commands, pool);
+    result.AddMember("commands", commands, allocator);
     response.setResult(std::move(result));
 }
 

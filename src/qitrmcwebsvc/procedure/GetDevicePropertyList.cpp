@@ -32,16 +32,18 @@ Lists listsOf(ResourceKind kind) {
 // A failure to list the resource's own properties is ignored: the properties of its kind are listed
 // anyway.
 void addDynamicNames(JsonValue& result, nQITRMCAPI100_Session session,
-                     const RequestResource& resource, const char* property, JsonPool& pool) {
+                     const RequestResource& resource, const char* property,
+                     JsonAllocator& allocator) {
     qierr::Status status;
     DriverStringArray names;
     nQITRMCAPI100_getGenericPropertyStringArray(session, resource.joinedNames().c_str(), property,
                                                 names.outArray(), names.outCount(), &status);
-    if (status.code < 0)
+    if (status.code < 0) {
         return;
+    }
     JsonValue dynamicNames(rapidjson::kArrayType);
-    appendTexts(dynamicNames, names, pool);
-    result.AddMember("dynamic_properties", dynamicNames, pool);
+    appendTexts(dynamicNames, names, allocator);
+    result.AddMember("dynamic_properties", dynamicNames, allocator);
 }
 
 }  // namespace
@@ -54,13 +56,14 @@ void GetDevicePropertyList::run(const JsonValue& params, SingleResponse& respons
     const RequestResource resource(params, *session);
     const Lists lists = listsOf(resource.kind());
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
     JsonValue staticNames(rapidjson::kArrayType);
-    appendTexts(staticNames, propertyNames(session->driverSession, lists.category), pool);
-    result.AddMember("static_properties", staticNames, pool);
-    if (lists.dynamicProperty != nullptr)
-        addDynamicNames(result, session->driverSession, resource, lists.dynamicProperty, pool);
+    appendTexts(staticNames, propertyNames(session->driverSession, lists.category), allocator);
+    result.AddMember("static_properties", staticNames, allocator);
+    if (lists.dynamicProperty != nullptr) {
+        addDynamicNames(result, session->driverSession, resource, lists.dynamicProperty, allocator);
+    }
     response.setResult(std::move(result));
 }
 

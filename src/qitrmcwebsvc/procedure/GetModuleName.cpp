@@ -15,8 +15,8 @@ void GetModuleName::run(const JsonValue& params, SingleResponse& response) const
     const std::vector<std::string> modules = modulesOf(resource, session);
     const std::uint32_t slot = uintParam(params, "slot_number");
 
-    JsonPool& pool = *response.getAllocator();
-    ScratchParams scratch(pool);
+    JsonAllocator& allocator = *response.getAllocator();
+    ScratchParams scratch(allocator);
     const auto slotMatches = [&](const std::string& module) {
         return slotOf(module, scratch, session) == slot;
     };
@@ -24,9 +24,10 @@ void GetModuleName::run(const JsonValue& params, SingleResponse& response) const
     const bool present = found != modules.end();
 
     JsonValue result(rapidjson::kObjectType);
-    if (present)
-        result.AddMember("module", textValue(*found, pool), pool);
-    result.AddMember("present", present, pool);
+    if (present) {
+        result.AddMember("module", textValue(*found, allocator), allocator);
+    }
+    result.AddMember("present", present, allocator);
     response.setResult(std::move(result));
 }
 

@@ -19,11 +19,13 @@ using Buffer = std::unique_ptr<std::uint8_t[], Free>;
 // Null for a size of 0. The system provides zeroed pages without touching them, so a request for
 // more bytes than an area has costs little before the driver rejects it.
 Buffer zeroedBuffer(std::uint32_t size) {
-    if (size == 0)
+    if (size == 0) {
         return nullptr;
+    }
     Buffer buffer(static_cast<std::uint8_t*>(std::calloc(size, 1)));
-    if (buffer == nullptr)
+    if (buffer == nullptr) {
         throw std::bad_alloc();
+    }
     return buffer;
 }
 
@@ -40,14 +42,15 @@ void GetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const
     callDriver(nQITRMCAPI100_getNvmemBytes, session->driverSession, resource.joinedNames().c_str(),
                address, buffer.get(), size);
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue data(rapidjson::kArrayType);
-    reserveElements(data, size, pool);
-    for (std::uint32_t i = 0; i < size; ++i)
-        appendElement(data, pool).SetUint(buffer[i]);
+    reserveElements(data, size, allocator);
+    for (std::uint32_t i = 0; i < size; ++i) {
+        appendElement(data, allocator).SetUint(buffer[i]);
+    }
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("data", data, pool);
-    result.AddMember("next_address", address + 1, pool);
+    result.AddMember("data", data, allocator);
+    result.AddMember("next_address", address + 1, allocator);
     response.setResult(std::move(result));
 }
 

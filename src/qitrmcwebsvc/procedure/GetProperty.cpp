@@ -13,15 +13,17 @@ void GetProperty::run(const JsonValue& params, SingleResponse& response) const {
     const RequestResource resource(params, *session);
     const SessionProperty property(session, name, resource);
     const PropertyValueType* type = propertyValueType(property.dataType());
-    if (type == nullptr)
+    if (type == nullptr) {
         throw nQITRMCSHAREDCMN100::InternalError("Unsupported data type for dynamic property.",
                                                  QITRMC_HERE);
-    JsonPool& pool = *response.getAllocator();
-    JsonValue value = type->read(property, pool);
+    }
+    JsonAllocator& allocator = *response.getAllocator();
+    JsonValue value = type->read(property, allocator);
 
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("data_type", enumItemValue("DataType", property.dataType(), pool), pool);
-    result.AddMember("value", value, pool);
+    result.AddMember("data_type", enumItemValue("DataType", property.dataType(), allocator),
+                     allocator);
+    result.AddMember("value", value, allocator);
     response.setResult(std::move(result));
 }
 

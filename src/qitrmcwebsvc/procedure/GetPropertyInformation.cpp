@@ -9,30 +9,33 @@ namespace nQITRMCWEBSVC100 {
 namespace {
 
 // Sorted by key, which is the order of the result.
-constexpr std::pair<const char*, const char*> PropertyInfoKeys[] = {
+constexpr std::pair<const char*, const char*> propertyInfoKeys[] = {
     {"description", "Prop.Descr"},  {"document", "Prop.Doc"}, {"max_value", "Prop.MaxValue"},
     {"min_value", "Prop.MinValue"}, {"unit", "Prop.Unit"},
 };
 
-void addTexts(JsonValue& result, const SessionProperty& property, JsonPool& pool) {
-    for (const auto& [key, attribute] : PropertyInfoKeys) {
+void addTexts(JsonValue& result, const SessionProperty& property, JsonAllocator& allocator) {
+    for (const auto& [key, attribute] : propertyInfoKeys) {
         const std::string text = property.metaString(attribute);
-        if (!text.empty())
-            result.AddMember(rapidjson::StringRef(key), textValue(text, pool), pool);
+        if (!text.empty()) {
+            result.AddMember(rapidjson::StringRef(key), textValue(text, allocator), allocator);
+        }
     }
 }
 
 // The items keep the driver's order.
-JsonValue enumValue(const SessionProperty& property, JsonPool& pool) {
+JsonValue enumValue(const SessionProperty& property, JsonAllocator& allocator) {
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("name", textValue(property.metaString("Prop.Enum.Name"), pool), pool);
+    result.AddMember("name", textValue(property.metaString("Prop.Enum.Name"), allocator),
+                     allocator);
     const std::vector<std::string> names = property.metaStringArray("Prop.Enum.ValueNames");
     const std::vector<std::int32_t> numbers = property.metaInt32Array("Prop.Enum.Values");
     JsonValue items(rapidjson::kObjectType);
     // The driver should return two lists of the same length.
-    for (std::size_t i = 0; i < std::min(numbers.size(), names.size()); ++i)
-        items.AddMember(textValue(names[i], pool), JsonValue(numbers[i]), pool);
-    result.AddMember("values", items, pool);
+    for (std::size_t i = 0; i < std::min(numbers.size(), names.size()); ++i) {
+        items.AddMember(textValue(names[i], allocator), JsonValue(numbers[i]), allocator);
+    }
+    result.AddMember("values", items, allocator);
     return result;
 }
 
@@ -47,17 +50,20 @@ void GetPropertyInformation::run(const JsonValue& params, SingleResponse& respon
     const RequestResource resource(params, *session);
     const SessionProperty property(session, name, resource);
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
-    addTexts(result, property, pool);
+    addTexts(result, property, allocator);
     result.AddMember("data_type",
-                     enumItemValue("DataType", property.metaInt32("Prop.DataType"), pool), pool);
-    result.AddMember(
-        "access", enumItemValue("PropertyAccess", property.metaInt32("Prop.Access"), pool), pool);
-    result.AddMember("driver_defined", property.isDriverDefined(), pool);
-    result.AddMember("pending_changes", property.metaBool("Prop.PendingChanges"), pool);
-    if (property.metaBool("Prop.IsEnum"))
-        result.AddMember("enum", enumValue(property, pool), pool);
+                     enumItemValue("DataType", property.metaInt32("Prop.DataType"), allocator),
+                     allocator);
+    result.AddMember("access",
+                     enumItemValue("PropertyAccess", property.metaInt32("Prop.Access"), allocator),
+                     allocator);
+    result.AddMember("driver_defined", property.isDriverDefined(), allocator);
+    result.AddMember("pending_changes", property.metaBool("Prop.PendingChanges"), allocator);
+    if (property.metaBool("Prop.IsEnum")) {
+        result.AddMember("enum", enumValue(property, allocator), allocator);
+    }
     response.setResult(std::move(result));
 }
 

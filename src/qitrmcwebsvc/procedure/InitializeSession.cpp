@@ -14,9 +14,9 @@ void InitializeSession::run(const JsonValue& params, SingleResponse& response) c
             ? sessionManager->createSession()
             : sessionManager->createSession(resource.kind(), resource.names(), reservation.access,
                                             reservation.group, reservation.timeout, forceReserve);
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("session_id", JsonValue(id, pool), pool);
+    result.AddMember("session_id", JsonValue(id, allocator), allocator);
     response.setResult(std::move(result));
 }
 

@@ -46,10 +46,10 @@ void ReadRegister::run(const JsonValue& params, SingleResponse& response) const 
     const std::uint64_t data =
         readRegister(size, session->driverSession, resource.joinedNames().c_str(), address);
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("next_address", address + 1, pool);
-    result.AddMember("data", data, pool);
+    result.AddMember("next_address", address + 1, allocator);
+    result.AddMember("data", data, allocator);
     response.setResult(std::move(result));
 }
 

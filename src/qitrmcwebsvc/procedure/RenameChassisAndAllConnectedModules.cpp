@@ -25,25 +25,25 @@ void RenameChassisAndAllConnectedModules::run(const JsonValue& params,
     const std::string oldChassisName = textParam(params, "old_chassis_name");
     // The driver reads a text up to its first NUL, so the new name ends there.
     const std::string newChassisName = textParam(params, "new_chassis_name").c_str();
-    JsonPool& pool = *response.getAllocator();
-    ScratchParams chassisParams(pool);
+    JsonAllocator& allocator = *response.getAllocator();
+    ScratchParams chassisParams(allocator);
     const RequestResource chassis = chassisParams.resourceFor(
         oldChassisName, session->driverSession, session->defaultResourceKind);
     requireChassis(chassis, session);
 
-    ScratchParams moduleParams(pool);
+    ScratchParams moduleParams(allocator);
     JsonValue newModuleNames(rapidjson::kArrayType);
     for (const std::string& module : modulesOf(chassis, session)) {
         const std::uint32_t slot = slotOf(module, moduleParams, session);
         const std::string newName = newChassisName + "-Mod" + std::to_string(slot);
         rename(*session, module, newName);
-        newModuleNames.PushBack(textValue(newName, pool), pool);
+        newModuleNames.PushBack(textValue(newName, allocator), allocator);
     }
     rename(*session, oldChassisName, newChassisName);
 
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("new_module_names", newModuleNames, pool);
-    result.AddMember("new_chassis_name", textValue(newChassisName, pool), pool);
+    result.AddMember("new_module_names", newModuleNames, allocator);
+    result.AddMember("new_chassis_name", textValue(newChassisName, allocator), allocator);
     response.setResult(std::move(result));
 }
 

@@ -12,8 +12,9 @@ namespace {
 std::vector<std::uint8_t> bytesOf(const JsonValue& data) {
     std::vector<std::uint8_t> bytes;
     bytes.reserve(data.Size());
-    for (const JsonValue& element : data.GetArray())
+    for (const JsonValue& element : data.GetArray()) {
         bytes.push_back(static_cast<std::uint8_t>(element.GetUint()));
+    }
     return bytes;
 }
 
@@ -32,9 +33,9 @@ void SetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const
                address, bytes.data(), static_cast<std::uint32_t>(bytes.size()),
                serialNumber.c_str(), password.c_str());
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("next_address", address + 1, pool);
+    result.AddMember("next_address", address + 1, allocator);
     response.setResult(std::move(result));
 }
 

@@ -20,8 +20,9 @@ const JsonValue& scalarUnwrap(const JsonValue& value, const SessionProperty& pro
 // Does not check a value of an unknown data type; run() throws for it.
 void checkRequestedType(const JsonValue& value, const SessionProperty& property) {
     const PropertyValueType* type = propertyValueType(property.dataType());
-    if (type == nullptr || type->accepts(value))
+    if (type == nullptr || type->accepts(value)) {
         return;
+    }
     BasicError error(qierr::codes::wrongValueType, QITRMC_HERE);
     addUsageString(error.details(), "kUsageTypeRequestedDataType",
                    nQITRMCAPI100_translateStaticEnumValueToString("DataType", property.dataType()));
@@ -41,13 +42,15 @@ void SetProperty::run(const JsonValue& params, SingleResponse& response) const {
     const JsonValue& value = scalarUnwrap(params["value"], property);
     checkRequestedType(value, property);
     const PropertyValueType* type = propertyValueType(property.dataType());
-    if (type == nullptr)
+    if (type == nullptr) {
         throw BasicError(QITRMC_HERE);
+    }
     type->write(property, value);
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("data_type", enumItemValue("DataType", property.dataType(), pool), pool);
+    result.AddMember("data_type", enumItemValue("DataType", property.dataType(), allocator),
+                     allocator);
     response.setResult(std::move(result));
 }
 

@@ -41,13 +41,14 @@ void WriteRegister::run(const JsonValue& params, SingleResponse& response) const
     const std::uint32_t address = uintParam(params, "address");
     const std::uint32_t size = registerSizeParam(params);
     const std::uint64_t data = params["data"].GetUint64();
-    if (!fits(data, size))
+    if (!fits(data, size)) {
         throw BasicError(qierr::codes::dataTooWide, QITRMC_HERE);
+    }
     writeRegister(size, session->driverSession, resource.joinedNames().c_str(), address, data);
 
-    JsonPool& pool = *response.getAllocator();
+    JsonAllocator& allocator = *response.getAllocator();
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("next_address", address + 1, pool);
+    result.AddMember("next_address", address + 1, allocator);
     response.setResult(std::move(result));
 }
 

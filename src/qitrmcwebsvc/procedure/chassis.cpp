@@ -11,8 +11,8 @@ constexpr std::int32_t chassisCategory = 1;
 
 }  // namespace
 
-ScratchParams::ScratchParams(JsonPool& pool) : params(rapidjson::kObjectType) {
-    params.AddMember("device", "", pool);
+ScratchParams::ScratchParams(JsonAllocator& allocator) : params(rapidjson::kObjectType) {
+    params.AddMember("device", "", allocator);
 }
 
 RequestResource ScratchParams::resourceFor(const std::string& device,
@@ -25,8 +25,9 @@ RequestResource ScratchParams::resourceFor(const std::string& device,
 
 void requireChassis(const RequestResource& resource,
                     const std::shared_ptr<SessionContext>& session) {
-    if (!isDeviceOfCategory(resource, session, chassisCategory))
+    if (!isDeviceOfCategory(resource, session, chassisCategory)) {
         throw nQITRMCSHAREDCMN100::BasicError(qierr::codes::notChassis, QITRMC_HERE);
+    }
 }
 
 std::vector<std::string> modulesOf(const RequestResource& chassis,

@@ -17,7 +17,7 @@ namespace nQITRMCWEBSVC100 {
 // name. The device's name is expanded and checked like one from a client.
 class ScratchParams {
   public:
-    explicit ScratchParams(JsonPool& pool);
+    explicit ScratchParams(JsonAllocator& allocator);
 
     RequestResource resourceFor(const std::string& device, nQITRMCAPI100_Session driverSession,
                                 ResourceKind defaultKind);

@@ -12,22 +12,24 @@ constexpr rapidjson::SizeType largestSize = std::numeric_limits<rapidjson::SizeT
 
 }  // namespace
 
-JsonValue textValue(std::string_view text, JsonPool& pool) {
+JsonValue textValue(std::string_view text, JsonAllocator& allocator) {
     // The JSON library stores sizes in 32 bits, including the NUL after a text.
-    if (text.size() >= largestSize)
+    if (text.size() >= largestSize) {
         throw std::bad_alloc();
-    return JsonValue(text.data(), static_cast<rapidjson::SizeType>(text.size()), pool);
+    }
+    return JsonValue(text.data(), static_cast<rapidjson::SizeType>(text.size()), allocator);
 }
 
-void reserveElements(JsonValue& array, std::size_t count, JsonPool& pool) {
+void reserveElements(JsonValue& array, std::size_t count, JsonAllocator& allocator) {
     // The JSON library does not check this multiplication for overflow.
-    if (count > largestSize || count > PTRDIFF_MAX / sizeof(JsonValue))
+    if (count > largestSize || count > PTRDIFF_MAX / sizeof(JsonValue)) {
         throw std::bad_alloc();
-    array.Reserve(static_cast<rapidjson::SizeType>(count), pool);
+    }
+    array.Reserve(static_cast<rapidjson::SizeType>(count), allocator);
 }
 
-JsonValue enumItemValue(const char* enumeration, std::int32_t value, JsonPool& pool) {
-    return textValue(nQITRMCAPI100_translateStaticEnumValueToString(enumeration, value), pool);
+JsonValue enumItemValue(const char* enumeration, std::int32_t value, JsonAllocator& allocator) {
+    return textValue(nQITRMCAPI100_translateStaticEnumValueToString(enumeration, value), allocator);
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -44,9 +44,11 @@ std::uint32_t uintParam(const JsonValue& params, const char* name) {
 
 std::uint32_t registerSizeParam(const JsonValue& params) {
     const JsonValue& size = params["size"];
-    for (const std::uint32_t width : {8u, 16u, 32u, 64u})
-        if (size.IsNumber() && size.GetDouble() == width)
+    for (const std::uint32_t width : {8u, 16u, 32u, 64u}) {
+        if (size.IsNumber() && size.GetDouble() == width) {
             return width;
+        }
+    }
     return 0;
 }
 

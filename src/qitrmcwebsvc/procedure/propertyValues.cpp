@@ -15,29 +15,29 @@ template <typename Integer>
 struct JsonForm {
     static bool accepts(const JsonValue& value) { return value.Is<Integer>(); }
     static Integer parse(const JsonValue& value) { return value.Get<Integer>(); }
-    static JsonValue make(Integer value, JsonPool&) { return JsonValue(value); }
+    static JsonValue make(Integer value, JsonAllocator&) { return JsonValue(value); }
 };
 
 template <>
 struct JsonForm<bool> {
     static bool accepts(const JsonValue& value) { return value.IsBool(); }
     static bool parse(const JsonValue& value) { return value.IsTrue(); }
-    static JsonValue make(bool value, JsonPool&) { return JsonValue(value); }
+    static JsonValue make(bool value, JsonAllocator&) { return JsonValue(value); }
 };
 
 template <>
 struct JsonForm<double> {
     static bool accepts(const JsonValue& value) { return value.IsNumber(); }
     static double parse(const JsonValue& value) { return value.GetDouble(); }
-    static JsonValue make(double value, JsonPool&) { return JsonValue(value); }
+    static JsonValue make(double value, JsonAllocator&) { return JsonValue(value); }
 };
 
 template <>
 struct JsonForm<std::string> {
     static bool accepts(const JsonValue& value) { return value.IsString(); }
     static std::string parse(const JsonValue& value) { return value.GetString(); }
-    static JsonValue make(const std::string& value, JsonPool& pool) {
-        return textValue(value, pool);
+    static JsonValue make(const std::string& value, JsonAllocator& allocator) {
+        return textValue(value, allocator);
     }
 };
 
@@ -49,22 +49,24 @@ struct JsonForm<std::vector<Item>> {
     static std::vector<Item> parse(const JsonValue& value) {
         std::vector<Item> items;
         items.reserve(value.Size());
-        for (const JsonValue& item : value.GetArray())
+        for (const JsonValue& item : value.GetArray()) {
             items.push_back(JsonForm<Item>::parse(item));
+        }
         return items;
     }
-    static JsonValue make(const std::vector<Item>& items, JsonPool& pool) {
+    static JsonValue make(const std::vector<Item>& items, JsonAllocator& allocator) {
         JsonValue array(rapidjson::kArrayType);
-        reserveElements(array, items.size(), pool);
-        for (const auto& item : items)
-            array.PushBack(JsonForm<Item>::make(item, pool), pool);
+        reserveElements(array, items.size(), allocator);
+        for (const auto& item : items) {
+            array.PushBack(JsonForm<Item>::make(item, allocator), allocator);
+        }
         return array;
     }
 };
 
 template <typename Value, Value (SessionProperty::*get)() const>
-JsonValue read(const SessionProperty& property, JsonPool& pool) {
-    return JsonForm<Value>::make((property.*get)(), pool);
+JsonValue read(const SessionProperty& property, JsonAllocator& allocator) {
+    return JsonForm<Value>::make((property.*get)(), allocator);
 }
 
 template <typename Value, void (SessionProperty::*set)(const Value&)>
@@ -82,9 +84,11 @@ constexpr PropertyValueType types[] = {
 }  // namespace
 
 const PropertyValueType* propertyValueType(std::int32_t dataType) {
-    for (const PropertyValueType& type : types)
-        if (type.dataType == dataType)
+    for (const PropertyValueType& type : types) {
+        if (type.dataType == dataType) {
             return &type;
+        }
+    }
     return nullptr;
 }
 

@@ -14,7 +14,7 @@ struct PropertyValueType {
     // Whether a value of a request has the type. A number with a fraction or an exponent is not an
     // integer, and an integer must be in the range of the type.
     bool (*accepts)(const JsonValue& value);
-    JsonValue (*read)(const SessionProperty& property, JsonPool& pool);
+    JsonValue (*read)(const SessionProperty& property, JsonAllocator& allocator);
     // Writes a value for which `accepts` returns true.
     void (*write)(SessionProperty& property, const JsonValue& value);
 };

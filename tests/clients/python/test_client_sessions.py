@@ -63,7 +63,8 @@ def test_a_session_ends_with_a_program_that_fails(bench, chassis):
 
 def test_a_session_ends_on_ctrl_c(bench, chassis):
     with start(bench, "with chassis.session('Mod2') as session:", "    print(session.id, flush=True)",
-               "    for row in session['Mod2/ch0'].watch('PSU.Voltage', every=3600): print('row', flush=True)",
+               "    for row in session['Mod2/ch0'].watch('PSU.Voltage', every=3600):",
+               "        print('row', flush=True)",
                ) as running:
         session_id = running.stdout.readline().strip()
         assert running.stdout.readline() == "row\n"

@@ -71,7 +71,7 @@ def test_show(printed):
         NVMEMArea.SerialNumWanted  False        ReadOnly          Whether writing asks for the serial number.
         NVMEMArea.Size             256          ReadOnly          The number of bytes.
         NVMEMArea.Writable         True         ReadOnly          Whether the area can be written.
-        """)
+        """)  # noqa: E501
 
 
 def test_get(printed):

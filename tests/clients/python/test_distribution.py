@@ -62,7 +62,8 @@ def test_the_installed_package_brings_its_command_and_fixture(installed):
     ran = run(installed, "import importlib.metadata as m\n"
                          "d = m.distribution('qitrmc')\n"
                          "print(d.version)\n"
-                         "for e in sorted(d.entry_points): print(e.group, e.name, e.value, e.load() is not None)\n")
+                         "for e in sorted(d.entry_points):\n"
+                         "    print(e.group, e.name, e.value, e.load() is not None)\n")
     assert ran.stdout.splitlines() == [qitrmc.__version__, "console_scripts qitrmc qitrmc.cli:main True",
                                        "pytest11 qitrmc qitrmc.testing.pytest_plugin True"], ran.stderr
 

@@ -67,7 +67,8 @@ def test_a_command_for_one_chassis_refuses_a_fleet(fleet):
     assert "leave --fleet out" in result.stderr
 
 
-@pytest.mark.parametrize("content, says", [("[rack\n", "is no TOML file"), ("[rack]\nport = 1\n", "has no url")])
+@pytest.mark.parametrize("content, says", [
+    ("[rack\n", "is no TOML file"), ("[rack]\nport = 1\n", "has no url")])
 def test_a_wrong_fleet_file_is_refused(tmp_path, content, says):
     path = tmp_path / "racks.toml"
     path.write_text(content)

@@ -2,9 +2,11 @@
 
 #include <qitrmcapi.h>
 
+#include <cstdint>
+
 namespace {
 
-int32_t keepNoDetails(qierr_Status*, uint32_t) {
+std::int32_t keepNoDetails(qierr_Status*, std::uint32_t) {
     return 0;
 }
 

@@ -16,12 +16,12 @@ namespace {
 
 struct Read {
     int result;
-    uint32_t size;
+    std::uint32_t size;
     std::string bytes;  // all of the buffer
 };
 
 // Reads the body into a buffer of `size` bytes, each of them "#" before.
-Read readBody(ws_Request* request, uint32_t size) {
+Read readBody(ws_Request* request, std::uint32_t size) {
     Read read{0, size, std::string(size, '#')};
     read.result = ReadPostData_C_REST_QI_QVWS_(request, &read.bytes[0], &read.size);
     return read;
@@ -29,20 +29,21 @@ Read readBody(ws_Request* request, uint32_t size) {
 
 std::string variable(ws_Request* request, const char* name) {
     char text[64] = "";
-    uint32_t size = sizeof text;
+    std::uint32_t size = sizeof text;
     const int result = ReadRequestVariable_C_REST_QI_QVWS_(request, name, text, &size);
     return result == 0 ? std::string(text) : "none, size " + std::to_string(size);
 }
 
 std::string body(ws_Request* request) {
     const Read first = readBody(request, 256);
-    if (first.result == 0)
+    if (first.result == 0) {
         return first.bytes.substr(0, first.bytes.find('\0'));
+    }
     return readBody(request, first.size).bytes;
 }
 
 void write(ws_Request* request, const std::string& text) {
-    WriteOutput_C_REST_QI_QVWS_(request, text.data(), static_cast<uint32_t>(text.size()));
+    WriteOutput_C_REST_QI_QVWS_(request, text.data(), static_cast<std::uint32_t>(text.size()));
 }
 
 std::string environment(const char* name) {
@@ -53,8 +54,9 @@ std::string environment(const char* name) {
 // Adds a line to the file that the test names.
 void record(const std::string& event) {
     const std::string path = environment("HOST_PLUGIN_LOG");
-    if (path.empty())
+    if (path.empty()) {
         return;
+    }
     FILE* file = std::fopen(path.c_str(), "a");
     std::fprintf(file, "%s\n", event.c_str());
     std::fclose(file);
@@ -112,8 +114,9 @@ void release(ws_Request*) {
 void writeMuch(ws_Request* request) {
     const std::string piece(65536, 'x');
     std::size_t left = std::stoul(body(request));
-    for (; left > piece.size(); left -= piece.size())
+    for (; left > piece.size(); left -= piece.size()) {
         write(request, piece);
+    }
     write(request, piece.substr(0, left));
 }
 
@@ -154,7 +157,7 @@ const std::map<std::string, void (*)(ws_Request*)> entries = {
 // The characters above 127 as "<hexadecimal number>".
 std::string printable(ws_WideString name) {
     std::string text;
-    for (const uint32_t* character = name.begin; character != name.end; ++character) {
+    for (const std::uint32_t* character = name.begin; character != name.end; ++character) {
         char number[16];
         std::snprintf(number, sizeof number, "<%X>", static_cast<unsigned>(*character));
         text += *character > 31 && *character < 127 ? std::string(1, static_cast<char>(*character))
@@ -169,8 +172,9 @@ extern "C" {
 
 void qitrmcInit() {
     record("init");
-    if (!environment("HOST_PLUGIN_INIT_THROWS").empty())
+    if (!environment("HOST_PLUGIN_INIT_THROWS").empty()) {
         throw std::runtime_error("no service today");
+    }
 }
 
 void qitrmcPause() {
@@ -183,17 +187,19 @@ void qitrmcResume() {
 
 void qitrmcFinalize() {
     record("finalize");
-    if (!environment("HOST_PLUGIN_FINALIZE_THROWS").empty())
+    if (!environment("HOST_PLUGIN_FINALIZE_THROWS").empty()) {
         throw std::runtime_error("no end today");
+    }
 }
 
 void qitrmcRun(ws_Entry* entry, ws_Request* request) {
     const std::string name = printable(entry->operations->entryName(entry));
     const auto found = entries.find(name);
-    if (found == entries.end())
+    if (found == entries.end()) {
         describe(request, name);
-    else
+    } else {
         found->second(request);
+    }
     record("run " + name);
 }
 }

@@ -14,7 +14,7 @@ namespace {
 using host::Connection;
 using host::Connections;
 
-constexpr std::chrono::milliseconds kMoment(20);
+constexpr std::chrono::milliseconds moment(20);
 
 // Two connected sockets: the host's and its client's.
 class Pair {
@@ -26,10 +26,10 @@ class Pair {
     }
     int host() const { return ends[0]; }
 
-    // Whether the client sees the end of the connection within kMoment.
+    // Whether the client sees the end of the connection within moment.
     bool isShut() const {
         pollfd client = {ends[1], POLLIN, 0};
-        return poll(&client, 1, static_cast<int>(kMoment.count())) == 1;
+        return poll(&client, 1, static_cast<int>(moment.count())) == 1;
     }
 
   private:
@@ -42,8 +42,9 @@ double shutOverdueUntil(Connections& connections, const std::function<bool()>& c
     using Clock = std::chrono::steady_clock;
     const Clock::time_point begin = Clock::now();
     const Clock::time_point giveUp = begin + std::chrono::minutes(1);
-    while (!condition() && Clock::now() < giveUp)
+    while (!condition() && Clock::now() < giveUp) {
         connections.shutOverdue();
+    }
     EXPECT_TRUE(condition());
     return std::chrono::duration<double>(Clock::now() - begin).count();
 }
@@ -101,7 +102,7 @@ TEST(Connections, HaveAFreeSlotUntilTheLimitIsReached) {
     Connection* last = connections.add(second.host());
     std::future<bool> place =
         std::async(std::launch::async, [&] { return connections.waitForPlace(); });
-    EXPECT_EQ(place.wait_for(kMoment), std::future_status::timeout);
+    EXPECT_EQ(place.wait_for(moment), std::future_status::timeout);
     connections.remove(last);
     EXPECT_TRUE(place.get());
 }
@@ -112,7 +113,7 @@ TEST(Connections, KeepASlotForTheClientThatIsConnecting) {
     EXPECT_TRUE(connections.waitForPlace());
     std::future<bool> next =
         std::async(std::launch::async, [&] { return connections.waitForPlace(); });
-    EXPECT_EQ(next.wait_for(kMoment), std::future_status::timeout);
+    EXPECT_EQ(next.wait_for(moment), std::future_status::timeout);
     connections.add(pair.host());
     EXPECT_TRUE(next.get());
 }

@@ -8,7 +8,7 @@ using host::entryNameOfPath;
 using testing::ElementsAre;
 using testing::Optional;
 
-using Name = std::vector<uint32_t>;
+using Name = std::vector<std::uint32_t>;
 
 TEST(EntryName, IsTheSegmentBelowTheServicesName) {
     EXPECT_THAT(entryNameOfPath("/qitrmc/Call"), Optional(ElementsAre('C', 'a', 'l', 'l')));

@@ -7,13 +7,13 @@ namespace {
 using host::Exchange;
 using host::Gate;
 
-constexpr uint32_t kMaxBody = 10;
-constexpr std::size_t kMebibyte = 1024 * 1024;
+constexpr std::uint32_t maxBody = 10;
+constexpr std::size_t mebibyte = 1024 * 1024;
 
 TEST(Exchange, IsInFlightUntilItIsDestroyed) {
     Gate gate;
     {
-        const Exchange exchange(gate, kMaxBody);
+        const Exchange exchange(gate, maxBody);
         EXPECT_FALSE(gate.waitUntilEmpty(std::chrono::milliseconds(0)));
     }
     EXPECT_TRUE(gate.waitUntilEmpty(std::chrono::milliseconds(0)));
@@ -21,7 +21,7 @@ TEST(Exchange, IsInFlightUntilItIsDestroyed) {
 
 TEST(Exchange, KeepsABodyUpToTheLimit) {
     Gate gate;
-    Exchange exchange(gate, kMaxBody);
+    Exchange exchange(gate, maxBody);
     exchange.begin("http", "POST", "/qitrmc/Call", "10");
     EXPECT_TRUE(exchange.take("01234", 5));
     EXPECT_TRUE(exchange.take("56789", 5));
@@ -32,7 +32,7 @@ TEST(Exchange, KeepsABodyUpToTheLimit) {
 TEST(Exchange, RefusesADeclaredLengthAboveTheLimit) {
     Gate gate;
     for (const char* length : {"11", "4294967306", "99999999999999999999999999"}) {
-        Exchange exchange(gate, kMaxBody);
+        Exchange exchange(gate, maxBody);
         exchange.begin("http", "POST", "/qitrmc/Call", length);
         EXPECT_TRUE(exchange.isAnswered()) << length;
         EXPECT_EQ(exchange.response().code, 413);
@@ -43,7 +43,7 @@ TEST(Exchange, RefusesADeclaredLengthAboveTheLimit) {
 
 TEST(Exchange, RefusesABodyThatGrowsAboveTheLimitAndDiscardsIt) {
     Gate gate;
-    Exchange exchange(gate, kMaxBody);
+    Exchange exchange(gate, maxBody);
     exchange.begin("http", "POST", "/qitrmc/Call", nullptr);
     EXPECT_TRUE(exchange.take("0123456789", 10));
     EXPECT_TRUE(exchange.take("x", 1));
@@ -53,17 +53,18 @@ TEST(Exchange, RefusesABodyThatGrowsAboveTheLimitAndDiscardsIt) {
 
 TEST(Exchange, DropsAClientThatSendsFarMoreThanTheLimit) {
     Gate gate;
-    Exchange exchange(gate, kMaxBody);
+    Exchange exchange(gate, maxBody);
     exchange.begin("http", "POST", "/qitrmc/Call", nullptr);
-    const std::string piece(kMebibyte, 'x');
-    for (int i = 0; i < 64; ++i)
+    const std::string piece(mebibyte, 'x');
+    for (int i = 0; i < 64; ++i) {
         EXPECT_TRUE(exchange.take(piece.data(), piece.size()));
+    }
     EXPECT_FALSE(exchange.take("x", 1));
 }
 
 TEST(Exchange, RefusesPathsOutsideTheService) {
     Gate gate;
-    Exchange exchange(gate, kMaxBody);
+    Exchange exchange(gate, maxBody);
     exchange.begin("http", "POST", "/elsewhere", nullptr);
     EXPECT_TRUE(exchange.isAnswered());
     EXPECT_EQ(exchange.response().code, 404);
@@ -75,7 +76,7 @@ TEST(Exchange, RefusesPathsOutsideTheService) {
 TEST(Exchange, RefusesWhatThePolicyRefusesOnEveryPath) {
     Gate gate;
     for (const char* path : {"/qitrmc/Call", "/elsewhere"}) {
-        Exchange exchange(gate, kMaxBody);
+        Exchange exchange(gate, maxBody);
         exchange.admit({"Not here.\n", false, {}});
         exchange.begin("http", "POST", path, "11");
         EXPECT_TRUE(exchange.isAnswered());
@@ -87,7 +88,7 @@ TEST(Exchange, RefusesWhatThePolicyRefusesOnEveryPath) {
 
 TEST(Exchange, AnswersAPreflightWithHeadersOnly) {
     Gate gate;
-    Exchange exchange(gate, kMaxBody);
+    Exchange exchange(gate, maxBody);
     exchange.admit({"", true, {{"Vary", "Origin"}}});
     exchange.begin("http", "OPTIONS", "/qitrmc/Call", nullptr);
     EXPECT_TRUE(exchange.isAnswered());
@@ -100,7 +101,7 @@ TEST(Exchange, AnswersAPreflightWithHeadersOnly) {
 
 TEST(Exchange, KeepsTheHeadersOfThePolicyWhenItRefusesTheRequestLater) {
     Gate gate;
-    Exchange exchange(gate, kMaxBody);
+    Exchange exchange(gate, maxBody);
     exchange.admit({"", false, {{"Vary", "Origin"}}});
     exchange.begin("http", "POST", "/elsewhere", nullptr);
     EXPECT_EQ(exchange.response().code, 404);
@@ -111,7 +112,7 @@ TEST(Exchange, KeepsTheHeadersOfThePolicyWhenItRefusesTheRequestLater) {
 TEST(Exchange, RefusesEveryRequestOnceTheGateIsClosed) {
     Gate gate;
     gate.close();
-    Exchange exchange(gate, kMaxBody);
+    Exchange exchange(gate, maxBody);
     exchange.begin("http", "POST", "/qitrmc/Call", nullptr);
     EXPECT_TRUE(exchange.isAnswered());
     EXPECT_EQ(exchange.response().code, 503);

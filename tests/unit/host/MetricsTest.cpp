@@ -14,16 +14,16 @@ using host::Outcome;
 using testing::HasSubstr;
 using testing::Not;
 
-std::optional<uint64_t> noDriver() {
+std::optional<std::uint64_t> noDriver() {
     return std::nullopt;
 }
 
 TEST(Metrics, CountsRequestsByHandlerAndOutcome) {
     Metrics metrics(noDriver);
-    metrics.countEndedRequest(Handler::service, Outcome::ok);
-    metrics.countEndedRequest(Handler::service, Outcome::ok);
-    metrics.countEndedRequest(Handler::service, Outcome::rpcError);
-    metrics.countEndedRequest(Handler::host, Outcome::httpError);
+    metrics.countEndedRequest(Handler::Service, Outcome::Ok);
+    metrics.countEndedRequest(Handler::Service, Outcome::Ok);
+    metrics.countEndedRequest(Handler::Service, Outcome::RpcError);
+    metrics.countEndedRequest(Handler::Host, Outcome::HttpError);
     const std::string text = metrics.text();
     EXPECT_THAT(text, HasSubstr("# TYPE qitrmc_requests_total counter\n"));
     const auto expectCount = [&](const char* handler, const char* outcome, const char* count) {
@@ -66,7 +66,7 @@ TEST(Metrics, ShowsWhatIsThereNowAndWhatWasThereInAll) {
     metrics.countClosedConnection();
     metrics.countBegunRequest();
     metrics.countBegunRequest();
-    metrics.countEndedRequest(Handler::service, Outcome::ok);
+    metrics.countEndedRequest(Handler::Service, Outcome::Ok);
     metrics.countReceivedBytes(5000000000);
     metrics.countSentBytes(20);
     const std::string text = metrics.text();
@@ -79,7 +79,7 @@ TEST(Metrics, ShowsWhatIsThereNowAndWhatWasThereInAll) {
 
 TEST(Metrics, HasCallsOfTheDriverOnlyWhenTheyAreKnown) {
     EXPECT_THAT(Metrics(noDriver).text(), Not(HasSubstr("driver")));
-    const Metrics metrics([] { return std::optional<uint64_t>(7); });
+    const Metrics metrics([] { return std::optional<std::uint64_t>(7); });
     EXPECT_THAT(metrics.text(), HasSubstr("\nqitrmc_driver_calls_total 7\n"));
 }
 
@@ -88,13 +88,15 @@ TEST(Metrics, LosesNothingWhenThreadsCountAtOnce) {
     std::vector<std::thread> threads;
     for (int i = 0; i < 4; ++i) {
         threads.emplace_back([&metrics] {
-            for (int n = 0; n < 10000; ++n)
+            for (int n = 0; n < 10000; ++n) {
                 metrics.countTime(std::chrono::microseconds(1));
+            }
         });
     }
     metrics.text();
-    for (std::thread& thread : threads)
+    for (std::thread& thread : threads) {
         thread.join();
+    }
     EXPECT_THAT(metrics.text(), HasSubstr("qitrmc_request_duration_seconds_count 40000\n"));
 }
 

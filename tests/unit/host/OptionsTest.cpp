@@ -165,8 +165,9 @@ TEST(Options, TheLimitsOfTheRangesAreAccepted) {
 }
 
 TEST(Options, TextThatIsNotANumberIsRefused) {
-    for (const char* text : {"", "x", "1x", " 1", "+1", "-1", "0x1", "1.0"})
+    for (const char* text : {"", "x", "1x", " 1", "+1", "-1", "0x1", "1.0"}) {
         EXPECT_THAT(usageErrorOf({"--threads", text}), HasSubstr("--threads takes")) << text;
+    }
 }
 
 TEST(Options, ASeedHas64Bits) {
@@ -180,8 +181,9 @@ TEST(Options, ASeedHas64Bits) {
 }
 
 TEST(Options, ATimeScaleIsANumberOrTheWordCalls) {
-    for (const char* text : {"calls", "0.001", "1000000", "2.5"})
+    for (const char* text : {"calls", "0.001", "1000000", "2.5"}) {
         EXPECT_EQ(parseOptions({"--time-scale", text}).timeScale, text);
+    }
     for (const char* text : {"", "x", "1x", "0", "-1", "0.0009", "1000000.1", "nan", "inf"}) {
         EXPECT_EQ(usageErrorOf({"--time-scale", text}),
                   std::string("--time-scale takes a number from 0.001 to 1000000 or the word "
@@ -192,9 +194,10 @@ TEST(Options, ATimeScaleIsANumberOrTheWordCalls) {
 
 TEST(Options, AnEmptyPathIsRefused) {
     for (const char* option :
-         {"--plugin", "--chassis", "--state", "--faults", "--trace", "--tls-cert", "--tls-key"})
+         {"--plugin", "--chassis", "--state", "--faults", "--trace", "--tls-cert", "--tls-key"}) {
         EXPECT_EQ(usageErrorOf({option, ""}),
                   std::string(option) + " takes a path, not an empty text.");
+    }
 }
 
 TEST(Options, AnEmptyTextAfterAnEqualsSignIsTheValue) {
@@ -233,10 +236,12 @@ TEST(Options, TheHelpNamesEveryOptionAndFitsATerminal) {
           "  --faults FILE ", "  --trace FILE ", "  --seed N ", "  --time-scale X ",
           "  --threads N ", "  --max-body BYTES ", "  --timeout SECONDS ", "  --host-name NAME ",
           "  --allow-origin ORIGIN ", "  --tls-cert FILE ", "  --tls-key FILE ",
-          "  --pass-transport ", "  -h,--help ", "  --version "})
+          "  --pass-transport ", "  -h,--help ", "  --version "}) {
         EXPECT_THAT(help, HasSubstr(option));
-    for (std::size_t line = 0; line < help.size(); line = help.find('\n', line) + 1)
+    }
+    for (std::size_t line = 0; line < help.size(); line = help.find('\n', line) + 1) {
         EXPECT_LE(help.find('\n', line) - line, 100u) << help.substr(line, 100);
+    }
 }
 
 }  // namespace

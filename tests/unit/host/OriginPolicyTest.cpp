@@ -42,15 +42,17 @@ TEST_F(OriginPolicyTest, AnUnknownHostNameIsRefusedWithTheOptionThatAllowsIt) {
               "Requests to the host name evil.example are not taken. Use an address of this "
               "machine, or start the host with --host-name evil.example.\n");
     for (const char* host : {"192.0.2.8", "127.0.0.1.evil.example", "localhost.evil.example",
-                             "lab-pc.example", "127.1", "[fe80::1]"})
+                             "lab-pc.example", "127.1", "[fe80::1]"}) {
         EXPECT_THAT(refusalOf(sourceOf({host})), HasSubstr("--host-name")) << host;
+    }
 }
 
 TEST_F(OriginPolicyTest, AMalformedHostIsRefused) {
     EXPECT_EQ(refusalOf(sourceOf({"a b"})),
               "The Host \"a b\" is not a name or address. Send the one that stands in the URL.\n");
-    for (const char* host : {"", ":80", "[::1", "127.0.0.1@evil", "localhost/", "localhost:x"})
+    for (const char* host : {"", ":80", "[::1", "127.0.0.1@evil", "localhost/", "localhost:x"}) {
         EXPECT_THAT(refusalOf(sourceOf({host})), HasSubstr("not a name or address")) << host;
+    }
 }
 
 TEST_F(OriginPolicyTest, APageThatUsesDnsRebindingIsRefusedForItsHost) {
@@ -92,9 +94,10 @@ TEST_F(OriginPolicyTest, AForeignOriginIsRefusedWithTheOptionThatAllowsIt) {
     for (const char* origin :
          {"http://127.0.0.1", "http://127.0.0.1:8081", "https://127.0.0.1:8080",
           "http://localhost:8080", "http://127.0.0.1.evil.example:8080", "https://app.example:444",
-          "http://app.example", "https://app.example.evil"})
+          "http://app.example", "https://app.example.evil"}) {
         EXPECT_THAT(refusalOf(sourceOf({"127.0.0.1:8080"}, {origin})), HasSubstr("--allow-origin"))
             << origin;
+    }
 }
 
 TEST_F(OriginPolicyTest, AnOriginThatCannotBeAllowedIsRefused) {
@@ -102,9 +105,10 @@ TEST_F(OriginPolicyTest, AnOriginThatCannotBeAllowedIsRefused) {
               "Requests with the Origin \"null\" are not taken. Serve the page from a web server, "
               "and start the host with --allow-origin and the origin of that server.\n");
     for (const char* origin :
-         {"", "Null", "http://localhost https://app.example", "https://", "https://app.example/"})
+         {"", "Null", "http://localhost https://app.example", "https://", "https://app.example/"}) {
         EXPECT_THAT(refusalOf(sourceOf({"localhost"}, {origin})), HasSubstr("with the Origin"))
             << origin;
+    }
 }
 
 TEST_F(OriginPolicyTest, MoreThanOneHostOrOriginIsRefusedWhateverTheyAre) {
@@ -117,8 +121,9 @@ TEST_F(OriginPolicyTest, MoreThanOneHostOrOriginIsRefusedWhateverTheyAre) {
 
 std::vector<std::string> linesOf(const Verdict& verdict) {
     std::vector<std::string> lines;
-    for (const host::Header& header : verdict.headers)
+    for (const host::Header& header : verdict.headers) {
         lines.push_back(header.name + (": " + header.value));
+    }
     return lines;
 }
 

@@ -28,8 +28,9 @@ TEST(CanonicalHost, ExtractsTheIpv4AddressFromAnIpv6Address) {
 
 TEST(CanonicalHost, IsAbsentForWhatIsNotAHost) {
     for (const char* text :
-         {"", " ", "a b", "a/b", "a@b", "[::1]", "a:80", ":", "::g", "*", "a\n", "\xC3\xA4"})
+         {"", " ", "a b", "a/b", "a@b", "[::1]", "a:80", ":", "::g", "*", "a\n", "\xC3\xA4"}) {
         EXPECT_EQ(canonicalHost(text), std::nullopt) << text;
+    }
 }
 
 TEST(ParseAuthority, ReadsHostAndPort) {
@@ -51,8 +52,9 @@ TEST(ParseAuthority, IsAbsentForWhatIsNotAnAuthority) {
     for (const char* text :
          {"",        ":80",         "::1",   "::1:80",    "[::1",   "::1]:80", "[]:80",
           "[a]:80",  "[127.0.0.1]", "a:b",   "a:-1",      "a:+1",   "a:65536", "a:4294967376",
-          "a:80:80", "a:80 ",       " a:80", "user@a:80", "a/b:80", "[::1]80", "x[::1]:80"})
+          "a:80:80", "a:80 ",       " a:80", "user@a:80", "a/b:80", "[::1]80", "x[::1]:80"}) {
         EXPECT_EQ(parseAuthority(text, "http"), std::nullopt) << text;
+    }
 }
 
 TEST(ParseOrigin, ComparesEqualForOneOriginInTwoForms) {
@@ -71,16 +73,19 @@ TEST(ParseOrigin, ComparesDifferentOriginsAsUnequal) {
 TEST(ParseOrigin, IsAbsentForWhatIsNotAnOrigin) {
     for (const char* text :
          {"", "null", "lab", "lab:80", "http:lab", "http://", "://lab", "http://lab/",
-          "http://a http://b", "http://a,b", "ht tp://lab", "http://a@b"})
+          "http://a http://b", "http://a,b", "ht tp://lab", "http://a@b"}) {
         EXPECT_FALSE(parseOrigin(text).has_value()) << text;
+    }
 }
 
 TEST(IsLoopback, RecognisesAllLoopbackAddresses) {
-    for (const char* host : {"localhost", "::1", "127.0.0.1", "127.0.0.0", "127.255.255.255"})
+    for (const char* host : {"localhost", "::1", "127.0.0.1", "127.0.0.0", "127.255.255.255"}) {
         EXPECT_TRUE(isLoopback(host)) << host;
+    }
     for (const char* host : {"", "126.255.255.255", "128.0.0.1", "127.1", "127.0.0.1.example",
-                             "localhost.example", "::2", "0.0.0.0", "my-localhost"})
+                             "localhost.example", "::2", "0.0.0.0", "my-localhost"}) {
         EXPECT_FALSE(isLoopback(host)) << host;
+    }
 }
 
 TEST(LocalAddress, IsTheAddressOfTheLocalEnd) {

@@ -9,13 +9,13 @@ namespace {
 class Runtime : public testing::Test {
   protected:
     // The first `size` bytes of a buffer belong to the caller; "#" shows what is not written.
-    int readVariable(const char* name, uint32_t available) {
+    int readVariable(const char* name, std::uint32_t available) {
         buffer.assign(300, '#');
         size = available;
         return ReadRequestVariable_C_REST_QI_QVWS_(&request, name, &buffer[0], &size);
     }
 
-    int readBody(uint32_t available) {
+    int readBody(std::uint32_t available) {
         buffer.assign(300, '#');
         size = available;
         return ReadPostData_C_REST_QI_QVWS_(&request, &buffer[0], &size);
@@ -25,7 +25,7 @@ class Runtime : public testing::Test {
 
     ws_Request request;
     std::string buffer;
-    uint32_t size = 0;
+    std::uint32_t size = 0;
 };
 
 TEST_F(Runtime, ReadsAVariableAsTextWithItsNul) {

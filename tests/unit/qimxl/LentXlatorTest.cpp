@@ -17,7 +17,7 @@ namespace {
 // ---- Another program ----------------------------------------------------------------------------
 
 // Grows by exactly the requested size, whereas the plug-in's own function doubles its buffers.
-int32_t exactRealloc(qierr_Status* status, uint32_t size) {
+std::int32_t exactRealloc(qierr_Status* status, std::uint32_t size) {
     if (size == 0) {
         std::free(status->json);
         status->json = nullptr;
@@ -57,7 +57,7 @@ struct ForeignMemory {
     int frees = 0;
     std::int32_t failure = 0;
 
-    static void* allocate(void* pointer, uint32_t size, void* context, qierr_Status* status) {
+    static void* allocate(void* pointer, std::uint32_t size, void* context, qierr_Status* status) {
         auto* self = static_cast<ForeignMemory*>(context);
         if (size == 0) {
             EXPECT_EQ(self->block + 16, pointer);
@@ -93,10 +93,10 @@ class LentXlatorTest : public testing::Test {
             (std::filesystem::temp_directory_path() / "qitrmc-lent-XXXXXX").string();
         directory = mkdtemp(pattern.data());
         plugin = dlopen(PLUGIN, RTLD_NOW | RTLD_LOCAL);
-        EXPECT_NE(nullptr, plugin) << dlerror();
+        EXPECT_NE(plugin, nullptr) << dlerror();
         create = reinterpret_cast<qixlator_exported_create_fn>(
             dlsym(plugin, "qixlator_exported_create"));
-        EXPECT_NE(nullptr, create);
+        EXPECT_NE(create, nullptr);
     }
     ~LentXlatorTest() override {
         dlclose(plugin);
@@ -123,7 +123,7 @@ class LentXlatorTest : public testing::Test {
 
     XlatorInterface* createLent() {
         XlatorInterface* xlator = create("mxlator_qitrmc", registration().c_str(), &status);
-        EXPECT_NE(nullptr, xlator) << status.text();
+        EXPECT_NE(xlator, nullptr) << status.text();
         return xlator;
     }
 

@@ -123,21 +123,21 @@ TEST_F(MemoryFaultTest, LackOfMemoryIsReportedAsTheInterpretersFailure) {
     qierr::Status failure;
     EXPECT_EQ(
         qixlatorlua::createLuaXlator("n", qixlator::localRegistrations().next->registrationInfo,
-                                     LuaRuntime::plain, &failure),
+                                     LuaRuntime::Plain, &failure),
         nullptr);
     EXPECT_TRUE(FaultyAllocator::hasFailed());
     EXPECT_EQ(failure.code, -52003);
 }
 
 TEST_F(MemoryFaultTest, AStateThatCannotBeMadeIsReported) {
-    for (const LuaRuntime runtime : {LuaRuntime::plain, LuaRuntime::fast}) {
+    for (const LuaRuntime runtime : {LuaRuntime::Plain, LuaRuntime::Fast}) {
         // The first request is for the translator itself.
         FaultyAllocator::failAt(1);
         qierr::Status failure;
         EXPECT_EQ(qixlatorlua::createLuaXlator("n", "{}", runtime, &failure), nullptr);
         FaultyAllocator::succeed();
         EXPECT_EQ(failure.code, -52000);
-        ASSERT_NE(nullptr, failure.json);
+        ASSERT_NE(failure.json, nullptr);
         EXPECT_NE(std::string::npos,
                   std::string(failure.json)
                       .find("\"qixlatorlua_debug\":{\"debug\":\"failed to create lua state\"}"))
@@ -152,7 +152,7 @@ class PlainMemoryFaultTest : public MemoryFaultTest, public testing::WithParamIn
 INSTANTIATE_TEST_SUITE_P(Parts, PlainMemoryFaultTest, testing::Range(0, parts));
 
 TEST_P(PlainMemoryFaultTest, ATranslatorSurvivesEachSingleFailure) {
-    EXPECT_LT(1000u, failEach([this] { askTranslator(LuaRuntime::plain); }, 1,
+    EXPECT_LT(1000u, failEach([this] { askTranslator(LuaRuntime::Plain); }, 1,
                               static_cast<std::uint64_t>(GetParam()), parts));
 }
 

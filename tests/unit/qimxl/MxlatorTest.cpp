@@ -108,7 +108,7 @@ TEST_F(MxlatorTest, IsTheOneTranslatorThatIsExported) {
     EXPECT_EQ(list.next->next, &list);
     XlatorInterface* xlator = qixlator_exported_create(
         "mxlator_qitrmc", qixlator::localRegistrations().next->registrationInfo, &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     EXPECT_EQ(taken(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status)),
               "Error description not found");
     xlator->destroy(xlator);

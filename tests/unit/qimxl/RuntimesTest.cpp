@@ -50,8 +50,8 @@ class RuntimesTest : public testing::Test {
 
     static void compare(std::int32_t code, const char* json, std::uint32_t attributes,
                         const char* format = "json1") {
-        EXPECT_EQ(observe(LuaRuntime::plain, code, json, attributes, format),
-                  observe(LuaRuntime::fast, code, json, attributes, format))
+        EXPECT_EQ(observe(LuaRuntime::Plain, code, json, attributes, format),
+                  observe(LuaRuntime::Fast, code, json, attributes, format))
             << "code " << code << ", attributes " << attributes << ", json "
             << (json == nullptr ? "(null)" : json);
     }

@@ -28,7 +28,7 @@ class ScriptedMxlatorTest : public testing::Test {
                                  host.root.locate("/scripts") +
                                  "\",\"qixlatorlua_settings\":" + settings + "}",
                              &status);
-        ASSERT_NE(nullptr, xlator) << status.json;
+        ASSERT_NE(xlator, nullptr) << status.json;
     }
 
     std::string describe(std::uint32_t attributes = 0) {
@@ -57,7 +57,7 @@ class ScriptedMxlatorTest : public testing::Test {
         EXPECT_TRUE(reported(status, message)) << status.json;
     }
 
-    ScriptHost host{qixlatorlua::LuaRuntime::plain};
+    ScriptHost host{qixlatorlua::LuaRuntime::Plain};
     qierr::Status status;
     XlatorInterface* xlator = nullptr;
 };

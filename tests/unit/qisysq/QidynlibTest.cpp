@@ -14,7 +14,7 @@ bool contains(const qierr::Status& status, const std::string& part) {
 TEST(QidynlibTest, LoadsALibraryAndFindsASymbol) {
     qierr::Status status;
     void* handle = qidynlib_load(RELOCATIONS_COMPLETE, &status);
-    EXPECT_NE(nullptr, qidynlib_symbol(handle, "get_relocated_dir", &status));
+    EXPECT_NE(qidynlib_symbol(handle, "get_relocated_dir", &status), nullptr);
     EXPECT_EQ(status.code, 0);
     dlclose(handle);
 }
@@ -51,8 +51,8 @@ TEST(QidynlibTest, TheSymbolsOfALibraryAreVisibleToTheWholeProcess) {
     qierr::Status status;
     // A library of its own, since finding the symbol keeps it loaded.
     void* handle = qidynlib_load(SHARED_SYMBOLS, &status);
-    ASSERT_NE(nullptr, handle);
-    EXPECT_NE(nullptr, dlsym(RTLD_DEFAULT, "another_function"));
+    ASSERT_NE(handle, nullptr);
+    EXPECT_NE(dlsym(RTLD_DEFAULT, "another_function"), nullptr);
     dlclose(handle);
 }
 

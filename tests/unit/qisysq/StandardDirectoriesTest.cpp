@@ -85,7 +85,7 @@ TEST(StandardDirectoriesTest, AnUnknownKeyIsAnErrorWithoutDetails) {
 TEST(StandardDirectoriesTest, TheProcessWideTableFindsTheLibraryByItsName) {
     // A loaded library is found by its name wherever it was loaded from.
     void* library = dlopen(RELOCATIONS_COMPLETE, RTLD_NOW);
-    ASSERT_NE(nullptr, library) << dlerror();
+    ASSERT_NE(library, nullptr) << dlerror();
     const qisysq::StandardDirectories table("libqirelocations.so.0");
     EXPECT_EQ(lookUp(table, "bindir"), "/moved/bin");
     dlclose(library);

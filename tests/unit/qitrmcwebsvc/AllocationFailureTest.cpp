@@ -17,10 +17,10 @@ namespace {
 class EachExtent : public testing::TestWithParam<AllocationFault::Extent> {};
 
 INSTANTIATE_TEST_SUITE_P(Faults, EachExtent,
-                         testing::Values(AllocationFault::Extent::one,
-                                         AllocationFault::Extent::allFromThere));
+                         testing::Values(AllocationFault::Extent::One,
+                                         AllocationFault::Extent::AllFromThere));
 
-enum class Outcome { done, refused, outOfMemory };
+enum class Outcome { Done, Refused, OutOfMemory };
 
 // Runs `action` with a fault at its first allocation, then at its second and so on, until all its
 // allocations have failed once. `check` gets each outcome.
@@ -28,22 +28,23 @@ template <typename Action, typename Check>
 void withFaultAtEachAllocation(AllocationFault::Extent extent, Action action, Check check) {
     constexpr int limit = 20000;
     for (int successes = 0; successes < limit; ++successes) {
-        Outcome outcome = Outcome::done;
+        Outcome outcome = Outcome::Done;
         bool struck = false;
         {
             AllocationFault fault(successes, extent);
             try {
                 action();
             } catch (const std::bad_alloc&) {
-                outcome = Outcome::outOfMemory;
+                outcome = Outcome::OutOfMemory;
             } catch (const qierr::ExceptionBase& error) {
-                outcome = Outcome::refused;
+                outcome = Outcome::Refused;
             }
             struck = fault.hasStruck();
         }
         check(outcome, struck);
-        if (!struck)
+        if (!struck) {
             return;
+        }
     }
     FAIL() << "still allocating after " << limit << " allocations";
 }
@@ -57,36 +58,36 @@ class ValidationUnderFaults : public EachExtent {
         withFaultAtEachAllocation(
             GetParam(), [&] { validator.validate(*request); },
             [&](Outcome outcome, bool struck) {
-                EXPECT_TRUE(outcome == expected || (struck && outcome == Outcome::outOfMemory));
+                EXPECT_TRUE(outcome == expected || (struck && outcome == Outcome::OutOfMemory));
                 EXPECT_EQ(refusalOf([&] { validator.validate(*request); }), undisturbed);
             });
     }
 };
 
 INSTANTIATE_TEST_SUITE_P(Faults, ValidationUnderFaults,
-                         testing::Values(AllocationFault::Extent::one,
-                                         AllocationFault::Extent::allFromThere));
+                         testing::Values(AllocationFault::Extent::One,
+                                         AllocationFault::Extent::AllFromThere));
 
 TEST_P(ValidationUnderFaults, AConformingRequestPassesOrRunsOutOfMemory) {
     expectCleanFailures(
         "procedure_initialize_session.json",
         requestText("initializeSession",
                     R"({"devices":["a","b"],"access":"ReadOnly","reservation_timeout":1.5})"),
-        Outcome::done);
+        Outcome::Done);
 }
 
 TEST_P(ValidationUnderFaults, ARequestIsRefusedOrRunsOutOfMemory) {
     expectCleanFailures(
         "procedure_set_property.json",
         requestText("setProperty", R"({"session_id":"_session1","property":"p","value":[1,true]})"),
-        Outcome::refused);
+        Outcome::Refused);
     expectCleanFailures(
         "procedure_read_register.json",
         requestText("readRegister", R"({"session_id":"_session1","address":0,"size":9})"),
-        Outcome::refused);
+        Outcome::Refused);
     expectCleanFailures("procedure_close_session.json",
                         requestText("closeSession", "{\"" + std::string(3000, '/') + "\":1}"),
-                        Outcome::refused);
+                        Outcome::Refused);
 }
 
 TEST_P(EachExtent, ASingleRequestIsTakenOverCompletelyOrNotAtAll) {
@@ -95,7 +96,7 @@ TEST_P(EachExtent, ASingleRequestIsTakenOverCompletelyOrNotAtAll) {
     withFaultAtEachAllocation(
         GetParam(), [&] { SingleRequest request(document); },
         [&](Outcome outcome, bool struck) {
-            EXPECT_EQ(struck ? Outcome::outOfMemory : Outcome::done, outcome);
+            EXPECT_EQ(struck ? Outcome::OutOfMemory : Outcome::Done, outcome);
             EXPECT_EQ(struck, document.IsObject());
         });
 }
@@ -114,7 +115,7 @@ TEST_P(EachExtent, JsonTextsAreParsedCopiedAndWrittenOrRunOutOfMemory) {
             copy.Accept(writer);
         },
         [](Outcome outcome, bool struck) {
-            EXPECT_EQ(struck ? Outcome::outOfMemory : Outcome::done, outcome);
+            EXPECT_EQ(struck ? Outcome::OutOfMemory : Outcome::Done, outcome);
         });
 }
 
@@ -127,7 +128,7 @@ TEST_P(EachExtent, AValidatorIsBuiltOrRunsOutOfMemory) {
     withFaultAtEachAllocation(
         GetParam(), [&] { SchemaValidator validator(embeddedText("procedure_set_property.json")); },
         [](Outcome outcome, bool struck) {
-            EXPECT_EQ(struck ? Outcome::outOfMemory : Outcome::done, outcome);
+            EXPECT_EQ(struck ? Outcome::OutOfMemory : Outcome::Done, outcome);
         });
 }
 

@@ -17,15 +17,15 @@ struct ws_Request {
 
 extern "C" {
 
-void WriteOutput_C_REST_QI_QVWS_(ws_Request* request, const char* data, uint32_t length) {
+void WriteOutput_C_REST_QI_QVWS_(ws_Request* request, const char* data, std::uint32_t length) {
     request->pieces.emplace_back(data, length);
 }
 
-int ReadRequestVariable_C_REST_QI_QVWS_(ws_Request*, const char*, char*, uint32_t*) {
+int ReadRequestVariable_C_REST_QI_QVWS_(ws_Request*, const char*, char*, std::uint32_t*) {
     return 1;
 }
 
-int ReadPostData_C_REST_QI_QVWS_(ws_Request*, char*, uint32_t*) {
+int ReadPostData_C_REST_QI_QVWS_(ws_Request*, char*, std::uint32_t*) {
     return 1;
 }
 
@@ -36,8 +36,9 @@ namespace {
 using Pieces = std::vector<std::pair<const void*, std::uint32_t>>;
 
 TEST(HttpOutput, AResponseOf4GiBAndMoreIsNotCut) {
-    if (sizeof(std::size_t) < 8)
+    if (sizeof(std::size_t) < 8) {
         GTEST_SKIP() << "sizes have 32 bits here";
+    }
     std::size_t size = UINT32_MAX;
     size += 6;
     // Addresses without memory behind them.

@@ -36,8 +36,9 @@ using NotingValue = rapidjson::GenericValue<JsonEncoding, NotingPool>;
 class LargeSizesTest : public testing::Test {
   protected:
     void SetUp() override {
-        if (beyond32Bits == 0)
+        if (beyond32Bits == 0) {
             GTEST_SKIP() << "sizes have 32 bits here";
+        }
     }
 
     static constexpr std::size_t chunkSize = 64;
@@ -66,24 +67,24 @@ TEST_F(LargeSizesTest, AnArrayOf268435456ElementsAsksForAllItsBytes) {
 }
 
 TEST_F(LargeSizesTest, ATextThatTheJsonLibraryCannotCountIsNoMemoryInsteadOfAShortText) {
-    JsonPool jsonPool;
-    EXPECT_THROW(textValue(std::string_view("x", beyond32Bits + 1), jsonPool), std::bad_alloc);
-    EXPECT_THROW(textValue(std::string_view("x", beyond32Bits - 1), jsonPool), std::bad_alloc);
+    JsonAllocator jsonAllocator;
+    EXPECT_THROW(textValue(std::string_view("x", beyond32Bits + 1), jsonAllocator), std::bad_alloc);
+    EXPECT_THROW(textValue(std::string_view("x", beyond32Bits - 1), jsonAllocator), std::bad_alloc);
 }
 
 TEST_F(LargeSizesTest, MoreElementsThanTheJsonLibraryCanCountAreNoMemoryInsteadOfFew) {
-    JsonPool jsonPool;
+    JsonAllocator jsonAllocator;
     JsonValue array(rapidjson::kArrayType);
-    EXPECT_THROW(reserveElements(array, beyond32Bits + 1, jsonPool), std::bad_alloc);
+    EXPECT_THROW(reserveElements(array, beyond32Bits + 1, jsonAllocator), std::bad_alloc);
 }
 
 // The text is far shorter than it claims: it must be refused before it is read.
 TEST(LargeTexts, ATextWhoseRoomOverflows32BitsIsNotWrittenBeyondTheBuffer) {
     constexpr rapidjson::SizeType length = 715827883;
     EXPECT_THROW(compactJson(JsonValue("x", length)), std::bad_alloc);
-    JsonPool pool;
+    JsonAllocator allocator;
     JsonValue object(rapidjson::kObjectType);
-    object.AddMember(JsonValue("x", length), JsonValue(), pool);
+    object.AddMember(JsonValue("x", length), JsonValue(), allocator);
     EXPECT_THROW(compactJson(object), std::bad_alloc);
 }
 

@@ -46,8 +46,9 @@ TEST_F(PropertyNamesTest, OmitTwelveNamesFromEveryList) {
     give("getSystemPropertyStringArray", listed);
     give("getSystemPropertyStringArray(7, \"Sys.NVMEMAreaProperties\")", listed);
     EXPECT_EQ(propertyNames(7, PropertyCategory::NvmemArea), (Names{"Dev.TCPIP.EthernetIP"}));
-    for (const std::string& name : hidden)
+    for (const std::string& name : hidden) {
         EXPECT_FALSE(isPropertyName(7, PropertyCategory::NvmemArea, name)) << name;
+    }
     EXPECT_TRUE(isPropertyName(7, PropertyCategory::NvmemArea, "Dev.TCPIP.EthernetIP"));
     EXPECT_FALSE(isPropertyName(7, PropertyCategory::NvmemArea, "Dev.TCPIP.Hostname"));
 }

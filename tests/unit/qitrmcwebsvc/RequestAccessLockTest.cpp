@@ -30,10 +30,11 @@ void __wrap__ZNSt18condition_variable4waitERSt11unique_lockISt5mutexE(
 
 void __wrap__ZNSt18condition_variable4waitERSt11unique_lockISt5mutexE(
     std::condition_variable* condition, std::unique_lock<std::mutex>* hold) {
-    if (spuriousWakeUps > 0)
+    if (spuriousWakeUps > 0) {
         --spuriousWakeUps;
-    else
+    } else {
         __real__ZNSt18condition_variable4waitERSt11unique_lockISt5mutexE(condition, hold);
+    }
 }
 
 namespace {
@@ -54,14 +55,16 @@ class Caller {
 
     bool isIn() const { return entered; }
     void waitUntilIn() const {
-        while (!entered)
+        while (!entered) {
             ::sched_yield();
+        }
     }
     // A caller that holds the lock is blocked in a wait too.
     bool waitUntilBlocked() const { return thread.waitUntilBlocked(); }
     void leave() {
-        if (!leaving)
+        if (!leaving) {
             left.set_value();
+        }
         leaving = true;
         thread.join();
     }
@@ -173,10 +176,12 @@ TEST(RequestAccessLock, WakesOneWaitingBatchAtATime) {
     running.leave();
     for (; !waiting.empty(); waiting.erase(waiting.begin())) {
         const auto isIn = [](const std::unique_ptr<Caller>& caller) { return caller->isIn(); };
-        while (std::none_of(waiting.begin(), waiting.end(), isIn))
+        while (std::none_of(waiting.begin(), waiting.end(), isIn)) {
             ::sched_yield();
-        for (const auto& caller : waiting)
+        }
+        for (const auto& caller : waiting) {
             ASSERT_TRUE(caller->waitUntilBlocked());
+        }
         ASSERT_EQ(std::count_if(waiting.begin(), waiting.end(), isIn), 1);
         std::iter_swap(waiting.begin(), std::find_if(waiting.begin(), waiting.end(), isIn));
         waiting.front()->leave();
@@ -209,8 +214,9 @@ TEST(RequestAccessLock, WakesAllSharedCallersAtOnce) {
         ASSERT_TRUE(readers.back()->waitUntilBlocked());
     }
     batch.leave();
-    for (const auto& reader : readers)
+    for (const auto& reader : readers) {
         reader->waitUntilIn();
+    }
 }
 
 TEST(RequestAccessLock, IsFreeAfterAnExceptionInEitherMode) {

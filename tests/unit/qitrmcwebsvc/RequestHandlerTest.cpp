@@ -65,8 +65,9 @@ TEST_F(RequestHandlerTest, ReportsABodyThatIsNotJson) {
 }
 
 TEST_F(RequestHandlerTest, RefusesRootsThatAreNotRequests) {
-    for (const char* root : {"1", "\"text\"", "true", "null", "[]"})
+    for (const char* root : {"1", "\"text\"", "true", "null", "[]"}) {
         EXPECT_EQ(answer(root), refusal("null", "-32600", "")) << root;
+    }
 }
 
 TEST_F(RequestHandlerTest, ChecksTheIdFirst) {
@@ -76,31 +77,35 @@ TEST_F(RequestHandlerTest, ChecksTheIdFirst) {
 
 TEST_F(RequestHandlerTest, EchoesAnIdOfTheWrongType) {
     for (const char* id : {"2147483648", "-2147483649", "1.5", "1.0", "null", "true", "{\"a\":[1]}",
-                           "[1,\"x\"]", "18446744073709551615"})
+                           "[1,\"x\"]", "18446744073709551615"}) {
         EXPECT_EQ(answer(std::string("{\"jsonrpc\":\"2.0\",\"method\":\"m\",\"id\":") + id + "}"),
                   invalid(id, "id"));
+    }
 }
 
 TEST_F(RequestHandlerTest, AcceptsIdsOfTheSigned32BitRangeAndTexts) {
-    for (const char* id : {"2147483647", "-2147483648", "0", "\"\"", "\"a\\\"b\\u0001\""})
+    for (const char* id : {"2147483647", "-2147483648", "0", "\"\"", "\"a\\\"b\\u0001\""}) {
         EXPECT_EQ(answer(std::string("{\"jsonrpc\":\"2.0\",\"method\":\"\",\"id\":") + id + "}"),
                   refusal(id, "-32601", " kUsageTypeMethod="));
+    }
 }
 
 TEST_F(RequestHandlerTest, ChecksTheProtocolVersionBeforeTheMethod) {
-    for (const char* version : {"", "\"jsonrpc\":2.0,", "\"jsonrpc\":\"1.0\","})
+    for (const char* version : {"", "\"jsonrpc\":2.0,", "\"jsonrpc\":\"1.0\","}) {
         EXPECT_EQ(answer(std::string("{") + version + "\"id\":7,\"method\":5}"),
                   invalid("7", "jsonrpc"));
+    }
     EXPECT_EQ(answer("{\"jsonrpc\":\"2.0\",\"id\":7,\"method\":5}"), invalid("7", "method"));
     EXPECT_EQ(answer("{\"jsonrpc\":\"2.0\",\"id\":7}"), invalid("7", "method"));
 }
 
 TEST_F(RequestHandlerTest, FindsMethodsByTheirExactNameOnly) {
     for (const char* method : {"InitializeSession", "initializesession", " initializeSession",
-                               "initializeSession ", "getChassisIpOrHostname"})
+                               "initializeSession ", "getChassisIpOrHostname"}) {
         EXPECT_EQ(answer(std::string("{\"jsonrpc\":\"2.0\",\"id\":1,\"params\":5,\"method\":\"") +
                          method + "\"}"),
                   refusal("1", "-32601", std::string(" kUsageTypeMethod=") + method));
+    }
 }
 
 TEST_F(RequestHandlerTest, RefusesParamsThatAreNotAnObject) {
@@ -157,8 +162,9 @@ TEST_F(RequestHandlerTest, DescribesAllSkippedElementsOnce) {
 
 TEST_F(RequestHandlerTest, RefusesABatchThatIsTooLongAsAWhole) {
     std::string body = "[1";
-    for (int element = 1; element < 100000; ++element)
+    for (int element = 1; element < 100000; ++element) {
         body += ",1";
+    }
     EXPECT_EQ(answer(body + "]").substr(0, 60),
               ("[" + refusal("null", "-32600", "")).substr(0, 60));
     EXPECT_EQ(answer(body + ",1]"), refusal("null", "-32600", ""));

@@ -127,8 +127,9 @@ TEST_F(RequestResourceTest, ReportsAnUnreadableListAsAnUnknownName) {
 TEST_F(RequestResourceTest, AcceptsTokensEvenWhenTheListIsUnreadable) {
     driver.fail("getSystemPropertyStringArray(7, \"Sys.Devices\")", -12);
     for (const char* token : {"$ConnectedDevices", "$DefaultDevices", "$DefaultNVMEMAreas",
-                              "$DefaultPhysChans", "$ReservedDevices"})
+                              "$DefaultPhysChans", "$ReservedDevices"}) {
         EXPECT_EQ(check(std::string("{\"devices\":\"") + token + "\"}").names(), Calls{token});
+    }
     EXPECT_EQ(failureOf([] { check("{\"devices\":\"$reserveddevices\"}"); }),
               unknown + "$reserveddevices");
 }
@@ -166,13 +167,15 @@ TEST_F(RequestResourceTest, AppliesNoDefaultToAnEmptyArray) {
 
 TEST_F(RequestResourceTest, LimitsHowManyNamesRangesExpandTo) {
     std::string parts = "Mod1/ch0:1023";
-    for (int i = 0; i < 100; ++i)
+    for (int i = 0; i < 100; ++i) {
         parts += ",Mod1/ch0:1023";
+    }
     EXPECT_EQ(failureOf([&] { read("{\"physical_channels\":\"" + parts + "\"}"); }),
               unknown + "Mod1/ch0:1023");
     std::string elements = "\"Mod1/ch0:1023\"";
-    for (int i = 0; i < 100; ++i)
+    for (int i = 0; i < 100; ++i) {
         elements += ",\"Mod1/ch0:1023\"";
+    }
     EXPECT_EQ(failureOf([&] { read("{\"physical_channels\":[" + elements + "]}"); }),
               unknown + "Mod1/ch0:1023");
 }

@@ -33,10 +33,12 @@ std::string failure(const std::string& text, int offset) {
 
 std::string nested(const std::string& open, int depth, const std::string& close) {
     std::string text;
-    for (int i = 0; i < depth; ++i)
+    for (int i = 0; i < depth; ++i) {
         text += open;
-    for (int i = 0; i < depth; ++i)
+    }
+    for (int i = 0; i < depth; ++i) {
         text += close;
+    }
     return text;
 }
 
@@ -66,8 +68,9 @@ TEST(RequestText, EndsAtTheFirstNul) {
 }
 
 TEST(RequestText, AcceptsBlanksAroundAnyRoot) {
-    for (const char* body : {" {} ", "\t[]\r\n", "null", "1", "\"\""})
+    for (const char* body : {" {} ", "\t[]\r\n", "null", "1", "\"\""}) {
         EXPECT_EQ(failureOf(body), "parsed") << body;
+    }
 }
 
 TEST(RequestText, RefusesNumbersTooBigForADoubleInEveryForm) {
@@ -96,8 +99,9 @@ double doubleOf(const std::string& literal) {
 std::string randomLiteral(std::mt19937_64& random) {
     std::string digits = std::to_string(10000000000000000 + random() % 90000000000000000);
     const std::string sign = random() % 2 == 0 ? "-" : "";
-    if (random() % 2 == 0)
+    if (random() % 2 == 0) {
         return sign + digits.insert(1 + random() % 16, ".");
+    }
     const int exponent = static_cast<int>(random() % 632) - 324;
     return sign + digits.insert(1, ".") + "e" + std::to_string(exponent);
 }
@@ -113,8 +117,9 @@ TEST(RequestText, ALiteralOf17DigitsIsNotOneUnitOff) {
     JsonDocument document;
     parseRequestText(body + "]", document);
     int wrong = 0;
-    for (rapidjson::SizeType i = 0; i < document.Size(); ++i)
+    for (rapidjson::SizeType i = 0; i < document.Size(); ++i) {
         wrong += document[i].GetDouble() != std::strtod(literals[i].c_str(), nullptr);
+    }
     EXPECT_EQ(document.Size(), 100000u);
     EXPECT_EQ(wrong, 0);
 }
@@ -166,8 +171,9 @@ TEST(RequestText, RefusesNestingBeyondTheLimit) {
 
 TEST(RequestText, CountsLevelsOfNestingAndNotContainers) {
     std::string manyFlatOnes = "[";
-    for (int i = 0; i < 2 * maxNesting; ++i)
+    for (int i = 0; i < 2 * maxNesting; ++i) {
         manyFlatOnes += "[{}],";
+    }
     EXPECT_EQ(failureOf(manyFlatOnes + "1]"), "parsed");
 }
 

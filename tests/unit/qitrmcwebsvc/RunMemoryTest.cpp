@@ -44,9 +44,10 @@ TEST(RunMemory, ReturnsNullForNoBytes) {
 
 TEST(RunMemory, AlignsBlocksForAnyType) {
     RunMemory memory;
-    for (std::size_t size : {1, 3, 17})
+    for (std::size_t size : {1, 3, 17}) {
         EXPECT_EQ(reinterpret_cast<std::uintptr_t>(memory.Malloc(size)) % alignof(std::max_align_t),
                   0u);
+    }
 }
 
 TEST(RunMemory, RefusesASizeBeyondTheAddressSpace) {

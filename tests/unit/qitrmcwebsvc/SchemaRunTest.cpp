@@ -27,8 +27,9 @@ class Schema {
 
     std::vector<std::string> parameterNames() const {
         std::vector<std::string> names;
-        for (const auto& member : document["properties"]["params"]["properties"].GetObject())
+        for (const auto& member : document["properties"]["params"]["properties"].GetObject()) {
             names.push_back(member.name.GetString());
+        }
         return names;
     }
 
@@ -47,8 +48,9 @@ std::string fragment(const JsonPointer& pointer) {
 // The outcome when the JSON library itself passes the whole request to the validator.
 std::string outcomeOfFullWalk(const Schema& schema, const JsonValue& request) {
     rapidjson::GenericSchemaValidator<JsonSchemaDocument> validator(*schema);
-    if (request.Accept(validator))
+    if (request.Accept(validator)) {
         return "accepted";
+    }
     return fragment(validator.GetInvalidDocumentPointer()) + " " +
            fragment(validator.GetInvalidSchemaPointer()) + " " +
            validator.GetInvalidSchemaKeyword();
@@ -56,8 +58,9 @@ std::string outcomeOfFullWalk(const Schema& schema, const JsonValue& request) {
 
 std::string outcomeOfRun(const Schema& schema, const JsonValue& request) {
     SchemaRun run(*schema);
-    if (run.accepts(request))
+    if (run.accepts(request)) {
         return "accepted";
+    }
     const SchemaFailure failure = run.failure();
     return failure.documentPointer + " " + failure.schemaPointer + " " + failure.keyword;
 }
@@ -70,8 +73,9 @@ class RequestMaker {
     std::string request() {
         std::string params;
         for (const std::string& name : names) {
-            if (chance(75))
+            if (chance(75)) {
                 params += (params.empty() ? "\"" : ",\"") + name + "\":" + value(4);
+            }
         }
         const std::string unknown = chance(20) ? R"("unknown":)" + value(4) + "," : "";
         return "{" + unknown + R"("id":1,"params":{)" + params + "}}";
@@ -82,10 +86,12 @@ class RequestMaker {
     int pick(int count) { return static_cast<int>(random() % static_cast<unsigned>(count)); }
 
     std::string value(int depth) {
-        if (depth > 0 && chance(30))
+        if (depth > 0 && chance(30)) {
             return list("[", "]", depth, false);
-        if (depth > 0 && chance(10))
+        }
+        if (depth > 0 && chance(10)) {
             return list("{", "}", depth, true);
+        }
         return scalars[pick(static_cast<int>(scalars.size()))];
     }
 
@@ -93,10 +99,12 @@ class RequestMaker {
         std::string text = open;
         const int count = pick(4);
         for (int i = 0; i < count; ++i) {
-            if (i > 0)
+            if (i > 0) {
                 text += ",";
-            if (named)
+            }
+            if (named) {
                 text += "\"m" + std::to_string(i) + "\":";
+            }
             text += value(depth - 1);
         }
         return text + close;
@@ -137,12 +145,12 @@ INSTANTIATE_TEST_SUITE_P(Schemas, SchemaRunOf,
 
 // A value that is nested a million times would take hours if each level cost a look at all others,
 // and would overflow the call stack if each level were a call.
-JsonValue nested(int levels, JsonPool& pool) {
+JsonValue nested(int levels, JsonAllocator& allocator) {
     JsonValue value(rapidjson::kArrayType);
     for (int i = 0; i < levels; ++i) {
         JsonValue outer(rapidjson::kArrayType);
-        outer.Reserve(1, pool);
-        outer.PushBack(value, pool);
+        outer.Reserve(1, allocator);
+        outer.PushBack(value, allocator);
         value = std::move(outer);
     }
     return value;
@@ -153,12 +161,12 @@ TEST(SchemaRun, IsFastOnDeeplyNestedValues) {
     const Schema schema("procedure_set_property.json");
     JsonDocument request;
     request.Parse(R"({"params":{"session_id":"_session1","property":"p"}})");
-    JsonPool& pool = request.GetAllocator();
+    JsonAllocator& allocator = request.GetAllocator();
 
-    request.AddMember("unknown", nested(levels, pool), pool);
+    request.AddMember("unknown", nested(levels, allocator), allocator);
     EXPECT_EQ(outcomeOfRun(schema, request), "#/params #/properties/params required");
 
-    request["params"].AddMember("value", nested(levels, pool), pool);
+    request["params"].AddMember("value", nested(levels, allocator), allocator);
     EXPECT_EQ(outcomeOfRun(schema, request), "#/params/value #/definitions/property_value oneOf");
 }
 

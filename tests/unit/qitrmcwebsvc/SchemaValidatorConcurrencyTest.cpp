@@ -42,24 +42,29 @@ TEST(SchemaValidator, HasTheSameResultsOnSeveralThreadsAsOnOne) {
 
     const auto work = [&](int offset) {
         std::vector<ParsedRequest> requests;
-        for (const Case& one : cases())
+        for (const Case& one : cases()) {
             requests.emplace_back(requestText("readRegister", one.params));
+        }
         --waiting;
-        while (waiting > 0)
+        while (waiting > 0) {
             std::this_thread::yield();
+        }
         for (int i = 0; i < rounds; ++i) {
             const std::size_t index = static_cast<std::size_t>(i + offset) % cases().size();
             const auto refusal = refusalOf([&] { validator.validate(*requests[index]); });
-            if (!(refusal == cases()[index].expected))
+            if (!(refusal == cases()[index].expected)) {
                 ++wrong;
+            }
         }
     };
 
     std::vector<std::thread> threads;
-    for (int i = 0; i < threadCount; ++i)
+    for (int i = 0; i < threadCount; ++i) {
         threads.emplace_back(work, i);
-    for (std::thread& thread : threads)
+    }
+    for (std::thread& thread : threads) {
         thread.join();
+    }
     EXPECT_EQ(wrong, 0);
 }
 

@@ -77,8 +77,9 @@ TEST(SchemaValidator, AcceptsAnEnumItemInAnyNotation) {
 // ---- An invalid request -------------------------------------------------------------------------
 
 TEST(SchemaValidator, RefusesParamsThatAreNotAnObjectAsAnInvalidRequest) {
-    for (const char* params : {"null", "true", "5", "\"text\"", "[]", "[{}]"})
+    for (const char* params : {"null", "true", "5", "\"text\"", "[]", "[{}]"}) {
         EXPECT_EQ(closeSession(params), invalidMember("params")) << params;
+    }
 }
 
 TEST(SchemaValidator, ReadsAbsentParamsAsNull) {
@@ -126,8 +127,9 @@ TEST(SchemaValidator, RefusesASessionIdOfAnotherForm) {
         "Wrong session ID format. The format of a session ID must be _session<number>. For "
         "example, a session ID can be _session1.");
     for (const char* id : {"session1", "_session", "_session1 ", " _session1", "_Session1",
-                           "_session-1", "_session1x", ""})
+                           "_session-1", "_session1x", ""}) {
         EXPECT_EQ(closeSession(std::string(R"({"session_id":")") + id + "\"}"), expected) << id;
+    }
 }
 
 TEST(SchemaValidator, ReadsASessionIdUpToItsFirstNul) {
@@ -205,8 +207,9 @@ TEST(SchemaValidator, RefusesAPropertyValueThatDoesNotMatchExactlyOneType) {
                       "string, or array of number."))
             << value;
     }
-    for (const char* value : {"true", "1.5", "\"\"", "[true]", "[1,2.5]", "[\"\"]"})
+    for (const char* value : {"true", "1.5", "\"\"", "[true]", "[1,2.5]", "[\"\"]"}) {
         EXPECT_EQ(setProperty(std::string(R"("value":)") + value), std::nullopt) << value;
+    }
 }
 
 TEST(SchemaValidator, RefusesMembersOfWhichOnlyOneMayBeGiven) {
@@ -280,25 +283,31 @@ TEST(SchemaValidator, WritesBytesThatAreNotUtf8OneByOne) {
 
 TEST(SchemaValidator, DoesNotReadPastANameThatEndsInATruncatedCharacter) {
     for (const std::string broken :
-         {"\xc3", "\xe2\x82", "\xe2", "\xf0\x9f\x92", "\xf0\x9f", "\xf0"})
+         {"\xc3", "\xe2\x82", "\xe2", "\xf0\x9f\x92", "\xf0\x9f", "\xf0"}) {
         for (std::size_t length = 1; length < 40; ++length) {
             const std::string name = std::string(length, 'n');
             const auto refusal = closeSession("{\"" + name + broken + "\":1}");
             std::string expected = "#/params/" + name;
-            for (const char* byte : {"%F0", "%9F", "%92", "%E2", "%82", "%C3"})
-                if (broken.find(static_cast<char>(std::stoi(byte + 1, nullptr, 16))) != broken.npos)
+            for (const char* byte : {"%F0", "%9F", "%92", "%E2", "%82", "%C3"}) {
+                if (broken.find(static_cast<char>(std::stoi(byte + 1, nullptr, 16))) !=
+                    broken.npos) {
                     expected += byte;
+                }
+            }
             EXPECT_EQ(refusal, invalidParameter(expected, unsupported));
         }
+    }
 }
 
 // A text of this length is at the end of a memory block of its own. The pattern stops before the
 // truncated character, as it does before a NUL, so the text is left to the session manager.
 TEST(SchemaValidator, DoesNotReadPastATextThatEndsInATruncatedCharacter) {
-    for (const char* broken : {"\xe2", "\xf0", "\xf0\x9f", "\xf0x"})
-        for (std::size_t length = 70000; length < 70008; ++length)
+    for (const char* broken : {"\xe2", "\xf0", "\xf0\x9f", "\xf0x"}) {
+        for (std::size_t length = 70000; length < 70008; ++length) {
             EXPECT_FALSE(closeSession(R"({"session_id":"_session)" + std::string(length, '1') +
                                       broken + "\"}"));
+        }
+    }
 }
 
 // ---- The validator itself -----------------------------------------------------------------------

@@ -16,7 +16,7 @@ TEST_F(SessionManagerMemoryTest, RemembersTheAccessOfAReservationWhenMemoryRunsO
     const auto session = manager.getSessionContext("_session1");
     std::optional<AllocationFault> fault;
     driver.reply("reserveDevices",
-                 {{}, 0, {}, [&] { fault.emplace(0, AllocationFault::Extent::allFromThere); }});
+                 {{}, 0, {}, [&] { fault.emplace(0, AllocationFault::Extent::AllFromThere); }});
     manager.reserveDevices("_session1", {"Mod1"}, 3, "", 0);
     fault.reset();
     EXPECT_EQ(session->access, 3);

@@ -135,15 +135,17 @@ TEST_F(SessionManagerTest, KeepsTheRecordOfAClosedSessionWhileItIsUsed) {
 }
 
 TEST_F(SessionManagerTest, LimitsSessionsWithResourcesOnly) {
-    for (std::uint64_t handle = 1; handle <= 100; ++handle)
+    for (std::uint64_t handle = 1; handle <= 100; ++handle) {
         openOnDevices(handle, {"Mod" + std::to_string(handle)});
+    }
     EXPECT_EQ(failureOf([&] { openOnDevices(101, {"Mod101"}); }), "BasicError: -250901");
     EXPECT_EQ(openBare(102), "_session102");
 }
 
 TEST_F(SessionManagerTest, DisplacesSessionsByForceBeforeItChecksTheLimit) {
-    for (std::uint64_t handle = 1; handle <= 100; ++handle)
+    for (std::uint64_t handle = 1; handle <= 100; ++handle) {
         openOnDevices(handle, {"Mod" + std::to_string(handle)});
+    }
     holds(7, {"Mod7"});
     driver.takeCalls();
     EXPECT_EQ(openOnDevices(101, {"Mod7"}, 3, true), "_session101");
@@ -197,8 +199,9 @@ TEST_F(SessionManagerTest, ListsHoldersByTheirLatestAccess) {
     openOnDevices(1, {"Mod1"}, 2);
     openOnDevices(2, {"Mod1"}, 3);
     openOnDevices(3, {"Mod1"}, 3);
-    for (std::uint64_t handle : {1, 2, 3})
+    for (std::uint64_t handle : {1, 2, 3}) {
         holds(handle, {"Mod1"});
+    }
     manager->unreserveDevices("_session2", {"Mod2"});
     manager->reserveDevices("_session3", {"Mod2"}, 1, "", 0);
     driver.fail("initializeSessionWithDevices", -250811);
@@ -355,8 +358,9 @@ TEST_F(SessionManagerTest, RefusesReservationsForUnknownSessions) {
 }
 
 TEST_F(SessionManagerTest, ClosesTheRemainingSessionsInKeyOrderAtItsEndAndIgnoresErrors) {
-    for (std::uint64_t handle : {9, 10, 11})
+    for (std::uint64_t handle : {9, 10, 11}) {
         openBare(handle);
+    }
     driver.fail("closeSession(10)", -1);
     driver.takeCalls();
     manager.reset();

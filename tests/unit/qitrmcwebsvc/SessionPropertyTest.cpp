@@ -198,8 +198,9 @@ TEST_F(SessionPropertyTest, EmptyNamesAreDropped) {
 
 TEST_F(SessionPropertyTest, TokensOfASessionPropertyAreNotReplaced) {
     open("Session.Timeout", R"({"devices":"$ReservedDevices"})");
-    for (const std::string& call : driver.calls())
+    for (const std::string& call : driver.calls()) {
         EXPECT_EQ(call.find("getSessionPropertyStringArray"), std::string::npos) << call;
+    }
 }
 
 TEST_F(SessionPropertyTest, ATokenThatCannotBeReadIsTheFailure) {

@@ -60,22 +60,26 @@ class TypedOperationTest : public ProcedureFixture, public testing::WithParamInt
             return;
         }
         Calls expected{call};
-        if (GetParam().given != nullptr)
+        if (GetParam().given != nullptr) {
             expected.push_back(GetParam().given);
+        }
         EXPECT_EQ(calls, expected);
     }
 
     void answer() {
-        for (const char* call : {GetParam().system, GetParam().session, GetParam().resources})
-            if (call != nullptr && std::string(call).rfind("get", 0) == 0)
+        for (const char* call : {GetParam().system, GetParam().session, GetParam().resources}) {
+            if (call != nullptr && std::string(call).rfind("get", 0) == 0) {
                 give(call, GetParam().answer);
+            }
+        }
     }
 };
 
 TEST_P(TypedOperationTest, CallsTheDriverFunctionOfEachScope) {
     answer();
-    if (std::string(GetParam().name) == "setBoolArray")
+    if (std::string(GetParam().name) == "setBoolArray") {
         expectOwnArray();
+    }
     expectServed("Sys.Delay", GetParam().system);
     expectServed("Session.Timeout", GetParam().session);
     expectServed("Dev.Own", GetParam().resources);
@@ -248,8 +252,9 @@ TEST_P(TypedOperationTest, PassesTheDriversErrorOnAndFreesWhatItReturned) {
     refusal.code = -250999;
     refusal.json = R"({"why":"busy"})";
     driver.reply(GetParam().resources, refusal);
-    if (std::string(GetParam().name) == "setBoolArray")
+    if (std::string(GetParam().name) == "setBoolArray") {
         expectOwnArray();
+    }
     try {
         callsOn("Dev.Own");
         FAIL() << "the refusal was lost";
@@ -268,8 +273,9 @@ TEST_P(TypedOperationTest, DropsAWarning) {
     warning.value = GetParam().answer;
     warning.code = 250999;
     driver.reply(GetParam().resources, warning);
-    if (std::string(GetParam().name) == "setBoolArray")
+    if (std::string(GetParam().name) == "setBoolArray") {
         expectOwnArray();
+    }
     expectServed("Dev.Own", GetParam().resources);
 }
 

@@ -41,8 +41,9 @@ TEST(SingleRequest, TakesAValidRequestOver) {
 }
 
 TEST(SingleRequest, RefusesWhatIsNotAnObjectOrIsEmptyWithoutDetails) {
-    for (const char* text : {"null", "true", "1", "\"text\"", "[]", "[1]", "{}"})
+    for (const char* text : {"null", "true", "1", "\"text\"", "[]", "[1]", "{}"}) {
         EXPECT_EQ(refusalOfText(text), (Refusal{-32600, ""})) << text;
+    }
 }
 
 TEST(SingleRequest, RefusesAMissingOrInvalidId) {

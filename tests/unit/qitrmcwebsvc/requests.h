@@ -30,8 +30,9 @@ inline std::string orderedDataOf(const qierr_Status& status) {
     const std::string text = status.json ? status.json : "";
     const std::string opening = "\"translator_info\":{\"ordered_data\":";
     const std::size_t start = text.find(opening);
-    if (start == std::string::npos)
+    if (start == std::string::npos) {
         return "";
+    }
     const std::size_t first = start + opening.size();
     return text.substr(first, text.size() - 2 - first);
 }

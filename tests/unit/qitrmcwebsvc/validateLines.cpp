@@ -16,8 +16,9 @@ using namespace nQITRMCWEBSVC100;
 SchemaValidator& validatorOf(const std::string& file) {
     static std::map<std::string, std::unique_ptr<SchemaValidator>> validators;
     std::unique_ptr<SchemaValidator>& validator = validators[file];
-    if (!validator)
+    if (!validator) {
         validator = std::make_unique<SchemaValidator>(embeddedText(file.c_str()));
+    }
     return *validator;
 }
 
@@ -29,9 +30,10 @@ int main() {
         const std::size_t tab = line.find('\t');
         SchemaValidator& validator = validatorOf(line.substr(0, tab));
         const ParsedRequest request(line.substr(tab + 1));
-        if (const auto refusal = refusalOf([&] { validator.validate(*request); }))
+        if (const auto refusal = refusalOf([&] { validator.validate(*request); })) {
             std::cout << *refusal << "\n";
-        else
+        } else {
             std::cout << "accepted\n";
+        }
     }
 }

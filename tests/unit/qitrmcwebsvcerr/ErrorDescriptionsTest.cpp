@@ -76,8 +76,9 @@ std::string statusTextOfLookup(const std::string& name) {
 
 TEST(ErrorDescriptions, HaveATextForEachOfThe21Names) {
     ASSERT_EQ(expectedDescriptions().size(), 21u);
-    for (const auto& [name, text] : expectedDescriptions())
+    for (const auto& [name, text] : expectedDescriptions()) {
         EXPECT_EQ(text, getErrorDescription(name)) << name;
+    }
 }
 
 TEST(ErrorDescriptions, LeaveThePlaceholderInPlace) {

@@ -296,7 +296,7 @@ TEST_F(SessionTest, AnUnknownExportIsReported) {
 TEST_F(SessionTest, ARegistrationUnlinksItselfAtItsEnd) {
     { const TestXlator xlator("test"); }
     EXPECT_EQ(qixlator::localRegistrations().find("test"), nullptr);
-    EXPECT_NE(nullptr, qixlator::localRegistrations().find("qixlator_default"));
+    EXPECT_NE(qixlator::localRegistrations().find("qixlator_default"), nullptr);
 }
 
 // ---- The framework's allocation -----------------------------------------------------------------
@@ -315,7 +315,7 @@ TEST_F(SessionTest, ReallocReportsLackOfMemory) {
 TEST_F(SessionTest, ReallocFreesWhateverTheStatusIs) {
     const std::int64_t before = FaultyAllocator::liveBlocks();
     void* block = qixlator_realloc(nullptr, 8, nullptr, &status);
-    EXPECT_NE(nullptr, block);
+    EXPECT_NE(block, nullptr);
     status.code = -1;
     EXPECT_EQ(qixlator_realloc(block, 0, nullptr, &status), nullptr);
     EXPECT_EQ(FaultyAllocator::liveBlocks(), before);

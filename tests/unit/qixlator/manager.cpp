@@ -4,6 +4,7 @@
 
 #include <qixlatormgr.h>
 
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <cstring>
@@ -24,7 +25,7 @@ void note(const char* call) {
     std::strcat(calls, ";");
 }
 
-char* describeCode(XlatorInterface*, int32_t code, uint32_t, qixlator_Alloc alloc,
+char* describeCode(XlatorInterface*, std::int32_t code, std::uint32_t, qixlator_Alloc alloc,
                    void* allocContext, qierr_Status* status) {
     char* text = static_cast<char*>(alloc(nullptr, 64, allocContext, status));
     if (text != nullptr) {

@@ -36,9 +36,9 @@ class LibraryFailuresTest : public testing::TestWithParam<LuaRuntime> {
 };
 
 INSTANTIATE_TEST_SUITE_P(Runtimes, LibraryFailuresTest,
-                         testing::Values(LuaRuntime::plain, LuaRuntime::fast),
+                         testing::Values(LuaRuntime::Plain, LuaRuntime::Fast),
                          [](const testing::TestParamInfo<LuaRuntime>& runtime) {
-                             return runtime.param == LuaRuntime::plain ? "Plain" : "Fast";
+                             return runtime.param == LuaRuntime::Plain ? "Plain" : "Fast";
                          });
 
 TEST_P(LibraryFailuresTest, ALibraryThatCannotBeOpenedIsNamed) {
@@ -63,7 +63,7 @@ TEST_P(LibraryFailuresTest, AStateWithoutATableForPreloadsIsReported) {
 // The fast runtime compiles these scripts only once per process.
 TEST(EmbeddedScriptFailuresTest, AnEmbeddedScriptThatCannotBeAddedIsReported) {
     preloadResult = 1;
-    expectNoTranslator(LuaRuntime::plain, "0", "",
+    expectNoTranslator(LuaRuntime::Plain, "0", "",
                        "\"debug\":\"failed to add embedded modules to preload table\"");
     preloadResult = 0;
 }

@@ -107,9 +107,9 @@ TEST_F(LuaMemoryTest, ShrinkingNeverFails) {
         void* block = LuaArena::allocate(&arena, nullptr, 0, 2000);
         FaultyAllocator::failAt(0, FaultyAllocator::never);
         block = LuaArena::allocate(&arena, block, 2000, 1000);
-        ASSERT_NE(nullptr, block);
+        ASSERT_NE(block, nullptr);
         block = LuaArena::allocate(&arena, block, 1000, 100);
-        ASSERT_NE(nullptr, block);
+        ASSERT_NE(block, nullptr);
         LuaArena::allocate(&arena, block, 100, 0);
     }
     FaultyAllocator::succeed();

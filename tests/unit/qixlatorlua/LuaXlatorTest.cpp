@@ -36,9 +36,9 @@ class LuaXlatorTest : public testing::TestWithParam<LuaRuntime> {
 };
 
 INSTANTIATE_TEST_SUITE_P(Runtimes, LuaXlatorTest,
-                         testing::Values(LuaRuntime::plain, LuaRuntime::fast),
+                         testing::Values(LuaRuntime::Plain, LuaRuntime::Fast),
                          [](const testing::TestParamInfo<LuaRuntime>& runtime) {
-                             return runtime.param == LuaRuntime::plain ? "Plain" : "Fast";
+                             return runtime.param == LuaRuntime::Plain ? "Plain" : "Fast";
                          });
 
 TEST_P(LuaXlatorTest, TheScriptGetsCodeLanguageAndEnvironment) {
@@ -53,7 +53,7 @@ TEST_P(LuaXlatorTest, LanguageAndEnvironmentAreEightAndFourBitsOfTheAttributes) 
                "return { getStaticDesc = function(code, lang, ade)\n"
                "return lang .. ' ' .. ade end }");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     const auto seen = [&](std::uint32_t attributes) {
         return ScriptHost::taken(
             xlator->getStaticDesc(xlator, -1, attributes, qixlator_realloc, nullptr, &status));
@@ -68,7 +68,7 @@ TEST_P(LuaXlatorTest, LanguageAndEnvironmentAreEightAndFourBitsOfTheAttributes) 
 TEST_P(LuaXlatorTest, TheStructureSizeIsSixteenWhateverThePlatform) {
     writeDynamic("");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     EXPECT_EQ(xlator->structSize, 16u);
     xlator->destroy(xlator);
 }
@@ -86,7 +86,7 @@ TEST_P(LuaXlatorTest, TheScriptKnowsItsNameAndSettings) {
         "\"b\":\"y\"},\"qixlatorlua_path\":\"/nowhere;" +
             host.root.locate("\\\\scripts/") + "\"}",
         &status);
-    ASSERT_NE(nullptr, xlator) << status.json;
+    ASSERT_NE(xlator, nullptr) << status.json;
     EXPECT_EQ(
         ScriptHost::taken(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status)),
         "xy");
@@ -98,7 +98,7 @@ TEST_P(LuaXlatorTest, WithoutAPathOnlyEmbeddedModulesAreFound) {
     EXPECT_EQ(status.code, -52003);
     qierr::Status second;
     XlatorInterface* xlator = host.create("{\"qixlatorlua_xlator\":\"qimxl_utilities\"}", &second);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     xlator->destroy(xlator);
 }
 
@@ -174,7 +174,7 @@ TEST_P(LuaXlatorTest, WithoutAHandlerTheMessageHasNoTraceback) {
                "qixlatorlua_errHandler = nil\n"
                "return { getStaticDesc = function() error('oops', 0) end }");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     EXPECT_EQ(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status), nullptr);
     EXPECT_TRUE(reported(status, "\"string\":\"oops\"}")) << status.json;
     xlator->destroy(xlator);
@@ -191,7 +191,7 @@ TEST_P(LuaXlatorTest, ManyFailuresDoNotExhaustTheState) {
                "return { getStaticDesc = function(code) if code == 0 then return 'good' "
                "end error('oops') end }");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     for (int count = 0; count < 10000; ++count) {
         qierr::Status failure;
         xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &failure);
@@ -208,7 +208,7 @@ TEST_P(LuaXlatorTest, AFailedCallLeavesTheStackAsItWas) {
                "local function fail() error('oops') end\n"
                "return { getStaticDesc = fail, getDynamicDesc = fail }");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     lua_State* L = static_cast<qixlatorlua::LuaXlator*>(xlator)->L;
     const int before = lua_gettop(L);
     qierr::Status ofStatic;
@@ -227,7 +227,7 @@ TEST_P(LuaXlatorTest, TheGarbageOfManyCallsIsCollected) {
                "return { getStaticDesc = function(code) "
                "return tostring(('x'):rep(100000) .. code):sub(1, 1) end }");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     FaultyAllocator::succeed();
     const std::int64_t before = FaultyAllocator::liveBytes();
     for (int count = 0; count < 1000; ++count) {
@@ -279,7 +279,7 @@ TEST_P(LuaXlatorTest, TheCallersAllocationIsUsed) {
     };
     host.write("chunk", "return { getStaticDesc = function() return 'text' end }");
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     char* text = xlator->getStaticDesc(xlator, -1, 0, alloc, &calls, &status);
     EXPECT_STREQ(text, "text");
     alloc(text, 0, &calls, &status);

@@ -33,7 +33,7 @@ class NativeModuleTest : public testing::Test {
                         "</qierror>\n</qidocument>\n");
     }
 
-    ScriptHost host{qixlatorlua::LuaRuntime::fast};
+    ScriptHost host{qixlatorlua::LuaRuntime::Fast};
 };
 
 TEST_F(NativeModuleTest, ExpandPathReplacesVariables) {

@@ -23,7 +23,7 @@ class RestrictionsTest : public testing::Test {
                    " end) return (ok and 'no error: ' or '') .. tostring(message)");
     }
 
-    ScriptHost host{qixlatorlua::LuaRuntime::plain};
+    ScriptHost host{qixlatorlua::LuaRuntime::Plain};
 };
 
 TEST_F(RestrictionsTest, NoProgramCanBeStartedWithAPipe) {

@@ -29,7 +29,7 @@ class ScriptFailuresTest : public testing::TestWithParam<LuaRuntime> {
     static void expectReport(const qierr_Status& status, const std::string& message,
                              const std::string& debug, int code = LUA_ERRRUN) {
         ASSERT_EQ(status.code, -52003);
-        ASSERT_NE(nullptr, status.json);
+        ASSERT_NE(status.json, nullptr);
         const std::string head =
             "{\"error_constant\":\"qiapalerr_softwareFaultAPALInternalUseOnly\","
             "\"file\":\"src/qixlatorlua/LuaState.cpp\",\"line\":#,\"component\":\"qitrmcsvc\","
@@ -78,9 +78,9 @@ class ScriptFailuresTest : public testing::TestWithParam<LuaRuntime> {
 };
 
 INSTANTIATE_TEST_SUITE_P(Runtimes, ScriptFailuresTest,
-                         testing::Values(LuaRuntime::plain, LuaRuntime::fast),
+                         testing::Values(LuaRuntime::Plain, LuaRuntime::Fast),
                          [](const testing::TestParamInfo<LuaRuntime>& runtime) {
-                             return runtime.param == LuaRuntime::plain ? "Plain" : "Fast";
+                             return runtime.param == LuaRuntime::Plain ? "Plain" : "Fast";
                          });
 
 const std::string traceback = "\\\\nstack traceback:\\\\n.*";
@@ -130,7 +130,7 @@ TEST_P(ScriptFailuresTest, AHandlerThatFailsIsReported) {
                "return { getStaticDesc = function() error('oops') end }");
     qierr::Status status;
     XlatorInterface* xlator = host.create(host.registration("chunk"), &status);
-    ASSERT_NE(nullptr, xlator);
+    ASSERT_NE(xlator, nullptr);
     EXPECT_EQ(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &status), nullptr);
     expectReport(status, "error in error handling", "failed to get static desc\"");
     xlator->destroy(xlator);
@@ -213,7 +213,7 @@ TEST_P(ScriptFailuresTest, AModuleThatIsNotATranslatorIsReportedAtItsFirstUse) {
         host.write("chunk", script);
         qierr::Status creation;
         XlatorInterface* xlator = host.create(host.registration("chunk"), &creation);
-        ASSERT_NE(nullptr, xlator) << script;
+        ASSERT_NE(xlator, nullptr) << script;
         qierr::Status first;
         EXPECT_EQ(xlator->getStaticDesc(xlator, -1, 0, qixlator_realloc, nullptr, &first), nullptr);
         expectReport(first, ".*attempt to (index|call).*", "failed to get static desc\"");

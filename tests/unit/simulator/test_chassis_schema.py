@@ -343,4 +343,3 @@ def test_both_agree_on_edits_of_a_shipped_description(probe, name):
         assert_agreement(probe, description)
 
     agree()
-

@@ -3,7 +3,6 @@ them: the readers take their lists of known members from there, and what the rea
 README lists must be the same."""
 
 import copy
-import json
 import re
 import sys
 

@@ -62,7 +62,8 @@ def test_the_code_that_a_script_raises_has_the_number_of_its_constant():
 
 def test_the_header_names_every_code_but_those_of_the_simulated_driver(tmp_path):
     header = tmp_path / "codes.h"
-    subprocess.run([ROOT / "share" / "statuses" / "make_codes.py", "--header", header], check=True, timeout=60)
+    subprocess.run([ROOT / "share" / "statuses" / "make_codes.py", "--header", header], check=True,
+                   timeout=60)
     declared = re.findall(r"^constexpr std::int32_t (\w+) = (-\d+);$", header.read_text(), re.MULTILINE)
     expected = [(row["constant"], row["code"]) for row in CATALOGUE] + [("deviceReserved", "-250811")]
     assert sorted(declared) == sorted(expected)

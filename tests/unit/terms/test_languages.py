@@ -1,7 +1,6 @@
 """Every list of the languages agrees with the table of the languages."""
 
 import re
-from pathlib import Path
 
 import pytest
 

@@ -13,13 +13,15 @@ def test_a_service_that_works_is_healthy():
     with clean_host() as host:
         status, headers, body = host.request("GET", "/healthz")
         assert (status, body) == (200, b"The service works.\n")
-        assert (headers["Content-Type"], headers["Cache-Control"]) == ("text/plain; charset=utf-8", "no-store")
+        assert (headers["Content-Type"], headers["Cache-Control"]) == (
+            "text/plain; charset=utf-8", "no-store")
 
 
 def test_missing_explanation_files_are_reported():
     with Host(plugin=BARE_PLUGIN, files=FILES) as host:
         assert host.request("GET", "/healthz")[::2] == (
-            503, b"The explanation files of the service are not found. Install them in the shared directory.\n")
+            503, b"The explanation files of the service are not found. "
+            b"Install them in the shared directory.\n")
 
 
 def test_a_service_that_is_switched_off_is_reported_in_its_own_words():

@@ -170,8 +170,8 @@ def test_a_chassis_is_renamed_with_all_its_modules(own_bench):
         # Renamed to its own name, and then to another one.
         assert rename(session, "Prüfstand", "Prüfstand") == renamed(
             "Prüfstand", "Prüfstand-Mod1", "Prüfstand-Mod2", "Prüfstand-Mod4", "Prüfstand-Mod5")
-        assert rename(session, "Prüfstand", "B") == renamed("B", "B-Mod1", "B-Mod2", "B-Mod4",
-                                                             "B-Mod5")
+        assert rename(session, "Prüfstand", "B") == renamed(
+            "B", "B-Mod1", "B-Mod2", "B-Mod4", "B-Mod5")
 
 
 def test_the_new_names_are_in_the_order_of_the_modules(session):

@@ -16,6 +16,7 @@ REQUESTS = 60
 
 # One request of each kind, with its response. Its id and one of its details contain the mark.
 
+
 def unknown_method(mark):
     return call(f"m{mark}", id=mark), standing(-32601, text(METHOD, f"Method: m{mark}"), id=mark)
 

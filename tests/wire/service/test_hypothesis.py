@@ -152,9 +152,10 @@ SOUND = {name: call(name, methods.request(name).params_in("_session1"), '"é"')
          for name in methods.NAMES}
 SOUND["batch"] = b"[" + SOUND["abortSession"] + b"," + call("x") + b"]"
 
-MUTATIONS = st.lists(st.tuples(st.floats(0, 1), st.sampled_from(["change", "insert", "delete",
-                                                                  "repeat"]),
-                               st.binary(min_size=1, max_size=3)), min_size=1, max_size=4)
+MUTATIONS = st.lists(
+    st.tuples(st.floats(0, 1), st.sampled_from(["change", "insert", "delete", "repeat"]),
+              st.binary(min_size=1, max_size=3)),
+    min_size=1, max_size=4)
 
 
 def mutate(body, mutations):

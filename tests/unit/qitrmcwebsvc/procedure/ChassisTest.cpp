@@ -58,17 +58,20 @@ class ChassisTest : public ProcedureFixture {
     }
     static Calls joined(const std::vector<Calls>& parts) {
         Calls all;
-        for (const Calls& part : parts)
+        for (const Calls& part : parts) {
             all.insert(all.end(), part.begin(), part.end());
+        }
         return all;
     }
 
     // The renames among the calls.
     Calls renames() {
         Calls found;
-        for (const std::string& call : driver.takeCalls())
-            if (call.rfind("renameDevice", 0) == 0)
+        for (const std::string& call : driver.takeCalls()) {
+            if (call.rfind("renameDevice", 0) == 0) {
                 found.push_back(call);
+            }
+        }
         return found;
     }
 

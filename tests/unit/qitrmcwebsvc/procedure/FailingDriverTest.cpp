@@ -84,12 +84,15 @@ class FailingDriverTest : public ProcedureFixture, public testing::WithParamInte
 
     // The expected failure for the client when this call fails.
     std::string expected(const std::string& call, const std::string& undisturbed) {
-        if (startsWith(call, "close"))
+        if (startsWith(call, "close")) {
             return undisturbed;
-        if (call.find("Sys.Devices") != std::string::npos)
+        }
+        if (call.find("Sys.Devices") != std::string::npos) {
             return "-250828";
-        if (call.find("Dev.Properties") != std::string::npos)
+        }
+        if (call.find("Dev.Properties") != std::string::npos) {
             return R"({"static_properties":["Dev.Name","Dev.Temperature"]})";
+        }
         return std::to_string(refusalCode);
     }
 
@@ -108,8 +111,9 @@ TEST_P(FailingDriverTest, ReportsTheErrorAndFreesEverything) {
     ASSERT_EQ(undisturbed.front(), '{') << undisturbed;
     const Calls road = driver.takeCalls();
     for (std::size_t i = 0; i < road.size(); ++i) {
-        if (cannotFail(road[i]))
+        if (cannotFail(road[i])) {
             continue;
+        }
         SCOPED_TRACE("call " + std::to_string(i) + ": " + road[i]);
         SetUp();
         const int earlier = static_cast<int>(std::count(road.begin(), road.begin() + i, road[i]));
@@ -134,11 +138,13 @@ INSTANTIATE_TEST_SUITE_P(Roads, FailingDriverTest, testing::ValuesIn(roads));
 TEST(FailingDriver, IsTriedWithEachMethod) {
     // What the driver refuses while a session is opened or closed is up to the session manager.
     std::set<std::string> tried = {"initializeSession", "closeSession"};
-    for (const Road& road : roads)
+    for (const Road& road : roads) {
         tried.insert(road.method);
+    }
     std::set<std::string> methods;
-    for (const nQITRMCWEBSVC100::Method& method : nQITRMCWEBSVC100::methodTable)
+    for (const nQITRMCWEBSVC100::Method& method : nQITRMCWEBSVC100::methodTable) {
         methods.insert(method.name);
+    }
     EXPECT_EQ(tried, methods);
 }
 

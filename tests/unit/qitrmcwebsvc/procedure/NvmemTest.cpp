@@ -96,9 +96,10 @@ TEST_F(NvmemTest, WritingNothingIsRefusedByTheSchema) {
 }
 
 TEST_F(NvmemTest, WritingWhatIsNotAByteIsRefusedByTheSchema) {
-    for (const char* data : {"[256]", "[-1]", "[1.0]", "[\"1\"]"})
+    for (const char* data : {"[256]", "[-1]", "[1.0]", "[\"1\"]"}) {
         EXPECT_EQ(ask("setNvmemBytes", R"("address":0,"data":)" + std::string(data)).substr(0, 6),
                   "-32602");
+    }
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 

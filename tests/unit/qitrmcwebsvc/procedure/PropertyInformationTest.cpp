@@ -32,8 +32,9 @@ class PropertyInformationTest : public ProcedureFixture {
 
 TEST_F(PropertyInformationTest, APropertyWithoutTextsHasOnlyTheFourRequiredMembers) {
     for (const char* name :
-         {"Prop.Descr", "Prop.Doc", "Prop.MaxValue", "Prop.MinValue", "Prop.Unit"})
+         {"Prop.Descr", "Prop.Doc", "Prop.MaxValue", "Prop.MinValue", "Prop.Unit"}) {
         giveText(name, "");
+    }
     EXPECT_EQ(ask("getPropertyInformation", question),
               R"({"data_type":"Int32","access":"ReadWrite","driver_defined":false,)"
               R"("pending_changes":false})");

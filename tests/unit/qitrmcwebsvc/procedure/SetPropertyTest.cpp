@@ -18,9 +18,11 @@ class SetPropertyTest : public ProcedureFixture {
 
     // The write among the latest calls; empty if there is none.
     std::string write() {
-        for (const std::string& call : driver.calls())
-            if (call.rfind("set", 0) == 0)
+        for (const std::string& call : driver.calls()) {
+            if (call.rfind("set", 0) == 0) {
                 return call;
+            }
+        }
         return "";
     }
 };
@@ -42,8 +44,9 @@ class SetPropertyAcceptsTest : public SetPropertyTest,
                                public testing::WithParamInterface<Accepted> {};
 
 TEST_P(SetPropertyAcceptsTest, TheValueAndReturnsTheType) {
-    if (GetParam().dataType == 8)
+    if (GetParam().dataType == 8) {
         expectOwnArray();
+    }
     EXPECT_EQ(set(GetParam().dataType, GetParam().value), GetParam().result);
     const std::string function = GetParam().write;
     const std::size_t split = function.find('|');
@@ -134,8 +137,9 @@ TEST_F(SetPropertyTest, TheSchemaRefusesAnEmptyArrayAndMixedElements) {
         R"("value":"Wrong data type for parameter property. The data type must be one of the )"
         R"(following data types: boolean, string, number, array of boolean, array of string, or )"
         R"(array of number.","value_type":"string"}])";
-    for (const char* value : {"[]", R"([1,"a"])", "[1,true]", "null", "{}", "[[1]]"})
+    for (const char* value : {"[]", R"([1,"a"])", "[1,true]", "null", "{}", "[[1]]"}) {
         EXPECT_EQ(set(10, value), wrongForm) << value;
+    }
     EXPECT_EQ(driver.takeCalls(), Calls{});
 }
 
@@ -193,8 +197,9 @@ TEST_F(SetPropertyTest, AFailingWriteStillClosesTheProperty) {
 }
 
 TEST_F(SetPropertyTest, AnUnknownDataTypeFailsWithoutDetails) {
-    for (const int number : {0, 15, -1})
+    for (const int number : {0, 15, -1}) {
         EXPECT_EQ(set(number, "5"), "-250800");
+    }
     EXPECT_EQ(afterOpening(driver.takeCalls()), Calls{"closeProperty(22)"});
 }
 
