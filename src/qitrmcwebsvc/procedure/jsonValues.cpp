@@ -2,6 +2,7 @@
 
 #include <qitrmcapi.h>
 
+#include <algorithm>
 #include <limits>
 #include <new>
 
@@ -22,7 +23,9 @@ JsonValue textValue(std::string_view text, JsonAllocator& allocator) {
 
 void reserveElements(JsonValue& array, std::size_t count, JsonAllocator& allocator) {
     // The JSON library does not check this multiplication for overflow.
-    if (count > largestSize || count > PTRDIFF_MAX / sizeof(JsonValue)) {
+    constexpr std::size_t most =
+        std::min<std::size_t>(largestSize, PTRDIFF_MAX / sizeof(JsonValue));
+    if (count > most) {
         throw std::bad_alloc();
     }
     array.Reserve(static_cast<rapidjson::SizeType>(count), allocator);

@@ -5,7 +5,7 @@ import re
 
 import pytest
 
-ROOT = pathlib.Path(__file__).resolve().parents[3]
+ROOT = pathlib.Path(__file__).resolve().parents[2]
 METHODS = re.findall(r'^QITRMC_METHOD\("(\w+)"',
                      (ROOT / "src/qitrmcwebsvc/methods.def").read_text(encoding="utf-8"), re.MULTILINE)
 EXACT = {method.casefold(): method for method in METHODS}

@@ -3,7 +3,7 @@
 import pathlib
 import re
 
-ROOT = pathlib.Path(__file__).resolve().parents[3]
+ROOT = pathlib.Path(__file__).resolve().parents[2]
 SOURCES = (".h", ".c", ".cpp", ".def")
 
 # A folder of src/ may include headers of its own floor or of one further down.
@@ -53,6 +53,12 @@ def test_includes_of_the_plug_in_point_downwards():
             if floor is not None and floor > own_floor and (name, folder) not in ALLOWED_UPWARDS:
                 faults.append(f"{name} includes {header}")
     assert faults == []
+
+
+def test_common_includes_nothing_else_of_the_project():
+    for path in sources("common"):
+        for header in re.findall(r'#include "([^"]+)"', path.read_text()):
+            assert header.startswith("common/"), f"{path}: {header}"
 
 
 def test_the_plug_in_does_not_include_the_simulator_or_the_host():

@@ -3,7 +3,7 @@
 import pathlib
 import re
 
-INCLUDE = pathlib.Path(__file__).resolve().parents[3] / "include"
+INCLUDE = pathlib.Path(__file__).resolve().parents[2] / "include"
 HEADERS = sorted(INCLUDE.glob("*.h"))
 # Types of POSIX whose size the build's settings for files and times change.
 CHANGING = r"\b(blkcnt|dev|fpos|fsblkcnt|fsfilcnt|ino|off|rlim|suseconds|time)(64)?_t\b"
