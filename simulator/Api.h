@@ -1,7 +1,6 @@
 #pragma once
 
-// The functions of these headers are what this library shows to the world; all else in it is
-// hidden.
+// The library exports the functions of these headers; all other symbols are hidden.
 #pragma GCC visibility push(default)
 #include "qitrmcapi.h"
 #include "qitrmcsim.h"

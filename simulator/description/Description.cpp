@@ -5,7 +5,7 @@
 #include <system_error>
 
 #include "description/Nearest.h"
-#include "description/SyntaxFault.h"
+#include "description/SyntaxError.h"
 #include "model/Values.h"
 
 namespace simulator {
@@ -41,15 +41,15 @@ bool isOutOfRange(std::string_view number) {
 
 void refuseOddNumber(std::string_view text, size_t place, std::string_view number) {
     if (hasHugeExponent(number)) {
-        throw DescriptionFault{"", "holds a number out of range at " + lineAndColumn(text, place),
+        throw DescriptionError{"", "holds a number out of range at " + lineAndColumn(text, place),
                                "exponents have at most 4 digits"};
     }
     if (isOutOfRange(number)) {
-        throw DescriptionFault{"", "holds a number out of range at " + lineAndColumn(text, place),
+        throw DescriptionError{"", "holds a number out of range at " + lineAndColumn(text, place),
                                "numbers are 0 or have an amount from 1e-300 to 1.79e308"};
     }
     if (isLongZero(number)) {
-        throw DescriptionFault{"", "holds a zero of many signs at " + lineAndColumn(text, place),
+        throw DescriptionError{"", "holds a zero of many signs at " + lineAndColumn(text, place),
                                "must be written as 0"};
     }
 }
@@ -118,7 +118,7 @@ void parseDescription(std::string_view text, JsonDocument& document, const char*
                                rapidjson::kParseFullPrecisionFlag;
     document.Parse<flags>(text.data(), text.size());
     if (document.HasParseError()) {
-        throw syntaxFault(text, document.GetErrorOffset(), document.GetParseError(), what);
+        throw syntaxError(text, document.GetErrorOffset(), document.GetParseError(), what);
     }
 }
 
@@ -153,7 +153,7 @@ std::string Node::shown() const {
 }
 
 void Node::fail(std::string wrong, std::string right) const {
-    throw DescriptionFault{pointer, std::move(wrong), std::move(right)};
+    throw DescriptionError{pointer, std::move(wrong), std::move(right)};
 }
 
 void Node::expect(bool condition, const char* right) const {
@@ -179,7 +179,7 @@ bool Node::has(const char* member) const {
 Node Node::member(const char* name, const char* right) const {
     const auto found = value->FindMember(name);
     if (found == value->MemberEnd()) {
-        throw DescriptionFault{childPointer(name), "is missing", std::string("must be ") + right};
+        throw DescriptionError{childPointer(name), "is missing", std::string("must be ") + right};
     }
     return Node(found->value, childPointer(name));
 }

@@ -12,7 +12,7 @@
 
 namespace simulator {
 
-// Memory for the JSON library, which does not look for null itself.
+// Memory for the JSON library, which does not check for null itself.
 class ThrowingAllocator {
   public:
     static const bool kNeedFree = true;
@@ -40,15 +40,15 @@ using JsonValue = rapidjson::GenericValue<rapidjson::UTF8<>, JsonAllocator>;
 using JsonDocument =
     rapidjson::GenericDocument<rapidjson::UTF8<>, JsonAllocator, ThrowingAllocator>;
 
-// Thrown where a description is not as it should be.
-struct DescriptionFault {
+// Thrown when a description is invalid.
+struct DescriptionError {
     // Where, as a JSON pointer; empty for the whole text.
     std::string pointer;
     std::string wrong;
     std::string right;
 };
 
-// A text with question marks in place of its control characters.
+// A text with its control characters replaced by question marks.
 std::string oneLine(std::string_view text);
 
 // Names with commas between them.
@@ -58,8 +58,8 @@ std::string listed(const std::vector<std::string>& names);
 void parseDescription(std::string_view text, JsonDocument& document,
                       const char* what = "a chassis description");
 
-// One value of a description together with its place, for reading it with plain words about what
-// is wrong. The reading functions throw DescriptionFault.
+// One value of a description together with its place, so that errors can say where they are. The
+// reading functions throw DescriptionError.
 class Node {
   public:
     explicit Node(const JsonValue& value, std::string pointer = "")
@@ -100,7 +100,7 @@ class Node {
             visit(element(i));
         }
     }
-    // Calls visit(name, Node) for the members of an object, in order. None may stand there twice.
+    // Calls visit(name, Node) for the members of an object, in order. None may occur twice.
     template <typename Visit>
     void forEachMember(Visit visit) const {
         expect(value->IsObject(), "an object");

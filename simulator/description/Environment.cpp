@@ -4,7 +4,7 @@
 #include <cstdlib>
 #include <system_error>
 
-#include "description/StartRefusal.h"
+#include "description/ErrorReport.h"
 
 namespace simulator {
 

@@ -10,13 +10,13 @@ namespace simulator {
 struct TimeScale {
     // Simulated seconds in one real second.
     double factor = 1.0;
-    // Time stands still but for one step with each call, and commands take no real time.
+    // Time advances by one step with each call only, and commands take no real time.
     bool byCalls = false;
 };
 
-// What the environment says about how the simulator runs.
+// What the environment sets.
 struct Settings {
-    // Nothing when the chassis file may choose.
+    // Empty when that of the chassis file applies.
     std::optional<uint64_t> seed;
     TimeScale timeScale;
 };
@@ -24,7 +24,7 @@ struct Settings {
 // The value of a variable of the environment; empty when it is not set.
 std::string environmentText(const char* variable);
 
-// Refuses to start because a variable has a wrong value. `right` goes on behind "must be".
+// Refuses to start because a variable has a wrong value. `right` completes "must be".
 [[noreturn]] void refuseVariable(const char* variable, const std::string& right);
 
 // Reads QITRMC_SIM_SEED and QITRMC_SIM_TIME_SCALE.

@@ -25,7 +25,7 @@ void addPart(std::string& line, const std::string& part) {
     }
 }
 
-// The channels of a device are numbered from 0 behind one prefix.
+// The channels of a device are numbered from 0, after a common prefix.
 std::string channels(const Device& device) {
     if (device.physChans.empty()) {
         return "";

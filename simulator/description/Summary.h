@@ -6,8 +6,8 @@
 
 namespace simulator {
 
-// What is where, in lines for people to read: the devices, what stands in which slot, the channels
-// and the NVMEM areas.
+// The devices, the modules in their slots, the channels and the NVMEM areas, as lines for people to
+// read.
 std::string summaryOf(const Chassis& chassis);
 
 }  // namespace simulator

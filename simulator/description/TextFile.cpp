@@ -42,7 +42,7 @@ class OpenFile {
 };
 
 [[noreturn]] void refuseUnreadable(const char* right) {
-    throw DescriptionFault{"", std::string("cannot be read: ") + std::strerror(errno), right};
+    throw DescriptionError{"", std::string("cannot be read: ") + std::strerror(errno), right};
 }
 
 }  // namespace
@@ -83,7 +83,7 @@ TextFile readTextFile(const std::string& path, const char* right) {
     while ((count = file.read(piece.data(), piece.size())) > 0) {
         read.text.append(piece.data(), static_cast<size_t>(count));
         if (read.text.size() > largestFile) {
-            throw DescriptionFault{"", "is larger than 16 MiB", right};
+            throw DescriptionError{"", "is larger than 16 MiB", right};
         }
     }
     if (count < 0) {

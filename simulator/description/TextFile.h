@@ -8,7 +8,7 @@
 
 namespace simulator {
 
-// By which two states of a file are told apart.
+// Identifies a state of a file, to notice changes.
 struct FileVersion {
     FileVersion() = default;
     explicit FileVersion(const struct stat& state);
@@ -16,7 +16,7 @@ struct FileVersion {
     bool operator==(const FileVersion& other) const;
     bool operator!=(const FileVersion& other) const { return !(*this == other); }
 
-    // All others mean something only when the file is there.
+    // The other members are meaningful only if the file exists.
     bool exists = false;
     bool isPipe = false;
     dev_t device = 0;
@@ -26,7 +26,7 @@ struct FileVersion {
     int64_t nanoseconds = 0;
 };
 
-// The present version of a file. One that cannot be asked for it is there, but has no more to tell.
+// The present version of a file. If it cannot be determined, only `exists` is set.
 FileVersion versionOf(const std::string& path) noexcept;
 
 struct TextFile {
@@ -34,7 +34,7 @@ struct TextFile {
     FileVersion version;
 };
 
-// Reads a file of at most 16 MiB. Throws DescriptionFault, in which `right` says what the file has
+// Reads a file of at most 16 MiB. Throws DescriptionError, in which `right` says what the file has
 // to be.
 TextFile readTextFile(const std::string& path, const char* right);
 

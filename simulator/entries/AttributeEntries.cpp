@@ -1,8 +1,8 @@
 // The attributes of properties.
 
 #include "entries/Attributes.h"
-#include "entries/TypedValues.h"
-#include "sessions/PropertyDesk.h"
+#include "entries/ValueFunctions.h"
+#include "sessions/PropertyAccessor.h"
 
 using namespace simulator;
 
@@ -16,31 +16,18 @@ const OpenProperty& openProperty(Simulator& simulator, nQITRMCAPI100_Property ha
     return *found;
 }
 
-template <typename Value>
-void getScalar(const char* function, nQITRMCAPI100_Property handle, const char* name, DataType type,
-               Value* value, qierr_Status* status) {
-    clearOutputs(status, value);
-    const auto call = [&] {
-        return Call(function).in("handle", handle).in("attribute", name).out("value", value);
-    };
-    withSimulator(status, call, [&](Simulator& simulator, auto&) {
-        const OpenProperty& property = openProperty(simulator, handle);
-        lendScalar(attribute(simulator, property, required(name, "attribute"), type), value);
-    });
-}
+struct PropertyAttribute {
+    nQITRMCAPI100_Property handle;
+    const char* name;
 
-template <typename Value>
-void getArray(const char* function, nQITRMCAPI100_Property handle, const char* name, DataType type,
-              Value** array, uint32_t* count, qierr_Status* status) {
-    clearOutputs(status, array, count);
-    const auto call = [&] {
-        return Call(function).in("handle", handle).in("attribute", name).out("array", array, count);
-    };
-    withSimulator(status, call, [&](Simulator& simulator, auto&) {
+    Call describe(const char* function) const {
+        return Call(function).in("handle", handle).in("attribute", name);
+    }
+    Elements read(Simulator& simulator, DataType type) const {
         const OpenProperty& property = openProperty(simulator, handle);
-        lendArray(attribute(simulator, property, required(name, "attribute"), type), array, count);
-    });
-}
+        return attribute(simulator, property, required(name, "attribute"), type);
+    }
+};
 
 }  // namespace
 
@@ -52,7 +39,7 @@ void nQITRMCAPI100_openDriverDefinedProperty(nQITRMCAPI100_Session session, cons
     };
     withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         *handle = simulator.openProperties.add(
-            PropertyDesk(simulator, owner).openDriverDefined(required(property, "property")));
+            PropertyAccessor(simulator, owner).openDriverDefined(required(property, "property")));
     });
 }
 
@@ -69,7 +56,7 @@ void nQITRMCAPI100_openGenericProperty(nQITRMCAPI100_Session session, const char
     };
     withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         *handle = simulator.openProperties.add(
-            PropertyDesk(simulator, owner)
+            PropertyAccessor(simulator, owner)
                 .openGeneric(required(resource, "resource"), required(property, "property")));
     });
 }
@@ -84,27 +71,27 @@ void nQITRMCAPI100_closeProperty(nQITRMCAPI100_Property handle, qierr_Status* st
 
 void nQITRMCAPI100_getPropertyPropertyInt32(nQITRMCAPI100_Property handle, const char* attribute,
                                             int32_t* value, qierr_Status* status) {
-    getScalar(__func__, handle, attribute, DataType::int32, value, status);
+    getScalar(__func__, PropertyAttribute{handle, attribute}, value, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyBool(nQITRMCAPI100_Property handle, const char* attribute,
                                            uint8_t* value, qierr_Status* status) {
-    getScalar(__func__, handle, attribute, DataType::boolean, value, status);
+    getScalar(__func__, PropertyAttribute{handle, attribute}, value, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyString(nQITRMCAPI100_Property handle, const char* attribute,
                                              char** value, qierr_Status* status) {
-    getScalar(__func__, handle, attribute, DataType::text, value, status);
+    getScalar(__func__, PropertyAttribute{handle, attribute}, value, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyInt32Array(nQITRMCAPI100_Property handle,
                                                  const char* attribute, int32_t** array,
                                                  uint32_t* count, qierr_Status* status) {
-    getArray(__func__, handle, attribute, DataType::int32Array, array, count, status);
+    getArray(__func__, PropertyAttribute{handle, attribute}, array, count, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyStringArray(nQITRMCAPI100_Property handle,
                                                   const char* attribute, char*** array,
                                                   uint32_t* count, qierr_Status* status) {
-    getArray(__func__, handle, attribute, DataType::textArray, array, count, status);
+    getArray(__func__, PropertyAttribute{handle, attribute}, array, count, status);
 }

@@ -6,8 +6,8 @@
 
 namespace simulator {
 
-// One attribute of an open property. `type` is the data type that the caller's function stands
-// for. Refuses with unknownAttribute. A text that the property does not have is empty.
+// One attribute of an open property. `type` is the data type in the name of the driver's
+// function. Refuses with unknownAttribute. A text that the property does not have is empty.
 Elements attribute(const Simulator& simulator, const OpenProperty& property, std::string_view name,
                    DataType type);
 

@@ -41,13 +41,13 @@ std::vector<Task> findTasks(const Resolver& resolver, std::string_view resources
     return tasks;
 }
 
-// Marks resources as busy for as long as it lives.
-class Occupation {
+// Marks resources as busy during its lifetime.
+class BusyMark {
   public:
-    explicit Occupation(const std::vector<Task>& tasks) : tasks(tasks) { mark(true); }
-    Occupation(const Occupation&) = delete;
-    Occupation& operator=(const Occupation&) = delete;
-    ~Occupation() { mark(false); }
+    explicit BusyMark(const std::vector<Task>& tasks) : tasks(tasks) { mark(true); }
+    BusyMark(const BusyMark&) = delete;
+    BusyMark& operator=(const BusyMark&) = delete;
+    ~BusyMark() { mark(false); }
 
   private:
     void mark(bool busy) {
@@ -67,7 +67,7 @@ std::vector<Device*> devicesOf(const std::vector<Task>& tasks) {
     return devices;
 }
 
-// Lets the time of the commands pass; they run side by side.
+// Lets the time of the commands pass; they run in parallel.
 void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Session session,
                Waits& waits, std::unique_lock<std::mutex>& lock) {
     double longest = 0.0;
@@ -102,12 +102,12 @@ void nQITRMCAPI100_executeGenericCommand(nQITRMCAPI100_Session session, const ch
         const Session& owner = simulator.sessions.get(session);
         const auto tasks = findTasks(simulator.resolver(owner), required(resources, "resources"),
                                      required(command, "command"));
-        const double patience = checkedTimeout(timeout);
+        const double allowed = checkedTimeout(timeout);
         for (const Task& task : tasks) {
             expectReady(*task.resource, simulator, session);
         }
-        const Occupation occupation(tasks);
-        spendTime(tasks, patience, session, simulator.waits, lock);
+        const BusyMark busyMark(tasks);
+        spendTime(tasks, allowed, session, simulator.waits, lock);
         if (const Refusal* warning = finish(tasks, simulator)) {
             report(*warning, *status);
         }

@@ -1,6 +1,6 @@
 #include <algorithm>
 
-#include "entries/Border.h"
+#include "entries/Entry.h"
 #include "model/NameText.h"
 
 using namespace simulator;
@@ -33,7 +33,7 @@ void expectAnswers(const std::vector<Device*>& devices, double timeout) {
     throw refusal;
 }
 
-// Lets the time pass that the devices need, side by side.
+// Lets the time pass that the devices need, in parallel.
 void spendConnectTime(const std::vector<Device*>& devices, double timeout,
                       nQITRMCAPI100_Session session, Waits& waits,
                       std::unique_lock<std::mutex>& lock) {
@@ -51,7 +51,7 @@ void spendConnectTime(const std::vector<Device*>& devices, double timeout,
 }
 
 void expectFreeName(const Chassis& chassis, const Device& device, std::string_view name) {
-    const std::string fault = nameFault(name);
+    const std::string fault = nameError(name);
     if (!fault.empty()) {
         throw Refusal(code::invalidName)
             .usage(tag::requestedValue, name)
@@ -73,13 +73,13 @@ void nQITRMCAPI100_connectToDevices(nQITRMCAPI100_Session session, const char* d
     withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
         Session& owner = simulator.sessions.get(session);
         auto wanted = simulator.resolver(owner).devicesToConnect(required(devices, "devices"));
-        const double patience = timeout < 0.0 ? usualConnectTime : checkedTimeout(timeout);
+        const double allowed = timeout < 0.0 ? usualConnectTime : checkedTimeout(timeout);
         const auto isConnected = [&](const Device* device) {
             return contains(owner.connectedDevices, device);
         };
         wanted.erase(std::remove_if(wanted.begin(), wanted.end(), isConnected), wanted.end());
-        spendConnectTime(wanted, patience, session, simulator.waits, lock);
-        expectAnswers(wanted, patience);
+        spendConnectTime(wanted, allowed, session, simulator.waits, lock);
+        expectAnswers(wanted, allowed);
         std::copy_if(wanted.begin(), wanted.end(), std::back_inserter(owner.connectedDevices),
                      [&](const Device* device) { return !isConnected(device); });
     });
@@ -117,7 +117,7 @@ void nQITRMCAPI100_resetDevices(nQITRMCAPI100_Session session, const char* devic
             simulator.reservations.expectWritable(session, *device);
         }
         for (Device* device : wanted) {
-            simulator.chassis->reset(*device, simulator.clock.now());
+            simulator.reset(*device);
         }
     });
 }

@@ -3,23 +3,23 @@
 #include <string>
 
 #include "description/Description.h"
-#include "entries/Border.h"
-#include "entries/Lending.h"
+#include "entries/Entry.h"
 #include "faults/FaultReader.h"
+#include "lending/Lending.h"
 #include "sessions/Simulator.h"
 
 using namespace simulator;
 
 namespace {
 
-// Returns the code, and puts words about a failure into `why`.
+// Returns the code, and puts a description of a failure into `why`.
 int32_t setFaults(const char* json, std::string& why) {
     try {
-        Simulator& simulator = Simulator::instance();
-        const std::unique_lock<std::mutex> lock(simulator.mutex);
-        simulator.faults.replace(readFaults(required(json, "json"), *simulator.chassis));
+        Driver& driver = Driver::instance();
+        const std::lock_guard<std::mutex> lock(driver.simulator.mutex);
+        driver.faults.replace(readFaults(required(json, "json"), *driver.simulator.chassis));
         return 0;
-    } catch (const DescriptionFault& fault) {
+    } catch (const DescriptionError& fault) {
         why = fault.pointer + (fault.pointer.empty() ? "" : " ") + fault.wrong + "; " + fault.right;
         return code::invalidFaults.number;
     } catch (const Refusal& refusal) {

@@ -1,114 +1,93 @@
 // The properties of devices, physical channels and NVMEM areas.
 
-#include "entries/TypedValues.h"
-#include "sessions/PropertyDesk.h"
+#include "entries/ValueFunctions.h"
+#include "sessions/PropertyAccessor.h"
 
 using namespace simulator;
 
 namespace {
 
-Call propertyCall(const char* function, nQITRMCAPI100_Session session, const char* resources,
-                  const char* property) {
-    return Call(function)
-        .session(session)
-        .resources("resources", resources)
-        .in("property", property);
-}
+struct ResourceProperty {
+    nQITRMCAPI100_Session session;
+    const char* resources;
+    const char* name;
 
-template <typename Value>
-void getScalar(const char* function, nQITRMCAPI100_Session session, const char* resources,
-               const char* property, DataType type, Value* value, qierr_Status* status) {
-    clearOutputs(status, value);
-    const auto call = [&] {
-        return propertyCall(function, session, resources, property).out("value", value);
-    };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
-        PropertyDesk desk(simulator, owner);
-        lendScalar(
-            desk.read(required(resources, "resources"), required(property, "property"), type),
-            value);
-    });
-}
+    Call describe(const char* function) const {
+        return Call(function)
+            .session(session)
+            .resources("resources", resources)
+            .in("property", name);
+    }
+    Elements read(Simulator& simulator, DataType type) const {
+        return PropertyAccessor(simulator, simulator.sessions.get(session))
+            .read(required(resources, "resources"), required(name, "property"), type);
+    }
+    void write(Simulator& simulator, DataType type, const Elements& values) const {
+        PropertyAccessor(simulator, simulator.sessions.get(session))
+            .write(required(resources, "resources"), required(name, "property"), type, values);
+    }
+};
 
-template <typename Value>
-void getArray(const char* function, nQITRMCAPI100_Session session, const char* resources,
-              const char* property, DataType type, Value** array, uint32_t* count,
-              qierr_Status* status) {
-    clearOutputs(status, array, count);
-    const auto call = [&] {
-        return propertyCall(function, session, resources, property).out("array", array, count);
-    };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
-        PropertyDesk desk(simulator, owner);
-        lendArray(desk.read(required(resources, "resources"), required(property, "property"), type),
-                  array, count);
-    });
-}
+struct DeviceProperty {
+    nQITRMCAPI100_Session session;
+    const char* device;
+    const char* name;
 
-template <typename Value>
-void setScalar(const char* function, nQITRMCAPI100_Session session, const char* resources,
-               const char* property, DataType type, Value value, qierr_Status* status) {
-    const auto call = [&] {
-        return propertyCall(function, session, resources, property).in("value", value);
-    };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
-        PropertyDesk(simulator, owner)
-            .write(required(resources, "resources"), required(property, "property"), type,
-                   asElements(value));
-    });
-}
-
-template <typename Value>
-void setArray(const char* function, nQITRMCAPI100_Session session, const char* resources,
-              const char* property, DataType type, const Value* array, uint32_t count,
-              qierr_Status* status) {
-    const auto call = [&] {
-        return propertyCall(function, session, resources, property).in("array", array, count);
-    };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
-        PropertyDesk(simulator, owner)
-            .write(required(resources, "resources"), required(property, "property"), type,
-                   asElements(array, count));
-    });
-}
+    Call describe(const char* function) const {
+        return Call(function)
+            .session(session)
+            .resources("device", device, "$DefaultDevices")
+            .in("property", name);
+    }
+    Elements read(Simulator& simulator, DataType type) const {
+        Session& owner = simulator.sessions.get(session);
+        const Device& found =
+            simulator.resolver(owner).oneDevice(device != nullptr ? device : "$DefaultDevices");
+        return PropertyAccessor(simulator, owner)
+            .read(found.name, required(name, "property"), type);
+    }
+};
 
 }  // namespace
 
-// The four functions of one type. Given and Taken are the C types of a value that comes out and
-// of one that goes in.
-#define GENERIC_PROPERTY_FUNCTIONS(Name, Given, Taken, type)                                       \
-    void nQITRMCAPI100_getGenericProperty##Name(nQITRMCAPI100_Session session,                     \
-                                                const char* resources, const char* property,       \
-                                                Given* value, qierr_Status* status) {              \
-        getScalar(__func__, session, resources, property, DataType::type, value, status);          \
-    }                                                                                              \
-    void nQITRMCAPI100_getGenericProperty##Name##Array(                                            \
-        nQITRMCAPI100_Session session, const char* resources, const char* property, Given** array, \
-        uint32_t* count, qierr_Status* status) {                                                   \
-        getArray(__func__, session, resources, property, DataType::type##Array, array, count,      \
-                 status);                                                                          \
-    }                                                                                              \
-    void nQITRMCAPI100_setGenericProperty##Name(nQITRMCAPI100_Session session,                     \
-                                                const char* resources, const char* property,       \
-                                                Taken value, qierr_Status* status) {               \
-        setScalar(__func__, session, resources, property, DataType::type, value, status);          \
-    }                                                                                              \
-    void nQITRMCAPI100_setGenericProperty##Name##Array(                                            \
-        nQITRMCAPI100_Session session, const char* resources, const char* property,                \
-        Taken const* array, uint32_t count, qierr_Status* status) {                                \
-        setArray(__func__, session, resources, property, DataType::type##Array, array, count,      \
-                 status);                                                                          \
+// The four functions of one type. Read and Written are its C types.
+#define GENERIC_PROPERTY_FUNCTIONS(Name, Read, Written)                                           \
+    void nQITRMCAPI100_getGenericProperty##Name(nQITRMCAPI100_Session session,                    \
+                                                const char* resources, const char* property,      \
+                                                Read* value, qierr_Status* status) {              \
+        getScalar(__func__, ResourceProperty{session, resources, property}, value, status);       \
+    }                                                                                             \
+    void nQITRMCAPI100_getGenericProperty##Name##Array(                                           \
+        nQITRMCAPI100_Session session, const char* resources, const char* property, Read** array, \
+        uint32_t* count, qierr_Status* status) {                                                  \
+        getArray(__func__, ResourceProperty{session, resources, property}, array, count, status); \
+    }                                                                                             \
+    void nQITRMCAPI100_setGenericProperty##Name(nQITRMCAPI100_Session session,                    \
+                                                const char* resources, const char* property,      \
+                                                Written value, qierr_Status* status) {            \
+        setScalar(__func__, ResourceProperty{session, resources, property}, value, status);       \
+    }                                                                                             \
+    void nQITRMCAPI100_setGenericProperty##Name##Array(                                           \
+        nQITRMCAPI100_Session session, const char* resources, const char* property,               \
+        Written const* array, uint32_t count, qierr_Status* status) {                             \
+        setArray(__func__, ResourceProperty{session, resources, property}, array, count, status); \
     }
 
-GENERIC_PROPERTY_FUNCTIONS(Bool, uint8_t, uint8_t, boolean)
-GENERIC_PROPERTY_FUNCTIONS(Double, double, double, real)
-GENERIC_PROPERTY_FUNCTIONS(Int32, int32_t, int32_t, int32)
-GENERIC_PROPERTY_FUNCTIONS(Int64, int64_t, int64_t, int64)
-GENERIC_PROPERTY_FUNCTIONS(String, char*, const char*, text)
-GENERIC_PROPERTY_FUNCTIONS(UInt32, uint32_t, uint32_t, uint32)
-GENERIC_PROPERTY_FUNCTIONS(UInt64, uint64_t, uint64_t, uint64)
+GENERIC_PROPERTY_FUNCTIONS(Bool, uint8_t, uint8_t)
+GENERIC_PROPERTY_FUNCTIONS(Double, double, double)
+GENERIC_PROPERTY_FUNCTIONS(Int32, int32_t, int32_t)
+GENERIC_PROPERTY_FUNCTIONS(Int64, int64_t, int64_t)
+GENERIC_PROPERTY_FUNCTIONS(String, char*, const char*)
+GENERIC_PROPERTY_FUNCTIONS(UInt32, uint32_t, uint32_t)
+GENERIC_PROPERTY_FUNCTIONS(UInt64, uint64_t, uint64_t)
 
 #undef GENERIC_PROPERTY_FUNCTIONS
+
+void nQITRMCAPI100_getDevicePropertyString(nQITRMCAPI100_Session session, const char* device,
+                                           const char* property, char** value,
+                                           qierr_Status* status) {
+    getScalar(__func__, DeviceProperty{session, device, property}, value, status);
+}
 
 void nQITRMCAPI100_commitPropertiesGeneric(nQITRMCAPI100_Session session, const char* resources,
                                            qierr_Status* status) {
@@ -116,25 +95,6 @@ void nQITRMCAPI100_commitPropertiesGeneric(nQITRMCAPI100_Session session, const 
         return Call(function).session(session).resources("resources", resources);
     };
     withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
-        PropertyDesk(simulator, owner).commit(required(resources, "resources"));
-    });
-}
-
-void nQITRMCAPI100_getDevicePropertyString(nQITRMCAPI100_Session session, const char* device,
-                                           const char* property, char** value,
-                                           qierr_Status* status) {
-    clearOutputs(status, value);
-    const auto call = [&, function = __func__] {
-        return Call(function)
-            .session(session)
-            .resources("device", device, "$DefaultDevices")
-            .in("property", property)
-            .out("value", value);
-    };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
-        const char* resource = device != nullptr ? device : "$DefaultDevices";
-        const Device& found = simulator.resolver(owner).oneDevice(resource);
-        PropertyDesk desk(simulator, owner);
-        lendScalar(desk.read(found.name, required(property, "property"), DataType::text), value);
+        PropertyAccessor(simulator, owner).commit(required(resources, "resources"));
     });
 }

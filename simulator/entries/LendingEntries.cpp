@@ -1,5 +1,5 @@
 #include "Api.h"
-#include "entries/Lending.h"
+#include "lending/Lending.h"
 
 void nQITRMCAPI100_freeString(char* text) {
     simulator::takeBackText(text);

@@ -1,6 +1,6 @@
 #include <algorithm>
 
-#include "entries/Border.h"
+#include "entries/Entry.h"
 
 using namespace simulator;
 

@@ -1,4 +1,4 @@
-// What the simulator tells those who watch it while clients use it.
+// What the simulator reports for the panel of the development server.
 
 #include <rapidjson/stringbuffer.h>
 #include <rapidjson/writer.h>
@@ -6,8 +6,8 @@
 #include <mutex>
 #include <new>
 
-#include "entries/Lending.h"
-#include "sessions/Simulator.h"
+#include "entries/Driver.h"
+#include "lending/Lending.h"
 #include "status/Refusal.h"
 
 using namespace simulator;
@@ -83,7 +83,8 @@ void writeDevice(Writer& writer, const Chassis& chassis, const Device& device) {
     writer.EndObject();
 }
 
-std::string describeDevices(Simulator& simulator) {
+std::string describeDevices(Driver& driver) {
+    Simulator& simulator = driver.simulator;
     rapidjson::StringBuffer text;
     Writer writer(text);
     const std::lock_guard<std::mutex> lock(simulator.mutex);
@@ -95,8 +96,8 @@ std::string describeDevices(Simulator& simulator) {
     return text.GetString();
 }
 
-std::string traceFrom(Simulator& simulator, uint64_t from) {
-    const TraceMemory::Lines lines = simulator.trace.latest.read(from);
+std::string traceFrom(Driver& driver, uint64_t from) {
+    const TraceMemory::Lines lines = driver.trace.latest.read(from);
     rapidjson::StringBuffer text;
     Writer writer(text);
     writer.StartObject();
@@ -112,12 +113,12 @@ std::string traceFrom(Simulator& simulator, uint64_t from) {
     return text.GetString();
 }
 
-// Lends the text that describe(simulator) returns.
+// Lends the text that describe(driver) returns.
 template <typename Describe>
 int32_t lendDescription(char** json, Describe describe) {
     *json = nullptr;
     try {
-        *json = lendText(describe(Simulator::instance()));
+        *json = lendText(describe(Driver::instance()));
         return 0;
     } catch (const Refusal& refusal) {
         return refusal.code();
@@ -129,10 +130,10 @@ int32_t lendDescription(char** json, Describe describe) {
 }  // namespace
 
 int32_t qitrmcsim_getFaults(char** json) {
-    return lendDescription(json, [](Simulator& simulator) {
-        const std::lock_guard<std::mutex> lock(simulator.mutex);
-        simulator.faults.refresh();
-        return simulator.faults.plan()->text;
+    return lendDescription(json, [](Driver& driver) {
+        const std::lock_guard<std::mutex> lock(driver.simulator.mutex);
+        driver.faults.refresh();
+        return driver.faults.plan()->text;
     });
 }
 
@@ -141,5 +142,5 @@ int32_t qitrmcsim_describeDevices(char** json) {
 }
 
 int32_t qitrmcsim_readTrace(uint64_t from, char** json) {
-    return lendDescription(json, [&](Simulator& simulator) { return traceFrom(simulator, from); });
+    return lendDescription(json, [&](Driver& driver) { return traceFrom(driver, from); });
 }

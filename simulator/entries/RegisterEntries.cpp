@@ -1,5 +1,5 @@
-#include "entries/Border.h"
-#include "sessions/RegisterDesk.h"
+#include "entries/Entry.h"
+#include "sessions/RegisterAccessor.h"
 
 using namespace simulator;
 
@@ -18,7 +18,7 @@ void readRegister(const char* function, nQITRMCAPI100_Session session, const cha
     };
     withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
-        RegisterDesk desk(simulator, owner);
+        RegisterAccessor desk(simulator, owner);
         *value = static_cast<Number>(desk.read(found, address, sizeof(Number)));
     });
 }
@@ -35,7 +35,7 @@ void writeRegister(const char* function, nQITRMCAPI100_Session session, const ch
     };
     withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
-        RegisterDesk desk(simulator, owner);
+        RegisterAccessor desk(simulator, owner);
         if (const Refusal* warning = desk.write(found, address, sizeof(Number), value)) {
             report(*warning, *status);
         }
@@ -44,42 +44,20 @@ void writeRegister(const char* function, nQITRMCAPI100_Session session, const ch
 
 }  // namespace
 
-void nQITRMCAPI100_readRegisterUInt8(nQITRMCAPI100_Session session, const char* device,
-                                     uint32_t address, uint8_t* value, qierr_Status* status) {
-    readRegister(__func__, session, device, address, value, status);
-}
+// The two functions of one width.
+#define REGISTER_FUNCTIONS(Name, Number)                                                           \
+    void nQITRMCAPI100_readRegister##Name(nQITRMCAPI100_Session session, const char* device,       \
+                                          uint32_t address, Number* value, qierr_Status* status) { \
+        readRegister(__func__, session, device, address, value, status);                           \
+    }                                                                                              \
+    void nQITRMCAPI100_writeRegister##Name(nQITRMCAPI100_Session session, const char* device,      \
+                                           uint32_t address, Number value, qierr_Status* status) { \
+        writeRegister(__func__, session, device, address, value, status);                          \
+    }
 
-void nQITRMCAPI100_readRegisterUInt16(nQITRMCAPI100_Session session, const char* device,
-                                      uint32_t address, uint16_t* value, qierr_Status* status) {
-    readRegister(__func__, session, device, address, value, status);
-}
+REGISTER_FUNCTIONS(UInt8, uint8_t)
+REGISTER_FUNCTIONS(UInt16, uint16_t)
+REGISTER_FUNCTIONS(UInt32, uint32_t)
+REGISTER_FUNCTIONS(UInt64, uint64_t)
 
-void nQITRMCAPI100_readRegisterUInt32(nQITRMCAPI100_Session session, const char* device,
-                                      uint32_t address, uint32_t* value, qierr_Status* status) {
-    readRegister(__func__, session, device, address, value, status);
-}
-
-void nQITRMCAPI100_readRegisterUInt64(nQITRMCAPI100_Session session, const char* device,
-                                      uint32_t address, uint64_t* value, qierr_Status* status) {
-    readRegister(__func__, session, device, address, value, status);
-}
-
-void nQITRMCAPI100_writeRegisterUInt8(nQITRMCAPI100_Session session, const char* device,
-                                      uint32_t address, uint8_t value, qierr_Status* status) {
-    writeRegister(__func__, session, device, address, value, status);
-}
-
-void nQITRMCAPI100_writeRegisterUInt16(nQITRMCAPI100_Session session, const char* device,
-                                       uint32_t address, uint16_t value, qierr_Status* status) {
-    writeRegister(__func__, session, device, address, value, status);
-}
-
-void nQITRMCAPI100_writeRegisterUInt32(nQITRMCAPI100_Session session, const char* device,
-                                       uint32_t address, uint32_t value, qierr_Status* status) {
-    writeRegister(__func__, session, device, address, value, status);
-}
-
-void nQITRMCAPI100_writeRegisterUInt64(nQITRMCAPI100_Session session, const char* device,
-                                       uint32_t address, uint64_t value, qierr_Status* status) {
-    writeRegister(__func__, session, device, address, value, status);
-}
+#undef REGISTER_FUNCTIONS

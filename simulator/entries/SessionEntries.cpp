@@ -1,6 +1,6 @@
 #include <utility>
 
-#include "entries/Border.h"
+#include "entries/Entry.h"
 
 namespace simulator {
 

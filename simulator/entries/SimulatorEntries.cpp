@@ -1,9 +1,9 @@
 // What the simulator offers beyond the driver's functions.
 
 #include "description/Summary.h"
-#include "entries/Ledger.h"
-#include "entries/Lending.h"
-#include "sessions/Simulator.h"
+#include "entries/Driver.h"
+#include "lending/Ledger.h"
+#include "lending/Lending.h"
 #include "status/Refusal.h"
 
 using namespace simulator;
@@ -11,7 +11,7 @@ using namespace simulator;
 int32_t qitrmcsim_start(char** text) {
     *text = nullptr;
     try {
-        Simulator& simulator = Simulator::instance();
+        Simulator& simulator = Driver::instance().simulator;
         const std::lock_guard<std::mutex> lock(simulator.mutex);
         *text = lendText(summaryOf(*simulator.chassis));
         return 0;
@@ -29,7 +29,7 @@ void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
     counts->numberArrays = static_cast<uint32_t>(ledger.count(Ledger::Item::numbers));
     counts->textArrays = static_cast<uint32_t>(ledger.count(Ledger::Item::texts));
     try {
-        Simulator& simulator = Simulator::instance();
+        Simulator& simulator = Driver::instance().simulator;
         const std::lock_guard<std::mutex> lock(simulator.mutex);
         counts->openProperties = simulator.openProperties.size();
         counts->openCommands = simulator.openCommands.size();
@@ -41,7 +41,7 @@ void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
 
 uint64_t qitrmcsim_countCalls(void) {
     try {
-        Simulator& simulator = Simulator::instance();
+        Simulator& simulator = Driver::instance().simulator;
         const std::lock_guard<std::mutex> lock(simulator.mutex);
         return simulator.clock.calls();
     } catch (...) {

@@ -8,7 +8,7 @@ namespace simulator {
 namespace {
 
 constexpr std::string_view emptyText = "{}";
-// A NUL behind the text, and the end marker.
+// A NUL after the text, and the end marker.
 constexpr size_t framing = 2;
 
 bool putText(qierr_Status& status, std::string_view text) noexcept {

@@ -9,8 +9,8 @@
 namespace simulator {
 
 // Sets the code of a status that is not negative yet, unless it is a warning that would replace a
-// warning, and puts the details into its text. The room for the text is made by the record's own
-// reallocJson; where that fails the code is set and the details are lost.
+// warning, and puts the details into its text. The memory for the text comes from the record's own
+// reallocJson; if that fails the code is set and the details are lost.
 void fillStatus(qierr_Status& status, int32_t code, std::string_view text) noexcept;
 
 // Puts a refusal into a status. Without the memory for its details, only the code arrives.

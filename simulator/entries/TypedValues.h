@@ -4,13 +4,35 @@
 #include <string>
 #include <vector>
 
-#include "entries/Border.h"
-#include "entries/Lending.h"
+#include "entries/Entry.h"
+#include "lending/Lending.h"
 #include "model/Values.h"
 
-// Between the C types of the driver's functions and values. A text is a pointer there, and a
-// Boolean the only number of 8 bits.
+// Conversion between the C types of the driver's functions and values. A text is a pointer in C,
+// and a Boolean the only number of 8 bits.
 namespace simulator {
+
+constexpr DataType typeOf(uint8_t) {
+    return DataType::boolean;
+}
+constexpr DataType typeOf(double) {
+    return DataType::real;
+}
+constexpr DataType typeOf(int32_t) {
+    return DataType::int32;
+}
+constexpr DataType typeOf(int64_t) {
+    return DataType::int64;
+}
+constexpr DataType typeOf(const char*) {
+    return DataType::text;
+}
+constexpr DataType typeOf(uint32_t) {
+    return DataType::uint32;
+}
+constexpr DataType typeOf(uint64_t) {
+    return DataType::uint64;
+}
 
 template <typename Number>
 void lendScalar(const Elements& elements, Number* value) {

@@ -4,45 +4,45 @@
 #include <exception>
 #include <mutex>
 
+#include "entries/Driver.h"
 #include "entries/StatusFiller.h"
-#include "faults/Strike.h"
-#include "sessions/Simulator.h"
+#include "faults/MatchedFault.h"
 #include "trace/Call.h"
 
 namespace simulator {
 
-// One call while somebody watches: a fault may strike it, and it goes into the trace with its
+// One call while there is a trace or a fault: a fault may apply to it, and it is traced with its
 // outcome.
 class WatchedCall {
   public:
-    WatchedCall(Simulator& simulator, const Call& call, qierr_Status& status)
-        : simulator(simulator), call(call), status(status) {}
+    WatchedCall(Driver& driver, const Call& call, qierr_Status& status)
+        : driver(driver), call(call), status(status) {}
 
-    // Runs body(lock) with the simulator's mutex held. What it throws ends up in the status.
+    // Runs body(lock) with the simulator's mutex locked. An exception ends up in the status.
     template <typename Body>
     void run(Body body) noexcept {
         const auto start = std::chrono::steady_clock::now();
         try {
-            std::unique_lock<std::mutex> lock(simulator.mutex);
-            simulator.clock.noteCall();
-            simulator.faults.refresh();
-            const Strike strike(simulator, call);
-            strike.before(lock);
+            std::unique_lock<std::mutex> lock(driver.simulator.mutex);
+            driver.simulator.clock.noteCall();
+            driver.faults.refresh();
+            const MatchedFault fault(driver.simulator, driver.faults, call);
+            fault.applyBefore(lock);
             const std::exception_ptr warning = warningOf(body, lock);
-            strike.after();
+            fault.applyAfter();
             if (warning != nullptr) {
                 std::rethrow_exception(warning);
             }
         } catch (...) {
             reportCurrentException(status);
         }
-        if (simulator.trace.isOn()) {
-            simulator.trace.note(call, status, start);
+        if (driver.trace.isOn()) {
+            driver.trace.note(call, status, start);
         }
     }
 
   private:
-    // Runs the body. A warning comes back, a failure goes on.
+    // Runs the body. Returns the exception of a warning; that of a failure is thrown on.
     template <typename Body>
     static std::exception_ptr warningOf(Body body, std::unique_lock<std::mutex>& lock) {
         try {
@@ -56,7 +56,7 @@ class WatchedCall {
         return nullptr;
     }
 
-    Simulator& simulator;
+    Driver& driver;
     const Call call;
     qierr_Status& status;
 };

@@ -8,7 +8,7 @@ namespace simulator {
 
 namespace {
 
-// An even spread over 0 to 1, 1 not among them, that depends on every bit of the number.
+// A number from 0 to below 1 that depends on every bit of the given number, evenly distributed.
 double drawOf(uint64_t number) {
     number += 0x9E3779B97F4A7C15u;
     number = (number ^ (number >> 30)) * 0xBF58476D1CE4E5B9u;
@@ -30,12 +30,12 @@ bool Fault::matchesFunction(std::string_view name) const {
     return isBeginning ? name.substr(0, function.size()) == function : name == function;
 }
 
-bool Fault::takeTurn(uint32_t seed, size_t place) {
+bool Fault::countCall(uint32_t seed, size_t place) {
     ++matched;
     if (matched < first || (matched - first) % every != 0 || (matched - first) / every >= count) {
         return false;
     }
-    // Odd factors keep neighbours apart.
+    // Odd factors, so that adjacent numbers give unrelated results.
     constexpr uint64_t seedFactor = 0xD1342543DE82EF95u;
     constexpr uint64_t placeFactor = 0xAF251AF3B0F025B5u;
     return drawOf(seed * seedFactor + place * placeFactor + matched) < probability;

@@ -12,9 +12,9 @@
 
 namespace simulator {
 
-// What becomes of the texts and arrays that a call gives out.
+// How the texts and arrays that a call returns are changed.
 struct OutputFault {
-    // Both are null; a count stands beside the null array.
+    // Texts and arrays are null; the count of a null array is `count`.
     bool isNull = false;
     // The texts in arrays are null.
     bool hasNullItems = false;
@@ -23,24 +23,24 @@ struct OutputFault {
     std::optional<uint32_t> count;
 };
 
-// Which calls a fault strikes, and what it does to them.
+// Which calls a fault applies to, and what it does to them.
 class Fault {
   public:
     // The name of a function without its prefix, or the beginning of such names.
     std::string function;
     bool isBeginning = true;
-    // A method of the service instead, whose functions are struck; empty for none.
+    // A method of the service instead, for all functions that it calls; empty for none.
     std::string method;
     // Null for calls about anything.
     const Resource* resource = nullptr;
-    // Of the calls that match: the first that is struck, the distance from one to the next, and how
-    // many.
+    // Of the calls that match: the first that the fault applies to, the distance from one to the
+    // next, and how many.
     uint64_t first = 1;
     uint64_t every = 1;
     uint64_t count = std::numeric_limits<uint64_t>::max();
-    // Of these calls again, the part that is struck, 0 to 1.
+    // Of these calls again, the fraction that the fault applies to, 0 to 1.
     double probability = 1.0;
-    // Seconds since the plan came into force, between which calls are struck.
+    // Seconds since the plan came into force, between which the fault applies.
     double begin = 0.0;
     double end = std::numeric_limits<double>::infinity();
 
@@ -48,20 +48,20 @@ class Fault {
     double delay = 0.0;
     // A failure or a warning.
     std::optional<Refusal> status;
-    // Whether a call that fails is carried out before.
+    // Whether a call that fails is carried out first.
     bool failsAfterwards = false;
     std::optional<OutputFault> output;
 
     bool matchesFunction(std::string_view name) const;
-    // Counts a call that matches. Returns whether it is struck. The same seed, the same place in
-    // the plan and the same number of calls give the same result.
-    bool takeTurn(uint32_t seed, size_t place);
+    // Counts a call that matches. Returns whether the fault applies to it. The same seed, the same
+    // place in the plan and the same number of calls give the same result.
+    bool countCall(uint32_t seed, size_t place);
 
   private:
     uint64_t matched = 0;
 };
 
-// What keeps a device from answering for a while.
+// A device does not answer for a while.
 struct DeviceEvent {
     const Device* device;
     Absence absence;

@@ -7,7 +7,7 @@
 #include "MethodFunctions.h"
 #include "description/Description.h"
 #include "description/Nearest.h"
-#include "description/StatusFile.h"
+#include "description/StatusReader.h"
 
 namespace simulator {
 
@@ -16,7 +16,7 @@ namespace {
 constexpr uint32_t mostBytes = 1u << 30;
 constexpr uint32_t mostElements = 1u << 24;
 
-// The name in a text that may have the prefix of all functions in front.
+// A function name without the common prefix, which it may have.
 std::string_view nameOf(std::string_view text) {
     constexpr std::string_view prefix = "nQITRMCAPI100_";
     return text.substr(0, prefix.size()) == prefix ? text.substr(prefix.size()) : text;

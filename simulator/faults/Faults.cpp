@@ -5,7 +5,7 @@
 #include <cstdlib>
 #include <utility>
 
-#include "description/StartRefusal.h"
+#include "description/ErrorReport.h"
 #include "faults/FaultReader.h"
 
 namespace simulator {
@@ -21,24 +21,21 @@ std::string pathFromEnvironment() {
 
 }  // namespace
 
-Faults::Faults(Chassis& chassis, Sessions& sessions, Waits& waits, const Clock& clock)
-    : chassis(chassis),
-      sessions(sessions),
-      waits(waits),
-      clock(clock),
+Faults::Faults(Simulator& simulator)
+    : simulator(simulator),
       path(pathFromEnvironment()),
       current(std::make_shared<FaultPlan>()),
-      start(clock.now()) {
-    waits.follow(*this);
-    noteWatching();
+      start(simulator.clock.now()) {
+    simulator.waits.setSchedule(*this);
+    updateIsOn();
     try {
         readFile();
-    } catch (const DescriptionFault& fault) {
+    } catch (const DescriptionError& fault) {
         refuseStart(path, fault);
     }
 }
 
-void Faults::noteWatching() {
+void Faults::updateIsOn() {
     on = !path.empty() || !current->isEmpty();
 }
 
@@ -54,13 +51,13 @@ void Faults::readFile() {
     }
     try {
         if (present.isPipe) {
-            throw DescriptionFault{"", "is a pipe, which is read but once",
+            throw DescriptionError{"", "is a pipe, which is read but once",
                                    "QITRMC_SIM_FAULTS must name a file on a disk"};
         }
         const TextFile file = readTextFile(path, "QITRMC_SIM_FAULTS must name a readable file");
-        replace(readFaults(file.text, chassis));
+        replace(readFaults(file.text, *simulator.chassis));
         version = file.version;
-    } catch (const DescriptionFault&) {
+    } catch (const DescriptionError&) {
         version = present;
         throw;
     }
@@ -69,15 +66,15 @@ void Faults::readFile() {
 void Faults::refresh() {
     try {
         readFile();
-    } catch (const DescriptionFault& fault) {
-        tellFault(path, {fault.pointer, fault.wrong, fault.right + "; the former faults stay"});
+    } catch (const DescriptionError& fault) {
+        reportError(path, {fault.pointer, fault.wrong, fault.right + "; the former faults stay"});
     }
     catchUp();
 }
 
 void Faults::replace(FaultPlan fresh) {
     auto former = std::make_shared<FaultPlan>(std::move(fresh));
-    const int64_t formerStart = std::exchange(start, clock.now());
+    const int64_t formerStart = std::exchange(start, simulator.clock.now());
     current.swap(former);
     due = start;
     try {
@@ -87,11 +84,11 @@ void Faults::replace(FaultPlan fresh) {
         start = formerStart;
         throw;
     }
-    noteWatching();
+    updateIsOn();
     for (Wait* wait : delays) {
         wait->finish(Wait::End::done);
     }
-    waits.lookAgain();
+    simulator.waits.scheduleChanged();
 }
 
 void Faults::delay(nQITRMCAPI100_Session session, double seconds,
@@ -102,11 +99,11 @@ void Faults::delay(nQITRMCAPI100_Session session, double seconds,
         std::list<Wait*>& list;
         const std::list<Wait*>::iterator place;
     } const isDelaying{delays, delays.insert(delays.end(), &wait)};
-    waits.spend(wait, seconds, lock);
+    simulator.waits.spend(wait, seconds, lock);
 }
 
 int64_t Faults::timeOf(double seconds) const {
-    // A time that nobody lives to see is as good as never.
+    // A time beyond a century counts as never.
     constexpr double century = 100.0 * 366.0 * 24.0 * 60.0 * 60.0;
     return seconds < century ? start + std::llround(seconds * 1e6) : never;
 }
@@ -122,14 +119,14 @@ Absence Faults::absenceAt(const Device& device, int64_t time) const {
 }
 
 void Faults::catchUp() {
-    const int64_t now = clock.now();
+    const int64_t now = simulator.clock.now();
     while (due != never && due <= now) {
         passTime(due);
     }
 }
 
 void Faults::passTime(int64_t time) {
-    for (const auto& device : chassis.devices()) {
+    for (const auto& device : simulator.chassis->devices()) {
         change(*device, absenceAt(*device, time));
     }
     due = never;
@@ -145,24 +142,25 @@ void Faults::change(Device& device, Absence absence) {
         return;
     }
     if (device.absence == Absence::removed) {
-        chassis.reset(device, clock.now());
+        simulator.reset(device);
     }
     if (absence == Absence::removed) {
         device.dropAllPending();
     }
     if (absence == Absence::removed || device.absence == Absence::removed) {
-        ++chassis.changes;
+        ++simulator.chassis->changes;
     }
     device.absence = absence;
+    const int64_t now = simulator.clock.now();
     device.forEachResource(
-        [&](const Resource& resource) { chassis.life.noteChange(resource, clock.now()); });
+        [&](const Resource& resource) { simulator.motions.noteChange(resource, now); });
     if (absence != Absence::none) {
-        sessions.forEach([&](Session& session) {
+        simulator.sessions.forEach([&](Session& session) {
             auto& connected = session.connectedDevices;
             connected.erase(std::remove(connected.begin(), connected.end(), &device),
                             connected.end());
         });
-        waits.endAbout(device);
+        simulator.waits.endAbout(device);
     }
 }
 

@@ -8,56 +8,52 @@
 
 #include "description/TextFile.h"
 #include "faults/FaultPlan.h"
-#include "sessions/Sessions.h"
-#include "sessions/Waits.h"
+#include "sessions/Simulator.h"
 
 namespace simulator {
 
 // The faults and events that are in force. Needs the simulator's mutex to be held, except for
 // isOn().
-class Faults : public Agenda {
+class Faults : public Schedule {
   public:
     // Reads the file that QITRMC_SIM_FAULTS names. A file that is missing has no faults. Refuses
-    // with chassisNotLoaded when it is broken.
-    Faults(Chassis& chassis, Sessions& sessions, Waits& waits, const Clock& clock);
+    // with chassisNotLoaded when it is invalid.
+    explicit Faults(Simulator& simulator);
 
-    // Whether calls have to be shown to this object.
+    // Whether calls have to be matched with the faults.
     bool isOn() const noexcept { return on.load(); }
 
-    // To be called at the beginning of each call. Reads the file again when it is another one than
-    // the last time, and lets events happen. A file that is broken by then leaves everything as it
-    // is, and is told on standard error once.
+    // To be called at the beginning of each call. Reads the file again if it has changed, and
+    // carries out events that are due. A file that has become invalid changes nothing, and is
+    // reported on standard error once.
     void refresh();
     // Puts another plan into force. Its time begins now.
     void replace(FaultPlan fresh);
 
-    // Lets time pass, with the mutex given up, until other faults come into force. Refuses when the
+    // Lets time pass, with the mutex unlocked, until other faults come into force. Refuses when the
     // session is aborted or closed meanwhile.
     void delay(nQITRMCAPI100_Session session, double seconds, std::unique_lock<std::mutex>& lock);
 
-    // The plan lives on while somebody holds it.
+    // The plan is valid as long as the pointer is kept.
     const std::shared_ptr<FaultPlan>& plan() const { return current; }
 
-    // Whether a time, in seconds since the plan came into force, has come or is over.
-    bool isPast(double seconds) const { return timeOf(seconds) <= clock.now(); }
+    // Whether a time, in seconds since the plan came into force, is now or in the past.
+    bool isPast(double seconds) const { return timeOf(seconds) <= simulator.clock.now(); }
 
     int64_t next() const override { return due; }
     void catchUp() override;
 
   private:
     void readFile();
-    void noteWatching();
-    // Lets happen what belongs to one time, and finds the next.
+    void updateIsOn();
+    // Carries out the events of one time, and finds the next time.
     void passTime(int64_t time);
     void change(Device& device, Absence absence);
     Absence absenceAt(const Device& device, int64_t time) const;
     int64_t timeOf(double seconds) const;
 
-    Chassis& chassis;
-    Sessions& sessions;
-    Waits& waits;
-    const Clock& clock;
-    // Empty when none is named.
+    Simulator& simulator;
+    // Empty when there is no faults file.
     const std::string path;
     FileVersion version;
     std::shared_ptr<FaultPlan> current;

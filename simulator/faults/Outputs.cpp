@@ -4,7 +4,7 @@
 #include <new>
 #include <utility>
 
-#include "entries/Lending.h"
+#include "lending/Lending.h"
 
 namespace simulator {
 
@@ -22,7 +22,7 @@ void takeBack(char** array, uint32_t count) noexcept {
 }
 
 template <typename Item>
-void lendInstead(const WantedArray<Item>& wanted, Item* array, uint32_t count) noexcept {
+void lendInstead(const OutputArray<Item>& wanted, Item* array, uint32_t count) noexcept {
     takeBack(std::exchange(*wanted.place, array), std::exchange(*wanted.count, count));
 }
 
@@ -41,7 +41,7 @@ class Distortion {
   public:
     explicit Distortion(const OutputFault& output) : output(output) {}
 
-    void operator()(const Wanted<char*>& wanted) const {
+    void operator()(const Output<char*>& wanted) const {
         if (output.isNull) {
             takeBackText(std::exchange(*wanted.place, nullptr));
         } else if (output.textSize) {
@@ -49,7 +49,7 @@ class Distortion {
         }
     }
     template <typename Number>
-    void operator()(const WantedArray<Number>& wanted) const {
+    void operator()(const OutputArray<Number>& wanted) const {
         if (output.isNull) {
             lendInstead(wanted, static_cast<Number*>(nullptr), output.count.value_or(0));
         } else if (output.count) {
@@ -57,7 +57,7 @@ class Distortion {
                         *output.count);
         }
     }
-    void operator()(const WantedArray<char*>& wanted) const {
+    void operator()(const OutputArray<char*>& wanted) const {
         if (output.isNull) {
             lendInstead(wanted, static_cast<char**>(nullptr), output.count.value_or(0));
         } else {
@@ -99,18 +99,18 @@ class Distortion {
 
 // Takes back an output of any kind.
 struct TakingBack {
-    void operator()(const Wanted<char*>& wanted) const {
+    void operator()(const Output<char*>& wanted) const {
         takeBackText(std::exchange(*wanted.place, nullptr));
     }
     template <typename Number>
-    void operator()(const Wanted<Number>& wanted) const {
+    void operator()(const Output<Number>& wanted) const {
         *wanted.place = Number{};
     }
     template <typename Item>
-    void operator()(const WantedArray<Item>& wanted) const {
+    void operator()(const OutputArray<Item>& wanted) const {
         lendInstead(wanted, static_cast<Item*>(nullptr), 0);
     }
-    void operator()(const WantedBytes& wanted) const {
+    void operator()(const OutputBytes& wanted) const {
         std::fill_n(wanted.buffer, wanted.size, uint8_t{0});
     }
     template <typename Other>
@@ -142,7 +142,7 @@ void distortOutputs(const Call& call, const OutputFault& output) {
 
 void takeBackOutputs(Simulator& simulator, const Call& call) noexcept {
     for (const Argument& argument : call) {
-        if (const auto* number = std::get_if<Wanted<uint32_t>>(&argument.value)) {
+        if (const auto* number = std::get_if<Output<uint32_t>>(&argument.value)) {
             closeOpened(simulator, call.function(), *number->place);
         }
         std::visit(TakingBack(), argument.value);

@@ -6,7 +6,7 @@
 
 namespace simulator {
 
-// Changes what a call has lent to its caller. What it replaces is taken back. Throws
+// Changes what a call has lent to its caller. What is replaced is freed. Throws
 // std::bad_alloc, also when more than 1 GiB of texts would be lent.
 void distortOutputs(const Call& call, const OutputFault& output);
 

@@ -65,8 +65,8 @@ double sineOfTurn(double turn) {
     return turn > 0.5 ? -x * sum : x * sum;
 }
 
-double tame(double number) {
-    return std::isnan(number) ? 0.0 : std::clamp(number, -largestTame, largestTame);
+double finite(double number) {
+    return std::isnan(number) ? 0.0 : std::clamp(number, -largestFinite, largestFinite);
 }
 
 }  // namespace simulator

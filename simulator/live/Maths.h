@@ -19,12 +19,11 @@ double gaussian(uint64_t key);
 
 // exp(-x) for x from 0 to infinity.
 double decay(double x);
-// The sine of a part of a turn, 0 to 1.
+// The sine of a fraction of a turn, 0 to 1.
 double sineOfTurn(double turn);
 
-// Anything as a number with which sums and differences stay finite: at most 1e300 either side of
-// 0, and 0 for what is no number.
-double tame(double number);
-constexpr double largestTame = 1e300;
+// The number, limited to -1e300 to 1e300 so that sums and differences stay finite; 0 for NaN.
+double finite(double number);
+constexpr double largestFinite = 1e300;
 
 }  // namespace simulator

@@ -12,20 +12,20 @@ namespace {
 constexpr double microseconds = 1e6;
 constexpr int64_t noiseTick = 1000;
 
-// What keeps the random numbers of one stream for different uses apart.
+// The uses of one random stream; each has its own numbers.
 enum class Use : uint64_t { drift = 1, noise, samples };
 
-uint64_t keyFor(Use use, const Dice& dice, int64_t tick) {
-    return mixed(mixed(dice.stream + static_cast<uint64_t>(use)) ^ static_cast<uint64_t>(tick));
+uint64_t keyFor(Use use, const RandomStream& random, int64_t tick) {
+    return mixed(mixed(random.stream + static_cast<uint64_t>(use)) ^ static_cast<uint64_t>(tick));
 }
 
 // -1 to 1.
-double knotAt(const Dice& dice, int64_t knot) {
-    return 2.0 * uniform(keyFor(Use::drift, dice, knot)) - 1.0;
+double knotAt(const RandomStream& random, int64_t knot) {
+    return 2.0 * uniform(keyFor(Use::drift, random, knot)) - 1.0;
 }
 
-uint64_t keyOfSample(Use use, const Dice& dice, uint64_t index) {
-    return mixed(keyFor(use, dice, dice.elapsed / noiseTick) ^ index);
+uint64_t keyOfSample(Use use, const RandomStream& random, uint64_t index) {
+    return mixed(keyFor(use, random, random.elapsed / noiseTick) ^ index);
 }
 
 // -1 to 1, for a part of a period from 0 (inclusive) to 1 (exclusive).
@@ -48,18 +48,18 @@ double shapeAt(Waveform::Shape shape, double phase) {
 
 }  // namespace
 
-double driftAt(const Drift& drift, const Dice& dice) {
-    const double position = static_cast<double>(dice.elapsed) / (drift.period * microseconds);
+double driftAt(const Drift& drift, const RandomStream& random) {
+    const double position = static_cast<double>(random.elapsed) / (drift.period * microseconds);
     const double knot = std::floor(position);
     const double part = position - knot;
-    const double from = knotAt(dice, static_cast<int64_t>(knot));
-    const double to = knotAt(dice, static_cast<int64_t>(knot) + 1);
+    const double from = knotAt(random, static_cast<int64_t>(knot));
+    const double to = knotAt(random, static_cast<int64_t>(knot) + 1);
     const double smooth = part * part * (3.0 - 2.0 * part);
     return drift.amplitude * std::clamp(from + (to - from) * smooth, -1.0, 1.0);
 }
 
-double noiseAt(double deviation, const Dice& dice, uint64_t index) {
-    return deviation == 0.0 ? 0.0 : deviation * gaussian(keyOfSample(Use::noise, dice, index));
+double noiseAt(double deviation, const RandomStream& random, uint64_t index) {
+    return deviation == 0.0 ? 0.0 : deviation * gaussian(keyOfSample(Use::noise, random, index));
 }
 
 uint64_t countAt(const Counts& counts, int64_t elapsed) {
@@ -73,13 +73,13 @@ uint64_t countAt(const Counts& counts, int64_t elapsed) {
     return seconds * whole + rest / million + static_cast<uint64_t>(broken);
 }
 
-double sampleAt(const Waveform& waveform, double rate, const Dice& dice, uint64_t index) {
+double sampleAt(const Waveform& waveform, double rate, const RandomStream& random, uint64_t index) {
     if (waveform.shape == Waveform::Shape::noise) {
-        const double random = uniform(keyOfSample(Use::samples, dice, index));
-        return waveform.offset + waveform.amplitude * (2.0 * random - 1.0);
+        const double part = uniform(keyOfSample(Use::samples, random, index));
+        return waveform.offset + waveform.amplitude * (2.0 * part - 1.0);
     }
     const double periods =
-        rate > 0.0 ? tame(waveform.frequency * static_cast<double>(index) / rate) : 0.0;
+        rate > 0.0 ? finite(waveform.frequency * static_cast<double>(index) / rate) : 0.0;
     return waveform.offset +
            waveform.amplitude * shapeAt(waveform.shape, periods - std::floor(periods));
 }
@@ -96,7 +96,7 @@ double firstNumber(const Elements& value) {
             if constexpr (std::is_same_v<std::decay_t<decltype(list)>, List<std::string>>) {
                 return 0.0;
             } else {
-                return tame(static_cast<double>(list.front()));
+                return finite(static_cast<double>(list.front()));
             }
         },
         value);

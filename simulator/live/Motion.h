@@ -11,20 +11,20 @@ namespace simulator {
 
 struct Resource;
 
-// A waveform has no more samples than this, whatever a property asks for: 8 MiB of numbers, of
+// The maximum number of samples of a waveform, whatever a property asks for: 8 MiB of numbers, of
 // which a small controller must hold some copies.
 constexpr uint32_t mostSamples = 1u << 20;
 
-// Takes its number from another property, instead of the stored value.
+// The number is that of another property instead of the stored value.
 struct Follows {
     const Property* source = nullptr;
-    // To which the source belongs. While its device is not in its slot the number is 0.
+    // The resource of the source. While its device is not in its slot the number is 0.
     const Resource* owner = nullptr;
     // A Bool; while it is false the number is 0. May be null.
     const Property* condition = nullptr;
     double factor = 1.0;
     double offset = 0.0;
-    // In seconds. Above 0 the number comes near each new target exponentially.
+    // In seconds. Above 0 the number approaches each new target exponentially.
     double timeConstant = 0.0;
 
     // With a time constant: the target, and the number when it became the target.
@@ -39,7 +39,7 @@ struct Drift {
     double period = 1.0;
 };
 
-// Adds up events since the property's restart.
+// Counts events since the property's restart.
 struct Counts {
     double perSecond = 0.0;
 };
@@ -64,9 +64,9 @@ struct Waveform {
     Quantity sampleRate;
 };
 
-// All that moves one property. Counts stand alone; a waveform may have noise with it.
+// How one property moves. Counts exclude everything else, a waveform everything but noise.
 struct Motion {
-    // Where its random numbers come from, together with the seed.
+    // Determines the random numbers, together with the seed.
     uint64_t key = 0;
     // When the property was powered on or reset.
     int64_t since = 0;
@@ -79,20 +79,20 @@ struct Motion {
 };
 
 // Random numbers of one motion at one time.
-struct Dice {
+struct RandomStream {
     uint64_t stream;
     // Since the restart.
     int64_t elapsed;
 };
 
 // The parts of a value, from what belongs to one motion alone.
-double driftAt(const Drift& drift, const Dice& dice);
-// `index` tells the samples of a record apart.
-double noiseAt(double deviation, const Dice& dice, uint64_t index);
+double driftAt(const Drift& drift, const RandomStream& random);
+// `index` is that of a sample in a record.
+double noiseAt(double deviation, const RandomStream& random, uint64_t index);
 // Modulo 2^64.
 uint64_t countAt(const Counts& counts, int64_t elapsed);
 // Before noise is added. A rate that is not above 0 leaves all samples at the first one.
-double sampleAt(const Waveform& waveform, double rate, const Dice& dice, uint64_t index);
+double sampleAt(const Waveform& waveform, double rate, const RandomStream& random, uint64_t index);
 // The number on its way to the target, for a time constant above 0.
 double laggedAt(const Follows& follows, int64_t now);
 

@@ -73,11 +73,6 @@ NvmemArea& Chassis::addNvmemArea(Device& device, const std::string& name) {
     return *device.nvmemAreas.back();
 }
 
-void Chassis::reset(Device& device, int64_t now) {
-    device.reset();
-    device.forEachResource([&](const Resource& resource) { life.restart(resource, now); });
-}
-
 void Chassis::rename(Device& device, const std::string& newName,
                      const std::function<void()>& keep) {
     std::string name = newName;

@@ -8,7 +8,6 @@
 #include <string_view>
 #include <vector>
 
-#include "live/Life.h"
 #include "model/Commands.h"
 #include "model/Nvmem.h"
 #include "model/Properties.h"
@@ -20,10 +19,10 @@ enum class Kind { device, physChan, nvmemArea };
 
 struct Device;
 
-// What keeps a device from answering at the moment.
+// Why a device does not answer at the moment.
 enum class Absence { none, connectionLost, removed };
 
-// Something that clients name. Resources live as long as the chassis; their addresses identify
+// Something that clients name. Resources exist as long as the chassis; their addresses identify
 // them, while their names may change.
 struct Resource {
     Resource(Kind kind, std::string name, Device& device)
@@ -39,7 +38,7 @@ struct Resource {
     Command* command(std::string_view commandName);
 
     Kind kind;
-    // The part of the name behind the slash, or the whole name of a device.
+    // The part of the name after the slash, or the whole name of a device.
     std::string name;
     // The device that this belongs to; a device belongs to itself.
     Device* device;
@@ -67,7 +66,7 @@ struct Device : Resource {
     int32_t category = 0;
     std::vector<std::unique_ptr<Resource>> physChans;
     std::vector<std::unique_ptr<NvmemArea>> nvmemAreas;
-    // What stands in the slots of a chassis, owned by the chassis.
+    // The modules in the slots of a chassis device; owned by the Chassis.
     std::vector<Device*> modules;
     // The channels and areas by their folded names, without the device's.
     std::map<std::string, Resource*, std::less<>> parts;
@@ -75,7 +74,7 @@ struct Device : Resource {
     // How long it takes to connect, and whether the device answers then.
     double connectSeconds = 0.0;
     bool reachable = true;
-    // Whoever names the device or its parts while this is not none is refused.
+    // While this is not none, calls that name the device or its parts are refused.
     Absence absence = Absence::none;
 
     // Calls visit(Resource&) for the device itself and all its parts.
@@ -89,33 +88,30 @@ struct Device : Resource {
             visit(static_cast<Resource&>(*area));
         }
     }
-    // Puts everything into the state after power-on, but what lasts: the names, the lasting
-    // properties and the committed content of the NVMEM areas.
+    // Puts everything into the state after power-on, except for what lasts: the names, the
+    // lasting properties and the committed content of the NVMEM areas.
     void reset();
-    // Forgets what a session wrote to the device and its parts and did not commit.
+    // Discards what a session wrote to the device and its parts and did not commit.
     void dropPending(nQITRMCAPI100_Session session);
-    // Forgets what anybody wrote to the device and its parts and did not commit.
+    // Discards everything that was written to the device and its parts and not committed.
     void dropAllPending() noexcept;
 };
 
-// Refuses with connectionLost or deviceRemoved, unless nothing keeps a device from answering.
+// Refuses with connectionLost or deviceRemoved, unless `absence` is none.
 void expectPresent(const Device& device, Absence absence);
 
 // All resources of the system. Names are looked up without regard to letter case.
 class Chassis {
   public:
-    // Adds a device behind those present. The name must be free.
+    // Appends a device. The name must be free.
     Device& addDevice(const std::string& name);
     // Add a part to a device. The name must be free on that device.
     Resource& addPhysChan(Device& device, const std::string& name);
     NvmemArea& addNvmemArea(Device& device, const std::string& name);
-    // Puts a device into its state after power-on, but for what lasts. `now` is in microseconds of
-    // the simulated time.
-    void reset(Device& device, int64_t now);
     // Gives a device a name that no other device has. keep() is called when nothing else can fail
-    // any more; when it throws, nothing has changed.
+    // any more; if it throws, nothing has changed.
     void rename(Device& device, const std::string& newName, const std::function<void()>& keep);
-    // Gives devices names, after which no two have the same. This counts as no change.
+    // Gives devices names, after which no two have the same. Does not count as a change.
     void rename(const std::map<Device*, std::string>& names);
 
     // Return null when there is no such resource.
@@ -140,10 +136,8 @@ class Chassis {
     Enumerations enumerations;
     Catalogue catalogue;
     PropertyStore systemProperties;
-    // What every session begins with.
+    // The properties of a new session.
     PropertyStore sessionProperties;
-    // How properties move.
-    Life life;
 
   private:
     std::vector<std::unique_ptr<Device>> all;

@@ -13,7 +13,7 @@ namespace simulator {
 
 struct Resource;
 
-// What a command does to one property when it is through.
+// What a command does to one property when it completes.
 struct CommandEffect {
     enum class Action { set, add };
     // Whose property it is.
@@ -26,7 +26,7 @@ struct CommandEffect {
     Elements value;
 };
 
-// When a command gives a status of its own. All of the conditions must hold.
+// When a command ends with a status of its own. All of the conditions must hold.
 struct CommandFailure {
     struct State {
         // A stored property of the resource, and the value it must have.
@@ -48,25 +48,25 @@ struct Command {
     std::string document;
     // How long it takes.
     double seconds = 0.0;
-    // Resets the properties of the resource first, and forgets what nobody committed.
+    // First resets the properties of the resource and discards what was not committed.
     bool resets = false;
     std::vector<CommandEffect> effects;
     std::optional<CommandFailure> fails;
-    // Tells this command of this resource from all others when chance decides.
-    uint64_t place = 0;
-    // How often it came to the end of its time. A reset does not change it.
+    // A number that differs for each command of each resource, for the random decision to fail.
+    uint64_t number = 0;
+    // How often it was completed. A reset does not change it.
     uint64_t executions = 0;
 };
 
-// What commands are going to do to properties. Everything that may run out of memory is done while
-// it is prepared. The properties must stay where they are.
+// What commands are going to do to properties. Everything that may run out of memory is done
+// during preparation. The properties must not move in memory.
 class PropertyChanges {
   public:
     // Adds what a command does to the properties of its resource and of the resource's device, on
     // top of what was added before.
     void add(const Command& command, Resource& resource);
-    // Adds a reset: the properties get their values after power-on, but for those that last, and
-    // what nobody committed is forgotten.
+    // Adds a reset: the properties get their values after power-on, except for lasting ones, and
+    // what was not committed is discarded.
     void addReset(Resource& resource);
 
     // Calls visit(const Resource&, const PropertyDefinition&, const Elements&) for each property

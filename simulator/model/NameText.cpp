@@ -63,7 +63,7 @@ void visitNames(std::string_view part, const Visit& visit) {
     }
 }
 
-// The number at the end of a name may be written as part of a range, where zeros in front are lost.
+// The number at the end of a name may be written as part of a range, where leading zeros are lost.
 bool endsInZeroPaddedNumber(std::string_view name) {
     const auto lastOther = std::find_if_not(name.rbegin(), name.rend(), isDigit);
     const size_t digits = static_cast<size_t>(lastOther - name.rbegin());
@@ -113,7 +113,7 @@ void forEachName(std::string_view joined, const Visit& visit) {
     }
 }
 
-std::string nameFault(std::string_view name) {
+std::string nameError(std::string_view name) {
     const auto isControl = [](unsigned char c) { return c < 0x20 || c == 0x7F; };
     if (name.empty()) {
         return "a name must not be empty";
@@ -137,11 +137,11 @@ std::string nameFault(std::string_view name) {
     return {};
 }
 
-std::string partNameFault(std::string_view name) {
+std::string partNameError(std::string_view name) {
     if (endsInZeroPaddedNumber(name)) {
         return "the number at its end must not begin with 0, or a range could not name it";
     }
-    return nameFault(name);
+    return nameError(name);
 }
 
 }  // namespace simulator

@@ -11,15 +11,15 @@ namespace simulator {
 // itself.
 std::string foldName(std::string_view name);
 
-// Calls visit(name) for each name of a joined text of resources, in order, with the ranges written
-// out: "Mod1/ch0:2,Mod2" stands for "Mod1/ch0", "Mod1/ch1", "Mod1/ch2" and "Mod2". An empty text
-// holds no names. Only a name with a slash can be a range. Throws a refusal for a range that is
-// backwards or longer than 1024.
+// Calls visit(name) for each name of a joined text of resources, in order, with the ranges
+// expanded: "Mod1/ch0:2,Mod2" stands for "Mod1/ch0", "Mod1/ch1", "Mod1/ch2" and "Mod2". An empty
+// text holds no names. Only a name with a slash can be a range. Throws a refusal for a range that
+// is backwards or longer than 1024.
 void forEachName(std::string_view joined, const std::function<void(const std::string&)>& visit);
 
 // Says why a text cannot be the name of a device, or returns an empty text when it can.
-std::string nameFault(std::string_view name);
-// The same for the part of a channel's or area's name that stands behind the slash.
-std::string partNameFault(std::string_view name);
+std::string nameError(std::string_view name);
+// The same for the part of a channel's or area's name after the slash.
+std::string partNameError(std::string_view name);
 
 }  // namespace simulator

@@ -32,13 +32,13 @@ void NvmemMemory::write(nQITRMCAPI100_Session session, uint32_t address, const u
 
 void NvmemMemory::unlock(std::string_view given, std::string_view deviceSerialNumber,
                          std::string_view givenPassword) const {
-    if (!guard.writable) {
+    if (!rules.writable) {
         throw Refusal(code::readOnlyNvmemArea);
     }
-    if (guard.wantsSerialNumber && given != deviceSerialNumber) {
+    if (rules.wantsSerialNumber && given != deviceSerialNumber) {
         throw Refusal(code::wrongSerialNumber).usage(tag::requestedValue, given);
     }
-    if (!guard.password.empty() && givenPassword != guard.password) {
+    if (!rules.password.empty() && givenPassword != rules.password) {
         throw Refusal(code::wrongPassword);
     }
 }

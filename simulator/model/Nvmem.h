@@ -11,11 +11,11 @@
 
 namespace simulator {
 
-// The content of one NVMEM area. Written bytes are read back at once, and last when committed.
+// The content of one NVMEM area. Written bytes are read back at once, and lasting when committed.
 class NvmemMemory {
   public:
-    // What writing asks for.
-    struct Guard {
+    // What a write needs.
+    struct WriteRules {
         bool writable = true;
         bool wantsSerialNumber = false;
         // Empty when none is wanted.
@@ -23,15 +23,15 @@ class NvmemMemory {
     };
 
     NvmemMemory() = default;
-    NvmemMemory(std::vector<uint8_t> content, Guard guard)
-        : lasting(std::move(content)), guard(std::move(guard)) {}
+    NvmemMemory(std::vector<uint8_t> content, WriteRules rules)
+        : lasting(std::move(content)), rules(std::move(rules)) {}
 
     // Takes lasting content of the same size.
     void restore(const std::vector<uint8_t>& content) { lasting = content; }
 
     uint32_t size() const { return static_cast<uint32_t>(lasting.size()); }
     bool hasPending() const { return pending.has_value(); }
-    const Guard& guardian() const { return guard; }
+    const WriteRules& writeRules() const { return rules; }
 
     // What is read: the lasting content with what was written since.
     const std::vector<uint8_t>& current() const { return pending ? pending->content : lasting; }
@@ -46,21 +46,21 @@ class NvmemMemory {
                 std::string_view givenPassword) const;
 
     void commit();
-    // Forgets what was written since the last commit, by anyone or by one session.
+    // Discard what was written since the last commit: all of it, or if one session wrote last.
     void drop() { pending.reset(); }
     void dropPending(nQITRMCAPI100_Session session);
 
   private:
     struct Pending {
         std::vector<uint8_t> content;
-        // The last one that wrote.
+        // The session that wrote last.
         nQITRMCAPI100_Session session;
     };
 
     void expectInside(uint32_t address, uint32_t count) const;
 
     std::vector<uint8_t> lasting;
-    Guard guard;
+    WriteRules rules;
     std::optional<Pending> pending;
 };
 

@@ -110,7 +110,7 @@ class PropertyStore {
         }
     }
     void commit();
-    // Forgets what a session wrote and did not commit.
+    // Discards what a session wrote and did not commit.
     void dropPending(nQITRMCAPI100_Session session);
     void dropAllPending() noexcept;
 

@@ -38,18 +38,18 @@ void RegisterBlock::write(uint32_t to, uint32_t count, uint64_t value) {
     }
 }
 
-size_t Registers::firstBehind(uint32_t address) const {
-    const auto behind = std::upper_bound(
+size_t Registers::firstAfter(uint32_t address) const {
+    const auto after = std::upper_bound(
         blocks.begin(), blocks.end(), address,
         [](uint32_t left, const RegisterBlock& right) { return left < right.address; });
-    return static_cast<size_t>(behind - blocks.begin());
+    return static_cast<size_t>(after - blocks.begin());
 }
 
 bool Registers::add(RegisterBlock block) {
     if (endOf(block) > addressCount) {
         return false;
     }
-    const size_t next = firstBehind(block.address);
+    const size_t next = firstAfter(block.address);
     if ((next > 0 && endOf(blocks[next - 1]) > block.address) ||
         (next < blocks.size() && endOf(block) > blocks[next].address)) {
         return false;
@@ -64,7 +64,7 @@ RegisterBlock& Registers::find(uint32_t address, uint32_t width) {
             .usage(tag::registerAddress, address)
             .usage(tag::registerWidth, width * 8);
     }
-    const size_t next = firstBehind(address);
+    const size_t next = firstAfter(address);
     if (next > 0) {
         RegisterBlock& block = blocks[next - 1];
         const bool fits = block.width == 0 || block.width == width;

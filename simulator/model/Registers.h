@@ -30,13 +30,14 @@ struct RegisterBlock {
     bool onesClear = false;
     // The command of the device that a write carries out. Empty for none.
     std::string command;
-    // The stored property whose value stands here instead of `bytes`, which then give no more than
-    // the size, and whose it is. Null for none.
+    // The stored property whose value the block shows instead of `bytes`, which then only give
+    // the size, and the resource that has the property. Null for none.
     Resource* owner = nullptr;
     Property* property = nullptr;
 
     uint32_t size() const { return static_cast<uint32_t>(bytes.size()); }
-    // Move width bytes (1, 2, 4 or 8) that lie in the block, with what this does to them.
+    // Read or write `count` bytes (1, 2, 4 or 8) that lie in the block, with the side effects of
+    // clearsOnRead and onesClear.
     uint64_t read(uint32_t from, uint32_t count);
     void write(uint32_t to, uint32_t count, uint64_t value);
 };
@@ -57,8 +58,8 @@ class Registers {
     const std::vector<RegisterBlock>& all() const { return blocks; }
 
   private:
-    // The first block behind an address.
-    size_t firstBehind(uint32_t address) const;
+    // The index of the first block after an address.
+    size_t firstAfter(uint32_t address) const;
 
     std::vector<RegisterBlock> blocks;
 };

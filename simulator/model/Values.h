@@ -32,7 +32,7 @@ bool isArray(DataType type);
 // The type of the elements of an array type, and the other way round.
 DataType elementType(DataType type);
 DataType arrayType(DataType type);
-// The name as it stands in the enumeration "DataType".
+// The name in the enumeration "DataType".
 std::string typeName(DataType type);
 std::optional<DataType> typeNamed(std::string_view name);
 
@@ -44,7 +44,7 @@ struct List : std::vector<Item> {
     List(std::vector<Item> items) : std::vector<Item>(std::move(items)) {}
 };
 
-// A value of any type. The alternatives stand in the order of the scalar types; a scalar is a list
+// A value of any type. The alternatives are in the order of the scalar types; a scalar is a list
 // of one. Booleans are 0 or 1.
 using Elements = std::variant<List<uint8_t>, List<double>, List<int32_t>, List<int64_t>,
                               List<std::string>, List<uint32_t>, List<uint64_t>>;

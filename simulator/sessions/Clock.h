@@ -12,8 +12,8 @@ class Clock {
   public:
     explicit Clock(const TimeScale& scale) : scale(scale) {}
 
-    // Microseconds since the chassis was loaded. The time never goes back; it stands still for
-    // good when it would pass the largest number, at the largest scale after 106 days.
+    // Microseconds since the chassis was loaded. The time never goes back; it stays at
+    // the largest number once that is reached, at the largest scale after 106 days.
     int64_t now() const;
     // A call of the driver begins: by calls, a millisecond has passed.
     void noteCall();

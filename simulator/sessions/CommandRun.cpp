@@ -9,21 +9,21 @@ namespace {
 bool isInState(const Resource& resource, const CommandFailure::State& state,
                const Simulator& simulator) {
     const Property& property = *resource.properties.find(state.property);
-    return simulator.chassis->life.valueAt(property, simulator.clock.now()) == state.value;
+    return simulator.motions.valueAt(property, simulator.clock.now()) == state.value;
 }
 
-// From 0 to below 1, the same in every run: the seed chooses the sequence, and the place tells
-// commands apart.
-double chance(uint64_t seed, uint64_t place, uint64_t number) {
-    return uniform(mixed(mixed(mixed(seed) + place) + number));
+// A random number from 0 to below 1, the same in every run for the same seed, command and number
+// of executions.
+double chance(uint64_t seed, uint64_t command, uint64_t executions) {
+    return uniform(mixed(mixed(mixed(seed) + command) + executions));
 }
 
-// The status that a command gives at the end of its time, or null.
+// The status with which a command ends, or null.
 const Refusal* outcome(const Task& task, const Simulator& simulator) {
     const Command& command = *task.command;
     const uint64_t number = command.executions + 1;
     if (!command.fails || number % command.fails->every != 0 ||
-        chance(simulator.chassis->life.seed, command.place, number) >= command.fails->probability) {
+        chance(simulator.motions.seed, command.number, number) >= command.fails->probability) {
         return nullptr;
     }
     const auto& when = command.fails->when;
@@ -31,17 +31,17 @@ const Refusal* outcome(const Task& task, const Simulator& simulator) {
     return happens ? &command.fails->status : nullptr;
 }
 
-// Lets what moves react.
+// Updates the values that follow changed properties.
 void noteOutcome(const Task& task, Simulator& simulator) noexcept {
-    Life& life = simulator.chassis->life;
+    Motions& motions = simulator.motions;
     const int64_t now = simulator.clock.now();
     if (task.command->resets) {
-        life.restart(*task.resource, now);
+        motions.restart(*task.resource, now);
     } else {
-        life.noteChange(*task.resource, now);
+        motions.noteChange(*task.resource, now);
     }
     if (task.resource != task.resource->device) {
-        life.noteChange(*task.resource->device, now);
+        motions.noteChange(*task.resource->device, now);
     }
 }
 

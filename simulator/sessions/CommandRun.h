@@ -17,8 +17,8 @@ struct Task {
 void expectReady(const Resource& resource, const Simulator& simulator,
                  nQITRMCAPI100_Session session);
 
-// Ends commands whose time has passed. Each takes effect, unless one of them fails: then none does,
-// and the first failure is thrown. Returns the first warning, which stays where it is, or null.
+// Completes commands whose time has passed. Each takes effect, unless one of them fails: then none
+// does, and the first failure is thrown. Returns the first warning, owned by its command, or null.
 const Refusal* finish(const std::vector<Task>& tasks, Simulator& simulator);
 
 }  // namespace simulator

@@ -32,7 +32,7 @@ std::vector<std::string> namesOf(const List& resources) {
     return names;
 }
 
-// Devices that stand in no slot any more are in no list of the system.
+// Removed devices are not in the lists of the system.
 template <typename List>
 std::vector<std::string> namesOfPresent(const List& devices) {
     std::vector<std::string> names;
@@ -125,15 +125,15 @@ constexpr Entry entries[] = {
      [](const Subject& subject) -> Value { return List<uint32_t>{subject.memory().size()}; }},
     {Category::nvmemArea, "NVMEMArea.Writable",
      [](const Subject& subject) -> Value {
-         return List<uint8_t>{subject.memory().guardian().writable};
+         return List<uint8_t>{subject.memory().writeRules().writable};
      }},
     {Category::nvmemArea, "NVMEMArea.SerialNumWanted",
      [](const Subject& subject) -> Value {
-         return List<uint8_t>{subject.memory().guardian().wantsSerialNumber};
+         return List<uint8_t>{subject.memory().writeRules().wantsSerialNumber};
      }},
     {Category::nvmemArea, "NVMEMArea.PasswordWanted",
      [](const Subject& subject) -> Value {
-         return List<uint8_t>{!subject.memory().guardian().password.empty()};
+         return List<uint8_t>{!subject.memory().writeRules().password.empty()};
      }},
     {Category::nvmemArea, "NVMEMArea.PendingChanges",
      [](const Subject& subject) -> Value { return List<uint8_t>{subject.memory().hasPending()}; }},

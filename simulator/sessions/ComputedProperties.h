@@ -7,7 +7,7 @@
 
 namespace simulator {
 
-// The value of a property that the simulator keeps itself, or nothing when there is no such
+// The value of a property that is computed instead of stored, or nothing when there is no such
 // property or the resource lacks it. `resource` is null for the categories system and session.
 std::optional<Elements> computedValue(const Simulator& simulator, const Session& session,
                                       Category category, const Resource* resource,

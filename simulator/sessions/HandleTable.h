@@ -6,8 +6,8 @@
 
 namespace simulator {
 
-// Things that callers name by a number which is never 0 and differs while they are there. A number
-// is used again only when all others have had their turn.
+// Items that callers identify by a number, which is unique and never 0. The number of a removed
+// item is used again only after all other numbers have been used.
 template <typename Item>
 class HandleTable {
   public:

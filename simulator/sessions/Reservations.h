@@ -16,19 +16,19 @@ namespace simulator {
 inline constexpr int32_t readOnlyAccess = 1;
 inline constexpr int32_t readWriteAccess = 3;
 
-// What one session has, or wants, of a device.
+// The reservation of a device that a session holds or asks for.
 struct Holding {
     nQITRMCAPI100_Session session;
     int32_t access;
     std::string group;
 
-    // Whether two sessions cannot have these at the same time. They can when both only read, and
-    // when both name the same group.
+    // Whether two sessions cannot hold these at the same time. They can if both only read, or if
+    // both name the same group.
     bool conflictsWith(const Holding& other) const;
 };
 
-// Who holds which device. A session holds a device at most once; reserving it again replaces the
-// access and the group. Every operation needs the simulator's mutex to be held.
+// Which session holds which device. A session holds a device at most once; reserving it again
+// replaces the access and the group. Every operation needs the simulator's mutex to be held.
 class Reservations {
   public:
     Reservations(const Chassis& chassis, Waits& waits);
@@ -36,24 +36,25 @@ class Reservations {
     // Reserves all of these devices or none. Calls that wait are served in the order of arrival
     // among those that want the same devices; for a call that does not wait, and at the end of a
     // wait, only the holders count. Refuses
-    // with deviceReserved, and when the session is aborted or closed meanwhile. The mutex is given
-    // up during the wait.
+    // with deviceReserved, and when the session is aborted or closed meanwhile. The mutex is
+    // unlocked during the wait.
     void reserve(const std::vector<Device*>& devices, const Holding& wanted, double timeout,
                  std::unique_lock<std::mutex>& lock);
 
-    // Gives up one device. Returns whether the session held it.
+    // Releases one device. Returns whether the session held it.
     bool release(nQITRMCAPI100_Session session, const Device& device);
     void releaseAll(nQITRMCAPI100_Session session);
 
     bool holds(nQITRMCAPI100_Session session, const Device& device) const;
 
-    // Whoever changes a device must not stand in the way of another session. Refuses with
+    // To be called before a session changes a device. Refuses with
     // readOnlyReservation when the session holds the device for reading, and with deviceReserved
     // when it does not hold the device and another session does.
     void expectWritable(nQITRMCAPI100_Session session, const Device& device) const;
 
   private:
-    // A reservation that waits. The holdings are made beforehand, so that granting cannot fail.
+    // A reservation that is asked for. The holdings are allocated beforehand, so that granting
+    // cannot fail.
     struct Request {
         Request(const std::vector<Device*>& devices, const Holding& wanted);
 

@@ -11,7 +11,7 @@ namespace simulator {
 
 struct Session {
     nQITRMCAPI100_Session handle = 0;
-    // Until the session has its devices, nobody else may use its handle.
+    // Until the session has its devices, other calls must not use its handle.
     bool opening = true;
     // The resources that the session was opened on, and the devices that these belong to.
     std::vector<Device*> defaultDevices;
@@ -24,26 +24,26 @@ struct Session {
 // The open sessions. A reference to a session is valid until the session is closed.
 class Sessions {
   public:
-    // firstProperties: what a session has to begin with.
+    // firstProperties: those of a new session.
     Sessions(nQITRMCAPI100_Session firstHandle, const PropertyStore& firstProperties,
              LastingState& lasting)
         : table(firstHandle), firstProperties(firstProperties), lasting(lasting) {}
 
-    // Makes a session under the next free handle. Refuses with stateNotWritten when a later start
-    // would give out this handle again.
+    // Creates a session with the next free handle. Refuses with stateNotWritten when the handle
+    // could be used again after a restart.
     Session& make();
-    // Refuses with unknownSession when the handle is dead or its session is still opening.
+    // Refuses with unknownSession when the handle is unknown or its session is still opening.
     Session& get(nQITRMCAPI100_Session handle);
-    // Returns null when the handle is dead.
+    // Returns null when the handle is unknown.
     Session* find(nQITRMCAPI100_Session handle) { return table.find(handle); }
-    // Calls visit(Session&) for all sessions, those that are still opening too.
+    // Calls visit(Session&) for all sessions, including those that are still opening.
     template <typename Visit>
     void forEach(Visit visit) {
         table.forEach(visit);
     }
     void remove(nQITRMCAPI100_Session handle) noexcept { table.remove(handle); }
 
-    // With those that are still opening.
+    // Including those that are still opening.
     uint32_t size() const { return table.size(); }
 
   private:

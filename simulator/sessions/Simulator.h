@@ -3,7 +3,7 @@
 #include <memory>
 #include <mutex>
 
-#include "faults/Faults.h"
+#include "live/Motions.h"
 #include "model/Chassis.h"
 #include "sessions/Clock.h"
 #include "sessions/HandleTable.h"
@@ -12,7 +12,6 @@
 #include "sessions/Sessions.h"
 #include "sessions/Waits.h"
 #include "state/LastingState.h"
-#include "trace/Trace.h"
 
 namespace simulator {
 
@@ -31,37 +30,31 @@ struct OpenCommand {
     const Command* command;
 };
 
-// The chassis together with the state of all its users. There is one in the process, made at the
-// first use. Its parts are guarded by one mutex, which calls that wait give up.
+// The chassis together with the state of all its users. Its parts are guarded by one mutex, which
+// calls that wait release.
 struct Simulator {
-    // Puts what lasts into the chassis.
-    Simulator(std::unique_ptr<Chassis> loaded, const TimeScale& timeScale);
-
-    // The loaded simulator. Refuses with chassisNotLoaded when the chassis file is broken, and with
-    // stateNotUsable when the state folder is, or when another process has it.
-    static Simulator& instance();
+    // Restores the lasting state of the chassis.
+    Simulator(std::unique_ptr<Chassis> loaded, Motions motions, const TimeScale& timeScale);
 
     Resolver resolver(const Session& session) const {
         return Resolver(*chassis, reservations, session);
     }
 
-    // Whether anybody wants to know of calls.
-    bool isWatched() const { return trace.isOn() || faults.isOn(); }
-
-    // Ends a session with all that it has.
+    // Puts a device into its state after power-on, except for what lasts.
+    void reset(Device& device);
+    // Closes a session with all that it has.
     void close(nQITRMCAPI100_Session session);
 
     std::mutex mutex;
     const std::unique_ptr<Chassis> chassis;
+    Motions motions;
     LastingState lasting;
-    Trace trace;
     Clock clock;
     Waits waits;
     Sessions sessions;
     Reservations reservations;
     HandleTable<OpenProperty> openProperties;
     HandleTable<OpenCommand> openCommands;
-    Faults faults;
 };
 
 }  // namespace simulator

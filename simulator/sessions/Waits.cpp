@@ -10,7 +10,7 @@ namespace simulator {
 
 namespace {
 
-// Far below what the clocks of small systems can count.
+// Far below what the clocks of small systems can represent.
 constexpr double longestWait = 24.0 * 60.0 * 60.0;
 
 }  // namespace
@@ -31,7 +31,7 @@ void Wait::finish(End reason) noexcept {
 
 namespace {
 
-// Stands in the list of those who wait for as long as it lives.
+// Keeps a wait in the list of all waits during its lifetime.
 class Waiting {
   public:
     Waiting(std::list<Wait*>& list, Wait& wait)
@@ -48,10 +48,10 @@ class Waiting {
 }  // namespace
 
 Waits::Deadline Waits::wakeBefore(Deadline deadline) const {
-    if (agenda == nullptr || agenda->next() == Agenda::never || clock.goesByCalls()) {
+    if (schedule == nullptr || schedule->next() == Schedule::never || clock.goesByCalls()) {
         return deadline;
     }
-    const double seconds = static_cast<double>(agenda->next() - clock.now()) / 1e6;
+    const double seconds = static_cast<double>(schedule->next() - clock.now()) / 1e6;
     const auto ahead = clock.realTime(std::clamp(seconds, 0.0, longestWait));
     return std::min(deadline, std::chrono::steady_clock::now() + ahead);
 }
@@ -60,8 +60,8 @@ void Waits::sleepUntil(Deadline deadline, Wait& wait, std::unique_lock<std::mute
     const Waiting isWaiting(waiting, wait);
     while (wait.end == Wait::End::none && std::chrono::steady_clock::now() < deadline) {
         wait.wake.wait_until(lock, wakeBefore(deadline));
-        if (agenda != nullptr) {
-            agenda->catchUp();
+        if (schedule != nullptr) {
+            schedule->catchUp();
         }
     }
 }
@@ -91,8 +91,8 @@ void Waits::spend(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock
     }
     const Waiting isWaiting(waiting, wait);
     clock.skip(seconds);
-    if (agenda != nullptr) {
-        agenda->catchUp();
+    if (schedule != nullptr) {
+        schedule->catchUp();
     }
     expectUndisturbed(wait);
 }
@@ -117,7 +117,7 @@ void Waits::endAbout(const Device& device) noexcept {
     }
 }
 
-void Waits::lookAgain() noexcept {
+void Waits::scheduleChanged() noexcept {
     for (Wait* wait : waiting) {
         wait->wake.notify_one();
     }

@@ -18,20 +18,20 @@ namespace simulator {
 // than a day counts as a day.
 double checkedTimeout(double seconds);
 
-// Things that happen at their time. Needs the simulator's mutex to be held.
-class Agenda {
+// Events that happen at a given time. Needs the simulator's mutex to be held.
+class Schedule {
   public:
-    // When nothing is to happen any more.
+    // The time of the next event if there is none.
     static constexpr int64_t never = std::numeric_limits<int64_t>::max();
 
-    virtual ~Agenda() = default;
-    // When the next thing is to happen, in microseconds of the simulated time.
+    virtual ~Schedule() = default;
+    // The time of the next event, in microseconds of the simulated time.
     virtual int64_t next() const = 0;
-    // Lets everything happen whose time has come.
+    // Carries out the events that are due.
     virtual void catchUp() = 0;
 };
 
-// One call of a session that waits. It lives on the stack of the waiting thread.
+// One waiting call of a session. It is on the stack of the waiting thread.
 struct Wait {
     enum class End { none, done, aborted, closed, deviceAbsent };
 
@@ -44,7 +44,7 @@ struct Wait {
     const nQITRMCAPI100_Session session;
     const std::vector<Device*>* const devices;
     End end = End::none;
-    // What ended the wait with End::deviceAbsent.
+    // The device because of which the wait ended with End::deviceAbsent.
     const Device* absentDevice = nullptr;
     Absence absence = Absence::none;
     std::condition_variable wake;
@@ -55,23 +55,23 @@ class Waits {
   public:
     explicit Waits(Clock& clock) : clock(clock) {}
 
-    // Sleeps, with the mutex given up, until the wait ends or the simulated time is over. Returns
+    // Sleeps, with the mutex unlocked, until the wait ends or the simulated time is over. Returns
     // whether the wait ended by Wait::End::done; refuses when the session was aborted or closed,
     // and when one of the wait's devices does not answer any more. Where time goes by calls it
-    // sleeps in real time, as nobody else would move time on.
+    // sleeps in real time, as simulated time might not advance otherwise.
     bool sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock);
-    // Lets the time pass that something takes, unless the wait ends. Refuses like sleep().
+    // Lets the time pass that an operation takes, unless the wait ends. Refuses like sleep().
     void spend(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock);
 
     // Ends all waits of a session.
     void endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept;
-    // Ends all waits about a device that has ceased to answer.
+    // Ends all waits about a device that does not answer any more.
     void endAbout(const Device& device) noexcept;
 
-    // Whoever waits keeps to an agenda, which lives as long as this object is in use.
-    void follow(Agenda& followed) { agenda = &followed; }
-    // To be called when the agenda has changed.
-    void lookAgain() noexcept;
+    // Sets what is carried out in time during waits. It must exist as long as this object is used.
+    void setSchedule(Schedule& followed) { schedule = &followed; }
+    // To be called when the schedule has changed.
+    void scheduleChanged() noexcept;
 
   private:
     using Deadline = std::chrono::steady_clock::time_point;
@@ -82,7 +82,7 @@ class Waits {
 
     Clock& clock;
     std::list<Wait*> waiting;
-    Agenda* agenda = nullptr;
+    Schedule* schedule = nullptr;
 };
 
 }  // namespace simulator

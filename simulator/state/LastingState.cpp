@@ -18,7 +18,7 @@ std::string keyOf(const std::string& resource, const std::string& item) {
     return foldName(resource) + '\n' + item;
 }
 
-[[noreturn]] void refuse(const StateFault& fault) {
+[[noreturn]] void refuse(const StateError& fault) {
     const std::string words = fault.wrong + "; " + fault.right;
     std::fprintf(stderr, "qitrmcapi: %s: %s\n", fault.path.c_str(), words.c_str());
     throw Refusal(code::stateNotUsable)
@@ -66,7 +66,7 @@ LastingState::LastingState(Chassis& chassis) {
         folder.emplace(path);
         restore(load(), path, chassis);
         loadSessionNumber(chassis);
-    } catch (const StateFault& fault) {
+    } catch (const StateError& fault) {
         refuse(fault);
     }
 }
@@ -133,7 +133,7 @@ void LastingState::loadSessionNumber(Chassis& chassis) const {
 }
 
 void LastingState::reserveSessionNumber(uint32_t number) {
-    // Numbers go round, and these differences with them.
+    // Numbers wrap around, and so does this difference.
     const bool isReserved = reservedEnd && *reservedEnd - number - 1 < sessionBlock;
     if (!folder || isReserved) {
         return;

@@ -12,7 +12,7 @@
 
 namespace simulator {
 
-// What one call makes last.
+// The lasting state that one call changes.
 class Change {
   public:
     // wanted: whether anything lasts at all; if not, nothing is gathered here.
@@ -45,7 +45,7 @@ class Change {
 class LastingState {
   public:
     // Puts into the chassis what is kept of it. What is kept of other things stays in the folder;
-    // what does not fit is told on standard error and not used. Refuses with stateNotUsable.
+    // what does not fit is reported on standard error and not used. Refuses with stateNotUsable.
     explicit LastingState(Chassis& chassis);
 
     Change change() const { return Change(folder.has_value()); }
@@ -55,7 +55,7 @@ class LastingState {
     void keep(const Change& change);
 
     // Makes sure that no later start gives out this number of a session again. Numbers are reserved
-    // in blocks, so that few sessions wait for the disk; a start goes on behind the last block.
+    // in blocks, so that few sessions wait for the disk; a restart continues after the last block.
     // Refuses with stateNotWritten.
     void reserveSessionNumber(uint32_t number);
 
@@ -72,7 +72,7 @@ class LastingState {
     void settle(const std::vector<std::string>& keys) noexcept;
 
     std::optional<StateFolder> folder;
-    // The first number behind the block that this start has reserved last.
+    // The first number after the block that was reserved last since the start.
     std::optional<uint32_t> reservedEnd;
     // Which file holds the latest value; 0 for none.
     std::map<std::string, Generation> holders;

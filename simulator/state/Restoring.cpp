@@ -23,7 +23,7 @@ class Restorer {
     void takeProperty(const StateEntry& entry, PropertyStore& properties);
     void takeContent(const StateEntry& entry, Resource& resource);
     void takeName(const StateEntry& entry, Resource& resource);
-    // Gives up one name that cannot be given. Returns false when there is none.
+    // Drops one name that cannot be restored. Returns false when there is none.
     bool dropTakenName();
     void complain(const std::string& about, const char* reason) const;
 
@@ -74,7 +74,7 @@ void Restorer::takeContent(const StateEntry& entry, Resource& resource) {
 
 void Restorer::takeName(const StateEntry& entry, Resource& resource) {
     const auto* name = std::get_if<List<std::string>>(&entry.value);
-    if (name == nullptr || name->size() != 1 || !nameFault(name->front()).empty()) {
+    if (name == nullptr || name->size() != 1 || !nameError(name->front()).empty()) {
         complain(titleOf(entry), "it is no name");
     } else {
         names[resource.device] = name->front();

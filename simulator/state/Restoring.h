@@ -14,7 +14,7 @@ inline constexpr const char* nameItem = "Dev.Name";
 inline constexpr const char* changesItem = "Sys.ConfigChangeCount";
 
 // Puts entries into a chassis that is as it was described. Entries for what the chassis does not
-// have, or does not keep, are passed over; one that does not fit is told on standard error, with
+// have, or does not keep, are skipped; one that does not fit is reported on standard error, with
 // the path of the folder.
 void restore(const std::map<std::string, StateEntry>& entries, const char* folder,
              Chassis& chassis);

@@ -34,7 +34,7 @@ void put(std::string& out, const std::string& text) {
     put(out, std::string_view(text));
 }
 
-// Takes a file apart from front to back. Throws a text that says what is wrong.
+// Parses a file from its beginning to its end. Throws a text that says what is wrong.
 class Scanner {
   public:
     explicit Scanner(std::string_view rest) : rest(rest) {}
@@ -184,7 +184,7 @@ std::vector<StateEntry> readStateFile(const std::string& path, uint64_t generati
         }
         return entries;
     } catch (const std::string& wrong) {
-        throw StateFault{path, wrong, remedy};
+        throw StateError{path, wrong, remedy};
     }
 }
 

@@ -10,7 +10,7 @@
 namespace simulator {
 
 // Thrown when the state folder or a file in it cannot be used.
-struct StateFault {
+struct StateError {
     // The folder or file.
     std::string path;
     std::string wrong;
@@ -27,7 +27,7 @@ struct StateEntry {
     Elements value;
 };
 
-// The values of one change, as they stand in a file. Numbers are little-endian on every machine.
+// The values of one change, in the format of a file. Numbers are little-endian on every machine.
 class StateText {
   public:
     void add(std::string_view resource, std::string_view item, DataType type,
@@ -44,7 +44,7 @@ class StateText {
     std::string body;
 };
 
-// Reads the content of the file of a generation. `path` is for the words of the StateFault that is
+// Reads the content of the file of a generation. `path` is for the text of the StateError that is
 // thrown when the content is not exactly what StateText::file() made.
 std::vector<StateEntry> readStateFile(const std::string& path, uint64_t generation,
                                       std::string_view content);

@@ -98,7 +98,7 @@ StateFolder::StateFolder(const std::string& path)
       folder(makeFolder(path)),
       lockFile(folder < 0 ? -1 : openat(folder, lockName, O_RDWR | O_CREAT | O_CLOEXEC, 0666)) {
     if (lockFile < 0) {
-        throw StateFault{path, std::string("cannot be used: ") + std::strerror(errno),
+        throw StateError{path, std::string("cannot be used: ") + std::strerror(errno),
                          usableFolder};
     }
     lock();
@@ -113,15 +113,15 @@ void StateFolder::lock() const {
         return;
     }
     if (errno != EACCES && errno != EAGAIN) {
-        throw StateFault{path, std::string("cannot be locked: ") + std::strerror(errno),
+        throw StateError{path, std::string("cannot be locked: ") + std::strerror(errno),
                          usableFolder};
     }
-    // The holder may have ended since, or live where its number means nothing here.
+    // The owner may have ended since, or run in another process namespace.
     const bool known =
         fcntl(lockFile, F_GETLK, &wanted) == 0 && wanted.l_type != F_UNLCK && wanted.l_pid > 0;
     const std::string holder =
         known ? "process " + std::to_string(wanted.l_pid) : "another process";
-    throw StateFault{path, "is in use by " + holder,
+    throw StateError{path, "is in use by " + holder,
                      "end that process, or name another folder in QITRMC_SIM_STATE"};
 }
 
@@ -141,7 +141,7 @@ std::vector<uint64_t> StateFolder::generations() const {
         }
     }
     if (errno != 0) {
-        throw StateFault{path, std::string("cannot be listed: ") + std::strerror(errno),
+        throw StateError{path, std::string("cannot be listed: ") + std::strerror(errno),
                          usableFolder};
     }
     std::sort(found.begin(), found.end());
@@ -155,7 +155,7 @@ bool StateFolder::has(uint64_t generation) const {
 
 std::string StateFolder::read(uint64_t generation) const {
     const auto refuse = [&] {
-        throw StateFault{filePath(generation),
+        throw StateError{filePath(generation),
                          std::string("cannot be read: ") + std::strerror(errno),
                          "must be a readable file"};
     };

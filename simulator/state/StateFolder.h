@@ -33,14 +33,14 @@ inline constexpr uint64_t sessionsFile = 0;
 class StateFolder {
   public:
     // Makes the folder if it is missing and locks it for as long as this object and its process
-    // live. Throws a StateFault, for one when another process has it.
+    // exist. Throws a StateError, for one when another process has it.
     explicit StateFolder(const std::string& path);
 
     std::string filePath(uint64_t generation) const;
-    // The generations of the files that are there, the oldest first. Throws a StateFault.
+    // The generations of the files that are there, the oldest first. Throws a StateError.
     std::vector<uint64_t> generations() const;
     bool has(uint64_t generation) const;
-    // The content of a file. Throws a StateFault.
+    // The content of a file. Throws a StateError.
     std::string read(uint64_t generation) const;
 
     // Makes a file. It is whole and on the disk when this returns. Refuses with stateNotWritten,

@@ -10,7 +10,7 @@ namespace simulator {
 // A text in double quotes as JSON has it. What is not UTF-8 is mended with replacement characters.
 std::string quoted(std::string_view text);
 
-// The details of one status, in words that the translator of this driver knows. Every operation
+// The details of one status, in the terms that the translator of this driver knows. Every operation
 // may throw std::bad_alloc. Texts that are not UTF-8 are mended with replacement characters, so
 // that the details stay valid JSON.
 class Details {

@@ -30,7 +30,7 @@ class Refusal {
     Refusal& empty();
     // The other one must not have a text of its own.
     Refusal& cause(const Refusal& other);
-    // Gives this text as it stands instead of the details. It need not be JSON.
+    // Replaces the details by this text, unchanged. It need not be JSON.
     Refusal& ownText(std::string text);
 
     int32_t code() const { return reason.number; }

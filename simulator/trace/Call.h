@@ -12,36 +12,37 @@ namespace simulator {
 
 // An array that a caller gives.
 template <typename Item>
-struct Given {
+struct InputArray {
     const Item* items;
     uint32_t count;
 };
 
-// Where a caller wants one value, an array, or bytes in a buffer of its own.
+// Where the function puts one value, an array, or bytes in a buffer of the caller.
 template <typename Item>
-struct Wanted {
+struct Output {
     Item* place;
 };
 template <typename Item>
-struct WantedArray {
+struct OutputArray {
     Item** place;
     uint32_t* count;
 };
-struct WantedBytes {
+struct OutputBytes {
     uint8_t* buffer;
     uint32_t size;
 };
 
-// One argument of a call, as the C function got it.
+// One argument of a call, as passed to the C function.
 struct Argument {
     using Value =
         std::variant<uint8_t, uint16_t, uint32_t, uint64_t, int32_t, int64_t, double, const char*,
-                     Given<uint8_t>, Given<uint32_t>, Given<uint64_t>, Given<int32_t>,
-                     Given<int64_t>, Given<double>, Given<const char*>, Wanted<uint8_t>,
-                     Wanted<uint16_t>, Wanted<uint32_t>, Wanted<uint64_t>, Wanted<int32_t>,
-                     Wanted<int64_t>, Wanted<double>, Wanted<char*>, WantedArray<uint8_t>,
-                     WantedArray<uint32_t>, WantedArray<uint64_t>, WantedArray<int32_t>,
-                     WantedArray<int64_t>, WantedArray<double>, WantedArray<char*>, WantedBytes>;
+                     InputArray<uint8_t>, InputArray<uint32_t>, InputArray<uint64_t>,
+                     InputArray<int32_t>, InputArray<int64_t>, InputArray<double>,
+                     InputArray<const char*>, Output<uint8_t>, Output<uint16_t>, Output<uint32_t>,
+                     Output<uint64_t>, Output<int32_t>, Output<int64_t>, Output<double>,
+                     Output<char*>, OutputArray<uint8_t>, OutputArray<uint32_t>,
+                     OutputArray<uint64_t>, OutputArray<int32_t>, OutputArray<int64_t>,
+                     OutputArray<double>, OutputArray<char*>, OutputBytes>;
 
     // Whether the function puts something there.
     bool isOutput() const { return value.index() >= firstOutput; }
@@ -53,14 +54,14 @@ struct Argument {
     static constexpr size_t firstOutput = 15;
 };
 
-// One call of the driver, for those who watch calls. It points to what the caller gave, so it lives
-// as long as the call. Making one allocates nothing.
+// One call of the driver, for traces and faults. It refers to the arguments of the caller, so it is
+// valid during the call only. Creating one allocates nothing.
 class Call {
   public:
-    // function: the name of the C function, a text that lives as long as the library.
+    // function: the name of the C function, a text that exists as long as the library.
     explicit Call(const char* function);
 
-    // Add an argument behind those present; at most `most`.
+    // Append an argument; at most `most`.
     Call& session(nQITRMCAPI100_Session handle);
     // The argument that names the resources that the call is about. When it is null, `otherwise`
     // names them.
@@ -71,18 +72,18 @@ class Call {
     }
     template <typename Item>
     Call& in(const char* name, const Item* items, uint32_t count) {
-        return add(name, Given<Item>{items, count});
+        return add(name, InputArray<Item>{items, count});
     }
     template <typename Item>
     Call& out(const char* name, Item* place) {
-        return add(name, Wanted<Item>{place});
+        return add(name, Output<Item>{place});
     }
     template <typename Item>
     Call& out(const char* name, Item** place, uint32_t* count) {
-        return add(name, WantedArray<Item>{place, count});
+        return add(name, OutputArray<Item>{place, count});
     }
     Call& out(const char* name, uint8_t* buffer, uint32_t size) {
-        return add(name, WantedBytes{buffer, size});
+        return add(name, OutputBytes{buffer, size});
     }
 
     // Without the prefix that all functions have.

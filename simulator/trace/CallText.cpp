@@ -49,18 +49,18 @@ std::string listText(const Item* items, uint32_t count) {
 // One function for each kind of argument. Places are read after the call.
 struct ValueText {
     template <typename Item>
-    std::string operator()(const Given<Item>& given) const {
+    std::string operator()(const InputArray<Item>& given) const {
         return listText(given.items, given.count);
     }
     template <typename Item>
-    std::string operator()(const Wanted<Item>& wanted) const {
+    std::string operator()(const Output<Item>& wanted) const {
         return itemText(*wanted.place);
     }
     template <typename Item>
-    std::string operator()(const WantedArray<Item>& wanted) const {
+    std::string operator()(const OutputArray<Item>& wanted) const {
         return listText(*wanted.place, *wanted.count);
     }
-    std::string operator()(const WantedBytes& wanted) const {
+    std::string operator()(const OutputBytes& wanted) const {
         return listText(wanted.buffer, wanted.size);
     }
     template <typename Item>

@@ -10,7 +10,7 @@
 #include <cstring>
 #include <new>
 
-#include "description/StartRefusal.h"
+#include "description/ErrorReport.h"
 #include "trace/CallText.h"
 
 namespace simulator {
@@ -59,7 +59,7 @@ Trace::~Trace() {
 }
 
 void Trace::writeLine(const std::string& line) const {
-    // A trace that cannot be written has nobody to tell.
+    // A failure to write the trace cannot be reported anywhere.
     [[maybe_unused]] const ssize_t written = write(file, line.data(), line.size());
 }
 

@@ -1,4 +1,4 @@
-#include "description/ChassisFile.h"
+#include "description/ChassisReader.h"
 #include "description/Description.h"
 #include "harnesses.h"
 
@@ -18,17 +18,17 @@ void requireSoundNames(const simulator::Chassis& chassis) {
     }
 }
 
-void requireWords(const simulator::DescriptionFault& fault) {
-    fuzz::require(fault.pointer.empty() || fault.pointer.front() == '/', "no JSON pointer");
-    fuzz::require(!fault.wrong.empty() && !fault.right.empty(), "a fault without words");
+void requireWords(const simulator::DescriptionError& error) {
+    fuzz::require(error.pointer.empty() || error.pointer.front() == '/', "no JSON pointer");
+    fuzz::require(!error.wrong.empty() && !error.right.empty(), "a error without words");
 }
 
 }  // namespace
 
 void fuzz::parseChassis(std::string_view input) {
     try {
-        requireSoundNames(*simulator::parseChassis(input));
-    } catch (const simulator::DescriptionFault& fault) {
-        requireWords(fault);
+        requireSoundNames(*simulator::parseChassis(input).chassis);
+    } catch (const simulator::DescriptionError& error) {
+        requireWords(error);
     }
 }

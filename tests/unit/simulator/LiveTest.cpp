@@ -427,6 +427,20 @@ TEST_F(LiveTest, AnEventThatIsOverAtTheEndOfACommandEndsIt) {
     EXPECT_EQ(status.code, -250941);
 }
 
+TEST_F(LiveTest, EventsBeginAndEndAtTheirTimes) {
+    const FaultsInForce faults(
+        R"({"events": [{"device": "Mover", "event": "connection_lost", "after": 0.003,
+                        "lasts": 0.002},
+                       {"device": "Mover", "event": "connection_lost", "after": 0.006,
+                        "lasts": 0.001}]})");
+    std::vector<int32_t> codes;
+    for (int call = 0; call < 7; ++call) {
+        codes.push_back(get(getDouble, session, "Mover", "Set").code);
+    }
+    // A millisecond passes at the beginning of each call.
+    EXPECT_EQ(codes, (std::vector<int32_t>{0, 0, -250941, -250941, 0, -250941, 0}));
+}
+
 TEST_F(LiveTest, AFaultAppliesToAndCountsTheCallsOfItsTime) {
     const auto codesWith = [&](const std::string& members) {
         const FaultsInForce faults(

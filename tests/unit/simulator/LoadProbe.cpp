@@ -8,7 +8,7 @@
 #include <string>
 
 #include "EmbeddedTexts.h"
-#include "description/ChassisFile.h"
+#include "description/ChassisReader.h"
 #include "description/Description.h"
 #include "faults/FaultReader.h"
 
@@ -19,15 +19,15 @@ void loadChassis(const std::string& description) {
 }
 
 void loadFaults(const std::string& description) {
-    static const auto chassis = simulator::parseChassis(simulator::embedded::bench);
-    simulator::readFaults(description, *chassis);
+    static const auto described = simulator::parseChassis(simulator::embedded::bench);
+    simulator::readFaults(description, *described.chassis);
 }
 
 std::string answerTo(const std::string& description, void (*load)(const std::string&)) {
     try {
         load(description);
         return "loaded";
-    } catch (const simulator::DescriptionFault& fault) {
+    } catch (const simulator::DescriptionError& fault) {
         return simulator::oneLine(fault.pointer) + "\t" +
                simulator::oneLine(fault.wrong + "; " + fault.right);
     }
