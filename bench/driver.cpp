@@ -5,6 +5,7 @@
 #include <benchmark/benchmark.h>
 #include <unistd.h>
 
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 #include <fstream>
@@ -18,7 +19,7 @@ namespace {
 // A status without memory for details.
 struct Status : qierr_Status {
     Status() : qierr_Status{} {
-        reallocJson = [](qierr_Status*, uint32_t) -> int { return 0; };
+        reallocJson = [](qierr_Status*, std::uint32_t) -> int { return 0; };
     }
 };
 
@@ -81,7 +82,7 @@ void writeDouble(benchmark::State& state) {
 void readRegister(benchmark::State& state) {
     Status status;
     for (auto _ : state) {
-        uint32_t value = 0;
+        std::uint32_t value = 0;
         nQITRMCAPI100_readRegisterUInt32(session, device.c_str(), 4, &value, &status);
         benchmark::DoNotOptimize(value);
     }
@@ -92,7 +93,7 @@ void readNames(benchmark::State& state, const char* property) {
     Status status;
     for (auto _ : state) {
         char** names = nullptr;
-        uint32_t count = 0;
+        std::uint32_t count = 0;
         nQITRMCAPI100_getSystemPropertyStringArray(session, property, &names, &count, &status);
         nQITRMCAPI100_freeStringArray(names, count);
     }
@@ -103,7 +104,7 @@ void readReserved(benchmark::State& state) {
     Status status;
     for (auto _ : state) {
         char** names = nullptr;
-        uint32_t count = 0;
+        std::uint32_t count = 0;
         nQITRMCAPI100_getSessionPropertyStringArray(session, "Session.ReservedDevices", &names,
                                                     &count, &status);
         nQITRMCAPI100_freeStringArray(names, count);
@@ -115,7 +116,7 @@ void readAttribute(benchmark::State& state) {
     Status status;
     for (auto _ : state) {
         nQITRMCAPI100_Property handle = 0;
-        int32_t type = 0;
+        std::int32_t type = 0;
         nQITRMCAPI100_openGenericProperty(session, device.c_str(), "Level.Set", &handle, &status);
         nQITRMCAPI100_getPropertyPropertyInt32(handle, "Prop.DataType", &type, &status);
         nQITRMCAPI100_closeProperty(handle, &status);

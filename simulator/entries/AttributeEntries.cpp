@@ -8,9 +8,9 @@ using namespace simulator;
 
 namespace {
 
-const OpenProperty& openProperty(Simulator& simulator, nQITRMCAPI100_Property handle) {
-    const OpenProperty* found = simulator.openProperties.find(handle);
-    if (found == nullptr) {
+OpenProperty openProperty(Simulator& simulator, nQITRMCAPI100_Property handle) {
+    const auto found = simulator.openProperties.find(handle);
+    if (!found) {
         throw Refusal(code::unknownHandle).usage(tag::handle, handle);
     }
     return *found;
@@ -23,9 +23,9 @@ struct PropertyAttribute {
     Call describe(const char* function) const {
         return Call(function).in("handle", handle).in("attribute", name);
     }
-    Elements read(Simulator& simulator, DataType type) const {
-        const OpenProperty& property = openProperty(simulator, handle);
-        return attribute(simulator, property, required(name, "attribute"), type);
+    ReadValue read(Simulator& simulator, DataType type) const {
+        const OpenProperty property = openProperty(simulator, handle);
+        return ReadValue(attribute(simulator, property, required(name, "attribute"), type));
     }
 };
 
@@ -37,7 +37,7 @@ void nQITRMCAPI100_openDriverDefinedProperty(nQITRMCAPI100_Session session, cons
     const auto call = [&, function = __func__] {
         return Call(function).session(session).in("property", property).out("handle", handle);
     };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
+    withSharedSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         *handle = simulator.openProperties.add(
             PropertyAccessor(simulator, owner).openDriverDefined(required(property, "property")));
     });
@@ -54,7 +54,7 @@ void nQITRMCAPI100_openGenericProperty(nQITRMCAPI100_Session session, const char
             .in("property", property)
             .out("handle", handle);
     };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
+    withSharedSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         *handle = simulator.openProperties.add(
             PropertyAccessor(simulator, owner)
                 .openGeneric(required(resource, "resource"), required(property, "property")));
@@ -63,9 +63,10 @@ void nQITRMCAPI100_openGenericProperty(nQITRMCAPI100_Session session, const char
 
 void nQITRMCAPI100_closeProperty(nQITRMCAPI100_Property handle, qierr_Status* status) {
     const auto call = [&, function = __func__] { return Call(function).in("handle", handle); };
-    withSimulator(status, call, [&](Simulator& simulator, auto&) {
-        openProperty(simulator, handle);
-        simulator.openProperties.remove(handle);
+    withSharedSimulator(status, call, [&](Simulator& simulator) {
+        if (!simulator.openProperties.remove(handle)) {
+            throw Refusal(code::unknownHandle).usage(tag::handle, handle);
+        }
     });
 }
 

@@ -41,10 +41,12 @@ Elements pendingChanges(const Subject& subject) {
         return oneFlag(isPending(*subject.property.resource, name));
     }
     bool found = false;
-    for (const auto& device : subject.simulator.chassis->devices()) {
-        device->forEachResource(
-            [&](const Resource& resource) { found = found || isPending(resource, name); });
-    }
+    subject.simulator.sessions.forEach([&](const Session& session) {
+        for (Device* device : session.writtenDevices) {
+            device->forEachResource(
+                [&](const Resource& resource) { found = found || isPending(resource, name); });
+        }
+    });
     return oneFlag(found);
 }
 

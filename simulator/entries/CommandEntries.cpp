@@ -69,7 +69,7 @@ std::vector<Device*> devicesOf(const std::vector<Task>& tasks) {
 
 // Lets the time of the commands pass; they run in parallel.
 void spendTime(const std::vector<Task>& tasks, double timeout, nQITRMCAPI100_Session session,
-               Waits& waits, std::unique_lock<std::mutex>& lock) {
+               Waits& waits, WriteLock& lock) {
     double longest = 0.0;
     for (const Task& task : tasks) {
         longest = std::max(longest, task.command->seconds);
@@ -98,7 +98,7 @@ void nQITRMCAPI100_executeGenericCommand(nQITRMCAPI100_Session session, const ch
             .in("command", command)
             .in("timeout", timeout);
     };
-    withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+    withSimulator(status, call, [&](Simulator& simulator, WriteLock& lock) {
         const Session& owner = simulator.sessions.get(session);
         const auto tasks = findTasks(simulator.resolver(owner), required(resources, "resources"),
                                      required(command, "command"));
@@ -125,7 +125,7 @@ void nQITRMCAPI100_openGenericCommand(nQITRMCAPI100_Session session, const char*
             .in("command", command)
             .out("handle", handle);
     };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
+    withSharedSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         const auto tasks = findTasks(simulator.resolver(owner), required(resources, "resources"),
                                      required(command, "command"));
         *handle = simulator.openCommands.add({session, tasks.front().command});
@@ -134,7 +134,7 @@ void nQITRMCAPI100_openGenericCommand(nQITRMCAPI100_Session session, const char*
 
 void nQITRMCAPI100_closeCommand(nQITRMCAPI100_Command handle, qierr_Status* status) {
     const auto call = [&, function = __func__] { return Call(function).in("handle", handle); };
-    withSimulator(status, call, [&](Simulator& simulator, auto&) {
+    withSharedSimulator(status, call, [&](Simulator& simulator) {
         if (!simulator.openCommands.remove(handle)) {
             throw Refusal(code::unknownHandle).usage(tag::handle, handle);
         }
@@ -147,9 +147,9 @@ void nQITRMCAPI100_getCommandPropertyString(nQITRMCAPI100_Command handle, const 
     const auto call = [&, function = __func__] {
         return Call(function).in("handle", handle).in("attribute", attribute).out("value", value);
     };
-    withSimulator(status, call, [&](Simulator& simulator, auto&) {
-        const OpenCommand* open = simulator.openCommands.find(handle);
-        if (open == nullptr) {
+    withSharedSimulator(status, call, [&](Simulator& simulator) {
+        const auto open = simulator.openCommands.find(handle);
+        if (!open) {
             throw Refusal(code::unknownHandle).usage(tag::handle, handle);
         }
         *value = lendText(simulator::attribute(*open->command, required(attribute, "attribute")));

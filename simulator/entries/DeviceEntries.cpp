@@ -35,8 +35,7 @@ void expectAnswers(const std::vector<Device*>& devices, double timeout) {
 
 // Lets the time pass that the devices need, in parallel.
 void spendConnectTime(const std::vector<Device*>& devices, double timeout,
-                      nQITRMCAPI100_Session session, Waits& waits,
-                      std::unique_lock<std::mutex>& lock) {
+                      nQITRMCAPI100_Session session, Waits& waits, WriteLock& lock) {
     double longest = 0.0;
     for (const Device* device : devices) {
         longest = std::max(longest, device->connectSeconds);
@@ -70,7 +69,7 @@ void nQITRMCAPI100_connectToDevices(nQITRMCAPI100_Session session, const char* d
     const auto call = [&, function = __func__] {
         return Call(function).session(session).resources("devices", devices).in("timeout", timeout);
     };
-    withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+    withSimulator(status, call, [&](Simulator& simulator, WriteLock& lock) {
         Session& owner = simulator.sessions.get(session);
         auto wanted = simulator.resolver(owner).devicesToConnect(required(devices, "devices"));
         const double allowed = timeout < 0.0 ? usualConnectTime : checkedTimeout(timeout);

@@ -1,6 +1,6 @@
 #pragma once
 
-#include <mutex>
+#include <shared_mutex>
 #include <string_view>
 
 #include "Api.h"
@@ -25,9 +25,9 @@ void withSimulator(qierr_Status* status, Describe describe, Body body) noexcept 
     try {
         Driver& driver = Driver::instance();
         Simulator& simulator = driver.simulator;
-        const auto act = [&](std::unique_lock<std::mutex>& lock) { body(simulator, lock); };
+        const auto act = [&](WriteLock& lock) { body(simulator, lock); };
         if (!driver.isWatched()) {
-            std::unique_lock<std::mutex> lock(simulator.mutex);
+            WriteLock lock(simulator.mutex);
             simulator.clock.noteCall();
             act(lock);
             return;
@@ -38,11 +38,43 @@ void withSimulator(qierr_Status* status, Describe describe, Body body) noexcept 
     }
 }
 
-// Runs body(simulator, session) in the same way, for an open session.
+// The same for a body that only reads, body(simulator): calls of several threads run at the same
+// time. A call that may be delayed or that moves the clock on is not shared.
+template <typename Describe, typename Body>
+void withSharedSimulator(qierr_Status* status, Describe describe, Body body) noexcept {
+    if (status->code < 0) {
+        return;
+    }
+    try {
+        Driver& driver = Driver::instance();
+        Simulator& simulator = driver.simulator;
+        if (!driver.isWatched() && !simulator.clock.goesByCalls()) {
+            const std::shared_lock<SharedMutex> lock(simulator.mutex);
+            simulator.clock.noteCall();
+            body(simulator);
+            return;
+        }
+    } catch (...) {
+        reportCurrentException(*status);
+        return;
+    }
+    withSimulator(status, describe, [&](Simulator& simulator, WriteLock&) { body(simulator); });
+}
+
+// Runs body(simulator, session) as withSimulator does, for an open session.
 template <typename Describe, typename Body>
 void withSession(nQITRMCAPI100_Session session, qierr_Status* status, Describe describe,
                  Body body) noexcept {
-    withSimulator(status, describe, [&](Simulator& simulator, std::unique_lock<std::mutex>&) {
+    withSimulator(status, describe, [&](Simulator& simulator, WriteLock&) {
+        body(simulator, simulator.sessions.get(session));
+    });
+}
+
+// The same as withSharedSimulator does.
+template <typename Describe, typename Body>
+void withSharedSession(nQITRMCAPI100_Session session, qierr_Status* status, Describe describe,
+                       Body body) noexcept {
+    withSharedSimulator(status, describe, [&](Simulator& simulator) {
         body(simulator, simulator.sessions.get(session));
     });
 }

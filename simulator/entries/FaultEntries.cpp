@@ -1,4 +1,3 @@
-#include <mutex>
 #include <new>
 #include <string>
 
@@ -16,7 +15,7 @@ namespace {
 int32_t setFaults(const char* json, std::string& why) {
     try {
         Driver& driver = Driver::instance();
-        const std::lock_guard<std::mutex> lock(driver.simulator.mutex);
+        const WriteLock lock(driver.simulator.mutex);
         driver.faults.replace(readFaults(required(json, "json"), *driver.simulator.chassis));
         return 0;
     } catch (const DescriptionError& fault) {

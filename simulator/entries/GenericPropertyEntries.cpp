@@ -18,7 +18,7 @@ struct ResourceProperty {
             .resources("resources", resources)
             .in("property", name);
     }
-    Elements read(Simulator& simulator, DataType type) const {
+    ReadValue read(Simulator& simulator, DataType type) const {
         return PropertyAccessor(simulator, simulator.sessions.get(session))
             .read(required(resources, "resources"), required(name, "property"), type);
     }
@@ -39,7 +39,7 @@ struct DeviceProperty {
             .resources("device", device, "$DefaultDevices")
             .in("property", name);
     }
-    Elements read(Simulator& simulator, DataType type) const {
+    ReadValue read(Simulator& simulator, DataType type) const {
         Session& owner = simulator.sessions.get(session);
         const Device& found =
             simulator.resolver(owner).oneDevice(device != nullptr ? device : "$DefaultDevices");

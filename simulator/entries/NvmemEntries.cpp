@@ -48,7 +48,7 @@ void nQITRMCAPI100_getNvmemBytes(nQITRMCAPI100_Session session, const char* nvme
             .in("address", address)
             .out("buffer", buffer, size);
     };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
+    withSharedSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         const NvmemArea& area =
             simulator.resolver(owner).oneNvmemArea(required(nvmemArea, "nvmemArea"));
         expectBytes(buffer, size, "buffer");
@@ -75,6 +75,7 @@ void nQITRMCAPI100_setNvmemBytes(nQITRMCAPI100_Session session, const char* nvme
         simulator.reservations.expectWritable(session, *area.device);
         area.memory.unlock(required(serialNumberGiven, "serialNumber"), serialNumber(*area.device),
                            required(password, "password"));
+        owner.writtenDevices.insert(area.device);
         area.memory.write(session, address, bytes, size);
     });
 }

@@ -3,8 +3,7 @@
 #include <rapidjson/stringbuffer.h>
 #include <rapidjson/writer.h>
 
-#include <mutex>
-#include <new>
+#include <shared_mutex>
 
 #include "entries/Driver.h"
 #include "lending/Lending.h"
@@ -87,7 +86,7 @@ std::string describeDevices(Driver& driver) {
     Simulator& simulator = driver.simulator;
     rapidjson::StringBuffer text;
     Writer writer(text);
-    const std::lock_guard<std::mutex> lock(simulator.mutex);
+    const std::shared_lock<SharedMutex> lock(simulator.mutex);
     writer.StartArray();
     for (const auto& device : simulator.chassis->devices()) {
         writeDevice(writer, *simulator.chassis, *device);
@@ -131,7 +130,7 @@ int32_t lendDescription(char** json, Describe describe) {
 
 int32_t qitrmcsim_getFaults(char** json) {
     return lendDescription(json, [](Driver& driver) {
-        const std::lock_guard<std::mutex> lock(driver.simulator.mutex);
+        const WriteLock lock(driver.simulator.mutex);
         driver.faults.refresh();
         return driver.faults.plan()->text;
     });

@@ -14,7 +14,7 @@ struct SystemProperty {
     Call describe(const char* function) const {
         return Call(function).session(session).in("property", name);
     }
-    Elements read(Simulator& simulator, DataType type) const {
+    ReadValue read(Simulator& simulator, DataType type) const {
         return PropertyAccessor(simulator, simulator.sessions.get(session))
             .readSystem(required(name, "property"), type);
     }
@@ -31,7 +31,7 @@ struct SessionProperty {
     Call describe(const char* function) const {
         return Call(function).session(session).in("property", name);
     }
-    Elements read(Simulator& simulator, DataType type) const {
+    ReadValue read(Simulator& simulator, DataType type) const {
         return PropertyAccessor(simulator, simulator.sessions.get(session))
             .readSession(required(name, "property"), type);
     }

@@ -16,10 +16,10 @@ void readRegister(const char* function, nQITRMCAPI100_Session session, const cha
             .in("address", address)
             .out("value", value);
     };
-    withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
+    withSharedSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
-        RegisterAccessor desk(simulator, owner);
-        *value = static_cast<Number>(desk.read(found, address, sizeof(Number)));
+        RegisterAccessor accessor(simulator, owner);
+        *value = static_cast<Number>(accessor.read(found, address, sizeof(Number)));
     });
 }
 
@@ -35,8 +35,8 @@ void writeRegister(const char* function, nQITRMCAPI100_Session session, const ch
     };
     withSession(session, status, call, [&](Simulator& simulator, Session& owner) {
         Device& found = simulator.resolver(owner).oneDevice(required(device, "device"));
-        RegisterAccessor desk(simulator, owner);
-        if (const Refusal* warning = desk.write(found, address, sizeof(Number), value)) {
+        RegisterAccessor accessor(simulator, owner);
+        if (const Refusal* warning = accessor.write(found, address, sizeof(Number), value)) {
             report(*warning, *status);
         }
     });

@@ -64,7 +64,7 @@ void openOn(const Opener& opener, const char* names, double connectTimeout,
             .in("reservationGroup", terms.group)
             .in("reservationTimeout", terms.timeout);
     };
-    withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+    withSimulator(status, call, [&](Simulator& simulator, WriteLock& lock) {
         Opening opening(simulator.sessions);
         Session& session = opening.session();
         const auto resources =
@@ -148,7 +148,7 @@ void nQITRMCAPI100_reserveDevices(nQITRMCAPI100_Session session, const char* dev
             .in("reservationGroup", reservationGroup)
             .in("reservationTimeout", reservationTimeout);
     };
-    withSimulator(status, call, [&](Simulator& simulator, std::unique_lock<std::mutex>& lock) {
+    withSimulator(status, call, [&](Simulator& simulator, WriteLock& lock) {
         const Session& holder = simulator.sessions.get(session);
         const auto wanted = simulator.resolver(holder).devices(required(devices, "devices"));
         const double timeout = checkedTimeout(reservationTimeout);

@@ -1,5 +1,7 @@
 // What the simulator offers beyond the driver's functions.
 
+#include <shared_mutex>
+
 #include "description/Summary.h"
 #include "entries/Driver.h"
 #include "lending/Ledger.h"
@@ -12,7 +14,7 @@ int32_t qitrmcsim_start(char** text) {
     *text = nullptr;
     try {
         Simulator& simulator = Driver::instance().simulator;
-        const std::lock_guard<std::mutex> lock(simulator.mutex);
+        const std::shared_lock<SharedMutex> lock(simulator.mutex);
         *text = lendText(summaryOf(*simulator.chassis));
         return 0;
     } catch (const Refusal& refusal) {
@@ -30,7 +32,7 @@ void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
     counts->textArrays = static_cast<uint32_t>(ledger.count(Ledger::Item::texts));
     try {
         Simulator& simulator = Driver::instance().simulator;
-        const std::lock_guard<std::mutex> lock(simulator.mutex);
+        const std::shared_lock<SharedMutex> lock(simulator.mutex);
         counts->openProperties = simulator.openProperties.size();
         counts->openCommands = simulator.openCommands.size();
         counts->sessions = simulator.sessions.size();
@@ -41,9 +43,7 @@ void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
 
 uint64_t qitrmcsim_countCalls(void) {
     try {
-        Simulator& simulator = Driver::instance().simulator;
-        const std::lock_guard<std::mutex> lock(simulator.mutex);
-        return simulator.clock.calls();
+        return Driver::instance().simulator.clock.calls();
     } catch (...) {
         return 0;  // A simulator that did not start has not been called.
     }

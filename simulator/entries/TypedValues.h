@@ -7,6 +7,7 @@
 #include "entries/Entry.h"
 #include "lending/Lending.h"
 #include "model/Values.h"
+#include "sessions/ReadValue.h"
 
 // Conversion between the C types of the driver's functions and values. A text is a pointer in C,
 // and a Boolean the only number of 8 bits.
@@ -35,25 +36,33 @@ constexpr DataType typeOf(uint64_t) {
 }
 
 template <typename Number>
-void lendScalar(const Elements& elements, Number* value) {
-    *value = std::get<List<Number>>(elements).front();
+void lendScalar(const ReadValue& read, Number* value) {
+    *value = std::get<List<Number>>(read.elements()).front();
 }
 
-inline void lendScalar(const Elements& elements, char** value) {
-    *value = lendText(std::get<List<std::string>>(elements).front());
+inline void lendScalar(const ReadValue& read, char** value) {
+    *value = lendText(std::get<List<std::string>>(read.elements()).front());
 }
 
 template <typename Number>
-void lendArray(const Elements& elements, Number** array, uint32_t* count) {
-    const auto& list = std::get<List<Number>>(elements);
+void lendArray(const ReadValue& read, Number** array, uint32_t* count) {
+    const auto& list = std::get<List<Number>>(read.elements());
     *array = lendNumbers(list);
     *count = static_cast<uint32_t>(list.size());
 }
 
-inline void lendArray(const Elements& elements, char*** array, uint32_t* count) {
-    const auto& list = std::get<List<std::string>>(elements);
-    *array = lendTexts(list);
+template <typename Text>
+void lendList(const std::vector<Text>& list, char*** array, uint32_t* count) {
+    *array = lendTexts(list.size(), [&](size_t index) { return std::string_view(list[index]); });
     *count = static_cast<uint32_t>(list.size());
+}
+
+inline void lendArray(const ReadValue& read, char*** array, uint32_t* count) {
+    if (const ReadValue::Names* names = read.names()) {
+        lendList(*names, array, count);
+    } else {
+        lendList(std::get<List<std::string>>(read.elements()), array, count);
+    }
 }
 
 template <typename Number>

@@ -6,7 +6,7 @@
 // The functions that read or write one value. `Source` says what a function reads or writes: an
 // aggregate of the arguments that name it, with
 //     Call describe(const char* function) const;
-//     Elements read(Simulator& simulator, DataType type) const;
+//     ReadValue read(Simulator& simulator, DataType type) const;
 //     void write(Simulator& simulator, DataType type, const Elements& values) const;
 // The data type follows from the C type of the value.
 namespace simulator {
@@ -15,7 +15,7 @@ template <typename Source, typename Value>
 void getScalar(const char* function, const Source& source, Value* value, qierr_Status* status) {
     clearOutputs(status, value);
     const auto call = [&] { return source.describe(function).out("value", value); };
-    withSimulator(status, call, [&](Simulator& simulator, auto&) {
+    withSharedSimulator(status, call, [&](Simulator& simulator) {
         lendScalar(source.read(simulator, typeOf(Value())), value);
     });
 }
@@ -25,7 +25,7 @@ void getArray(const char* function, const Source& source, Value** array, uint32_
               qierr_Status* status) {
     clearOutputs(status, array, count);
     const auto call = [&] { return source.describe(function).out("array", array, count); };
-    withSimulator(status, call, [&](Simulator& simulator, auto&) {
+    withSharedSimulator(status, call, [&](Simulator& simulator) {
         lendArray(source.read(simulator, arrayType(typeOf(Value()))), array, count);
     });
 }

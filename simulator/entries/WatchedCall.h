@@ -2,7 +2,6 @@
 
 #include <chrono>
 #include <exception>
-#include <mutex>
 
 #include "entries/Driver.h"
 #include "entries/StatusFiller.h"
@@ -23,7 +22,7 @@ class WatchedCall {
     void run(Body body) noexcept {
         const auto start = std::chrono::steady_clock::now();
         try {
-            std::unique_lock<std::mutex> lock(driver.simulator.mutex);
+            WriteLock lock(driver.simulator.mutex);
             driver.simulator.clock.noteCall();
             driver.faults.refresh();
             const MatchedFault fault(driver.simulator, driver.faults, call);
@@ -44,7 +43,7 @@ class WatchedCall {
   private:
     // Runs the body. Returns the exception of a warning; that of a failure is thrown on.
     template <typename Body>
-    static std::exception_ptr warningOf(Body body, std::unique_lock<std::mutex>& lock) {
+    static std::exception_ptr warningOf(Body body, WriteLock& lock) {
         try {
             body(lock);
         } catch (const Refusal& refusal) {

@@ -91,8 +91,7 @@ void Faults::replace(FaultPlan fresh) {
     simulator.waits.scheduleChanged();
 }
 
-void Faults::delay(nQITRMCAPI100_Session session, double seconds,
-                   std::unique_lock<std::mutex>& lock) {
+void Faults::delay(nQITRMCAPI100_Session session, double seconds, WriteLock& lock) {
     Wait wait(session);
     struct Delaying {
         ~Delaying() { list.erase(place); }

@@ -3,7 +3,6 @@
 #include <atomic>
 #include <list>
 #include <memory>
-#include <mutex>
 #include <string>
 
 #include "description/TextFile.h"
@@ -32,7 +31,7 @@ class Faults : public Schedule {
 
     // Lets time pass, with the mutex unlocked, until other faults come into force. Refuses when the
     // session is aborted or closed meanwhile.
-    void delay(nQITRMCAPI100_Session session, double seconds, std::unique_lock<std::mutex>& lock);
+    void delay(nQITRMCAPI100_Session session, double seconds, WriteLock& lock);
 
     // The plan is valid as long as the pointer is kept.
     const std::shared_ptr<FaultPlan>& plan() const { return current; }

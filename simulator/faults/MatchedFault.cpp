@@ -60,7 +60,7 @@ MatchedFault::MatchedFault(Simulator& simulator, Faults& faults, const Call& cal
     }
 }
 
-void MatchedFault::applyBefore(std::unique_lock<std::mutex>& lock) const {
+void MatchedFault::applyBefore(WriteLock& lock) const {
     if (fault == nullptr) {
         return;
     }

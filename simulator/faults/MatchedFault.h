@@ -1,7 +1,6 @@
 #pragma once
 
 #include <memory>
-#include <mutex>
 
 #include "faults/Faults.h"
 #include "sessions/Simulator.h"
@@ -17,7 +16,7 @@ class MatchedFault {
 
     // To be called before the call is carried out. Lets the delay pass, with the mutex unlocked,
     // and throws the failure of a call that is not to be carried out.
-    void applyBefore(std::unique_lock<std::mutex>& lock) const;
+    void applyBefore(WriteLock& lock) const;
     // To be called after the call was carried out. Changes its outputs, and throws the warning or
     // failure of the fault. After a failure, also one for lack of memory, nothing is lent or open.
     void applyAfter() const;

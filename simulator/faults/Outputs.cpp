@@ -13,17 +13,18 @@ namespace {
 constexpr size_t mostTextBytes = size_t{1} << 30;
 
 template <typename Number>
-void takeBack(Number* array, uint32_t) noexcept {
+void takeBack(Number* array) noexcept {
     takeBackNumbers(array);
 }
 
-void takeBack(char** array, uint32_t count) noexcept {
-    takeBackTexts(array, count);
+void takeBack(char** array) noexcept {
+    takeBackTexts(array);
 }
 
 template <typename Item>
 void lendInstead(const OutputArray<Item>& wanted, Item* array, uint32_t count) noexcept {
-    takeBack(std::exchange(*wanted.place, array), std::exchange(*wanted.count, count));
+    takeBack(std::exchange(*wanted.place, array));
+    *wanted.count = count;
 }
 
 // The items of an array, repeated until there are `count` of them.
@@ -72,26 +73,25 @@ class Distortion {
   private:
     std::string longText() const { return std::string(*output.textSize, 'x'); }
 
-    std::string textInsteadOf(char* const* texts, uint32_t present, size_t index) const {
-        if (output.textSize) {
-            return longText();
-        }
-        return present > 0 ? texts[index % present] : "";
-    }
-
     char** textsInsteadOf(char* const* texts, uint32_t present, uint32_t count) const {
-        size_t bytes = 0;
-        return lendTexts(count, [&](size_t index) -> char* {
+        const std::string sized(output.textSize.value_or(0), 'x');
+        const auto textAt = [&](size_t index) -> std::string_view {
             if (output.hasNullItems) {
-                return nullptr;
+                return {};
             }
-            const std::string text = textInsteadOf(texts, present, index);
-            bytes += text.size();
+            if (output.textSize) {
+                return sized;
+            }
+            return present > 0 ? texts[index % present] : "";
+        };
+        size_t bytes = 0;
+        for (size_t i = 0; i < count; ++i) {
+            bytes += textAt(i).size();
             if (bytes > mostTextBytes) {
                 throw std::bad_alloc();
             }
-            return copyOf(text);
-        });
+        }
+        return lendTexts(count, textAt);
     }
 
     const OutputFault& output;

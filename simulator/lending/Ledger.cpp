@@ -1,6 +1,7 @@
 #include "lending/Ledger.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <new>
 
 namespace simulator {
@@ -13,30 +14,44 @@ Ledger& Ledger::instance() {
     return ledger;
 }
 
+size_t Ledger::partOf(const void* address) noexcept {
+    // The lowest bits are those of the alignment.
+    const auto number = reinterpret_cast<uintptr_t>(address) >> 4;
+    return (number ^ number >> 4 ^ number >> 8) % std::tuple_size<decltype(parts)>::value;
+}
+
 void Ledger::lend(const void* address, Item item) {
-    const std::lock_guard<std::mutex> lock(mutex);
-    items.emplace(address, item);
+    Part& part = parts[partOf(address)];
+    const std::lock_guard<std::mutex> lock(part.mutex);
+    part.items.emplace(address, item);
 }
 
 bool Ledger::takeBack(const void* address, Item item) noexcept {
-    const std::lock_guard<std::mutex> lock(mutex);
-    const auto found = items.find(address);
-    if (found == items.end() || found->second != item) {
+    Part& part = parts[partOf(address)];
+    const std::lock_guard<std::mutex> lock(part.mutex);
+    const auto found = part.items.find(address);
+    if (found == part.items.end() || found->second != item) {
         return false;
     }
-    items.erase(found);
+    part.items.erase(found);
     return true;
 }
 
 bool Ledger::has(const void* address) const noexcept {
-    const std::lock_guard<std::mutex> lock(mutex);
-    return items.count(address) != 0;
+    const Part& part = parts[partOf(address)];
+    const std::lock_guard<std::mutex> lock(part.mutex);
+    return part.items.count(address) != 0;
 }
 
 size_t Ledger::count(Item item) const noexcept {
-    const std::lock_guard<std::mutex> lock(mutex);
-    return static_cast<size_t>(std::count_if(
-        items.begin(), items.end(), [&](const auto& entry) { return entry.second == item; }));
+    size_t count = 0;
+    for (const Part& part : parts) {
+        const std::lock_guard<std::mutex> lock(part.mutex);
+        count += static_cast<size_t>(
+            std::count_if(part.items.begin(), part.items.end(),
+                          [&](const auto& entry) { return entry.second == item; }));
+    }
+    return count;
 }
 
 }  // namespace simulator

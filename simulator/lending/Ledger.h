@@ -1,5 +1,6 @@
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <mutex>
 #include <unordered_map>
@@ -23,8 +24,15 @@ class Ledger {
     size_t count(Item item) const noexcept;
 
   private:
-    mutable std::mutex mutex;
-    std::unordered_map<const void*, Item> items;
+    // Several tables, so that threads seldom wait for each other.
+    struct Part {
+        mutable std::mutex mutex;
+        std::unordered_map<const void*, Item> items;
+    };
+
+    static size_t partOf(const void* address) noexcept;
+
+    std::array<Part, 16> parts;
 };
 
 }  // namespace simulator

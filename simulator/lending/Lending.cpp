@@ -9,21 +9,6 @@ namespace simulator {
 
 namespace {
 
-void* allocate(size_t size) {
-    void* memory = std::malloc(size);
-    if (memory == nullptr) {
-        throw std::bad_alloc();
-    }
-    return memory;
-}
-
-void freeTexts(char** array, size_t count) noexcept {
-    for (size_t i = 0; i < count; ++i) {
-        std::free(array[i]);
-    }
-    std::free(array);
-}
-
 void reportMisuse(const char* function, const char* item) noexcept {
     std::fprintf(stderr,
                  "qitrmcapi: nQITRMCAPI100_%s was given what is not %s that is lent; it was left "
@@ -33,55 +18,24 @@ void reportMisuse(const char* function, const char* item) noexcept {
 
 }  // namespace
 
-char* copyOf(std::string_view text) {
-    auto* copy = static_cast<char*>(allocate(text.size() + 1));
-    std::memcpy(copy, text.data(), text.size());
-    copy[text.size()] = '\0';
-    return copy;
+void* lendMemory(size_t size, Ledger::Item item) {
+    void* memory = std::malloc(size);
+    if (memory == nullptr) {
+        throw std::bad_alloc();
+    }
+    try {
+        Ledger::instance().lend(memory, item);
+    } catch (...) {
+        std::free(memory);
+        throw;
+    }
+    return memory;
 }
 
 char* lendText(const std::string& text) {
-    char* copy = copyOf(text);
-    try {
-        Ledger::instance().lend(copy, Ledger::Item::text);
-    } catch (...) {
-        std::free(copy);
-        throw;
-    }
+    auto* copy = static_cast<char*>(lendMemory(text.size() + 1, Ledger::Item::text));
+    std::memcpy(copy, text.c_str(), text.size() + 1);
     return copy;
-}
-
-char** lendTexts(const std::vector<std::string>& texts) {
-    return lendTexts(texts.size(), [&](size_t index) { return copyOf(texts[index]); });
-}
-
-char** lendTexts(size_t count, const std::function<char*(size_t)>& makeText) {
-    if (count == 0) {
-        return nullptr;
-    }
-    auto** array = static_cast<char**>(allocate(count * sizeof(char*)));
-    size_t made = 0;
-    try {
-        for (; made < count; ++made) {
-            array[made] = makeText(made);
-        }
-        Ledger::instance().lend(array, Ledger::Item::texts);
-    } catch (...) {
-        freeTexts(array, made);
-        throw;
-    }
-    return array;
-}
-
-void* lendNumberMemory(size_t size) {
-    void* array = allocate(size);
-    try {
-        Ledger::instance().lend(array, Ledger::Item::numbers);
-    } catch (...) {
-        std::free(array);
-        throw;
-    }
-    return array;
 }
 
 void takeBackText(char* text) noexcept {
@@ -107,12 +61,12 @@ void takeBackNumbers(void* array) noexcept {
     }
 }
 
-void takeBackTexts(char** array, uint32_t count) noexcept {
+void takeBackTexts(char** array) noexcept {
     if (array == nullptr) {
         return;
     }
     if (Ledger::instance().takeBack(array, Ledger::Item::texts)) {
-        freeTexts(array, count);
+        std::free(array);
     } else {
         reportMisuse("freeStringArray", "an array of texts");
     }

@@ -3,25 +3,25 @@
 #include <cstdint>
 #include <cstdlib>
 #include <cstring>
-#include <functional>
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "lending/Ledger.h"
 
 namespace simulator {
 
 // Copies of texts and numbers for a caller, who owns them and returns them to the driver. All of
 // them come from malloc and are in the ledger. These throw std::bad_alloc and lend nothing then.
 char* lendText(const std::string& text);
-// An empty list is lent as null.
-char** lendTexts(const std::vector<std::string>& texts);
-// Lends an array of as many texts as count says; 0 is lent as null. makeText(index) makes them by
-// copyOf(), or leaves one null.
-char** lendTexts(size_t count, const std::function<char*(size_t)>& makeText);
-char* copyOf(std::string_view text);
+// Lends an array of `count` texts, or null for none. textAt(index) returns a std::string_view,
+// which is valid until the next call; one whose data is null becomes a null pointer. It is called
+// twice for each index. The array and its texts are one block of memory.
+template <typename TextAt>
+char** lendTexts(size_t count, TextAt textAt);
 
-// Memory for an array of numbers that is lent. size is in bytes and not 0.
-void* lendNumberMemory(size_t size);
+// Memory that is lent as an item of this kind. size is in bytes and not 0.
+void* lendMemory(size_t size, Ledger::Item item);
 
 template <typename Number>
 Number* lendNumbers(const std::vector<Number>& numbers) {
@@ -29,9 +29,33 @@ Number* lendNumbers(const std::vector<Number>& numbers) {
         return nullptr;
     }
     const size_t size = numbers.size() * sizeof(Number);
-    void* array = lendNumberMemory(size);
+    void* array = lendMemory(size, Ledger::Item::numbers);
     std::memcpy(array, numbers.data(), size);
     return static_cast<Number*>(array);
+}
+
+template <typename TextAt>
+char** lendTexts(size_t count, TextAt textAt) {
+    if (count == 0) {
+        return nullptr;
+    }
+    size_t size = count * sizeof(char*);
+    for (size_t i = 0; i < count; ++i) {
+        const std::string_view text = textAt(i);
+        size += text.data() == nullptr ? 0 : text.size() + 1;
+    }
+    auto** array = static_cast<char**>(lendMemory(size, Ledger::Item::texts));
+    char* next = reinterpret_cast<char*>(array + count);
+    for (size_t i = 0; i < count; ++i) {
+        const std::string_view text = textAt(i);
+        array[i] = text.data() == nullptr ? nullptr : next;
+        if (array[i] != nullptr) {
+            std::memcpy(next, text.data(), text.size());
+            next[text.size()] = '\0';
+            next += text.size() + 1;
+        }
+    }
+    return array;
 }
 
 // Free what was lent; null is allowed. What was not lent as such an item is not touched, with a
@@ -39,6 +63,6 @@ Number* lendNumbers(const std::vector<Number>& numbers) {
 // owner with malloc, and is freed.
 void takeBackText(char* text) noexcept;
 void takeBackNumbers(void* array) noexcept;
-void takeBackTexts(char** array, uint32_t count) noexcept;
+void takeBackTexts(char** array) noexcept;
 
 }  // namespace simulator

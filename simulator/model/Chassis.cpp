@@ -1,6 +1,5 @@
 #include "model/Chassis.h"
 
-#include "model/NameText.h"
 #include "status/Refusal.h"
 
 namespace simulator {
@@ -56,54 +55,57 @@ void expectPresent(const Device& device, Absence absence) {
 }
 
 Device& Chassis::addDevice(const std::string& name) {
-    all.push_back(std::make_unique<Device>(name));
-    byName.emplace(foldName(name), all.back().get());
-    return *all.back();
+    all.push_back(std::make_unique<Device>(name, all.size()));
+    Device& added = *all.back();
+    byName.emplace(HashedName(added.foldedName), &added);
+    return added;
 }
 
 Resource& Chassis::addPhysChan(Device& device, const std::string& name) {
     device.physChans.push_back(std::make_unique<Resource>(Kind::physChan, name, device));
-    device.parts.emplace(foldName(name), device.physChans.back().get());
-    return *device.physChans.back();
+    Resource& added = *device.physChans.back();
+    device.parts.emplace(HashedName(added.foldedName), &added);
+    return added;
 }
 
 NvmemArea& Chassis::addNvmemArea(Device& device, const std::string& name) {
     device.nvmemAreas.push_back(std::make_unique<NvmemArea>(name, device));
-    device.parts.emplace(foldName(name), device.nvmemAreas.back().get());
-    return *device.nvmemAreas.back();
+    NvmemArea& added = *device.nvmemAreas.back();
+    device.parts.emplace(HashedName(added.foldedName), &added);
+    return added;
 }
 
 void Chassis::rename(Device& device, const std::string& newName,
                      const std::function<void()>& keep) {
     std::string name = newName;
-    const std::string old = foldName(device.name);
-    std::map<std::string, Device*, std::less<>> entry;
-    entry.emplace(foldName(newName), &device);
+    std::string folded = foldName(newName);
     keep();
-    byName.erase(old);
-    byName.merge(entry);
+    // An entry that is taken out and put in again needs no memory.
+    auto entry = byName.extract(HashedName(device.foldedName));
     device.name.swap(name);
+    device.foldedName.swap(folded);
+    entry.key() = HashedName(device.foldedName);
+    byName.insert(std::move(entry));
     ++changes;
 }
 
 void Chassis::rename(const std::map<Device*, std::string>& names) {
     for (const auto& [device, name] : names) {
         device->name = name;
+        device->foldedName = foldName(name);
     }
     byName.clear();
     for (const auto& device : all) {
-        byName.emplace(foldName(device->name), device.get());
+        byName.emplace(HashedName(device->foldedName), device.get());
     }
 }
 
 Device* Chassis::findDevice(std::string_view name) const {
-    const auto found = byName.find(foldName(name));
-    return found == byName.end() ? nullptr : found->second;
+    return findIn(byName, HashedName(FoldedName(name).text()));
 }
 
 Resource* Chassis::findPart(const Device& device, std::string_view name) const {
-    const auto found = device.parts.find(foldName(name));
-    return found == device.parts.end() ? nullptr : found->second;
+    return findIn(device.parts, HashedName(FoldedName(name).text()));
 }
 
 Resource* Chassis::find(std::string_view fullName) const {

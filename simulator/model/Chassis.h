@@ -9,6 +9,8 @@
 #include <vector>
 
 #include "model/Commands.h"
+#include "model/NameIndex.h"
+#include "model/NameText.h"
 #include "model/Nvmem.h"
 #include "model/Properties.h"
 #include "model/Registers.h"
@@ -25,8 +27,8 @@ enum class Absence { none, connectionLost, removed };
 // Something that clients name. Resources exist as long as the chassis; their addresses identify
 // them, while their names may change.
 struct Resource {
-    Resource(Kind kind, std::string name, Device& device)
-        : kind(kind), name(std::move(name)), device(&device) {}
+    Resource(Kind kind, const std::string& name, Device& device)
+        : kind(kind), name(name), foldedName(foldName(name)), device(&device) {}
     Resource(const Resource&) = delete;
     Resource& operator=(const Resource&) = delete;
 
@@ -40,6 +42,8 @@ struct Resource {
     Kind kind;
     // The part of the name after the slash, or the whole name of a device.
     std::string name;
+    // The name for look-ups.
+    std::string foldedName;
     // The device that this belongs to; a device belongs to itself.
     Device* device;
     PropertyStore properties;
@@ -50,18 +54,19 @@ struct Resource {
 };
 
 struct NvmemArea : Resource {
-    NvmemArea(std::string name, Device& device)
-        : Resource(Kind::nvmemArea, std::move(name), device) {}
+    NvmemArea(const std::string& name, Device& device) : Resource(Kind::nvmemArea, name, device) {}
 
     NvmemMemory memory;
 };
 
 struct Device : Resource {
-    explicit Device(const std::string& name)
-        : Resource(Kind::device, name, *this), firstName(name) {}
+    Device(const std::string& name, size_t place)
+        : Resource(Kind::device, name, *this), firstName(name), place(place) {}
 
     // The name in the description.
     const std::string firstName;
+    // The index in the list of all devices.
+    const size_t place;
     uint32_t slot = 0;
     int32_t category = 0;
     std::vector<std::unique_ptr<Resource>> physChans;
@@ -69,7 +74,7 @@ struct Device : Resource {
     // The modules in the slots of a chassis device; owned by the Chassis.
     std::vector<Device*> modules;
     // The channels and areas by their folded names, without the device's.
-    std::map<std::string, Resource*, std::less<>> parts;
+    NameIndex<Resource*> parts;
     Registers registers;
     // How long it takes to connect, and whether the device answers then.
     double connectSeconds = 0.0;
@@ -141,7 +146,8 @@ class Chassis {
 
   private:
     std::vector<std::unique_ptr<Device>> all;
-    std::map<std::string, Device*, std::less<>> byName;
+    // By their folded names.
+    NameIndex<Device*> byName;
 };
 
 }  // namespace simulator

@@ -21,14 +21,12 @@ bool isDigit(char c) {
     return c >= '0' && c <= '9';
 }
 
-std::string foldAscii(std::string_view name) {
-    std::string folded(name);
-    for (char& c : folded) {
-        if (c >= 'A' && c <= 'Z') {
-            c = static_cast<char>(c - 'A' + 'a');
-        }
-    }
-    return folded;
+bool isAscii(std::string_view text) {
+    return std::all_of(text.begin(), text.end(), [](unsigned char c) { return c < 0x80; });
+}
+
+char foldAscii(char c) {
+    return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
 }
 
 uint32_t rangeNumber(std::string_view digits, std::string_view name) {
@@ -86,8 +84,10 @@ bool isValidUtf8(std::string_view text) {
 }  // namespace
 
 std::string foldName(std::string_view name) {
-    if (std::all_of(name.begin(), name.end(), [](unsigned char c) { return c < 0x80; })) {
-        return foldAscii(name);
+    if (isAscii(name)) {
+        std::string folded(name);
+        std::transform(folded.begin(), folded.end(), folded.begin(), foldAscii);
+        return folded;
     }
     utf8proc_uint8_t* folded = nullptr;
     const auto length =
@@ -101,6 +101,16 @@ std::string foldName(std::string_view name) {
         return std::string(name);
     }
     return std::string(reinterpret_cast<const char*>(folded), static_cast<size_t>(length));
+}
+
+FoldedName::FoldedName(std::string_view name) {
+    if (name.size() <= shortText.size() && isAscii(name)) {
+        std::transform(name.begin(), name.end(), shortText.begin(), foldAscii);
+        folded = std::string_view(shortText.data(), name.size());
+    } else {
+        otherText = foldName(name);
+        folded = otherText;
+    }
 }
 
 void forEachName(std::string_view joined, const Visit& visit) {

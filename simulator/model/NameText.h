@@ -1,5 +1,6 @@
 #pragma once
 
+#include <array>
 #include <functional>
 #include <string>
 #include <string_view>
@@ -10,6 +11,21 @@ namespace simulator {
 // the same exactly when their folded forms are equal bytes. A text that is not UTF-8 folds to
 // itself.
 std::string foldName(std::string_view name);
+
+// The folded form of a name, for one look-up. Allocates only for names that are long or not ASCII.
+class FoldedName {
+  public:
+    explicit FoldedName(std::string_view name);
+    FoldedName(const FoldedName&) = delete;
+    FoldedName& operator=(const FoldedName&) = delete;
+
+    std::string_view text() const { return folded; }
+
+  private:
+    std::array<char, 64> shortText;
+    std::string otherText;
+    std::string_view folded;
+};
 
 // Calls visit(name) for each name of a joined text of resources, in order, with the ranges
 // expanded: "Mod1/ch0:2,Mod2" stands for "Mod1/ch0", "Mod1/ch1", "Mod1/ch2" and "Mod2". An empty

@@ -69,23 +69,29 @@ std::optional<size_t> PropertyDefinition::firstWithoutItem(const Elements& value
     return std::nullopt;
 }
 
+PropertyStore::PropertyStore(const PropertyStore& other) : all(other.all), own(other.own) {
+    byName.reserve(all.size());
+    for (auto& [name, property] : all) {
+        byName.emplace(HashedName(name), &property);
+    }
+}
+
+PropertyStore& PropertyStore::operator=(PropertyStore other) noexcept {
+    all.swap(other.all);
+    byName.swap(other.byName);
+    own.swap(other.own);
+    return *this;
+}
+
 void PropertyStore::add(const DefinitionPointer& definition, const Elements& initial) {
-    all.emplace(definition->name, Property{definition, initial, initial, std::nullopt});
+    const auto added =
+        all.emplace(definition->name, Property{definition, initial, initial, std::nullopt}).first;
+    byName.emplace(HashedName(added->first), &added->second);
 }
 
 void PropertyStore::addOwn(const DefinitionPointer& definition) {
     add(definition, *definition->initial);
-    own.push_back(definition->name);
-}
-
-Property* PropertyStore::find(std::string_view name) {
-    const auto found = all.find(name);
-    return found == all.end() ? nullptr : &found->second;
-}
-
-const Property* PropertyStore::find(std::string_view name) const {
-    const auto found = all.find(name);
-    return found == all.end() ? nullptr : &found->second;
+    std::get<List<std::string>>(own).push_back(definition->name);
 }
 
 std::vector<std::string> PropertyStore::names() const {
@@ -120,31 +126,17 @@ void PropertyStore::dropAllPending() noexcept {
 }
 
 void Catalogue::add(Category category, const DefinitionPointer& definition) {
-    all[category].push_back(definition);
-    byName[category].emplace(definition->name, definition);
+    Part& part = parts[static_cast<size_t>(category)];
+    part.definitions.push_back(definition);
+    std::get<List<std::string>>(part.names).push_back(definition->name);
+    part.byName.emplace(HashedName(definition->name), definition);
 }
 
-const std::vector<DefinitionPointer>& Catalogue::definitions(Category category) const {
-    static const std::vector<DefinitionPointer> none;
-    const auto found = all.find(category);
-    return found == all.end() ? none : found->second;
-}
-
-std::vector<std::string> Catalogue::names(Category category) const {
-    std::vector<std::string> names;
-    for (const DefinitionPointer& definition : definitions(category)) {
-        names.push_back(definition->name);
-    }
-    return names;
-}
-
-DefinitionPointer Catalogue::find(Category category, std::string_view name) const {
-    const auto names = byName.find(category);
-    if (names == byName.end()) {
-        return nullptr;
-    }
-    const auto found = names->second.find(name);
-    return found == names->second.end() ? nullptr : found->second;
+const DefinitionPointer& Catalogue::find(Category category, const HashedName& name) const {
+    static const DefinitionPointer none;
+    const NameIndex<DefinitionPointer>& byName = part(category).byName;
+    const auto found = byName.find(name);
+    return found == byName.end() ? none : found->second;
 }
 
 }  // namespace simulator

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <array>
 #include <map>
 #include <memory>
 #include <optional>
@@ -10,12 +11,14 @@
 #include <vector>
 
 #include "Api.h"
+#include "model/NameIndex.h"
 #include "model/Values.h"
 
 namespace simulator {
 
 // What kinds of things have properties.
 enum class Category { system, session, device, physChan, nvmemArea };
+inline constexpr size_t categoryCount = 5;
 
 // The numbers of the enumeration "PropertyAccess".
 enum class PropertyAccess : int32_t { readOnly = 1, writeOnly = 2, readWrite = 3 };
@@ -88,19 +91,26 @@ struct Property {
 // The stored properties of one thing. Names are compared byte by byte.
 class PropertyStore {
   public:
+    PropertyStore() = default;
+    PropertyStore(const PropertyStore& other);
+    PropertyStore(PropertyStore&&) = default;
+    PropertyStore& operator=(PropertyStore other) noexcept;
+
     // Adds a property with its value after power-on. A name that is there keeps its property.
     void add(const DefinitionPointer& definition, const Elements& initial);
     // Adds a property that the driver does not define itself.
     void addOwn(const DefinitionPointer& definition);
 
     // Return null when there is no such property.
-    Property* find(std::string_view name);
-    const Property* find(std::string_view name) const;
+    Property* find(const HashedName& name) { return findIn(byName, name); }
+    const Property* find(const HashedName& name) const { return findIn(byName, name); }
+    Property* find(std::string_view name) { return find(HashedName(name)); }
+    const Property* find(std::string_view name) const { return find(HashedName(name)); }
 
     // The names of all properties, sorted.
     std::vector<std::string> names() const;
     // The names of the properties that the driver does not define, in the order of addition.
-    const std::vector<std::string>& ownNames() const { return own; }
+    const Elements& ownNames() const { return own; }
 
     // Calls visit(Property&) for each property.
     template <typename Visit>
@@ -115,8 +125,10 @@ class PropertyStore {
     void dropAllPending() noexcept;
 
   private:
+    // In the order of their names, and to be found by name. The names are those in `all`.
     std::map<std::string, Property, std::less<>> all;
-    std::vector<std::string> own;
+    NameIndex<Property*> byName;
+    Elements own = List<std::string>();
 };
 
 // The properties that the driver itself defines.
@@ -124,15 +136,28 @@ class Catalogue {
   public:
     void add(Category category, const DefinitionPointer& definition);
 
-    const std::vector<DefinitionPointer>& definitions(Category category) const;
-    std::vector<std::string> names(Category category) const;
-    // Returns null when there is no such property.
-    DefinitionPointer find(Category category, std::string_view name) const;
+    const std::vector<DefinitionPointer>& definitions(Category category) const {
+        return part(category).definitions;
+    }
+    // The names of the definitions.
+    const Elements& names(Category category) const { return part(category).names; }
+    // Null when there is no such property.
+    const DefinitionPointer& find(Category category, const HashedName& name) const;
+    const DefinitionPointer& find(Category category, std::string_view name) const {
+        return find(category, HashedName(name));
+    }
 
   private:
-    // In the order of addition, and to be found by name.
-    std::map<Category, std::vector<DefinitionPointer>> all;
-    std::map<Category, std::map<std::string, DefinitionPointer, std::less<>>> byName;
+    struct Part {
+        // In the order of addition, and to be found by name.
+        std::vector<DefinitionPointer> definitions;
+        Elements names = List<std::string>();
+        NameIndex<DefinitionPointer> byName;
+    };
+
+    const Part& part(Category category) const { return parts[static_cast<size_t>(category)]; }
+
+    std::array<Part, categoryCount> parts;
 };
 
 }  // namespace simulator

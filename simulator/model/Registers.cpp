@@ -77,6 +77,14 @@ RegisterBlock& Registers::find(uint32_t address, uint32_t width) {
         .usage(tag::registerWidth, width * 8);
 }
 
+uint64_t Registers::read(RegisterBlock& block, uint32_t address, uint32_t width) {
+    if (!block.clearsOnRead) {
+        return block.read(address, width);
+    }
+    const std::lock_guard<std::mutex> lock(clearing);
+    return block.read(address, width);
+}
+
 void Registers::reset() {
     for (RegisterBlock& block : blocks) {
         std::copy(block.initial.begin(), block.initial.end(), block.bytes.begin());

@@ -2,6 +2,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <mutex>
 #include <string>
 #include <vector>
 
@@ -52,6 +53,9 @@ class Registers {
     // misalignedRegister and unmappedRegister.
     RegisterBlock& find(uint32_t address, uint32_t width);
 
+    // Reads from a block. Threads may do so at the same time, while nothing writes.
+    uint64_t read(RegisterBlock& block, uint32_t address, uint32_t width);
+
     void reset();
 
     // In the order of their addresses.
@@ -62,6 +66,8 @@ class Registers {
     size_t firstAfter(uint32_t address) const;
 
     std::vector<RegisterBlock> blocks;
+    // Held while a block is read whose bytes become 0.
+    std::mutex clearing;
 };
 
 }  // namespace simulator

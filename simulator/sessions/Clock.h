@@ -1,5 +1,6 @@
 #pragma once
 
+#include <atomic>
 #include <chrono>
 #include <cstdint>
 
@@ -7,7 +8,8 @@
 
 namespace simulator {
 
-// The simulated time. Every operation needs the simulator's mutex to be held.
+// The simulated time. Needs the simulator's mutex to be held, except for noteCall()
+// and calls() where time does not go by calls.
 class Clock {
   public:
     explicit Clock(const TimeScale& scale) : scale(scale) {}
@@ -18,7 +20,7 @@ class Clock {
     // A call of the driver begins: by calls, a millisecond has passed.
     void noteCall();
     // How many calls have begun.
-    uint64_t calls() const { return begun; }
+    uint64_t calls() const { return begun.load(std::memory_order_relaxed); }
 
     // Whether what takes time is over at once, with the clock moved on by skip().
     bool goesByCalls() const { return scale.byCalls; }
@@ -34,7 +36,7 @@ class Clock {
     Real::time_point start = Real::now();
     // By calls, the time itself in microseconds.
     int64_t stepped = 0;
-    uint64_t begun = 0;
+    std::atomic<uint64_t> begun{0};
 };
 
 }  // namespace simulator

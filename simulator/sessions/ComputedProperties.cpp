@@ -15,7 +15,7 @@ struct Subject {
     const NvmemMemory& memory() const { return static_cast<const NvmemArea*>(resource)->memory; }
 };
 
-using Value = std::optional<Elements>;
+using Value = std::optional<ReadValue>;
 
 struct Entry {
     Category category;
@@ -23,42 +23,56 @@ struct Entry {
     Value (*read)(const Subject& subject);
 };
 
-template <typename List>
-std::vector<std::string> namesOf(const List& resources) {
-    std::vector<std::string> names;
+template <typename Item>
+Value scalar(Item item) {
+    return ReadValue(Elements(List<Item>{std::move(item)}));
+}
+
+template <typename Resources>
+Value fullNames(const Resources& resources) {
+    List<std::string> names;
     for (const auto& resource : resources) {
         names.push_back(resource->fullName());
     }
-    return names;
+    return ReadValue(Elements(std::move(names)));
+}
+
+Value deviceNames(const std::vector<Device*>& devices) {
+    ReadValue::Names names;
+    for (const Device* device : devices) {
+        names.push_back(device->name);
+    }
+    return ReadValue(std::move(names));
 }
 
 // Removed devices are not in the lists of the system.
-template <typename List>
-std::vector<std::string> namesOfPresent(const List& devices) {
-    std::vector<std::string> names;
+template <typename Devices>
+Value presentNames(const Devices& devices) {
+    ReadValue::Names names;
+    names.reserve(devices.size());
     for (const auto& device : devices) {
         if (device->absence != Absence::removed) {
             names.push_back(device->name);
         }
     }
-    return names;
+    return ReadValue(std::move(names));
 }
 
 template <Category category>
 Value propertyNames(const Subject& subject) {
-    return subject.simulator.chassis->catalogue.names(category);
+    return ReadValue(subject.simulator.chassis->catalogue.names(category));
 }
 
 Value ownPropertyNames(const Subject& subject) {
-    return subject.resource->properties.ownNames();
+    return ReadValue(subject.resource->properties.ownNames());
 }
 
 Value commandNames(const Subject& subject) {
-    std::vector<std::string> names;
+    ReadValue::Names names;
     for (const Command& command : subject.resource->commands) {
         names.push_back(command.name);
     }
-    return names;
+    return ReadValue(std::move(names));
 }
 
 // Only a chassis has modules, and only a module has a slot.
@@ -71,24 +85,24 @@ Value modules(const Subject& subject) {
     if (subject.device().category != chassisCategory || isModule(subject.device())) {
         return std::nullopt;
     }
-    return namesOfPresent(subject.device().modules);
+    return presentNames(subject.device().modules);
 }
 
 Value slotNumber(const Subject& subject) {
     if (!isModule(subject.device())) {
         return std::nullopt;
     }
-    return List<uint32_t>{subject.device().slot};
+    return scalar(subject.device().slot);
 }
 
 constexpr Entry entries[] = {
     {Category::system, "Sys.Devices",
      [](const Subject& subject) -> Value {
-         return namesOfPresent(subject.simulator.chassis->devices());
+         return presentNames(subject.simulator.chassis->devices());
      }},
     {Category::system, "Sys.ConfigChangeCount",
      [](const Subject& subject) -> Value {
-         return List<uint64_t>{subject.simulator.chassis->changes};
+         return scalar<uint64_t>(subject.simulator.chassis->changes);
      }},
     {Category::system, "Sys.SystemProperties", propertyNames<Category::system>},
     {Category::system, "Sys.SessionProperties", propertyNames<Category::session>},
@@ -97,47 +111,60 @@ constexpr Entry entries[] = {
     {Category::system, "Sys.NVMEMAreaProperties", propertyNames<Category::nvmemArea>},
     {Category::session, "Session.ReservedDevices",
      [](const Subject& subject) -> Value {
-         return namesOf(subject.simulator.resolver(subject.session).reservedDevices());
+         return deviceNames(subject.simulator.reservations.heldBy(subject.session.handle));
      }},
     {Category::session, "Session.ConnectedDevices",
-     [](const Subject& subject) -> Value { return namesOf(subject.session.connectedDevices); }},
+     [](const Subject& subject) -> Value { return deviceNames(subject.session.connectedDevices); }},
     {Category::session, "Session.DefaultDevices",
-     [](const Subject& subject) -> Value { return namesOf(subject.session.defaultDevices); }},
+     [](const Subject& subject) -> Value { return deviceNames(subject.session.defaultDevices); }},
     {Category::session, "Session.DefaultPhysChans",
-     [](const Subject& subject) -> Value { return namesOf(subject.session.defaultPhysChans); }},
+     [](const Subject& subject) -> Value { return fullNames(subject.session.defaultPhysChans); }},
     {Category::session, "Session.DefaultNVMEMAreas",
-     [](const Subject& subject) -> Value { return namesOf(subject.session.defaultNvmemAreas); }},
+     [](const Subject& subject) -> Value { return fullNames(subject.session.defaultNvmemAreas); }},
     {Category::device, "Dev.Name",
-     [](const Subject& subject) -> Value { return List<std::string>{subject.device().name}; }},
+     [](const Subject& subject) -> Value { return scalar<std::string>(subject.device().name); }},
     {Category::device, "Dev.ProductCategory",
-     [](const Subject& subject) -> Value { return List<int32_t>{subject.device().category}; }},
+     [](const Subject& subject) -> Value { return scalar<int32_t>(subject.device().category); }},
     {Category::device, "Dev.Modules", modules},
     {Category::device, "Dev.SlotNum", slotNumber},
     {Category::device, "Dev.PhysChans",
-     [](const Subject& subject) -> Value { return namesOf(subject.device().physChans); }},
+     [](const Subject& subject) -> Value { return fullNames(subject.device().physChans); }},
     {Category::device, "Dev.NVMEM.Areas",
-     [](const Subject& subject) -> Value { return namesOf(subject.device().nvmemAreas); }},
+     [](const Subject& subject) -> Value { return fullNames(subject.device().nvmemAreas); }},
     {Category::device, "Dev.Properties", ownPropertyNames},
     {Category::device, "Dev.Commands", commandNames},
     {Category::physChan, "PhysChan.Properties", ownPropertyNames},
     {Category::physChan, "PhysChan.Commands", commandNames},
     {Category::nvmemArea, "NVMEMArea.Size",
-     [](const Subject& subject) -> Value { return List<uint32_t>{subject.memory().size()}; }},
+     [](const Subject& subject) -> Value { return scalar<uint32_t>(subject.memory().size()); }},
     {Category::nvmemArea, "NVMEMArea.Writable",
      [](const Subject& subject) -> Value {
-         return List<uint8_t>{subject.memory().writeRules().writable};
+         return scalar<uint8_t>(subject.memory().writeRules().writable);
      }},
     {Category::nvmemArea, "NVMEMArea.SerialNumWanted",
      [](const Subject& subject) -> Value {
-         return List<uint8_t>{subject.memory().writeRules().wantsSerialNumber};
+         return scalar<uint8_t>(subject.memory().writeRules().wantsSerialNumber);
      }},
     {Category::nvmemArea, "NVMEMArea.PasswordWanted",
      [](const Subject& subject) -> Value {
-         return List<uint8_t>{!subject.memory().writeRules().password.empty()};
+         return scalar<uint8_t>(!subject.memory().writeRules().password.empty());
      }},
     {Category::nvmemArea, "NVMEMArea.PendingChanges",
-     [](const Subject& subject) -> Value { return List<uint8_t>{subject.memory().hasPending()}; }},
+     [](const Subject& subject) -> Value {
+         return scalar<uint8_t>(subject.memory().hasPending());
+     }},
 };
+
+const NameIndex<const Entry*>& entriesByName() {
+    static const NameIndex<const Entry*> index = [] {
+        NameIndex<const Entry*> made;
+        for (const Entry& entry : entries) {
+            made.emplace(HashedName(entry.name), &entry);
+        }
+        return made;
+    }();
+    return index;
+}
 
 std::string joined(const std::vector<std::string>& names) {
     std::string text;
@@ -149,15 +176,12 @@ std::string joined(const std::vector<std::string>& names) {
 
 }  // namespace
 
-std::optional<Elements> computedValue(const Simulator& simulator, const Session& session,
-                                      Category category, const Resource* resource,
-                                      std::string_view name) {
-    for (const Entry& entry : entries) {
-        if (entry.category == category && entry.name == name) {
-            return entry.read({simulator, session, resource});
-        }
-    }
-    return std::nullopt;
+Value computedValue(const Simulator& simulator, const Session& session, Category category,
+                    const Resource* resource, const HashedName& name) {
+    const Entry* entry = findIn(entriesByName(), name);
+    return entry != nullptr && entry->category == category
+               ? entry->read({simulator, session, resource})
+               : std::nullopt;
 }
 
 void setDefaultResources(const Resolver& resolver, Session& session, std::string_view property,

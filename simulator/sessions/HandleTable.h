@@ -1,7 +1,9 @@
 #pragma once
 
 #include <cstdint>
-#include <map>
+#include <mutex>
+#include <optional>
+#include <unordered_map>
 #include <utility>
 
 namespace simulator {
@@ -37,9 +39,17 @@ class HandleTable {
     // Returns whether there was such an item.
     bool remove(uint32_t handle) noexcept { return items.erase(handle) != 0; }
 
+    // In no particular order.
     template <typename Visit>
     void forEach(Visit visit) {
         for (auto& [handle, item] : items) {
+            visit(item);
+        }
+    }
+
+    template <typename Visit>
+    void forEach(Visit visit) const {
+        for (const auto& [handle, item] : items) {
             visit(item);
         }
     }
@@ -54,8 +64,41 @@ class HandleTable {
     uint32_t size() const { return static_cast<uint32_t>(items.size()); }
 
   private:
-    std::map<uint32_t, Item> items;
+    std::unordered_map<uint32_t, Item> items;
     uint32_t next;
+};
+
+// A handle table that is thread-safe, for small items.
+template <typename Item>
+class GuardedHandleTable {
+  public:
+    uint32_t add(const Item& item) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        return table.add(item);
+    }
+    // A copy of the item, or nothing.
+    std::optional<Item> find(uint32_t handle) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        const Item* item = table.find(handle);
+        return item != nullptr ? std::optional(*item) : std::nullopt;
+    }
+    bool remove(uint32_t handle) noexcept {
+        const std::lock_guard<std::mutex> lock(mutex);
+        return table.remove(handle);
+    }
+    template <typename Condition>
+    void removeIf(Condition condition) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        table.removeIf(condition);
+    }
+    uint32_t size() const {
+        const std::lock_guard<std::mutex> lock(mutex);
+        return table.size();
+    }
+
+  private:
+    mutable std::mutex mutex;
+    HandleTable<Item> table;
 };
 
 }  // namespace simulator

@@ -96,7 +96,7 @@ std::vector<std::string> PropertyAccessor::knownNames(Category category, const R
     std::vector<std::string> names = store.names();
     for (const DefinitionPointer& definition : simulator.chassis->catalogue.definitions(category)) {
         if (definition->computed &&
-            computedValue(simulator, session, category, resource, definition->name)) {
+            computedValue(simulator, session, category, resource, HashedName(definition->name))) {
             names.push_back(definition->name);
         }
     }
@@ -104,35 +104,45 @@ std::vector<std::string> PropertyAccessor::knownNames(Category category, const R
 }
 
 PropertyAccessor::Place PropertyAccessor::find(Category category, Resource* resource,
-                                               PropertyStore& store, std::string_view name) {
+                                               PropertyStore& store, const HashedName& name) {
     if (Property* stored = store.find(name)) {
-        return {category, resource, stored->definition, stored, std::nullopt};
+        return {resource, stored->definition.get(), stored, std::nullopt};
     }
-    auto computed = computedValue(simulator, session, category, resource, name);
-    DefinitionPointer definition = simulator.chassis->catalogue.find(category, name);
-    if (!computed || definition == nullptr) {
-        refuseUnknown(name, resource, knownNames(category, resource, store));
+    const DefinitionPointer& definition = simulator.chassis->catalogue.find(category, name);
+    auto computed = definition != nullptr
+                        ? computedValue(simulator, session, category, resource, name)
+                        : std::nullopt;
+    if (!computed) {
+        refuseUnknown(name.text, resource, knownNames(category, resource, store));
     }
-    return {category, resource, definition, nullptr, std::move(computed)};
+    return {resource, definition.get(), nullptr, std::move(computed)};
 }
 
-std::vector<PropertyAccessor::Place> PropertyAccessor::findIn(Category category,
-                                                              std::string_view name) {
+PropertyAccessor::Place PropertyAccessor::findIn(Category category, const HashedName& name) {
     PropertyStore& store =
         category == Category::session ? session.properties : simulator.chassis->systemProperties;
-    return {find(category, nullptr, store, name)};
+    return find(category, nullptr, store, name);
 }
 
-std::vector<PropertyAccessor::Place> PropertyAccessor::find(std::string_view resources,
-                                                            std::string_view name) {
-    if (simulator.chassis->catalogue.find(Category::session, name) != nullptr) {
-        return findIn(Category::session, name);
+PropertyAccessor::Place PropertyAccessor::findOn(Resource& resource, const HashedName& name) {
+    return find(categoryOf(resource.kind), &resource, resource.properties, name);
+}
+
+bool PropertyAccessor::isOfSession(const HashedName& name) const {
+    return simulator.chassis->catalogue.find(Category::session, name) != nullptr;
+}
+
+std::vector<PropertyAccessor::Place> PropertyAccessor::findAll(std::string_view resources,
+                                                               const HashedName& name) {
+    std::vector<Place> places;
+    if (isOfSession(name)) {
+        places.push_back(findIn(Category::session, name));
+        return places;
     }
     const auto found = simulator.resolver(session).anyResources(resources);
     expectSome(found);
-    std::vector<Place> places;
     for (Resource* resource : found) {
-        places.push_back(find(categoryOf(resource->kind), resource, resource->properties, name));
+        places.push_back(findOn(*resource, name));
         // Lists of several resources are refused. They must not pile up until that is found out.
         if (found.size() > 1 && isArray(places.back().definition->type)) {
             places.back().computed.reset();
@@ -141,30 +151,47 @@ std::vector<PropertyAccessor::Place> PropertyAccessor::find(std::string_view res
     return places;
 }
 
-Elements PropertyAccessor::readAll(const std::vector<Place>& places, DataType type) {
+ReadValue PropertyAccessor::readOne(Place place, DataType type, size_t places) {
+    expectType(*place.definition, type, places);
+    if (place.definition->access == PropertyAccess::writeOnly) {
+        throw about(code::writeOnlyProperty, *place.definition);
+    }
+    if (place.stored == nullptr) {
+        return std::move(*place.computed);
+    }
+    if (simulator.motions.find(*place.stored) == nullptr) {
+        return ReadValue(place.stored->value);
+    }
+    return ReadValue(simulator.motions.valueAt(*place.stored, simulator.clock.now()));
+}
+
+Elements PropertyAccessor::readAll(std::vector<Place> places, DataType type) {
     Elements all = noElements(type);
-    const int64_t now = simulator.clock.now();
-    for (const Place& place : places) {
-        expectType(*place.definition, type, places.size());
-        if (place.definition->access == PropertyAccess::writeOnly) {
-            throw about(code::writeOnlyProperty, *place.definition);
-        }
-        append(all,
-               place.computed ? *place.computed : simulator.motions.valueAt(*place.stored, now));
+    for (Place& place : places) {
+        append(all, readOne(std::move(place), type, places.size()).elements());
     }
     return all;
 }
 
-Elements PropertyAccessor::readSystem(std::string_view name, DataType type) {
-    return readAll(findIn(Category::system, name), type);
+ReadValue PropertyAccessor::readSystem(std::string_view name, DataType type) {
+    return readOne(findIn(Category::system, HashedName(name)), type);
 }
 
-Elements PropertyAccessor::readSession(std::string_view name, DataType type) {
-    return readAll(findIn(Category::session, name), type);
+ReadValue PropertyAccessor::readSession(std::string_view name, DataType type) {
+    return readOne(findIn(Category::session, HashedName(name)), type);
 }
 
-Elements PropertyAccessor::read(std::string_view resources, std::string_view name, DataType type) {
-    return readAll(find(resources, name), type);
+ReadValue PropertyAccessor::read(std::string_view resources, std::string_view name, DataType type) {
+    const HashedName hashed(name);
+    if (isOfSession(hashed)) {
+        return readOne(findIn(Category::session, hashed), type);
+    }
+    if (Resource* resource = simulator.resolver(session).singleResource(resources)) {
+        return readOne(findOn(*resource, hashed), type);
+    }
+    auto places = findAll(resources, hashed);
+    return places.size() == 1 ? readOne(std::move(places.front()), type)
+                              : ReadValue(readAll(std::move(places), type));
 }
 
 void PropertyAccessor::expectAcceptable(const Place& place, const Elements& value) const {
@@ -200,6 +227,9 @@ void PropertyAccessor::writeAll(const std::vector<Place>& places, DataType type,
     }
     Change change = simulator.lasting.change();
     for (size_t i = 0; i < places.size(); ++i) {
+        if (places[i].definition->needsCommit && places[i].resource != nullptr) {
+            session.writtenDevices.insert(places[i].resource->device);
+        }
         if (places[i].stored != nullptr && !places[i].definition->needsCommit) {
             change.property(places[i].resource, *places[i].definition, parts[i]);
         }
@@ -225,16 +255,16 @@ void PropertyAccessor::noteChange(const Resource* resource) noexcept {
 }
 
 void PropertyAccessor::writeSystem(std::string_view name, DataType type, const Elements& values) {
-    writeAll(findIn(Category::system, name), type, values);
+    writeAll({findIn(Category::system, HashedName(name))}, type, values);
 }
 
 void PropertyAccessor::writeSession(std::string_view name, DataType type, const Elements& values) {
-    writeAll(findIn(Category::session, name), type, values);
+    writeAll({findIn(Category::session, HashedName(name))}, type, values);
 }
 
 void PropertyAccessor::write(std::string_view resources, std::string_view name, DataType type,
                              const Elements& values) {
-    writeAll(find(resources, name), type, values);
+    writeAll(findAll(resources, HashedName(name)), type, values);
 }
 
 void PropertyAccessor::commit(std::string_view resources) {
@@ -259,11 +289,12 @@ void PropertyAccessor::commit(std::string_view resources) {
 }
 
 OpenProperty PropertyAccessor::openDriverDefined(std::string_view name) {
+    const HashedName hashed(name);
     constexpr Category categories[] = {Category::session, Category::system, Category::device,
                                        Category::physChan, Category::nvmemArea};
     for (const Category category : categories) {
-        if (auto definition = simulator.chassis->catalogue.find(category, name)) {
-            return {session.handle, category, std::move(definition), nullptr};
+        if (const auto& definition = simulator.chassis->catalogue.find(category, hashed)) {
+            return {session.handle, definition.get(), nullptr};
         }
     }
     std::vector<std::string> known;
@@ -276,11 +307,14 @@ OpenProperty PropertyAccessor::openDriverDefined(std::string_view name) {
 }
 
 OpenProperty PropertyAccessor::openGeneric(std::string_view resource, std::string_view name) {
-    const auto found = simulator.resolver(session).anyResources(resource);
-    expectOne(found);
-    Resource& owner = *found.front();
-    Place place = find(categoryOf(owner.kind), &owner, owner.properties, name);
-    return {session.handle, place.category, std::move(place.definition), &owner};
+    const Resolver resolver = simulator.resolver(session);
+    Resource* owner = resolver.singleResource(resource);
+    if (owner == nullptr) {
+        const auto found = resolver.anyResources(resource);
+        expectOne(found);
+        owner = found.front();
+    }
+    return {session.handle, findOn(*owner, HashedName(name)).definition, owner};
 }
 
 }  // namespace simulator

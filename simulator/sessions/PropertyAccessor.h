@@ -4,6 +4,7 @@
 #include <string_view>
 #include <vector>
 
+#include "sessions/ReadValue.h"
 #include "sessions/Simulator.h"
 
 namespace simulator {
@@ -17,10 +18,10 @@ class PropertyAccessor {
     PropertyAccessor(Simulator& simulator, Session& session)
         : simulator(simulator), session(session) {}
 
-    Elements readSystem(std::string_view name, DataType type);
-    Elements readSession(std::string_view name, DataType type);
+    ReadValue readSystem(std::string_view name, DataType type);
+    ReadValue readSession(std::string_view name, DataType type);
     // A name that is the session's is read there, whatever the resources are.
-    Elements read(std::string_view resources, std::string_view name, DataType type);
+    ReadValue read(std::string_view resources, std::string_view name, DataType type);
 
     // Write all values or none. What needs a commit waits for it.
     void writeSystem(std::string_view name, DataType type, const Elements& values);
@@ -38,22 +39,24 @@ class PropertyAccessor {
   private:
     // A property of the system, the session or one resource.
     struct Place {
-        Category category;
         // Null for the system and the session.
         Resource* resource;
-        DefinitionPointer definition;
+        const PropertyDefinition* definition;
         // Null for a computed property.
         Property* stored;
-        std::optional<Elements> computed;
+        std::optional<ReadValue> computed;
     };
 
-    // The names of the properties that are there.
+    // The names of the properties that there are.
     std::vector<std::string> knownNames(Category category, const Resource* resource,
                                         const PropertyStore& store) const;
-    std::vector<Place> findIn(Category category, std::string_view name);
-    std::vector<Place> find(std::string_view resources, std::string_view name);
-    Place find(Category category, Resource* resource, PropertyStore& store, std::string_view name);
-    Elements readAll(const std::vector<Place>& places, DataType type);
+    bool isOfSession(const HashedName& name) const;
+    Place findIn(Category category, const HashedName& name);
+    Place findOn(Resource& resource, const HashedName& name);
+    Place find(Category category, Resource* resource, PropertyStore& store, const HashedName& name);
+    std::vector<Place> findAll(std::string_view resources, const HashedName& name);
+    ReadValue readOne(Place place, DataType type, size_t places = 1);
+    Elements readAll(std::vector<Place> places, DataType type);
     void writeAll(const std::vector<Place>& places, DataType type, const Elements& values);
     // Null for the system and the session.
     void noteChange(const Resource* resource) noexcept;

@@ -9,9 +9,10 @@ namespace simulator {
 
 uint64_t RegisterAccessor::readProperty(const RegisterBlock& block, uint32_t address) {
     const PropertyDefinition& definition = *block.property->definition;
-    const Elements value = PropertyAccessor(simulator, session)
-                               .read(block.owner->fullName(), definition.name, definition.type);
-    return toRegister(value, block.size()) >> (8 * (address - block.address));
+    const std::string owner = block.owner->fullName();
+    const ReadValue value =
+        PropertyAccessor(simulator, session).read(owner, definition.name, definition.type);
+    return toRegister(value.elements(), block.size()) >> (8 * (address - block.address));
 }
 
 uint64_t RegisterAccessor::read(Device& device, uint32_t address, uint32_t width) {
@@ -19,7 +20,8 @@ uint64_t RegisterAccessor::read(Device& device, uint32_t address, uint32_t width
     if (!block.readable) {
         throw Refusal(code::writeOnlyRegister).usage(tag::registerAddress, address);
     }
-    return block.property != nullptr ? readProperty(block, address) : block.read(address, width);
+    return block.property != nullptr ? readProperty(block, address)
+                                     : device.registers.read(block, address, width);
 }
 
 void RegisterAccessor::writeProperty(const RegisterBlock& block, uint32_t address, uint32_t width,

@@ -15,23 +15,21 @@ bool Holding::conflictsWith(const Holding& other) const {
 Reservations::Request::Request(const std::vector<Device*>& devices, const Holding& wanted)
     : devices(devices),
       wanted(wanted),
-      prepared(devices.size(), wanted),
+      holdings(devices.size(), wanted),
+      held{{wanted.session, {devices.begin(), devices.end()}}},
       wait(wanted.session, &devices) {}
 
-Reservations::Reservations(const Chassis& chassis, Waits& waits) : waits(waits) {
-    for (const auto& device : chassis.devices()) {
-        holders[device.get()];
-    }
-}
+Reservations::Reservations(const Chassis& chassis, Waits& waits)
+    : holders(chassis.devices().size()), waits(waits) {}
 
 bool Reservations::conflictsOn(const Device& device, const Holding& wanted) const {
-    const std::list<Holding>& present = holders.at(&device);
+    const std::list<Holding>& present = holders[device.place];
     return std::any_of(present.begin(), present.end(),
                        [&](const Holding& holding) { return holding.conflictsWith(wanted); });
 }
 
 const Holding* Reservations::find(nQITRMCAPI100_Session session, const Device& device) const {
-    const std::list<Holding>& present = holders.at(&device);
+    const std::list<Holding>& present = holders[device.place];
     const auto found = std::find_if(present.begin(), present.end(), [&](const Holding& holding) {
         return holding.session == session;
     });
@@ -65,10 +63,15 @@ bool Reservations::mustQueue(const Request& request) const {
 
 void Reservations::grant(Request& request) noexcept {
     for (const Device* device : request.devices) {
-        std::list<Holding>& present = holders.find(device)->second;
+        std::list<Holding>& present = holders[device->place];
         present.remove_if(
             [&](const Holding& holding) { return holding.session == request.wanted.session; });
-        present.splice(present.end(), request.prepared, request.prepared.begin());
+        present.splice(present.end(), request.holdings, request.holdings.begin());
+    }
+    // Moves the entry, or if there is one for the session already, the devices in it.
+    held.merge(request.held);
+    for (auto& [session, devices] : request.held) {
+        held.find(session)->second.merge(devices);
     }
     request.wait.finish(Wait::End::done);
 }
@@ -94,8 +97,7 @@ void Reservations::refuse(const Request& request) const {
     throw Refusal(code::deviceReserved).usage(tag::devices, taken);
 }
 
-void Reservations::waitInQueue(Request& request, double timeout,
-                               std::unique_lock<std::mutex>& lock) {
+void Reservations::waitInQueue(Request& request, double timeout, WriteLock& lock) {
     struct InQueue {
         InQueue(Reservations& owner, Request& request)
             : owner(owner), place(owner.queue.insert(owner.queue.end(), &request)) {}
@@ -115,7 +117,7 @@ void Reservations::waitInQueue(Request& request, double timeout,
 }
 
 void Reservations::reserve(const std::vector<Device*>& devices, const Holding& wanted,
-                           double timeout, std::unique_lock<std::mutex>& lock) {
+                           double timeout, WriteLock& lock) {
     Request request(devices, wanted);
     const bool mayWait = timeout > 0.0;
     if (isFree(request) && !(mayWait && mustQueue(request))) {
@@ -128,24 +130,47 @@ void Reservations::reserve(const std::vector<Device*>& devices, const Holding& w
     }
 }
 
+void Reservations::removeHolding(nQITRMCAPI100_Session session, const Device& device) noexcept {
+    holders[device.place].remove_if(
+        [&](const Holding& holding) { return holding.session == session; });
+}
+
 bool Reservations::release(nQITRMCAPI100_Session session, const Device& device) {
-    std::list<Holding>& present = holders.at(&device);
-    const size_t before = present.size();
-    present.remove_if([&](const Holding& holding) { return holding.session == session; });
-    const bool held = present.size() != before;
+    const auto ofSession = held.find(session);
+    if (ofSession == held.end()) {
+        return false;
+    }
+    auto& devices = ofSession->second;
+    const auto place = devices.find(&device);
+    if (place == devices.end()) {
+        return false;
+    }
+    devices.erase(place);
+    if (devices.empty()) {
+        held.erase(ofSession);
+    }
+    removeHolding(session, device);
     serveQueue();
-    return held;
+    return true;
 }
 
 void Reservations::releaseAll(nQITRMCAPI100_Session session) {
-    for (auto& [device, present] : holders) {
-        present.remove_if([&](const Holding& holding) { return holding.session == session; });
+    const auto ofSession = held.find(session);
+    if (ofSession != held.end()) {
+        for (const Device* device : ofSession->second) {
+            removeHolding(session, *device);
+        }
+        held.erase(ofSession);
     }
     serveQueue();
 }
 
-bool Reservations::holds(nQITRMCAPI100_Session session, const Device& device) const {
-    return find(session, device) != nullptr;
+std::vector<Device*> Reservations::heldBy(nQITRMCAPI100_Session session) const {
+    const auto ofSession = held.find(session);
+    if (ofSession == held.end()) {
+        return {};
+    }
+    return {ofSession->second.begin(), ofSession->second.end()};
 }
 
 void Reservations::expectWritable(nQITRMCAPI100_Session session, const Device& device) const {

@@ -3,7 +3,7 @@
 #include <cstdint>
 #include <list>
 #include <map>
-#include <mutex>
+#include <set>
 #include <string>
 #include <vector>
 
@@ -39,13 +39,14 @@ class Reservations {
     // with deviceReserved, and when the session is aborted or closed meanwhile. The mutex is
     // unlocked during the wait.
     void reserve(const std::vector<Device*>& devices, const Holding& wanted, double timeout,
-                 std::unique_lock<std::mutex>& lock);
+                 WriteLock& lock);
 
     // Releases one device. Returns whether the session held it.
     bool release(nQITRMCAPI100_Session session, const Device& device);
     void releaseAll(nQITRMCAPI100_Session session);
 
-    bool holds(nQITRMCAPI100_Session session, const Device& device) const;
+    // The devices that a session holds, in the order of the chassis.
+    std::vector<Device*> heldBy(nQITRMCAPI100_Session session) const;
 
     // To be called before a session changes a device. Refuses with
     // readOnlyReservation when the session holds the device for reading, and with deviceReserved
@@ -53,14 +54,23 @@ class Reservations {
     void expectWritable(nQITRMCAPI100_Session session, const Device& device) const;
 
   private:
-    // A reservation that is asked for. The holdings are allocated beforehand, so that granting
-    // cannot fail.
+    struct ByPlace {
+        using is_transparent = void;
+        bool operator()(const Device* left, const Device* right) const {
+            return left->place < right->place;
+        }
+    };
+    using HeldDevices = std::map<nQITRMCAPI100_Session, std::set<Device*, ByPlace>>;
+
+    // A reservation that is asked for. All memory is allocated beforehand, so that granting cannot
+    // fail.
     struct Request {
         Request(const std::vector<Device*>& devices, const Holding& wanted);
 
         const std::vector<Device*>& devices;
         const Holding& wanted;
-        std::list<Holding> prepared;
+        std::list<Holding> holdings;
+        HeldDevices held;
         Wait wait;
     };
 
@@ -68,13 +78,16 @@ class Reservations {
     bool competes(const Request& earlier, const Request& later) const;
     bool mustQueue(const Request& request) const;
     void grant(Request& request) noexcept;
+    void removeHolding(nQITRMCAPI100_Session session, const Device& device) noexcept;
     void serveQueue() noexcept;
-    void waitInQueue(Request& request, double timeout, std::unique_lock<std::mutex>& lock);
+    void waitInQueue(Request& request, double timeout, WriteLock& lock);
     [[noreturn]] void refuse(const Request& request) const;
     bool conflictsOn(const Device& device, const Holding& wanted) const;
     const Holding* find(nQITRMCAPI100_Session session, const Device& device) const;
 
-    std::map<const Device*, std::list<Holding>> holders;
+    // By the places of the devices, and the same by session.
+    std::vector<std::list<Holding>> holders;
+    HeldDevices held;
     std::list<Request*> queue;
     Waits& waits;
 };

@@ -61,16 +61,13 @@ std::vector<Device*> owners(const std::vector<Resource*>& resources) {
 }
 
 std::vector<Device*> Resolver::reservedDevices() const {
-    std::vector<Device*> held;
-    for (const auto& device : chassis.devices()) {
-        if (reservations.holds(session.handle, *device)) {
-            held.push_back(device.get());
-        }
-    }
-    return held;
+    return reservations.heldBy(session.handle);
 }
 
 std::optional<std::vector<Resource*>> Resolver::tokenResources(std::string_view name) const {
+    if (name.empty() || name.front() != '$') {
+        return std::nullopt;
+    }
     if (name == "$ConnectedDevices") {
         return asResources(session.connectedDevices);
     }
@@ -141,6 +138,16 @@ std::vector<Resource*> Resolver::resources(Kind kind, std::string_view joined) c
 std::vector<Resource*> Resolver::anyResources(std::string_view joined) const {
     return present(
         collect(joined, [&](const std::string& name) -> Resource& { return named(name); }));
+}
+
+Resource* Resolver::singleResource(std::string_view joined) const {
+    if (joined.empty() || joined.front() == '$' ||
+        joined.find_first_of(",:") != std::string_view::npos) {
+        return nullptr;
+    }
+    Resource& found = named(joined);
+    expectPresent(*found.device, found.device->absence);
+    return &found;
 }
 
 std::vector<Resource*> Resolver::mentioned(std::string_view joined) const {

@@ -23,6 +23,9 @@ class Resolver {
     std::vector<Resource*> resources(Kind kind, std::string_view joined) const;
     // As above for resources of any kind.
     std::vector<Resource*> anyResources(std::string_view joined) const;
+    // The resource of a text that is a single name; null for a list, a range or a token. Refuses
+    // like anyResources().
+    Resource* singleResource(std::string_view joined) const;
     // Devices, each once. Refuses with noResources when there is none.
     std::vector<Device*> devices(std::string_view joined) const;
     // As above, together with devices whose connection is lost.

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <set>
 #include <vector>
 
 #include "Api.h"
@@ -19,6 +20,8 @@ struct Session {
     std::vector<Resource*> defaultNvmemAreas;
     std::vector<Device*> connectedDevices;
     PropertyStore properties;
+    // The devices to which this session wrote something that needs a commit, and maybe others.
+    std::set<Device*> writtenDevices;
 };
 
 // The open sessions. A reference to a session is valid until the session is closed.
@@ -39,6 +42,10 @@ class Sessions {
     // Calls visit(Session&) for all sessions, including those that are still opening.
     template <typename Visit>
     void forEach(Visit visit) {
+        table.forEach(visit);
+    }
+    template <typename Visit>
+    void forEach(Visit visit) const {
         table.forEach(visit);
     }
     void remove(nQITRMCAPI100_Session handle) noexcept { table.remove(handle); }

@@ -23,8 +23,10 @@ void Simulator::close(nQITRMCAPI100_Session session) {
     reservations.releaseAll(session);
     openProperties.removeIf(isOfSession);
     openCommands.removeIf(isOfSession);
-    for (const auto& device : chassis->devices()) {
-        device->dropPending(session);
+    if (const Session* closing = sessions.find(session)) {
+        for (Device* device : closing->writtenDevices) {
+            device->dropPending(session);
+        }
     }
     sessions.remove(session);
 }

@@ -1,7 +1,6 @@
 #pragma once
 
 #include <memory>
-#include <mutex>
 
 #include "live/Motions.h"
 #include "model/Chassis.h"
@@ -10,6 +9,7 @@
 #include "sessions/Reservations.h"
 #include "sessions/Resolver.h"
 #include "sessions/Sessions.h"
+#include "sessions/SharedMutex.h"
 #include "sessions/Waits.h"
 #include "state/LastingState.h"
 
@@ -18,8 +18,7 @@ namespace simulator {
 // A property that a session has opened to read its attributes.
 struct OpenProperty {
     nQITRMCAPI100_Session session;
-    Category category;
-    DefinitionPointer definition;
+    const PropertyDefinition* definition;
     // Null when the property was opened without a resource.
     const Resource* resource;
 };
@@ -30,8 +29,8 @@ struct OpenCommand {
     const Command* command;
 };
 
-// The chassis together with the state of all its users. Its parts are guarded by one mutex, which
-// calls that wait release.
+// The chassis together with the state of all its users. Its parts are guarded by one mutex. Calls
+// that only read hold it together; all others hold it alone, and release it while they wait.
 struct Simulator {
     // Restores the lasting state of the chassis.
     Simulator(std::unique_ptr<Chassis> loaded, Motions motions, const TimeScale& timeScale);
@@ -45,7 +44,7 @@ struct Simulator {
     // Closes a session with all that it has.
     void close(nQITRMCAPI100_Session session);
 
-    std::mutex mutex;
+    SharedMutex mutex;
     const std::unique_ptr<Chassis> chassis;
     Motions motions;
     LastingState lasting;
@@ -53,8 +52,9 @@ struct Simulator {
     Waits waits;
     Sessions sessions;
     Reservations reservations;
-    HandleTable<OpenProperty> openProperties;
-    HandleTable<OpenCommand> openCommands;
+    // These have mutexes of their own: opening and closing do not change the chassis.
+    GuardedHandleTable<OpenProperty> openProperties;
+    GuardedHandleTable<OpenCommand> openCommands;
 };
 
 }  // namespace simulator

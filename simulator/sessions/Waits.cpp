@@ -56,7 +56,7 @@ Waits::Deadline Waits::wakeBefore(Deadline deadline) const {
     return std::min(deadline, std::chrono::steady_clock::now() + ahead);
 }
 
-void Waits::sleepUntil(Deadline deadline, Wait& wait, std::unique_lock<std::mutex>& lock) {
+void Waits::sleepUntil(Deadline deadline, Wait& wait, WriteLock& lock) {
     const Waiting isWaiting(waiting, wait);
     while (wait.end == Wait::End::none && std::chrono::steady_clock::now() < deadline) {
         wait.wake.wait_until(lock, wakeBefore(deadline));
@@ -78,13 +78,13 @@ void Waits::expectUndisturbed(const Wait& wait) const {
     }
 }
 
-bool Waits::sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock) {
+bool Waits::sleep(Wait& wait, double seconds, WriteLock& lock) {
     sleepUntil(std::chrono::steady_clock::now() + clock.realTime(seconds), wait, lock);
     expectUndisturbed(wait);
     return wait.end == Wait::End::done;
 }
 
-void Waits::spend(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock) {
+void Waits::spend(Wait& wait, double seconds, WriteLock& lock) {
     if (!clock.goesByCalls()) {
         sleep(wait, seconds, lock);
         return;

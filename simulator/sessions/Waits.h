@@ -5,12 +5,12 @@
 #include <cstdint>
 #include <limits>
 #include <list>
-#include <mutex>
 #include <vector>
 
 #include "Api.h"
 #include "model/Chassis.h"
 #include "sessions/Clock.h"
+#include "sessions/SharedMutex.h"
 
 namespace simulator {
 
@@ -47,7 +47,7 @@ struct Wait {
     // The device because of which the wait ended with End::deviceAbsent.
     const Device* absentDevice = nullptr;
     Absence absence = Absence::none;
-    std::condition_variable wake;
+    std::condition_variable_any wake;
 };
 
 // All calls that wait at the moment. Every operation needs the simulator's mutex to be held.
@@ -59,9 +59,9 @@ class Waits {
     // whether the wait ended by Wait::End::done; refuses when the session was aborted or closed,
     // and when one of the wait's devices does not answer any more. Where time goes by calls it
     // sleeps in real time, as simulated time might not advance otherwise.
-    bool sleep(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock);
+    bool sleep(Wait& wait, double seconds, WriteLock& lock);
     // Lets the time pass that an operation takes, unless the wait ends. Refuses like sleep().
-    void spend(Wait& wait, double seconds, std::unique_lock<std::mutex>& lock);
+    void spend(Wait& wait, double seconds, WriteLock& lock);
 
     // Ends all waits of a session.
     void endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept;
@@ -77,7 +77,7 @@ class Waits {
     using Deadline = std::chrono::steady_clock::time_point;
 
     Deadline wakeBefore(Deadline deadline) const;
-    void sleepUntil(Deadline deadline, Wait& wait, std::unique_lock<std::mutex>& lock);
+    void sleepUntil(Deadline deadline, Wait& wait, WriteLock& lock);
     void expectUndisturbed(const Wait& wait) const;
 
     Clock& clock;

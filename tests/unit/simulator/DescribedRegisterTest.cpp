@@ -1,3 +1,4 @@
+#include <atomic>
 #include <future>
 #include <thread>
 
@@ -54,6 +55,32 @@ TEST_F(DescribedRegisterTest, BytesAreClearedAfterTheyAreRead) {
     EXPECT_EQ(write(write8, session, "Unit", 3, uint8_t{7}), 0);
     EXPECT_EQ(at(0, 32), 0x07000000u);
     EXPECT_EQ(at(0, 32), 0u);
+}
+
+TEST_F(DescribedRegisterTest, OneOfManyReadersGetsABitThatReadingClears) {
+    EXPECT_EQ(at(0, 64), 0x0807060504030201u);
+    constexpr uint32_t writes = 100;
+    std::atomic<uint32_t> seen{0};
+    std::atomic<bool> stopped{false};
+    std::vector<std::thread> readers;
+    for (int i = 0; i < 3; ++i) {
+        readers.emplace_back([&] {
+            while (!stopped) {
+                seen += static_cast<uint32_t>(at(0, 8));
+            }
+        });
+    }
+    for (uint32_t i = 0; i < writes; ++i) {
+        EXPECT_EQ(write(write8, session, "Unit", 0, uint8_t{1}), 0);
+        while (seen <= i) {
+            std::this_thread::yield();
+        }
+    }
+    stopped = true;
+    for (std::thread& reader : readers) {
+        reader.join();
+    }
+    EXPECT_EQ(seen, writes);
 }
 
 TEST_F(DescribedRegisterTest, APartialWriteDoesNotStoreTheNoiseOfTheOtherBytes) {
