@@ -4,6 +4,8 @@ import uPlot from "uplot";
 import { firstIndexSince, recording } from "../service/recorder.ts";
 
 const HEIGHT = 360;
+// Parts of the window, about half a pixel each: less than that is not worth drawing an hour again for.
+const STEPS = 2000;
 const COLOURS = ["#1f7a99", "#c2571a", "#5a8f29", "#9b4f96", "#b8860b", "#3b6fd1", "#c0392b", "#2f8f83"];
 
 export function colourOf(index: number): string {
@@ -48,8 +50,10 @@ export function PlotCanvas({ seconds, paused, tracks }: PlotView) {
     let drawn = -1;
     const draw = () => {
       const latest = recording.times.at(-1) ?? 0;
-      if (latest !== drawn && !paused) plot.setData(dataSince(latest - seconds));
-      drawn = latest;
+      if (latest - drawn > seconds / STEPS && !paused) {
+        plot.setData(dataSince(latest - seconds));
+        drawn = latest;
+      }
       frame = requestAnimationFrame(draw);
     };
     frame = requestAnimationFrame(draw);

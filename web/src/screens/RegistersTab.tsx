@@ -57,7 +57,8 @@ function RegisterName({ blocks, address }: { blocks: Registers[]; address: numbe
   const block = blocks.find((one) => one.address <= address && address < one.address + one.size);
   if (!block?.name) return <td />;
   const offset = address - block.address;
-  return <td>{block.name}{offset > 0 && ` + ${offset}`}{block.description && <small class="description">{block.description}</small>}</td>;
+  return offset > 0 ? <td title={block.description}>{block.name}{` + ${offset}`}</td>
+    : <td>{block.name}{block.description && <small class="description">{block.description}</small>}</td>;
 }
 
 function RegisterRow({ device, blocks, row, replace, remove }: {
