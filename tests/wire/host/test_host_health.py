@@ -40,7 +40,7 @@ def test_another_plug_in_is_reported(host):
 def test_a_batch_that_waits_for_a_device_does_not_delay_it():
     """The batch keeps all later requests waiting, but the service works."""
     open_and_reserve = batch(
-        call("initializeSession", {"devices": "Mod1"}),
+        call("initializeSession"),
         call("reserveDevices", {"session_id": "_session2", "devices": "Mod1", "access": "ReadWrite",
                                 "reservation_timeout": 10 * PATIENCE}))
     with Host() as host:
