@@ -141,8 +141,9 @@ std::vector<Resource*> Resolver::anyResources(std::string_view joined) const {
 }
 
 Resource* Resolver::singleResource(std::string_view joined) const {
+    const auto isSpecial = [](char c) { return c == ',' || c == ':'; };
     if (joined.empty() || joined.front() == '$' ||
-        joined.find_first_of(",:") != std::string_view::npos) {
+        std::any_of(joined.begin(), joined.end(), isSpecial)) {
         return nullptr;
     }
     Resource& found = named(joined);
