@@ -48,6 +48,27 @@ def test_the_tool_finds_the_explanations(root):
     assert result.stdout.startswith("The request failed. ")
 
 
+# Lays the explanation files over themselves, so that their numbers on the file system have 64 bits.
+# Prints one of them, and runs the tool.
+LARGE_NUMBERS = """
+mount -t tmpfs tmpfs /mnt && mkdir /mnt/new /mnt/work
+mount -t overlay overlay -o xino=on,lowerdir="$0/usr/local/qinstal",upperdir=/mnt/new,workdir=/mnt/work \
+  "$0/usr/local/qinstal"
+stat -c %i "$0/usr/local/qinstal/share/errors/English/qitrmc.txt"
+exec "$@"
+"""
+
+
+def test_explanation_files_are_found_whose_numbers_on_the_file_system_have_64_bits(root):
+    result = subprocess.run(
+        ["unshare", "--mount", "sh", "-ec", LARGE_NUMBERS, root, *emulated(root, "/usr/bin/qitrmc-explain"),
+         "-32000"], capture_output=True, text=True, timeout=60)
+    assert (result.returncode, result.stderr) == (0, "")
+    number, text = result.stdout.split("\n", 1)
+    assert int(number) >= 1 << 32
+    assert text.startswith("The request failed. ")
+
+
 def test_without_its_driver_the_service_is_not_loaded(root):
     result = subprocess.run(
         [*emulated(root, "/usr/bin/qitrmc-host"), "--plugin", PLUGIN, "--listen", "127.0.0.1:0"],
