@@ -21,8 +21,13 @@ add_custom_target(compressed_documents ALL DEPENDS ${compressed})
 install(FILES "${built}/qitrmc-host.1.gz" DESTINATION share/man/man1 COMPONENT qitrmc-host)
 install(FILES "${built}/qitrmc-explain.1.gz" DESTINATION share/man/man1 COMPONENT qitrmc-tools)
 foreach(package IN LISTS QITRMC_PACKAGES)
-  install(FILES debian/copyright "${built}/changelog.gz" DESTINATION "share/doc/${package}"
+  set(copyright debian/copyright)
+  if(package STREQUAL qitrmc-web)
+    set(copyright "${QITRMC_CLIENTS}/web-copyright")
+  endif()
+  install(FILES "${copyright}" DESTINATION "share/doc/${package}" RENAME copyright
           COMPONENT "${package}")
+  install(FILES "${built}/changelog.gz" DESTINATION "share/doc/${package}" COMPONENT "${package}")
   if(EXISTS "${CMAKE_CURRENT_SOURCE_DIR}/debian/${package}.lintian-overrides")
     install(FILES "debian/${package}.lintian-overrides" DESTINATION share/lintian/overrides
             RENAME "${package}" COMPONENT "${package}")

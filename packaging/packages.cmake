@@ -60,12 +60,29 @@ qitrmc_package(qitrmc-simulator misc "simulated instrument chassis"
 described by a file, with moving values and faults on demand. It lies in a
 folder of its own and never takes the place of a driver.")
 
-set(CPACK_DEBIAN_QITRMC-DEV_PACKAGE_SHLIBDEPS OFF)
-set(CPACK_DEBIAN_QITRMC-DEV_PACKAGE_ARCHITECTURE all)
+qitrmc_package(python3-qitrmc python "modular instrument chassis from Python and the command line"
+"The Python package qitrmc uses a chassis through its web service: sessions,
+properties, commands, registers and memory of the devices. The command qitrmc
+does the same for people and scripts.")
+qitrmc_package(qitrmc-web web "page in the browser for an instrument chassis"
+"Shows the modules of a chassis, their properties, live plots, registers and
+memory. Served by qitrmc-host, or by a web server in front of a controller.")
+
+foreach(package IN ITEMS QITRMC-DEV PYTHON3-QITRMC QITRMC-WEB)
+  set(CPACK_DEBIAN_${package}_PACKAGE_SHLIBDEPS OFF)
+  set(CPACK_DEBIAN_${package}_PACKAGE_ARCHITECTURE all)
+endforeach()
+if(QITRMC_CLIENTS)
+  file(STRINGS "${QITRMC_CLIENTS}/python-depends" CPACK_DEBIAN_PYTHON3-QITRMC_PACKAGE_DEPENDS)
+endif()
+set(CPACK_DEBIAN_PYTHON3-QITRMC_PACKAGE_SUGGESTS
+    "qitrmc-host, qitrmc-simulator, python3-pandas, python3-pytest")
+set(CPACK_DEBIAN_QITRMC-WEB_PACKAGE_SUGGESTS "qitrmc-host, nginx-light")
 set(CPACK_DEBIAN_LIBQITRMCSVC_PACKAGE_SUGGESTS "qitrmc-tools, qitrmc-host")
 set(CPACK_DEBIAN_QITRMC-TOOLS_PACKAGE_RECOMMENDS libqitrmcsvc)
 set(CPACK_DEBIAN_QITRMC-HOST_PACKAGE_DEPENDS "libqitrmcsvc (= ${PROJECT_VERSION})")
 set(CPACK_DEBIAN_QITRMC-HOST_PACKAGE_RECOMMENDS qitrmc-simulator)
+set(CPACK_DEBIAN_QITRMC-HOST_PACKAGE_SUGGESTS qitrmc-web)
 
 if(CMAKE_CROSSCOMPILING)
   set(CPACK_PROJECT_CONFIG_FILE "${PROJECT_BINARY_DIR}/cross-packages.cmake")

@@ -22,8 +22,12 @@ INCLUDED = "curl,openssl,systemd"
 # Starts the program of a unit as systemctl does, with its settings, but without the hardening.
 SYSTEMCTL = r"""#!/bin/bash
 set -eu
-[ "$1" = start ]
+[[ $1 = start || $1 = restart ]]
 name=${2%.service}
+if [ "$1" = restart ] && [ -f "/run/$name.pid" ]; then
+  kill "$(cat "/run/$name.pid")"
+  while kill -0 "$(cat "/run/$name.pid")" 2>/dev/null; do sleep 0.1; done
+fi
 instance=
 [[ $name != *@* ]] || instance=${name#*@}
 unit=/lib/systemd/system/${name%"$instance"}.service
@@ -33,6 +37,7 @@ set -a
 eval "$(value Environment)"
 mkdir -p "/var/lib/$(value StateDirectory)"
 eval "setsid $(value ExecStart) </dev/null >/var/log/unit.log 2>&1 &"
+echo $! >"/run/$name.pid"
 """
 
 

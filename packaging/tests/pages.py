@@ -9,12 +9,18 @@ LANGUAGES = ("English", "French", "German", "Japanese", "Korean", "ChineseS")
 
 
 def documented_files():
-    """Paths by package."""
+    """Paths by package. One that ends in / stands for all files below it."""
     files = {}
-    for package, path in re.findall(r"^\| `([a-z-]+)` \| `(/[^`]+)` \|$", PAGE, re.MULTILINE):
+    for package, path in re.findall(r"^\| `([a-z0-9-]+)` \| `(/[^`]+)` \|$", PAGE, re.MULTILINE):
         for language in LANGUAGES if "<Language>" in path else [""]:
             files.setdefault(package, set()).add(path.replace("<Language>", language))
     return files
+
+
+def as_documented(package, path):
+    """The entry of the page for a file of a package: the file, or a folder that it lies in."""
+    folders = [entry for entry in documented_files().get(package, ()) if entry.endswith("/")]
+    return next((folder for folder in folders if path.startswith(folder)), path)
 
 
 def documented_libraries():

@@ -62,7 +62,7 @@ def proxied(request):
         pytest.skip("a machine in a folder needs root")
     package, start = {"nginx": ("nginx-light", NGINX), "haproxy": ("haproxy", HAPROXY)}[request.param]
     with machine.machine() as debian:
-        debian.install("libqitrmcsvc", "qitrmc-host", "qitrmc-simulator", package)
+        debian.install("libqitrmcsvc", "qitrmc-host", "qitrmc-simulator", "qitrmc-web", package)
         shutil.copytree(machine.ROOT / "packaging/proxy", debian.root / "proxy")
         debian.output(PREPARE, keep=True)
 
@@ -119,6 +119,19 @@ def test_foreign_pages_are_refused_and_known_ones_are_not(proxied):
       post rack.example/rack1/qitrmc/Call $known -H 'Origin: null'
       post rack.example/rack1/qitrmc/Call $known -H 'Origin: https://rack.example'
     """) == ["403", "403", "200"]
+
+
+def test_nginx_serves_the_page_at_the_name_of_a_chassis(proxied):
+    if proxied.name != "nginx":
+        pytest.skip("HAProxy serves no files")
+    assert proxied("""
+      call rack1.example/ $known; grep -ci '<!doctype html>' /tmp/body
+      call rack1.example/
+      call rack1.example/ $known -d x
+      call rack.example/ $known
+      call rack1.example/../nginx/html/index.html $known --path-as-is
+      post rack1.example/qitrmc/Call $known -H 'Origin: https://rack1.example'
+    """) == ["200", "1", "401", "405", "404", "400", "200"]
 
 
 def test_other_methods_are_refused(proxied):

@@ -6,7 +6,8 @@ OPEN = '{"jsonrpc": "2.0", "id": 1, "method": "initializeSession"}'
 OPENED = '{"jsonrpc":"2.0","id":1,"result":{"session_id":"_session1"}}'
 # Blocks of the page that are no commands.
 NO_COMMANDS = {"[WebService]\nEnable = 1\n"}
-RUN_HERE = {"On a Debian machine: serve a simulated chassis", "On a controller", "Upgrade and removal"}
+RUN_HERE = {"On a Debian machine: serve a simulated chassis", "The page and the command line",
+            "On a controller", "Upgrade and removal"}
 # Made before these tests run.
 RUN_BEFORE = {"scripts/package"}
 

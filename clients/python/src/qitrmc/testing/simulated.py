@@ -43,11 +43,13 @@ class SimulatedChassis:
         self._folder = pathlib.Path(tempfile.mkdtemp(prefix="qitrmc-"))
         try:
             self._write_faults()
-            command = [os.path.abspath(program or host_program()),
-                       "--listen", listen, "--time-scale", str(time_scale),
+            host = os.path.abspath(program or host_program())
+            command = [host, *_plugin_option(host), "--listen", listen, "--time-scale", str(time_scale),
                        "--faults", str(self._folder / "faults.json"),
                        "--trace", str(self._folder / "trace"), *self._chassis_option(description)]
-            self._start(command + (["--seed", str(seed)] if seed is not None else []))
+            if seed is not None:
+                command += ["--seed", str(seed)]
+            self._start(command, _driver_environment(host))
         except BaseException:
             shutil.rmtree(self._folder, ignore_errors=True)
             raise
@@ -133,10 +135,10 @@ class SimulatedChassis:
             return ["--chassis", str(path)]
         return ["--chassis", str(pathlib.Path(description).resolve())]
 
-    def _start(self, command: List[str]) -> None:
+    def _start(self, command: List[str], environment: Dict[str, str]) -> None:
         with open(self._folder / "stderr", "wb") as stderr:
             self._process = subprocess.Popen(command, stdout=subprocess.PIPE, stderr=stderr, text=True,
-                                             cwd=self._folder)
+                                             cwd=self._folder, env={**os.environ, **environment})
         assert self._process.stdout is not None
         line = self._process.stdout.readline()
         listening = LISTENING.match(line)
@@ -147,6 +149,26 @@ class SimulatedChassis:
             said = (self._folder / "stderr").read_text(encoding="utf-8", errors="replace").strip()
             raise Error(f"The simulated chassis did not start: {said or line.strip()}")
         self.url = listening[1]
+
+
+def _installed(host: str, path: str) -> Optional[pathlib.Path]:
+    """What an installation has at a path below lib/qitrmc; None beside a build."""
+    place = pathlib.Path(host).resolve().parent.parent / "lib" / "qitrmc" / path
+    return place if place.exists() else None
+
+
+def _plugin_option(host: str) -> List[str]:
+    plugin = _installed(host, "plugin/libqitrmcsvc.so")
+    return ["--plugin", str(plugin)] if plugin else []
+
+
+def _driver_environment(host: str) -> Dict[str, str]:
+    # An installation keeps the simulated driver where only those who name its folder find it.
+    folder = _installed(host, "simulator")
+    if folder is None:
+        return {}
+    others = os.environ.get("LD_LIBRARY_PATH")
+    return {"LD_LIBRARY_PATH": f"{folder}:{others}" if others else str(folder)}
 
 
 def host_program() -> str:
