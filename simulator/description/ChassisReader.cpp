@@ -17,10 +17,10 @@ namespace simulator {
 
 namespace {
 
-constexpr int32_t chassisCategory = 1;
-constexpr uint32_t mostSlots = 64;
+constexpr std::int32_t chassisCategory = 1;
+constexpr std::uint32_t mostSlots = 64;
 
-enum class Place { system, slot };
+enum class Place { System, Slot };
 
 // Reads the devices of one description.
 class DeviceReader {
@@ -51,7 +51,7 @@ Device& DeviceReader::addDevice(const Node& node) {
 }
 
 void DeviceReader::readSlot(const Node& node, Place place, Device& device) {
-    if (place == Place::slot) {
+    if (place == Place::Slot) {
         device.slot = node.member("slot", "the number of the slot").unsignedNumber(1, mostSlots);
     } else if (node.has("slot")) {
         node.member("slot", "").fail("belongs to no chassis", "only modules have a slot");
@@ -60,7 +60,7 @@ void DeviceReader::readSlot(const Node& node, Place place, Device& device) {
 
 void DeviceReader::readModules(const Node& node, Device& owner) {
     node.forEachElement([&](const Node& element) {
-        Device& module = read(element, Place::slot);
+        Device& module = read(element, Place::Slot);
         for (const Device* other : owner.modules) {
             if (other->slot == module.slot) {
                 element.member("slot", "")
@@ -80,7 +80,7 @@ Device& DeviceReader::read(const Node& node, Place place) {
     node.ifPresent("connect_seconds",
                    [&](const Node& time) { device.connectSeconds = time.seconds(); });
     node.ifPresent("reachable", [&](const Node& flag) { device.reachable = flag.flag(); });
-    readResource(node, Category::device, chassis, enumerations, device);
+    readResource(node, Category::Device, chassis, enumerations, device);
     node.ifPresent("channels", [&](const Node& channels) {
         readPhysChans(channels, enumerations, chassis, device);
     });
@@ -93,7 +93,7 @@ Device& DeviceReader::read(const Node& node, Place place) {
             [&](const Node& block) { readRegisterBlock(block, chassis, device); });
     });
     node.ifPresent("modules", [&](const Node& modules) {
-        if (device.category != chassisCategory || place == Place::slot) {
+        if (device.category != chassisCategory || place == Place::Slot) {
             modules.fail("belongs to a device that is no chassis",
                          "only a device of category 1 outside of a slot has modules");
         }
@@ -105,7 +105,7 @@ Device& DeviceReader::read(const Node& node, Place place) {
 void readBuiltInCatalogue(Catalogue& catalogue) {
     JsonDocument document;
     parseDescription(embedded::catalogue, document);
-    readCatalogue(Node(document), {}, Origin::driver, catalogue);
+    readCatalogue(Node(document), {}, Origin::Driver, catalogue);
 }
 
 void fillFrom(const Node& root, const char* member, Category category, const Catalogue& catalogue,
@@ -136,15 +136,15 @@ DescribedChassis parseChassis(std::string_view text) {
     root.ifPresent("enums", [&](const Node& node) { enumerations = readEnumerations(node); });
     readBuiltInCatalogue(chassis->catalogue);
     root.ifPresent("driver_properties", [&](const Node& node) {
-        readCatalogue(node, enumerations, Origin::file, chassis->catalogue);
+        readCatalogue(node, enumerations, Origin::File, chassis->catalogue);
     });
-    fillFrom(root, "system_values", Category::system, chassis->catalogue,
+    fillFrom(root, "system_values", Category::System, chassis->catalogue,
              chassis->systemProperties);
-    fillFrom(root, "session_values", Category::session, chassis->catalogue,
+    fillFrom(root, "session_values", Category::Session, chassis->catalogue,
              chassis->sessionProperties);
     DeviceReader reader(*chassis, enumerations);
     root.member("devices", "an array of devices").forEachElement([&](const Node& element) {
-        reader.read(element, Place::system);
+        reader.read(element, Place::System);
     });
     readMotions(root, *chassis, described.motions);
     return described;

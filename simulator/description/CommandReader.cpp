@@ -16,7 +16,7 @@ using Owner = CommandEffect::Owner;
 
 const Property& effectTarget(const Node& node, const std::string& name, Owner owner,
                              const Resource& resource) {
-    const bool ofDevice = owner == Owner::device;
+    const bool ofDevice = owner == Owner::Device;
     const PropertyStore& properties = (ofDevice ? *resource.device : resource).properties;
     const Property* property = properties.find(name);
     if (property == nullptr && ofDevice) {
@@ -33,8 +33,8 @@ const Property& effectTarget(const Node& node, const std::string& name, Owner ow
 }
 
 bool isSingleNumber(const PropertyDefinition& definition) {
-    return !isArray(definition.type) && definition.type != DataType::text &&
-           definition.type != DataType::boolean;
+    return !isArray(definition.type) && definition.type != DataType::Text &&
+           definition.type != DataType::Boolean;
 }
 
 Elements readAddend(const Node& node, const PropertyDefinition& definition) {
@@ -51,14 +51,14 @@ void readEffects(const Node& node, Owner owner, const Resource& resource, Comman
         values.forEachMember([&](const std::string& name, const Node& value) {
             const Property& target = effectTarget(value, name, owner, resource);
             command.effects.push_back(
-                {Action::set, owner, name, readValue(*target.definition, value)});
+                {Action::Set, owner, name, readValue(*target.definition, value)});
         });
     });
     node.ifPresent("adds", [&](const Node& numbers) {
         numbers.forEachMember([&](const std::string& name, const Node& number) {
             const Property& target = effectTarget(number, name, owner, resource);
             command.effects.push_back(
-                {Action::add, owner, name, readAddend(number, *target.definition)});
+                {Action::Add, owner, name, readAddend(number, *target.definition)});
         });
     });
 }
@@ -106,10 +106,10 @@ Command readCommand(const std::string& name, const Node& node, const Resource& r
     node.ifPresent("document", [&](const Node& text) { command.document = text.text(); });
     node.ifPresent("seconds", [&](const Node& time) { command.seconds = time.seconds(); });
     node.ifPresent("resets", [&](const Node& resets) { command.resets = resets.flag(); });
-    readEffects(node, Owner::resource, resource, command);
+    readEffects(node, Owner::Resource, resource, command);
     node.ifPresent("on_device", [&](const Node& effects) {
         effects.expectMembers(members::onDevice);
-        readEffects(effects, Owner::device, resource, command);
+        readEffects(effects, Owner::Device, resource, command);
     });
     node.ifPresent("fails", [&](const Node& failure) {
         command.fails = readFailure(failure, resource, enumerations);

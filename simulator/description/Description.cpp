@@ -12,13 +12,13 @@ namespace simulator {
 
 namespace {
 
-constexpr size_t mostExponentDigits = 4;
-constexpr size_t mostDigitsOfZero = 20;
+constexpr std::size_t mostExponentDigits = 4;
+constexpr std::size_t mostDigitsOfZero = 20;
 
 // The JSON library overflows its own arithmetic on numbers with huge exponents.
 bool hasHugeExponent(std::string_view number) {
-    const size_t exponent = number.find_first_of("eE");
-    const size_t digits = number.find_first_not_of("+-", exponent + 1);
+    const std::size_t exponent = number.find_first_of("eE");
+    const std::size_t digits = number.find_first_not_of("+-", exponent + 1);
     return exponent != std::string_view::npos && digits != std::string_view::npos &&
            number.size() - digits > mostExponentDigits;
 }
@@ -39,7 +39,7 @@ bool isOutOfRange(std::string_view number) {
     return failure == std::errc::result_out_of_range || (value > 0 && value < leastRead);
 }
 
-void refuseOddNumber(std::string_view text, size_t place, std::string_view number) {
+void refuseOddNumber(std::string_view text, std::size_t place, std::string_view number) {
     if (hasHugeExponent(number)) {
         throw DescriptionError{"", "holds a number out of range at " + lineAndColumn(text, place),
                                "exponents have at most 4 digits"};
@@ -56,13 +56,13 @@ void refuseOddNumber(std::string_view text, size_t place, std::string_view numbe
 
 void refuseOddNumbers(std::string_view text) {
     bool inString = false;
-    for (size_t i = 0; i < text.size(); ++i) {
+    for (std::size_t i = 0; i < text.size(); ++i) {
         if (text[i] == '\\' && inString) {
             ++i;
         } else if (text[i] == '"') {
             inString = !inString;
         } else if (!inString && text[i] >= '0' && text[i] <= '9') {
-            const size_t end = text.find_first_not_of("0123456789.eE+-", i);
+            const std::size_t end = text.find_first_not_of("0123456789.eE+-", i);
             const std::string_view number = text.substr(i, end - i);
             refuseOddNumber(text, i, number);
             i += number.size() - 1;
@@ -72,8 +72,8 @@ void refuseOddNumbers(std::string_view text) {
 
 // The beginning of a text, cut between characters.
 std::string beginning(std::string_view text) {
-    constexpr size_t most = 40;
-    size_t end = std::min(most, text.size());
+    constexpr std::size_t most = 40;
+    std::size_t end = std::min(most, text.size());
     while (end < text.size() && end > 0 &&
            (static_cast<unsigned char>(text[end]) & 0xC0u) == 0x80u) {
         --end;
@@ -162,7 +162,7 @@ void Node::expect(bool condition, const char* right) const {
     }
 }
 
-void Node::expectMembers(const std::string_view* allowed, size_t count) const {
+void Node::expectMembers(const std::string_view* allowed, std::size_t count) const {
     forEachMember([&](const std::string& name, const Node& member) {
         if (std::find(allowed, allowed + count, name) == allowed + count) {
             const std::vector<std::string> known(allowed, allowed + count);
@@ -184,7 +184,7 @@ Node Node::member(const char* name, const char* right) const {
     return Node(found->value, childPointer(name));
 }
 
-Node Node::element(size_t index) const {
+Node Node::element(std::size_t index) const {
     return Node((*value)[static_cast<rapidjson::SizeType>(index)],
                 pointer + "/" + std::to_string(index));
 }
@@ -198,7 +198,7 @@ std::string Node::text() const {
     return std::string(value->GetString(), value->GetStringLength());
 }
 
-uint32_t Node::unsignedNumber(uint32_t least, uint32_t most) const {
+std::uint32_t Node::unsignedNumber(std::uint32_t least, std::uint32_t most) const {
     const std::string right =
         "must be a whole number from " + std::to_string(least) + " to " + std::to_string(most);
     if (!value->IsUint() || value->GetUint() < least || value->GetUint() > most) {
@@ -207,7 +207,7 @@ uint32_t Node::unsignedNumber(uint32_t least, uint32_t most) const {
     return value->GetUint();
 }
 
-int32_t Node::signedNumber() const {
+std::int32_t Node::signedNumber() const {
     expect(value->IsInt(), "a whole number of 32 bits");
     return value->GetInt();
 }

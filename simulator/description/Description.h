@@ -1,8 +1,6 @@
 #pragma once
 
 #include <cstdint>
-#include <cstdlib>
-#include <new>
 #include <set>
 #include <string>
 #include <string_view>
@@ -10,31 +8,11 @@
 
 #include <rapidjson/document.h>
 
+#include "common/ThrowingAllocator.h"
+
 namespace simulator {
 
-// Memory for the JSON library, which does not check for null itself.
-class ThrowingAllocator {
-  public:
-    static const bool kNeedFree = true;
-    void* Malloc(size_t size) { return size == 0 ? nullptr : checked(std::malloc(size)); }
-    void* Realloc(void* old, size_t, size_t size) {
-        if (size == 0) {
-            std::free(old);
-            return nullptr;
-        }
-        return checked(std::realloc(old, size));
-    }
-    static void Free(void* memory) { std::free(memory); }
-
-  private:
-    static void* checked(void* memory) {
-        if (memory == nullptr) {
-            throw std::bad_alloc();
-        }
-        return memory;
-    }
-};
-
+using common::ThrowingAllocator;
 using JsonAllocator = rapidjson::MemoryPoolAllocator<ThrowingAllocator>;
 using JsonValue = rapidjson::GenericValue<rapidjson::UTF8<>, JsonAllocator>;
 using JsonDocument =
@@ -67,7 +45,7 @@ class Node {
 
     // Makes sure that this is an object with no members but these: a list of Members.h, which has
     // them from the JSON Schemas.
-    template <size_t count>
+    template <std::size_t count>
     void expectMembers(const std::string_view (&allowed)[count]) const {
         expectMembers(allowed, count);
     }
@@ -83,15 +61,15 @@ class Node {
     Node member(const char* name, const char* right) const;
 
     std::string text() const;
-    uint32_t unsignedNumber(uint32_t least, uint32_t most) const;
-    int32_t signedNumber() const;
+    std::uint32_t unsignedNumber(std::uint32_t least, std::uint32_t most) const;
+    std::int32_t signedNumber() const;
     double number(double least, double most) const;
     // A time, 0 to a day.
     double seconds() const;
     bool flag() const;
 
     // The element of an array at an index that it has.
-    Node element(size_t index) const;
+    Node element(std::size_t index) const;
     // Calls visit(Node) for the elements of an array, in order.
     template <typename Visit>
     void forEachElement(Visit visit) const {
@@ -124,7 +102,7 @@ class Node {
     void expect(bool condition, const char* right) const;
 
   private:
-    void expectMembers(const std::string_view* allowed, size_t count) const;
+    void expectMembers(const std::string_view* allowed, std::size_t count) const;
     std::string childPointer(std::string_view name) const;
 
     const JsonValue* value;

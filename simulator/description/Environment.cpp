@@ -27,12 +27,12 @@ std::optional<Number> numberIn(const std::string& text) {
     return number;
 }
 
-std::optional<uint64_t> readSeed() {
+std::optional<std::uint64_t> readSeed() {
     const std::string text = environmentText(seedVariable);
     if (text.empty()) {
         return std::nullopt;
     }
-    const auto seed = numberIn<uint64_t>(text);
+    const auto seed = numberIn<std::uint64_t>(text);
     if (!seed) {
         refuseVariable(seedVariable, "a whole number from 0 to 18446744073709551615");
     }

@@ -17,7 +17,7 @@ struct TimeScale {
 // What the environment sets.
 struct Settings {
     // Empty when that of the chassis file applies.
-    std::optional<uint64_t> seed;
+    std::optional<std::uint64_t> seed;
     TimeScale timeScale;
 };
 

@@ -7,7 +7,7 @@ namespace simulator {
 
 namespace {
 
-constexpr size_t longestChain = 16;
+constexpr std::size_t longestChain = 16;
 
 // What was read, to be looked at when all of it is there.
 struct Moving {
@@ -51,7 +51,7 @@ void MotionsReader::readDevice(const Node& node) {
     node.ifPresent("live", [&](const Node& live) { readResource(live, {device, ""}); });
     node.ifPresent("channels", [&](const Node& channels) {
         channels.ifPresent("live", [&](const Node& live) {
-            for (size_t i = 0; i < device.physChans.size(); ++i) {
+            for (std::size_t i = 0; i < device.physChans.size(); ++i) {
                 readResource(live, {*device.physChans[i], std::to_string(i)});
             }
         });
@@ -72,7 +72,7 @@ void MotionsReader::expectSoundChain(const Moving& moving) const {
         follows.fail("follows a property that moves itself, with a time constant",
                      "leave time_constant out, or follow a property that keeps still");
     }
-    for (size_t length = 1; next != nullptr && next->follows; ++length) {
+    for (std::size_t length = 1; next != nullptr && next->follows; ++length) {
         if (next == motion) {
             follows.fail("follows itself", "must not go round in a circle");
         }

@@ -18,24 +18,24 @@ constexpr double highestCountRate = 1e9;
 constexpr double day = 24.0 * 60.0 * 60.0;
 
 constexpr std::array<std::pair<const char*, Waveform::Shape>, 6> shapes{{
-    {"dc", Waveform::Shape::dc},
-    {"noise", Waveform::Shape::noise},
-    {"sawtooth", Waveform::Shape::sawtooth},
-    {"sine", Waveform::Shape::sine},
-    {"square", Waveform::Shape::square},
-    {"triangle", Waveform::Shape::triangle},
+    {"dc", Waveform::Shape::Dc},
+    {"noise", Waveform::Shape::Noise},
+    {"sawtooth", Waveform::Shape::Sawtooth},
+    {"sine", Waveform::Shape::Sine},
+    {"square", Waveform::Shape::Square},
+    {"triangle", Waveform::Shape::Triangle},
 }};
 
 bool isNumber(DataType type) {
-    return !isArray(type) && type != DataType::boolean && type != DataType::text;
+    return !isArray(type) && type != DataType::Boolean && type != DataType::Text;
 }
 
 bool isWholeNumber(DataType type) {
-    return isNumber(type) && type != DataType::real;
+    return isNumber(type) && type != DataType::Real;
 }
 
 bool isRecord(DataType type) {
-    return type == DataType::realArray || type == DataType::int32Array;
+    return type == DataType::RealArray || type == DataType::Int32Array;
 }
 
 void readNumber(const Node& node, const char* name, double least, double most, double& number) {
@@ -51,7 +51,7 @@ void expectType(const Node& node, bool suits, const PropertyDefinition& definiti
 
 std::string withNumber(std::string name, const std::string& number) {
     constexpr std::string_view placeholder = "{n}";
-    const size_t found = number.empty() ? std::string::npos : name.find(placeholder);
+    const std::size_t found = number.empty() ? std::string::npos : name.find(placeholder);
     return found == std::string::npos ? name : name.replace(found, placeholder.size(), number);
 }
 
@@ -117,7 +117,7 @@ void FollowsReader::read(ReadMotion& into) const {
     node.ifPresent("while", [&](const Node& name) {
         follows.condition = &propertyOf(*into.followed, name);
         const PropertyDefinition& definition = *follows.condition->definition;
-        expectType(name, definition.type == DataType::boolean, definition, "must be a Bool");
+        expectType(name, definition.type == DataType::Boolean, definition, "must be a Bool");
     });
     into.motion.follows = follows;
 }
@@ -203,7 +203,7 @@ void expectSuitableType(const Node& node, const PropertyDefinition& definition) 
     } else if (node.has("counts")) {
         expectType(node.member("counts", ""), isWholeNumber(type), definition,
                    "only whole numbers count");
-        if (definition.access != PropertyAccess::readOnly) {
+        if (definition.access != PropertyAccess::ReadOnly) {
             node.member("counts", "")
                 .fail("counts in a property that can be written", "the access must be ReadOnly");
         }

@@ -7,7 +7,7 @@ namespace simulator {
 
 namespace {
 
-constexpr size_t longest = 64;
+constexpr std::size_t longest = 64;
 
 char lowered(char c) {
     return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
@@ -15,18 +15,18 @@ char lowered(char c) {
 
 // How many bytes must be put in, left out, replaced or exchanged with their neighbour to make one
 // name of the other.
-size_t distance(std::string_view left, std::string_view right) {
-    std::vector<size_t> before;
-    std::vector<size_t> last;
-    std::vector<size_t> row(right.size() + 1);
-    for (size_t j = 0; j <= right.size(); ++j) {
+std::size_t distance(std::string_view left, std::string_view right) {
+    std::vector<std::size_t> before;
+    std::vector<std::size_t> last;
+    std::vector<std::size_t> row(right.size() + 1);
+    for (std::size_t j = 0; j <= right.size(); ++j) {
         row[j] = j;
     }
-    for (size_t i = 1; i <= left.size(); ++i) {
+    for (std::size_t i = 1; i <= left.size(); ++i) {
         before = std::move(last);
         last = row;
         row[0] = i;
-        for (size_t j = 1; j <= right.size(); ++j) {
+        for (std::size_t j = 1; j <= right.size(); ++j) {
             const bool same = lowered(left[i - 1]) == lowered(right[j - 1]);
             row[j] = std::min({last[j] + 1, row[j - 1] + 1, last[j - 1] + (same ? 0 : 1)});
             if (i > 1 && j > 1 && lowered(left[i - 1]) == lowered(right[j - 2]) &&
@@ -44,11 +44,11 @@ const std::string* nearestName(std::string_view given, const std::vector<std::st
     if (given.empty() || given.size() > longest) {
         return nullptr;
     }
-    size_t least = given.size() / 3 + 1;
+    std::size_t least = given.size() / 3 + 1;
     const std::string* nearest = nullptr;
     for (const std::string& name : known) {
         if (name.size() < given.size() + least && given.size() < name.size() + least) {
-            const size_t apart = distance(given, name);
+            const std::size_t apart = distance(given, name);
             if (apart < least) {
                 least = apart;
                 nearest = &name;

@@ -1,26 +1,19 @@
 #include "description/PartsReader.h"
 
 #include "Members.h"
+#include "common/digits.h"
 #include "description/CommandReader.h"
 #include "description/Nearest.h"
 #include "model/NameText.h"
 
 namespace simulator {
 
+using common::hexDigit;
+
 namespace {
 
-constexpr uint32_t mostChannels = 1024;
-constexpr uint32_t mostBytes = 16u << 20;
-
-int hexDigit(char c) {
-    if (c >= '0' && c <= '9') {
-        return c - '0';
-    }
-    if (c >= 'a' && c <= 'f') {
-        return c - 'a' + 10;
-    }
-    return c >= 'A' && c <= 'F' ? c - 'A' + 10 : -1;
-}
+constexpr std::uint32_t mostChannels = 1024;
+constexpr std::uint32_t mostBytes = 16u << 20;
 
 bool readWritable(const Node& node) {
     if (!node.has("access")) {
@@ -46,9 +39,9 @@ std::string readName(const Node& node, std::string (*errorOf)(std::string_view))
     return name;
 }
 
-std::vector<uint8_t> readBytes(const Node& node) {
+std::vector<std::uint8_t> readBytes(const Node& node) {
     const Node sizeNode = node.member("size", "the number of bytes");
-    std::vector<uint8_t> bytes(sizeNode.unsignedNumber(1, mostBytes));
+    std::vector<std::uint8_t> bytes(sizeNode.unsignedNumber(1, mostBytes));
     if (!node.has("bytes")) {
         return bytes;
     }
@@ -59,11 +52,11 @@ std::vector<uint8_t> readBytes(const Node& node) {
                       "must be two digits for each byte, at most " +
                           std::to_string(2 * bytes.size()) + " for this size");
     }
-    for (size_t i = 0; i < text.size(); i += 2) {
+    for (std::size_t i = 0; i < text.size(); i += 2) {
         const int high = hexDigit(text[i]);
         const int low = hexDigit(text[i + 1]);
         textNode.expect(high >= 0 && low >= 0, "hexadecimal digits without blanks or 0x");
-        bytes[i / 2] = static_cast<uint8_t>(high * 16 + low);
+        bytes[i / 2] = static_cast<std::uint8_t>(high * 16 + low);
     }
     return bytes;
 }
@@ -97,10 +90,10 @@ void readPhysChans(const Node& node, const Enumerations& enumerations, Chassis& 
         prefixNode.fail("ends in a digit", "the channel's number follows the prefix");
     }
     const Node countNode = node.member("count", "the number of channels");
-    const uint32_t count = countNode.unsignedNumber(1, mostChannels);
-    for (uint32_t i = 0; i < count; ++i) {
+    const std::uint32_t count = countNode.unsignedNumber(1, mostChannels);
+    for (std::uint32_t i = 0; i < count; ++i) {
         Resource& channel = chassis.addPhysChan(device, prefix + std::to_string(i));
-        readResource(node, Category::physChan, chassis, enumerations, channel);
+        readResource(node, Category::PhysChan, chassis, enumerations, channel);
     }
 }
 
@@ -126,7 +119,7 @@ void readNvmemArea(const Node& node, const Enumerations& enumerations, Chassis& 
         }
     });
     area.memory = NvmemMemory(readBytes(node), std::move(rules));
-    readResource(node, Category::nvmemArea, chassis, enumerations, area);
+    readResource(node, Category::NvmemArea, chassis, enumerations, area);
 }
 
 }  // namespace simulator

@@ -19,7 +19,7 @@ void readNvmemArea(const Node& node, const Enumerations& enumerations, Chassis& 
 
 // Reads the members "size" and "bytes": so many bytes, the first of them given in hexadecimal
 // digits and the others 0.
-std::vector<uint8_t> readBytes(const Node& node);
+std::vector<std::uint8_t> readBytes(const Node& node);
 // Reads a text that can serve as a name; `errorOf` says why not.
 std::string readName(const Node& node, std::string (*errorOf)(std::string_view));
 

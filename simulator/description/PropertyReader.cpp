@@ -12,18 +12,18 @@ namespace simulator {
 
 namespace {
 
-constexpr uint32_t firstEnumerationId = 0x1000;
+constexpr std::uint32_t firstEnumerationId = 0x1000;
 
 constexpr std::array<std::pair<const char*, Category>, 5> categories{{
-    {"system", Category::system},
-    {"session", Category::session},
-    {"device", Category::device},
-    {"phys_chan", Category::physChan},
-    {"nvmem_area", Category::nvmemArea},
+    {"system", Category::System},
+    {"session", Category::Session},
+    {"device", Category::Device},
+    {"phys_chan", Category::PhysChan},
+    {"nvmem_area", Category::NvmemArea},
 }};
 
 bool isNumeric(DataType type) {
-    return elementType(type) != DataType::boolean && elementType(type) != DataType::text;
+    return elementType(type) != DataType::Boolean && elementType(type) != DataType::Text;
 }
 
 std::optional<Elements> readLimit(const char* member, const PropertyDefinition& definition,
@@ -49,22 +49,22 @@ void expectOrder(const PropertyDefinition& definition, const Node& node) {
 
 PropertyAccess readAccess(const Node& node) {
     if (!node.has("access")) {
-        return PropertyAccess::readOnly;
+        return PropertyAccess::ReadOnly;
     }
     const Node access = node.member("access", "");
     const std::string name = access.text();
     if (name == "ReadOnly") {
-        return PropertyAccess::readOnly;
+        return PropertyAccess::ReadOnly;
     }
     if (name == "WriteOnly") {
-        return PropertyAccess::writeOnly;
+        return PropertyAccess::WriteOnly;
     }
     if (name != "ReadWrite") {
         access.fail("is " + access.shown(),
                     perhapsMeant(name, {"ReadOnly", "WriteOnly", "ReadWrite"}) +
                         "must be ReadOnly, WriteOnly or ReadWrite");
     }
-    return PropertyAccess::readWrite;
+    return PropertyAccess::ReadWrite;
 }
 
 constexpr const char* typeWords =
@@ -72,8 +72,8 @@ constexpr const char* typeWords =
 
 std::vector<std::string> typeNames() {
     std::vector<std::string> names;
-    for (auto number = static_cast<int32_t>(DataType::boolean);
-         number <= static_cast<int32_t>(DataType::uint64Array); ++number) {
+    for (auto number = static_cast<std::int32_t>(DataType::Boolean);
+         number <= static_cast<std::int32_t>(DataType::Uint64Array); ++number) {
         names.push_back(typeName(static_cast<DataType>(number)));
     }
     return names;
@@ -107,7 +107,7 @@ std::shared_ptr<const Enumeration> readEnumerationOf(const PropertyDefinition& d
         nameNode.fail("is " + nameNode.shown() + ", which is not a known enumeration",
                       perhapsMeant(name, known) + "must be a member of /enums");
     }
-    if (elementType(definition.type) != DataType::int32) {
+    if (elementType(definition.type) != DataType::Int32) {
         nameNode.fail("enumerates what is no Int32", "the type must be Int32 or Int32Array");
     }
     return found->second;
@@ -138,14 +138,14 @@ void addToCatalogue(const std::string& name, const Node& node, Category category
     }
     const auto definition =
         std::make_shared<const PropertyDefinition>(readDefinition(name, node, enumerations));
-    if (origin == Origin::file) {
+    if (origin == Origin::File) {
         expectStored(node);
     }
-    const bool ofResource = category != Category::system && category != Category::session;
+    const bool ofResource = category != Category::System && category != Category::Session;
     if (definition->needsCommit && !ofResource) {
         node.fail("can never be committed", "only properties of resources are committed");
     }
-    if (definition->lasting && category == Category::session) {
+    if (definition->lasting && category == Category::Session) {
         node.fail("can never last", "sessions end, and their properties with them");
     }
     catalogue.add(category, definition);
@@ -165,7 +165,7 @@ Enumerations readEnumerations(const Node& node) {
         expectWritableName(name, itemsNode);
         auto enumeration = std::make_shared<Enumeration>();
         enumeration->name = name;
-        enumeration->id = firstEnumerationId + static_cast<uint32_t>(enumerations.size());
+        enumeration->id = firstEnumerationId + static_cast<std::uint32_t>(enumerations.size());
         itemsNode.forEachMember([&](const std::string& item, const Node& number) {
             expectWritableName(item, number);
             enumeration->add(item, number.signedNumber());
@@ -213,7 +213,7 @@ void fillStore(Category category, const Catalogue& catalogue, const Node* values
                PropertyStore& store) {
     if (values != nullptr) {
         values->forEachMember([&](const std::string& name, const Node& value) {
-            const DefinitionPointer definition = catalogue.find(category, name);
+            const DefinitionPointer& definition = catalogue.find(category, name);
             if (definition == nullptr || definition->computed) {
                 value.fail("is not a property whose value can be given",
                            perhapsMeant(name, storedNames(category, catalogue)) +

@@ -18,7 +18,7 @@ PropertyDefinition readDefinition(const std::string& name, const Node& node,
 void expectWritableName(const std::string& name, const Node& node);
 
 // Who defines a property. What is computed can come from the driver alone.
-enum class Origin { driver, file };
+enum class Origin { Driver, File };
 
 // Adds the driver-defined properties of an object of categories to a catalogue.
 void readCatalogue(const Node& node, const Enumerations& enumerations, Origin origin,

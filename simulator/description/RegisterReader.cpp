@@ -26,7 +26,7 @@ void readAccess(const Node& node, RegisterBlock& block) {
 
 void readWidth(const Node& node, RegisterBlock& block) {
     node.ifPresent("width", [&](const Node& width) {
-        const uint32_t bits = width.unsignedNumber(8, 64);
+        const std::uint32_t bits = width.unsignedNumber(8, 64);
         width.expect(bits == 8 || bits == 16 || bits == 32 || bits == 64, "8, 16, 32 or 64");
         block.width = bits / 8;
         if (block.address % block.width != 0 || block.size() % block.width != 0) {
@@ -78,9 +78,9 @@ Resource& readOwner(const Node& node, const Chassis& chassis, Device& device) {
     return *part;
 }
 
-std::string sizesText(const std::vector<uint32_t>& sizes) {
+std::string sizesText(const std::vector<std::uint32_t>& sizes) {
     std::string text = std::to_string(sizes.front());
-    for (size_t i = 1; i < sizes.size(); ++i) {
+    for (std::size_t i = 1; i < sizes.size(); ++i) {
         text += (i + 1 < sizes.size() ? ", " : " or ") + std::to_string(sizes[i]);
     }
     return text;
@@ -96,7 +96,7 @@ void readProperty(const Node& node, Resource& owner, RegisterBlock& block) {
                       "a register shows a property that is there");
     }
     const PropertyDefinition& definition = *block.property->definition;
-    if (block.readable && definition.access == PropertyAccess::writeOnly) {
+    if (block.readable && definition.access == PropertyAccess::WriteOnly) {
         node.fail("can only be written", "the access of the registers must be WriteOnly");
     }
     const auto sizes = registerSizes(definition.type);
@@ -151,7 +151,7 @@ void readRegisterBlock(const Node& node, const Chassis& chassis, Device& device)
         expectNothingElse(node);
         readShown(shown, chassis, device, block);
     });
-    const uint64_t last = uint64_t{block.address} + block.size() - 1;
+    const std::uint64_t last = std::uint64_t{block.address} + block.size() - 1;
     const std::string addresses = std::to_string(block.address) + " to " + std::to_string(last);
     if (!device.registers.add(std::move(block))) {
         node.fail(

@@ -71,9 +71,9 @@ void readEntry(const Node& node, const Enumerations& enumerations, Refusal& stat
     }
 }
 
-int32_t readCode(const Node& node) {
+std::int32_t readCode(const Node& node) {
     const Node codeNode = node.member("code", "the number of the status");
-    const int32_t code = codeNode.signedNumber();
+    const std::int32_t code = codeNode.signedNumber();
     codeNode.expect(code != 0, "a number other than 0, which means success");
     return code;
 }
@@ -83,7 +83,7 @@ Refusal readNested(const Node& node, const Enumerations& enumerations, int depth
         node.fail("is nested too deep", "causes are nested at most 16 deep");
     }
     node.expectMembers(members::nestedStatus);
-    const int32_t code = readCode(node);
+    const std::int32_t code = readCode(node);
     std::optional<std::string> constant;
     node.ifPresent("constant", [&](const Node& name) { constant = name.text(); });
     Refusal status(code, std::move(constant));

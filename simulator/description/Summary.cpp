@@ -6,8 +6,8 @@ namespace simulator {
 
 namespace {
 
-size_t longestName(const Chassis& chassis) {
-    size_t longest = 0;
+std::size_t longestName(const Chassis& chassis) {
+    std::size_t longest = 0;
     for (const auto& device : chassis.devices()) {
         longest = std::max(longest, device->name.size());
     }
@@ -31,7 +31,7 @@ std::string channels(const Device& device) {
         return "";
     }
     const std::string first = device.physChans.front()->name;
-    const size_t more = device.physChans.size() - 1;
+    const std::size_t more = device.physChans.size() - 1;
     return first + (more == 0 ? "" : ":" + std::to_string(more));
 }
 
@@ -55,7 +55,7 @@ std::string partsOf(const Device& device) {
     return line;
 }
 
-std::string lineOf(const Device& device, const std::string& place, size_t nameWidth) {
+std::string lineOf(const Device& device, const std::string& place, std::size_t nameWidth) {
     std::string line = "  " + place + device.name;
     const std::string parts = partsOf(device);
     if (!parts.empty()) {
@@ -72,7 +72,7 @@ std::string slotOf(const Device& module) {
 }  // namespace
 
 std::string summaryOf(const Chassis& chassis) {
-    const size_t nameWidth = longestName(chassis);
+    const std::size_t nameWidth = longestName(chassis);
     std::string text;
     for (const auto& device : chassis.devices()) {
         if (device->slot != 0) {

@@ -4,7 +4,11 @@
 
 #include <algorithm>
 
+#include "common/digits.h"
+
 namespace simulator {
+
+using common::isDigit;
 
 namespace {
 
@@ -24,10 +28,6 @@ struct Place {
 
 bool isLetter(char c) {
     return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_';
-}
-
-bool isDigit(char c) {
-    return c >= '0' && c <= '9';
 }
 
 std::string wordAt(std::string_view rest) {
@@ -133,10 +133,10 @@ Words wordsAt(const Place& place, rapidjson::ParseErrorCode code, const char* wh
 
 }  // namespace
 
-std::string lineAndColumn(std::string_view text, size_t offset) {
+std::string lineAndColumn(std::string_view text, std::size_t offset) {
     const std::string_view before = text.substr(0, std::min(offset, text.size()));
     const auto line = 1 + std::count(before.begin(), before.end(), '\n');
-    const size_t lastBreak = before.rfind('\n');
+    const std::size_t lastBreak = before.rfind('\n');
     const std::string_view ofLine =
         lastBreak == std::string_view::npos ? before : before.substr(lastBreak + 1);
     const auto column = 1 + std::count_if(ofLine.begin(), ofLine.end(), [](char c) {
@@ -145,13 +145,13 @@ std::string lineAndColumn(std::string_view text, size_t offset) {
     return "line " + std::to_string(line) + ", column " + std::to_string(column);
 }
 
-DescriptionError syntaxError(std::string_view text, size_t offset, rapidjson::ParseErrorCode code,
-                             const char* what) {
+DescriptionError syntaxError(std::string_view text, std::size_t offset,
+                             rapidjson::ParseErrorCode code, const char* what) {
     if (isUtf16(text)) {
         return {"", "is UTF-16 text", "the file must be saved as UTF-8"};
     }
     const std::string_view before = text.substr(0, std::min(offset, text.size()));
-    const size_t last = before.find_last_not_of(" \t\r\n");
+    const std::size_t last = before.find_last_not_of(" \t\r\n");
     const Place place{text.substr(before.size()),
                       last == std::string_view::npos ? '\0' : before[last]};
     const Words words = wordsAt(place, code, what);

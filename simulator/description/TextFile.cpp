@@ -13,7 +13,7 @@ namespace simulator {
 
 namespace {
 
-constexpr size_t largestFile = size_t{16} << 20;
+constexpr std::size_t largestFile = std::size_t{16} << 20;
 
 class OpenFile {
   public:
@@ -29,7 +29,7 @@ class OpenFile {
     bool isOpen() const { return file >= 0; }
     bool askState(struct stat& state) const { return fstat(file, &state) == 0; }
     // The number of bytes, 0 at the end, or below 0.
-    ssize_t read(char* buffer, size_t size) const {
+    ssize_t read(char* buffer, std::size_t size) const {
         ssize_t count = -1;
         do {
             count = ::read(file, buffer, size);
@@ -81,7 +81,7 @@ TextFile readTextFile(const std::string& path, const char* right) {
     std::array<char, 4096> piece;
     ssize_t count = 0;
     while ((count = file.read(piece.data(), piece.size())) > 0) {
-        read.text.append(piece.data(), static_cast<size_t>(count));
+        read.text.append(piece.data(), static_cast<std::size_t>(count));
         if (read.text.size() > largestFile) {
             throw DescriptionError{"", "is larger than 16 MiB", right};
         }

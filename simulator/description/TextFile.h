@@ -22,8 +22,8 @@ struct FileVersion {
     dev_t device = 0;
     ino_t inode = 0;
     off_t size = 0;
-    int64_t seconds = 0;
-    int64_t nanoseconds = 0;
+    std::int64_t seconds = 0;
+    std::int64_t nanoseconds = 0;
 };
 
 // The present version of a file. If it cannot be determined, only `exists` is set.

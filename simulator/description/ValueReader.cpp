@@ -6,7 +6,7 @@ namespace simulator {
 
 namespace {
 
-void readElement(const Node& node, List<uint8_t>& list) {
+void readElement(const Node& node, List<std::uint8_t>& list) {
     node.expect(node.json().IsBool(), "true or false");
     list.push_back(node.json().GetBool() ? 1 : 0);
 }
@@ -16,11 +16,11 @@ void readElement(const Node& node, List<double>& list) {
     list.push_back(node.json().GetDouble());
 }
 
-void readElement(const Node& node, List<int32_t>& list) {
+void readElement(const Node& node, List<std::int32_t>& list) {
     list.push_back(node.signedNumber());
 }
 
-void readElement(const Node& node, List<int64_t>& list) {
+void readElement(const Node& node, List<std::int64_t>& list) {
     node.expect(node.json().IsInt64(), "a whole number of 64 bits");
     list.push_back(node.json().GetInt64());
 }
@@ -29,11 +29,11 @@ void readElement(const Node& node, List<std::string>& list) {
     list.push_back(node.text());
 }
 
-void readElement(const Node& node, List<uint32_t>& list) {
+void readElement(const Node& node, List<std::uint32_t>& list) {
     list.push_back(node.unsignedNumber(0, UINT32_MAX));
 }
 
-void readElement(const Node& node, List<uint64_t>& list) {
+void readElement(const Node& node, List<std::uint64_t>& list) {
     node.expect(node.json().IsUint64(), "a whole number of 64 bits, not below 0");
     list.push_back(node.json().GetUint64());
 }
@@ -50,7 +50,7 @@ std::string itemsOf(const Enumeration& enumeration) {
 void readItem(const Enumeration& enumeration, const Node& node, Elements& elements) {
     const std::string name = node.text();
     if (const auto number = enumeration.numberOf(name)) {
-        std::get<List<int32_t>>(elements).push_back(*number);
+        std::get<List<std::int32_t>>(elements).push_back(*number);
         return;
     }
     std::vector<std::string> known;
@@ -76,7 +76,7 @@ std::string limitWords(const PropertyDefinition& definition) {
 }
 
 // The node of one element of a value.
-Node elementNode(const PropertyDefinition& definition, const Node& node, size_t index) {
+Node elementNode(const PropertyDefinition& definition, const Node& node, std::size_t index) {
     return isArray(definition.type) ? node.element(index) : node;
 }
 

@@ -71,12 +71,12 @@ void nQITRMCAPI100_closeProperty(nQITRMCAPI100_Property handle, qierr_Status* st
 }
 
 void nQITRMCAPI100_getPropertyPropertyInt32(nQITRMCAPI100_Property handle, const char* attribute,
-                                            int32_t* value, qierr_Status* status) {
+                                            std::int32_t* value, qierr_Status* status) {
     getScalar(__func__, PropertyAttribute{handle, attribute}, value, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyBool(nQITRMCAPI100_Property handle, const char* attribute,
-                                           uint8_t* value, qierr_Status* status) {
+                                           std::uint8_t* value, qierr_Status* status) {
     getScalar(__func__, PropertyAttribute{handle, attribute}, value, status);
 }
 
@@ -86,13 +86,13 @@ void nQITRMCAPI100_getPropertyPropertyString(nQITRMCAPI100_Property handle, cons
 }
 
 void nQITRMCAPI100_getPropertyPropertyInt32Array(nQITRMCAPI100_Property handle,
-                                                 const char* attribute, int32_t** array,
-                                                 uint32_t* count, qierr_Status* status) {
+                                                 const char* attribute, std::int32_t** array,
+                                                 std::uint32_t* count, qierr_Status* status) {
     getArray(__func__, PropertyAttribute{handle, attribute}, array, count, status);
 }
 
 void nQITRMCAPI100_getPropertyPropertyStringArray(nQITRMCAPI100_Property handle,
                                                   const char* attribute, char*** array,
-                                                  uint32_t* count, qierr_Status* status) {
+                                                  std::uint32_t* count, qierr_Status* status) {
     getArray(__func__, PropertyAttribute{handle, attribute}, array, count, status);
 }

@@ -27,7 +27,7 @@ Elements oneText(const std::optional<Elements>& limit) {
     return oneText(limit ? firstText(*limit) : std::string());
 }
 Elements oneFlag(bool flag) {
-    return List<uint8_t>{flag};
+    return List<std::uint8_t>{flag};
 }
 
 bool isPending(const Resource& resource, const std::string& name) {
@@ -59,7 +59,7 @@ Elements itemNames(const Subject& subject) {
 }
 
 Elements itemNumbers(const Subject& subject) {
-    std::vector<int32_t> numbers;
+    std::vector<std::int32_t> numbers;
     for (const auto& item : subject.definition().enumeration->items) {
         numbers.push_back(item.second);
     }
@@ -67,31 +67,31 @@ Elements itemNumbers(const Subject& subject) {
 }
 
 constexpr Entry entries[] = {
-    {"Prop.DataType", DataType::int32, false,
+    {"Prop.DataType", DataType::Int32, false,
      [](const Subject& subject) -> Elements {
-         return List<int32_t>{static_cast<int32_t>(subject.definition().type)};
+         return List<std::int32_t>{static_cast<std::int32_t>(subject.definition().type)};
      }},
-    {"Prop.Access", DataType::int32, false,
+    {"Prop.Access", DataType::Int32, false,
      [](const Subject& subject) -> Elements {
-         return List<int32_t>{static_cast<int32_t>(subject.definition().access)};
+         return List<std::int32_t>{static_cast<std::int32_t>(subject.definition().access)};
      }},
-    {"Prop.PendingChanges", DataType::boolean, false, pendingChanges},
-    {"Prop.IsEnum", DataType::boolean, false,
+    {"Prop.PendingChanges", DataType::Boolean, false, pendingChanges},
+    {"Prop.IsEnum", DataType::Boolean, false,
      [](const Subject& subject) { return oneFlag(subject.definition().enumeration != nullptr); }},
-    {"Prop.Descr", DataType::text, false,
+    {"Prop.Descr", DataType::Text, false,
      [](const Subject& subject) { return oneText(subject.definition().description); }},
-    {"Prop.Doc", DataType::text, false,
+    {"Prop.Doc", DataType::Text, false,
      [](const Subject& subject) { return oneText(subject.definition().document); }},
-    {"Prop.Unit", DataType::text, false,
+    {"Prop.Unit", DataType::Text, false,
      [](const Subject& subject) { return oneText(subject.definition().unit); }},
-    {"Prop.MinValue", DataType::text, false,
+    {"Prop.MinValue", DataType::Text, false,
      [](const Subject& subject) { return oneText(subject.definition().least); }},
-    {"Prop.MaxValue", DataType::text, false,
+    {"Prop.MaxValue", DataType::Text, false,
      [](const Subject& subject) { return oneText(subject.definition().most); }},
-    {"Prop.Enum.Name", DataType::text, true,
+    {"Prop.Enum.Name", DataType::Text, true,
      [](const Subject& subject) { return oneText(subject.definition().enumeration->name); }},
-    {"Prop.Enum.Values", DataType::int32Array, true, itemNumbers},
-    {"Prop.Enum.ValueNames", DataType::textArray, true, itemNames},
+    {"Prop.Enum.Values", DataType::Int32Array, true, itemNumbers},
+    {"Prop.Enum.ValueNames", DataType::TextArray, true, itemNames},
 };
 
 [[noreturn]] void refuse(std::string_view name) {

@@ -18,7 +18,7 @@ void expectAnswers(const std::vector<Device*>& devices, double timeout) {
     std::vector<const Device*> silent;
     std::copy_if(devices.begin(), devices.end(), std::back_inserter(silent),
                  [](const Device* device) {
-                     return !device->reachable || device->absence != Absence::none;
+                     return !device->reachable || device->absence != Absence::None;
                  });
     if (silent.empty()) {
         return;

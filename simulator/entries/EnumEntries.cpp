@@ -1,4 +1,5 @@
 #include <array>
+#include <cstdint>
 #include <cstring>
 
 #include "Api.h"
@@ -8,7 +9,7 @@ namespace {
 struct Item {
     const char* enumeration;
     const char* name;
-    int32_t value;
+    std::int32_t value;
 };
 
 constexpr std::array<Item, 19> items{{
@@ -39,7 +40,8 @@ bool same(const char* left, const char* right) {
 
 }  // namespace
 
-int32_t nQITRMCAPI100_translateStaticEnumStringToValue(const char* enumeration, const char* item) {
+std::int32_t nQITRMCAPI100_translateStaticEnumStringToValue(const char* enumeration,
+                                                            const char* item) {
     for (const Item& known : items) {
         if (same(enumeration, known.enumeration) && same(item, known.name)) {
             return known.value;
@@ -48,7 +50,8 @@ int32_t nQITRMCAPI100_translateStaticEnumStringToValue(const char* enumeration, 
     return 0;
 }
 
-const char* nQITRMCAPI100_translateStaticEnumValueToString(const char* enumeration, int32_t value) {
+const char* nQITRMCAPI100_translateStaticEnumValueToString(const char* enumeration,
+                                                           std::int32_t value) {
     for (const Item& known : items) {
         if (same(enumeration, known.enumeration) && value == known.value) {
             return known.name;

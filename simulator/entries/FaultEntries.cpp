@@ -12,7 +12,7 @@ using namespace simulator;
 namespace {
 
 // Returns the code, and puts a description of a failure into `why`.
-int32_t setFaults(const char* json, std::string& why) {
+std::int32_t setFaults(const char* json, std::string& why) {
     try {
         Driver& driver = Driver::instance();
         const WriteLock lock(driver.simulator.mutex);
@@ -29,13 +29,13 @@ int32_t setFaults(const char* json, std::string& why) {
 
 }  // namespace
 
-int32_t qitrmcsim_setFaults(const char* json, char** reason) {
+std::int32_t qitrmcsim_setFaults(const char* json, char** reason) {
     if (reason != nullptr) {
         *reason = nullptr;
     }
     try {
         std::string why;
-        const int32_t code = setFaults(json, why);
+        const std::int32_t code = setFaults(json, why);
         if (code != 0 && reason != nullptr) {
             *reason = lendText(why);
         }

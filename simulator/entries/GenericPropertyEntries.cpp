@@ -59,7 +59,7 @@ struct DeviceProperty {
     }                                                                                             \
     void nQITRMCAPI100_getGenericProperty##Name##Array(                                           \
         nQITRMCAPI100_Session session, const char* resources, const char* property, Read** array, \
-        uint32_t* count, qierr_Status* status) {                                                  \
+        std::uint32_t* count, qierr_Status* status) {                                             \
         getArray(__func__, ResourceProperty{session, resources, property}, array, count, status); \
     }                                                                                             \
     void nQITRMCAPI100_setGenericProperty##Name(nQITRMCAPI100_Session session,                    \
@@ -69,17 +69,17 @@ struct DeviceProperty {
     }                                                                                             \
     void nQITRMCAPI100_setGenericProperty##Name##Array(                                           \
         nQITRMCAPI100_Session session, const char* resources, const char* property,               \
-        Written const* array, uint32_t count, qierr_Status* status) {                             \
+        Written const* array, std::uint32_t count, qierr_Status* status) {                        \
         setArray(__func__, ResourceProperty{session, resources, property}, array, count, status); \
     }
 
-GENERIC_PROPERTY_FUNCTIONS(Bool, uint8_t, uint8_t)
+GENERIC_PROPERTY_FUNCTIONS(Bool, std::uint8_t, std::uint8_t)
 GENERIC_PROPERTY_FUNCTIONS(Double, double, double)
-GENERIC_PROPERTY_FUNCTIONS(Int32, int32_t, int32_t)
-GENERIC_PROPERTY_FUNCTIONS(Int64, int64_t, int64_t)
+GENERIC_PROPERTY_FUNCTIONS(Int32, std::int32_t, std::int32_t)
+GENERIC_PROPERTY_FUNCTIONS(Int64, std::int64_t, std::int64_t)
 GENERIC_PROPERTY_FUNCTIONS(String, char*, const char*)
-GENERIC_PROPERTY_FUNCTIONS(UInt32, uint32_t, uint32_t)
-GENERIC_PROPERTY_FUNCTIONS(UInt64, uint64_t, uint64_t)
+GENERIC_PROPERTY_FUNCTIONS(UInt32, std::uint32_t, std::uint32_t)
+GENERIC_PROPERTY_FUNCTIONS(UInt64, std::uint64_t, std::uint64_t)
 
 #undef GENERIC_PROPERTY_FUNCTIONS
 

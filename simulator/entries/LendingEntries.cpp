@@ -9,6 +9,6 @@ void nQITRMCAPI100_freeArray(void* array) {
     simulator::takeBackNumbers(array);
 }
 
-void nQITRMCAPI100_freeStringArray(char** array, uint32_t) {
+void nQITRMCAPI100_freeStringArray(char** array, std::uint32_t) {
     simulator::takeBackTexts(array);
 }

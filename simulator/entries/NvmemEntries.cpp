@@ -6,7 +6,7 @@ using namespace simulator;
 
 namespace {
 
-void expectBytes(const uint8_t* bytes, uint32_t size, const char* argument) {
+void expectBytes(const std::uint8_t* bytes, std::uint32_t size, const char* argument) {
     if (bytes == nullptr && size != 0) {
         throw Refusal(code::missingArgument).usage(tag::argument, argument);
     }
@@ -23,9 +23,9 @@ std::vector<NvmemArea*> areasOf(const Resolver& resolver, std::string_view resou
     expectSome(found);
     std::vector<NvmemArea*> areas;
     for (Resource* resource : found) {
-        if (resource->kind == Kind::nvmemArea) {
+        if (resource->kind == Kind::NvmemArea) {
             areas.push_back(static_cast<NvmemArea*>(resource));
-        } else if (resource->kind == Kind::device) {
+        } else if (resource->kind == Kind::Device) {
             for (const auto& area : resource->device->nvmemAreas) {
                 areas.push_back(area.get());
             }
@@ -39,7 +39,7 @@ std::vector<NvmemArea*> areasOf(const Resolver& resolver, std::string_view resou
 }  // namespace
 
 void nQITRMCAPI100_getNvmemBytes(nQITRMCAPI100_Session session, const char* nvmemArea,
-                                 uint32_t address, uint8_t* buffer, uint32_t size,
+                                 std::uint32_t address, std::uint8_t* buffer, std::uint32_t size,
                                  qierr_Status* status) {
     const auto call = [&, function = __func__] {
         return Call(function)
@@ -57,9 +57,9 @@ void nQITRMCAPI100_getNvmemBytes(nQITRMCAPI100_Session session, const char* nvme
 }
 
 void nQITRMCAPI100_setNvmemBytes(nQITRMCAPI100_Session session, const char* nvmemArea,
-                                 uint32_t address, const uint8_t* bytes, uint32_t size,
-                                 const char* serialNumberGiven, const char* password,
-                                 qierr_Status* status) {
+                                 std::uint32_t address, const std::uint8_t* bytes,
+                                 std::uint32_t size, const char* serialNumberGiven,
+                                 const char* password, qierr_Status* status) {
     const auto call = [&, function = __func__] {
         return Call(function)
             .session(session)

@@ -22,18 +22,18 @@ void writeMember(Writer& writer, const char* name, const std::string& text) {
     }
 }
 
-void writeMember(Writer& writer, const char* name, uint32_t number) {
+void writeMember(Writer& writer, const char* name, std::uint32_t number) {
     writer.Key(name);
     writer.Uint(number);
 }
 
 const char* stateOf(const Device& device) {
     switch (device.absence) {
-        case Absence::none:
+        case Absence::None:
             return "present";
-        case Absence::connectionLost:
+        case Absence::ConnectionLost:
             return "connection_lost";
-        case Absence::removed:
+        case Absence::Removed:
             return "pulled";
     }
     return "";
@@ -95,7 +95,7 @@ std::string describeDevices(Driver& driver) {
     return text.GetString();
 }
 
-std::string traceFrom(Driver& driver, uint64_t from) {
+std::string traceFrom(Driver& driver, std::uint64_t from) {
     const TraceMemory::Lines lines = driver.trace.latest.read(from);
     rapidjson::StringBuffer text;
     Writer writer(text);
@@ -114,7 +114,7 @@ std::string traceFrom(Driver& driver, uint64_t from) {
 
 // Lends the text that describe(driver) returns.
 template <typename Describe>
-int32_t lendDescription(char** json, Describe describe) {
+std::int32_t lendDescription(char** json, Describe describe) {
     *json = nullptr;
     try {
         *json = lendText(describe(Driver::instance()));
@@ -128,7 +128,7 @@ int32_t lendDescription(char** json, Describe describe) {
 
 }  // namespace
 
-int32_t qitrmcsim_getFaults(char** json) {
+std::int32_t qitrmcsim_getFaults(char** json) {
     return lendDescription(json, [](Driver& driver) {
         const WriteLock lock(driver.simulator.mutex);
         driver.faults.refresh();
@@ -136,10 +136,10 @@ int32_t qitrmcsim_getFaults(char** json) {
     });
 }
 
-int32_t qitrmcsim_describeDevices(char** json) {
+std::int32_t qitrmcsim_describeDevices(char** json) {
     return lendDescription(json, describeDevices);
 }
 
-int32_t qitrmcsim_readTrace(uint64_t from, char** json) {
+std::int32_t qitrmcsim_readTrace(std::uint64_t from, char** json) {
     return lendDescription(json, [&](Driver& driver) { return traceFrom(driver, from); });
 }

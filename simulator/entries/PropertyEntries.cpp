@@ -44,7 +44,7 @@ struct SessionProperty {
 }  // namespace
 
 void nQITRMCAPI100_getSystemPropertyBool(nQITRMCAPI100_Session session, const char* property,
-                                         uint8_t* value, qierr_Status* status) {
+                                         std::uint8_t* value, qierr_Status* status) {
     getScalar(__func__, SystemProperty{session, property}, value, status);
 }
 
@@ -54,18 +54,18 @@ void nQITRMCAPI100_getSystemPropertyDouble(nQITRMCAPI100_Session session, const 
 }
 
 void nQITRMCAPI100_getSystemPropertyUInt64(nQITRMCAPI100_Session session, const char* property,
-                                           uint64_t* value, qierr_Status* status) {
+                                           std::uint64_t* value, qierr_Status* status) {
     getScalar(__func__, SystemProperty{session, property}, value, status);
 }
 
 void nQITRMCAPI100_getSystemPropertyStringArray(nQITRMCAPI100_Session session, const char* property,
-                                                char*** array, uint32_t* count,
+                                                char*** array, std::uint32_t* count,
                                                 qierr_Status* status) {
     getArray(__func__, SystemProperty{session, property}, array, count, status);
 }
 
 void nQITRMCAPI100_setSystemPropertyBool(nQITRMCAPI100_Session session, const char* property,
-                                         uint8_t value, qierr_Status* status) {
+                                         std::uint8_t value, qierr_Status* status) {
     setScalar(__func__, SystemProperty{session, property}, value, status);
 }
 
@@ -81,7 +81,7 @@ void nQITRMCAPI100_getSessionPropertyDouble(nQITRMCAPI100_Session session, const
 
 void nQITRMCAPI100_getSessionPropertyStringArray(nQITRMCAPI100_Session session,
                                                  const char* property, char*** array,
-                                                 uint32_t* count, qierr_Status* status) {
+                                                 std::uint32_t* count, qierr_Status* status) {
     getArray(__func__, SessionProperty{session, property}, array, count, status);
 }
 
@@ -92,6 +92,6 @@ void nQITRMCAPI100_setSessionPropertyDouble(nQITRMCAPI100_Session session, const
 
 void nQITRMCAPI100_setSessionPropertyStringArray(nQITRMCAPI100_Session session,
                                                  const char* property, const char* const* array,
-                                                 uint32_t count, qierr_Status* status) {
+                                                 std::uint32_t count, qierr_Status* status) {
     setArray(__func__, SessionProperty{session, property}, array, count, status);
 }

@@ -7,7 +7,7 @@ namespace {
 
 template <typename Number>
 void readRegister(const char* function, nQITRMCAPI100_Session session, const char* device,
-                  uint32_t address, Number* value, qierr_Status* status) {
+                  std::uint32_t address, Number* value, qierr_Status* status) {
     clearOutputs(status, value);
     const auto call = [&] {
         return Call(function)
@@ -25,7 +25,7 @@ void readRegister(const char* function, nQITRMCAPI100_Session session, const cha
 
 template <typename Number>
 void writeRegister(const char* function, nQITRMCAPI100_Session session, const char* device,
-                   uint32_t address, Number value, qierr_Status* status) {
+                   std::uint32_t address, Number value, qierr_Status* status) {
     const auto call = [&] {
         return Call(function)
             .session(session)
@@ -45,19 +45,21 @@ void writeRegister(const char* function, nQITRMCAPI100_Session session, const ch
 }  // namespace
 
 // The two functions of one width.
-#define REGISTER_FUNCTIONS(Name, Number)                                                           \
-    void nQITRMCAPI100_readRegister##Name(nQITRMCAPI100_Session session, const char* device,       \
-                                          uint32_t address, Number* value, qierr_Status* status) { \
-        readRegister(__func__, session, device, address, value, status);                           \
-    }                                                                                              \
-    void nQITRMCAPI100_writeRegister##Name(nQITRMCAPI100_Session session, const char* device,      \
-                                           uint32_t address, Number value, qierr_Status* status) { \
-        writeRegister(__func__, session, device, address, value, status);                          \
+#define REGISTER_FUNCTIONS(Name, Number)                                                      \
+    void nQITRMCAPI100_readRegister##Name(nQITRMCAPI100_Session session, const char* device,  \
+                                          std::uint32_t address, Number* value,               \
+                                          qierr_Status* status) {                             \
+        readRegister(__func__, session, device, address, value, status);                      \
+    }                                                                                         \
+    void nQITRMCAPI100_writeRegister##Name(nQITRMCAPI100_Session session, const char* device, \
+                                           std::uint32_t address, Number value,               \
+                                           qierr_Status* status) {                            \
+        writeRegister(__func__, session, device, address, value, status);                     \
     }
 
-REGISTER_FUNCTIONS(UInt8, uint8_t)
-REGISTER_FUNCTIONS(UInt16, uint16_t)
-REGISTER_FUNCTIONS(UInt32, uint32_t)
-REGISTER_FUNCTIONS(UInt64, uint64_t)
+REGISTER_FUNCTIONS(UInt8, std::uint8_t)
+REGISTER_FUNCTIONS(UInt16, std::uint16_t)
+REGISTER_FUNCTIONS(UInt32, std::uint32_t)
+REGISTER_FUNCTIONS(UInt64, std::uint64_t)
 
 #undef REGISTER_FUNCTIONS

@@ -7,7 +7,7 @@ namespace simulator {
 namespace {
 
 struct ReservationTerms {
-    int32_t access;
+    std::int32_t access;
     const char* group;
     double timeout;
 };
@@ -37,9 +37,9 @@ class Opening {
 
 void setDefaults(Session& session, Kind kind, const std::vector<Resource*>& resources) {
     session.defaultDevices = owners(resources);
-    if (kind == Kind::physChan) {
+    if (kind == Kind::PhysChan) {
         session.defaultPhysChans = distinct(resources);
-    } else if (kind == Kind::nvmemArea) {
+    } else if (kind == Kind::NvmemArea) {
         session.defaultNvmemAreas = distinct(resources);
     }
 }
@@ -97,27 +97,25 @@ void nQITRMCAPI100_initializeSessionWithoutResources(nQITRMCAPI100_Session* sess
 }
 
 void nQITRMCAPI100_initializeSessionWithDevices(nQITRMCAPI100_Session* session, const char* devices,
-                                                double timeout, int32_t access,
+                                                double timeout, std::int32_t access,
                                                 const char* reservationGroup,
                                                 double reservationTimeout, qierr_Status* status) {
-    openOn({__func__, Kind::device, "devices"}, devices, timeout,
+    openOn({__func__, Kind::Device, "devices"}, devices, timeout,
            {access, reservationGroup, reservationTimeout}, session, status);
 }
 
 void nQITRMCAPI100_initializeSessionWithPhysChans(nQITRMCAPI100_Session* session,
                                                   const char* physicalChannels, double timeout,
-                                                  int32_t access, const char* reservationGroup,
+                                                  std::int32_t access, const char* reservationGroup,
                                                   double reservationTimeout, qierr_Status* status) {
-    openOn({__func__, Kind::physChan, "physicalChannels"}, physicalChannels, timeout,
+    openOn({__func__, Kind::PhysChan, "physicalChannels"}, physicalChannels, timeout,
            {access, reservationGroup, reservationTimeout}, session, status);
 }
 
-void nQITRMCAPI100_initializeSessionWithNvmemAreas(nQITRMCAPI100_Session* session,
-                                                   const char* nvmemAreas, double timeout,
-                                                   int32_t access, const char* reservationGroup,
-                                                   double reservationTimeout,
-                                                   qierr_Status* status) {
-    openOn({__func__, Kind::nvmemArea, "nvmemAreas"}, nvmemAreas, timeout,
+void nQITRMCAPI100_initializeSessionWithNvmemAreas(
+    nQITRMCAPI100_Session* session, const char* nvmemAreas, double timeout, std::int32_t access,
+    const char* reservationGroup, double reservationTimeout, qierr_Status* status) {
+    openOn({__func__, Kind::NvmemArea, "nvmemAreas"}, nvmemAreas, timeout,
            {access, reservationGroup, reservationTimeout}, session, status);
 }
 
@@ -133,12 +131,12 @@ void nQITRMCAPI100_abortSession(nQITRMCAPI100_Session session, qierr_Status* sta
     const auto call = [&, function = __func__] { return Call(function).session(session); };
     withSimulator(status, call, [&](Simulator& simulator, auto&) {
         simulator.sessions.get(session);
-        simulator.waits.endAll(session, Wait::End::aborted);
+        simulator.waits.endAll(session, Wait::End::Aborted);
     });
 }
 
 void nQITRMCAPI100_reserveDevices(nQITRMCAPI100_Session session, const char* devices,
-                                  int32_t access, const char* reservationGroup,
+                                  std::int32_t access, const char* reservationGroup,
                                   double reservationTimeout, qierr_Status* status) {
     const auto call = [&, function = __func__] {
         return Call(function)

@@ -10,7 +10,7 @@
 
 using namespace simulator;
 
-int32_t qitrmcsim_start(char** text) {
+std::int32_t qitrmcsim_start(char** text) {
     *text = nullptr;
     try {
         Simulator& simulator = Driver::instance().simulator;
@@ -27,9 +27,9 @@ int32_t qitrmcsim_start(char** text) {
 void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
     const Ledger& ledger = Ledger::instance();
     *counts = {};
-    counts->texts = static_cast<uint32_t>(ledger.count(Ledger::Item::text));
-    counts->numberArrays = static_cast<uint32_t>(ledger.count(Ledger::Item::numbers));
-    counts->textArrays = static_cast<uint32_t>(ledger.count(Ledger::Item::texts));
+    counts->texts = static_cast<std::uint32_t>(ledger.count(Ledger::Item::Text));
+    counts->numberArrays = static_cast<std::uint32_t>(ledger.count(Ledger::Item::Numbers));
+    counts->textArrays = static_cast<std::uint32_t>(ledger.count(Ledger::Item::Texts));
     try {
         Simulator& simulator = Driver::instance().simulator;
         const std::shared_lock<SharedMutex> lock(simulator.mutex);
@@ -41,7 +41,7 @@ void qitrmcsim_countOutstanding(qitrmcsim_Outstanding* counts) {
     }
 }
 
-uint64_t qitrmcsim_countCalls(void) {
+std::uint64_t qitrmcsim_countCalls(void) {
     try {
         return Driver::instance().simulator.clock.calls();
     } catch (...) {

@@ -9,14 +9,15 @@ namespace {
 
 constexpr std::string_view emptyText = "{}";
 // A NUL after the text, and the end marker.
-constexpr size_t framing = 2;
+constexpr std::size_t framing = 2;
 
 bool putText(qierr_Status& status, std::string_view text) noexcept {
-    const size_t needed = text.size() + framing;
+    const std::size_t needed = text.size() + framing;
     if (needed > INT32_MAX) {
         return false;
     }
-    if (needed > status.capacity && !status.reallocJson(&status, static_cast<uint32_t>(needed))) {
+    if (needed > status.capacity &&
+        !status.reallocJson(&status, static_cast<std::uint32_t>(needed))) {
         return false;
     }
     if (status.json == nullptr || status.capacity < needed) {
@@ -30,7 +31,7 @@ bool putText(qierr_Status& status, std::string_view text) noexcept {
 
 }  // namespace
 
-void fillStatus(qierr_Status& status, int32_t code, std::string_view text) noexcept {
+void fillStatus(qierr_Status& status, std::int32_t code, std::string_view text) noexcept {
     if (status.code < 0 || code == 0 || (status.code > 0 && code > 0)) {
         return;
     }

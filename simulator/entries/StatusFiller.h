@@ -11,7 +11,7 @@ namespace simulator {
 // Sets the code of a status that is not negative yet, unless it is a warning that would replace a
 // warning, and puts the details into its text. The memory for the text comes from the record's own
 // reallocJson; if that fails the code is set and the details are lost.
-void fillStatus(qierr_Status& status, int32_t code, std::string_view text) noexcept;
+void fillStatus(qierr_Status& status, std::int32_t code, std::string_view text) noexcept;
 
 // Puts a refusal into a status. Without the memory for its details, only the code arrives.
 void report(const Refusal& refusal, qierr_Status& status) noexcept;

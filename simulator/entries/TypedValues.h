@@ -13,26 +13,26 @@
 // and a Boolean the only number of 8 bits.
 namespace simulator {
 
-constexpr DataType typeOf(uint8_t) {
-    return DataType::boolean;
+constexpr DataType typeOf(std::uint8_t) {
+    return DataType::Boolean;
 }
 constexpr DataType typeOf(double) {
-    return DataType::real;
+    return DataType::Real;
 }
-constexpr DataType typeOf(int32_t) {
-    return DataType::int32;
+constexpr DataType typeOf(std::int32_t) {
+    return DataType::Int32;
 }
-constexpr DataType typeOf(int64_t) {
-    return DataType::int64;
+constexpr DataType typeOf(std::int64_t) {
+    return DataType::Int64;
 }
 constexpr DataType typeOf(const char*) {
-    return DataType::text;
+    return DataType::Text;
 }
-constexpr DataType typeOf(uint32_t) {
-    return DataType::uint32;
+constexpr DataType typeOf(std::uint32_t) {
+    return DataType::Uint32;
 }
-constexpr DataType typeOf(uint64_t) {
-    return DataType::uint64;
+constexpr DataType typeOf(std::uint64_t) {
+    return DataType::Uint64;
 }
 
 template <typename Number>
@@ -45,19 +45,20 @@ inline void lendScalar(const ReadValue& read, char** value) {
 }
 
 template <typename Number>
-void lendArray(const ReadValue& read, Number** array, uint32_t* count) {
+void lendArray(const ReadValue& read, Number** array, std::uint32_t* count) {
     const auto& list = std::get<List<Number>>(read.elements());
     *array = lendNumbers(list);
-    *count = static_cast<uint32_t>(list.size());
+    *count = static_cast<std::uint32_t>(list.size());
 }
 
 template <typename Text>
-void lendList(const std::vector<Text>& list, char*** array, uint32_t* count) {
-    *array = lendTexts(list.size(), [&](size_t index) { return std::string_view(list[index]); });
-    *count = static_cast<uint32_t>(list.size());
+void lendList(const std::vector<Text>& list, char*** array, std::uint32_t* count) {
+    *array =
+        lendTexts(list.size(), [&](std::size_t index) { return std::string_view(list[index]); });
+    *count = static_cast<std::uint32_t>(list.size());
 }
 
-inline void lendArray(const ReadValue& read, char*** array, uint32_t* count) {
+inline void lendArray(const ReadValue& read, char*** array, std::uint32_t* count) {
     if (const ReadValue::Names* names = read.names()) {
         lendList(*names, array, count);
     } else {
@@ -70,7 +71,7 @@ Number asElement(Number value) {
     return value;
 }
 
-inline uint8_t asElement(uint8_t value) {
+inline std::uint8_t asElement(std::uint8_t value) {
     return value != 0 ? 1 : 0;
 }
 
@@ -84,13 +85,13 @@ Elements asElements(Value value) {
 }
 
 template <typename Value>
-Elements asElements(const Value* array, uint32_t count) {
+Elements asElements(const Value* array, std::uint32_t count) {
     if (array == nullptr && count != 0) {
         throw Refusal(code::missingArgument).usage(tag::argument, "array");
     }
     List<decltype(asElement(*array))> list;
     list.reserve(count);
-    for (uint32_t i = 0; i < count; ++i) {
+    for (std::uint32_t i = 0; i < count; ++i) {
         list.push_back(asElement(array[i]));
     }
     return list;

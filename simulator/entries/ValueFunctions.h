@@ -21,7 +21,7 @@ void getScalar(const char* function, const Source& source, Value* value, qierr_S
 }
 
 template <typename Source, typename Value>
-void getArray(const char* function, const Source& source, Value** array, uint32_t* count,
+void getArray(const char* function, const Source& source, Value** array, std::uint32_t* count,
               qierr_Status* status) {
     clearOutputs(status, array, count);
     const auto call = [&] { return source.describe(function).out("array", array, count); };
@@ -39,7 +39,7 @@ void setScalar(const char* function, const Source& source, Value value, qierr_St
 }
 
 template <typename Source, typename Value>
-void setArray(const char* function, const Source& source, const Value* array, uint32_t count,
+void setArray(const char* function, const Source& source, const Value* array, std::uint32_t count,
               qierr_Status* status) {
     const auto call = [&] { return source.describe(function).in("array", array, count); };
     withSimulator(status, call, [&](Simulator& simulator, auto&) {

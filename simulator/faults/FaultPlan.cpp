@@ -9,7 +9,7 @@ namespace simulator {
 namespace {
 
 // A number from 0 to below 1 that depends on every bit of the given number, evenly distributed.
-double drawOf(uint64_t number) {
+double drawOf(std::uint64_t number) {
     number += 0x9E3779B97F4A7C15u;
     number = (number ^ (number >> 30)) * 0xBF58476D1CE4E5B9u;
     number = (number ^ (number >> 27)) * 0x94D049BB133111EBu;
@@ -30,14 +30,14 @@ bool Fault::matchesFunction(std::string_view name) const {
     return isBeginning ? name.substr(0, function.size()) == function : name == function;
 }
 
-bool Fault::countCall(uint32_t seed, size_t place) {
+bool Fault::countCall(std::uint32_t seed, std::size_t place) {
     ++matched;
     if (matched < first || (matched - first) % every != 0 || (matched - first) / every >= count) {
         return false;
     }
     // Odd factors, so that adjacent numbers give unrelated results.
-    constexpr uint64_t seedFactor = 0xD1342543DE82EF95u;
-    constexpr uint64_t placeFactor = 0xAF251AF3B0F025B5u;
+    constexpr std::uint64_t seedFactor = 0xD1342543DE82EF95u;
+    constexpr std::uint64_t placeFactor = 0xAF251AF3B0F025B5u;
     return drawOf(seed * seedFactor + place * placeFactor + matched) < probability;
 }
 

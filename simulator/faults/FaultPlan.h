@@ -19,8 +19,8 @@ struct OutputFault {
     // The texts in arrays are null.
     bool hasNullItems = false;
     // The length of every text in bytes, and the elements of every array.
-    std::optional<uint32_t> textSize;
-    std::optional<uint32_t> count;
+    std::optional<std::uint32_t> textSize;
+    std::optional<std::uint32_t> count;
 };
 
 // Which calls a fault applies to, and what it does to them.
@@ -35,9 +35,9 @@ class Fault {
     const Resource* resource = nullptr;
     // Of the calls that match: the first that the fault applies to, the distance from one to the
     // next, and how many.
-    uint64_t first = 1;
-    uint64_t every = 1;
-    uint64_t count = std::numeric_limits<uint64_t>::max();
+    std::uint64_t first = 1;
+    std::uint64_t every = 1;
+    std::uint64_t count = std::numeric_limits<std::uint64_t>::max();
     // Of these calls again, the fraction that the fault applies to, 0 to 1.
     double probability = 1.0;
     // Seconds since the plan came into force, between which the fault applies.
@@ -55,10 +55,10 @@ class Fault {
     bool matchesFunction(std::string_view name) const;
     // Counts a call that matches. Returns whether the fault applies to it. The same seed, the same
     // place in the plan and the same number of calls give the same result.
-    bool countCall(uint32_t seed, size_t place);
+    bool countCall(std::uint32_t seed, std::size_t place);
 
   private:
-    uint64_t matched = 0;
+    std::uint64_t matched = 0;
 };
 
 // A device does not answer for a while.
@@ -75,7 +75,7 @@ struct FaultPlan {
 
     // The description that this was read from.
     std::string text = "{}";
-    uint32_t seed = 0;
+    std::uint32_t seed = 0;
     std::vector<Fault> faults;
     std::vector<DeviceEvent> events;
 };

@@ -13,8 +13,8 @@ namespace simulator {
 
 namespace {
 
-constexpr uint32_t mostBytes = 1u << 30;
-constexpr uint32_t mostElements = 1u << 24;
+constexpr std::uint32_t mostBytes = 1u << 30;
+constexpr std::uint32_t mostElements = 1u << 24;
 
 // A function name without the common prefix, which it may have.
 std::string_view nameOf(std::string_view text) {
@@ -78,7 +78,7 @@ const Resource& readResource(const Node& node, const Chassis& chassis) {
 
 void readTurns(const Node& node, Fault& fault) {
     node.expectMembers(members::calls);
-    const auto read = [&](const char* name, uint64_t& number) {
+    const auto read = [&](const char* name, std::uint64_t& number) {
         node.ifPresent(name,
                        [&](const Node& value) { number = value.unsignedNumber(1, UINT32_MAX); });
     };
@@ -117,7 +117,8 @@ OutputFault readOutput(const Node& node) {
     if (!output.isNull && !output.hasNullItems && !output.textSize && !output.count) {
         node.fail("changes nothing", "must have null, null_items, text_size or count");
     }
-    if (output.textSize && output.count && uint64_t{*output.textSize} * *output.count > mostBytes) {
+    if (output.textSize && output.count &&
+        std::uint64_t{*output.textSize} * *output.count > mostBytes) {
         node.fail("is too large", "text_size times count must be at most 1073741824");
     }
     return output;
@@ -168,7 +169,7 @@ Fault readFault(const Node& node, const Chassis& chassis) {
 const Device& readDevice(const Node& node, const Chassis& chassis) {
     const Resource* found = findResource(chassis, node.text());
     const Device* device =
-        found != nullptr && found->kind == Kind::device ? found->device : nullptr;
+        found != nullptr && found->kind == Kind::Device ? found->device : nullptr;
     if (device == nullptr) {
         node.fail("is not a device of the chassis", "must be the name of one");
     }
@@ -179,12 +180,12 @@ Absence readAbsence(const Node& node, const Device& device) {
     const std::string name = node.text();
     node.expect(name == "pulled" || name == "connection_lost", "pulled or connection_lost");
     if (name == "connection_lost") {
-        return Absence::connectionLost;
+        return Absence::ConnectionLost;
     }
     if (device.slot == 0) {
         node.fail("befalls a device that is no module", "only what stands in a slot can be pulled");
     }
-    return Absence::removed;
+    return Absence::Removed;
 }
 
 DeviceEvent readEvent(const Node& node, const Chassis& chassis) {

@@ -74,7 +74,7 @@ void Faults::refresh() {
 
 void Faults::replace(FaultPlan fresh) {
     auto former = std::make_shared<FaultPlan>(std::move(fresh));
-    const int64_t formerStart = std::exchange(start, simulator.clock.now());
+    const std::int64_t formerStart = std::exchange(start, simulator.clock.now());
     current.swap(former);
     due = start;
     try {
@@ -86,7 +86,7 @@ void Faults::replace(FaultPlan fresh) {
     }
     updateIsOn();
     for (Wait* wait : delays) {
-        wait->finish(Wait::End::done);
+        wait->finish(Wait::End::Done);
     }
     simulator.waits.scheduleChanged();
 }
@@ -101,14 +101,14 @@ void Faults::delay(nQITRMCAPI100_Session session, double seconds, WriteLock& loc
     simulator.waits.spend(wait, seconds, lock);
 }
 
-int64_t Faults::timeOf(double seconds) const {
+std::int64_t Faults::timeOf(double seconds) const {
     // A time beyond a century counts as never.
     constexpr double century = 100.0 * 366.0 * 24.0 * 60.0 * 60.0;
     return seconds < century ? start + std::llround(seconds * 1e6) : never;
 }
 
-Absence Faults::absenceAt(const Device& device, int64_t time) const {
-    Absence absence = Absence::none;
+Absence Faults::absenceAt(const Device& device, std::int64_t time) const {
+    Absence absence = Absence::None;
     for (const DeviceEvent& event : current->events) {
         if (event.device == &device && timeOf(event.begin) <= time && time < timeOf(event.end)) {
             absence = std::max(absence, event.absence);
@@ -118,19 +118,19 @@ Absence Faults::absenceAt(const Device& device, int64_t time) const {
 }
 
 void Faults::catchUp() {
-    const int64_t now = simulator.clock.now();
+    const std::int64_t now = simulator.clock.now();
     while (due != never && due <= now) {
         passTime(due);
     }
 }
 
-void Faults::passTime(int64_t time) {
+void Faults::passTime(std::int64_t time) {
     for (const auto& device : simulator.chassis->devices()) {
         change(*device, absenceAt(*device, time));
     }
     due = never;
     for (const DeviceEvent& event : current->events) {
-        for (const int64_t next : {timeOf(event.begin), timeOf(event.end)}) {
+        for (const std::int64_t next : {timeOf(event.begin), timeOf(event.end)}) {
             due = next > time ? std::min(due, next) : due;
         }
     }
@@ -140,20 +140,20 @@ void Faults::change(Device& device, Absence absence) {
     if (device.absence == absence) {
         return;
     }
-    if (device.absence == Absence::removed) {
+    if (device.absence == Absence::Removed) {
         simulator.reset(device);
     }
-    if (absence == Absence::removed) {
+    if (absence == Absence::Removed) {
         device.dropAllPending();
     }
-    if (absence == Absence::removed || device.absence == Absence::removed) {
+    if (absence == Absence::Removed || device.absence == Absence::Removed) {
         ++simulator.chassis->changes;
     }
     device.absence = absence;
-    const int64_t now = simulator.clock.now();
+    const std::int64_t now = simulator.clock.now();
     device.forEachResource(
         [&](const Resource& resource) { simulator.motions.noteChange(resource, now); });
-    if (absence != Absence::none) {
+    if (absence != Absence::None) {
         simulator.sessions.forEach([&](Session& session) {
             auto& connected = session.connectedDevices;
             connected.erase(std::remove(connected.begin(), connected.end(), &device),

@@ -39,17 +39,17 @@ class Faults : public Schedule {
     // Whether a time, in seconds since the plan came into force, is now or in the past.
     bool isPast(double seconds) const { return timeOf(seconds) <= simulator.clock.now(); }
 
-    int64_t next() const override { return due; }
+    std::int64_t next() const override { return due; }
     void catchUp() override;
 
   private:
     void readFile();
     void updateIsOn();
     // Carries out the events of one time, and finds the next time.
-    void passTime(int64_t time);
+    void passTime(std::int64_t time);
     void change(Device& device, Absence absence);
-    Absence absenceAt(const Device& device, int64_t time) const;
-    int64_t timeOf(double seconds) const;
+    Absence absenceAt(const Device& device, std::int64_t time) const;
+    std::int64_t timeOf(double seconds) const;
 
     Simulator& simulator;
     // Empty when there is no faults file.
@@ -58,8 +58,8 @@ class Faults : public Schedule {
     std::shared_ptr<FaultPlan> current;
     // When the plan came into force, and when its next event begins or ends, in microseconds of the
     // simulated time.
-    int64_t start;
-    int64_t due = never;
+    std::int64_t start;
+    std::int64_t due = never;
     std::list<Wait*> delays;
     std::atomic<bool> on{false};
 };

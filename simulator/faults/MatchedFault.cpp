@@ -10,7 +10,7 @@ namespace {
 
 bool isAbout(const Resource& mentioned, const Resource& resource) {
     return &mentioned == &resource ||
-           (resource.kind == Kind::device && mentioned.device == resource.device);
+           (resource.kind == Kind::Device && mentioned.device == resource.device);
 }
 
 // The resources that a call names, looked up once and only if a fault is about a resource.
@@ -49,7 +49,7 @@ class Subjects {
 MatchedFault::MatchedFault(Simulator& simulator, Faults& faults, const Call& call)
     : simulator(simulator), faults(faults), call(call), plan(faults.plan()) {
     Subjects subjects(simulator, call);
-    for (size_t place = 0; place < plan->faults.size(); ++place) {
+    for (std::size_t place = 0; place < plan->faults.size(); ++place) {
         Fault& candidate = plan->faults[place];
         if (faults.isPast(candidate.begin) && !faults.isPast(candidate.end) &&
             candidate.matchesFunction(call.function()) &&

@@ -10,7 +10,7 @@ namespace simulator {
 
 namespace {
 
-constexpr size_t mostTextBytes = size_t{1} << 30;
+constexpr std::size_t mostTextBytes = std::size_t{1} << 30;
 
 template <typename Number>
 void takeBack(Number* array) noexcept {
@@ -22,16 +22,16 @@ void takeBack(char** array) noexcept {
 }
 
 template <typename Item>
-void lendInstead(const OutputArray<Item>& wanted, Item* array, uint32_t count) noexcept {
+void lendInstead(const OutputArray<Item>& wanted, Item* array, std::uint32_t count) noexcept {
     takeBack(std::exchange(*wanted.place, array));
     *wanted.count = count;
 }
 
 // The items of an array, repeated until there are `count` of them.
 template <typename Number>
-Number* repeated(const Number* items, uint32_t present, uint32_t count) {
+Number* repeated(const Number* items, std::uint32_t present, std::uint32_t count) {
     std::vector<Number> list(count);
-    for (uint32_t i = 0; i < count && present > 0; ++i) {
+    for (std::uint32_t i = 0; i < count && present > 0; ++i) {
         list[i] = items[i % present];
     }
     return lendNumbers(list);
@@ -62,7 +62,7 @@ class Distortion {
         if (output.isNull) {
             lendInstead(wanted, static_cast<char**>(nullptr), output.count.value_or(0));
         } else {
-            const uint32_t count = output.count.value_or(*wanted.count);
+            const std::uint32_t count = output.count.value_or(*wanted.count);
             lendInstead(wanted, textsInsteadOf(*wanted.place, *wanted.count, count), count);
         }
     }
@@ -73,9 +73,9 @@ class Distortion {
   private:
     std::string longText() const { return std::string(*output.textSize, 'x'); }
 
-    char** textsInsteadOf(char* const* texts, uint32_t present, uint32_t count) const {
+    char** textsInsteadOf(char* const* texts, std::uint32_t present, std::uint32_t count) const {
         const std::string sized(output.textSize.value_or(0), 'x');
-        const auto textAt = [&](size_t index) -> std::string_view {
+        const auto textAt = [&](std::size_t index) -> std::string_view {
             if (output.hasNullItems) {
                 return {};
             }
@@ -84,8 +84,8 @@ class Distortion {
             }
             return present > 0 ? texts[index % present] : "";
         };
-        size_t bytes = 0;
-        for (size_t i = 0; i < count; ++i) {
+        std::size_t bytes = 0;
+        for (std::size_t i = 0; i < count; ++i) {
             bytes += textAt(i).size();
             if (bytes > mostTextBytes) {
                 throw std::bad_alloc();
@@ -111,7 +111,7 @@ struct TakingBack {
         lendInstead(wanted, static_cast<Item*>(nullptr), 0);
     }
     void operator()(const OutputBytes& wanted) const {
-        std::fill_n(wanted.buffer, wanted.size, uint8_t{0});
+        std::fill_n(wanted.buffer, wanted.size, std::uint8_t{0});
     }
     template <typename Other>
     void operator()(const Other&) const {}
@@ -122,7 +122,7 @@ bool beginsWith(std::string_view name, std::string_view beginning) {
 }
 
 // Closes what a function that opens something has given its caller a handle of.
-void closeOpened(Simulator& simulator, std::string_view function, uint32_t handle) noexcept {
+void closeOpened(Simulator& simulator, std::string_view function, std::uint32_t handle) noexcept {
     if (beginsWith(function, "initializeSession")) {
         simulator.close(handle);
     } else if (function == "openGenericCommand") {
@@ -142,7 +142,7 @@ void distortOutputs(const Call& call, const OutputFault& output) {
 
 void takeBackOutputs(Simulator& simulator, const Call& call) noexcept {
     for (const Argument& argument : call) {
-        if (const auto* number = std::get_if<Output<uint32_t>>(&argument.value)) {
+        if (const auto* number = std::get_if<Output<std::uint32_t>>(&argument.value)) {
             closeOpened(simulator, call.function(), *number->place);
         }
         std::visit(TakingBack(), argument.value);

@@ -14,9 +14,9 @@ Ledger& Ledger::instance() {
     return ledger;
 }
 
-size_t Ledger::partOf(const void* address) noexcept {
+std::size_t Ledger::partOf(const void* address) noexcept {
     // The lowest bits are those of the alignment.
-    const auto number = reinterpret_cast<uintptr_t>(address) >> 4;
+    const auto number = reinterpret_cast<std::uintptr_t>(address) >> 4;
     return (number ^ number >> 4 ^ number >> 8) % std::tuple_size<decltype(parts)>::value;
 }
 
@@ -43,11 +43,11 @@ bool Ledger::has(const void* address) const noexcept {
     return part.items.count(address) != 0;
 }
 
-size_t Ledger::count(Item item) const noexcept {
-    size_t count = 0;
+std::size_t Ledger::count(Item item) const noexcept {
+    std::size_t count = 0;
     for (const Part& part : parts) {
         const std::lock_guard<std::mutex> lock(part.mutex);
-        count += static_cast<size_t>(
+        count += static_cast<std::size_t>(
             std::count_if(part.items.begin(), part.items.end(),
                           [&](const auto& entry) { return entry.second == item; }));
     }

@@ -10,7 +10,7 @@ namespace simulator {
 // The memory that callers have been lent and have not returned. Thread-safe.
 class Ledger {
   public:
-    enum class Item { text, numbers, texts };
+    enum class Item { Text, Numbers, Texts };
 
     // There is one in the process.
     static Ledger& instance();
@@ -21,7 +21,7 @@ class Ledger {
     bool takeBack(const void* address, Item item) noexcept;
 
     bool has(const void* address) const noexcept;
-    size_t count(Item item) const noexcept;
+    std::size_t count(Item item) const noexcept;
 
   private:
     // Several tables, so that threads seldom wait for each other.
@@ -30,7 +30,7 @@ class Ledger {
         std::unordered_map<const void*, Item> items;
     };
 
-    static size_t partOf(const void* address) noexcept;
+    static std::size_t partOf(const void* address) noexcept;
 
     std::array<Part, 16> parts;
 };

@@ -18,7 +18,7 @@ void reportMisuse(const char* function, const char* item) noexcept {
 
 }  // namespace
 
-void* lendMemory(size_t size, Ledger::Item item) {
+void* lendMemory(std::size_t size, Ledger::Item item) {
     void* memory = std::malloc(size);
     if (memory == nullptr) {
         throw std::bad_alloc();
@@ -33,7 +33,7 @@ void* lendMemory(size_t size, Ledger::Item item) {
 }
 
 char* lendText(const std::string& text) {
-    auto* copy = static_cast<char*>(lendMemory(text.size() + 1, Ledger::Item::text));
+    auto* copy = static_cast<char*>(lendMemory(text.size() + 1, Ledger::Item::Text));
     std::memcpy(copy, text.c_str(), text.size() + 1);
     return copy;
 }
@@ -42,7 +42,7 @@ void takeBackText(char* text) noexcept {
     if (text == nullptr) {
         return;
     }
-    if (Ledger::instance().takeBack(text, Ledger::Item::text)) {
+    if (Ledger::instance().takeBack(text, Ledger::Item::Text)) {
         std::free(text);
     } else {
         reportMisuse("freeString", "a text");
@@ -54,7 +54,7 @@ void takeBackNumbers(void* array) noexcept {
     if (array == nullptr) {
         return;
     }
-    if (ledger.takeBack(array, Ledger::Item::numbers) || !ledger.has(array)) {
+    if (ledger.takeBack(array, Ledger::Item::Numbers) || !ledger.has(array)) {
         std::free(array);
     } else {
         reportMisuse("freeArray", "an array of numbers");
@@ -65,7 +65,7 @@ void takeBackTexts(char** array) noexcept {
     if (array == nullptr) {
         return;
     }
-    if (Ledger::instance().takeBack(array, Ledger::Item::texts)) {
+    if (Ledger::instance().takeBack(array, Ledger::Item::Texts)) {
         std::free(array);
     } else {
         reportMisuse("freeStringArray", "an array of texts");

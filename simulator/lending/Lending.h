@@ -18,35 +18,35 @@ char* lendText(const std::string& text);
 // which is valid until the next call; one whose data is null becomes a null pointer. It is called
 // twice for each index. The array and its texts are one block of memory.
 template <typename TextAt>
-char** lendTexts(size_t count, TextAt textAt);
+char** lendTexts(std::size_t count, TextAt textAt);
 
 // Memory that is lent as an item of this kind. size is in bytes and not 0.
-void* lendMemory(size_t size, Ledger::Item item);
+void* lendMemory(std::size_t size, Ledger::Item item);
 
 template <typename Number>
 Number* lendNumbers(const std::vector<Number>& numbers) {
     if (numbers.empty()) {
         return nullptr;
     }
-    const size_t size = numbers.size() * sizeof(Number);
-    void* array = lendMemory(size, Ledger::Item::numbers);
+    const std::size_t size = numbers.size() * sizeof(Number);
+    void* array = lendMemory(size, Ledger::Item::Numbers);
     std::memcpy(array, numbers.data(), size);
     return static_cast<Number*>(array);
 }
 
 template <typename TextAt>
-char** lendTexts(size_t count, TextAt textAt) {
+char** lendTexts(std::size_t count, TextAt textAt) {
     if (count == 0) {
         return nullptr;
     }
-    size_t size = count * sizeof(char*);
-    for (size_t i = 0; i < count; ++i) {
+    std::size_t size = count * sizeof(char*);
+    for (std::size_t i = 0; i < count; ++i) {
         const std::string_view text = textAt(i);
         size += text.data() == nullptr ? 0 : text.size() + 1;
     }
-    auto** array = static_cast<char**>(lendMemory(size, Ledger::Item::texts));
+    auto** array = static_cast<char**>(lendMemory(size, Ledger::Item::Texts));
     char* next = reinterpret_cast<char*>(array + count);
-    for (size_t i = 0; i < count; ++i) {
+    for (std::size_t i = 0; i < count; ++i) {
         const std::string_view text = textAt(i);
         array[i] = text.data() == nullptr ? nullptr : next;
         if (array[i] != nullptr) {

@@ -5,7 +5,7 @@
 
 namespace simulator {
 
-uint64_t mixed(uint64_t number) {
+std::uint64_t mixed(std::uint64_t number) {
     // The digits of the golden ratio and of the roots of 2 and 3, made odd.
     number += 0x9E3779B97F4A7C15;
     number = (number ^ number >> 31) * 0x6A09E667F3BCC909;
@@ -14,24 +14,24 @@ uint64_t mixed(uint64_t number) {
     return number ^ number >> 30;
 }
 
-uint64_t keyOf(std::string_view text) {
-    uint64_t key = text.size();
+std::uint64_t keyOf(std::string_view text) {
+    std::uint64_t key = text.size();
     for (const char c : text) {
         key = mixed(key ^ static_cast<unsigned char>(c));
     }
     return key;
 }
 
-double uniform(uint64_t key) {
+double uniform(std::uint64_t key) {
     return static_cast<double>(mixed(key) >> 11) * 0x1p-53;
 }
 
-double gaussian(uint64_t key) {
+double gaussian(std::uint64_t key) {
     // Twelve numbers of 16 bits, whose sum has a variance of 2^32 and nearly the normal shape.
-    constexpr uint64_t mean = 12 * 65535 / 2;
-    uint64_t sum = 0;
-    for (uint64_t i = 0; i < 3; ++i) {
-        const uint64_t bits = mixed(key + i);
+    constexpr std::uint64_t mean = 12 * 65535 / 2;
+    std::uint64_t sum = 0;
+    for (std::uint64_t i = 0; i < 3; ++i) {
+        const std::uint64_t bits = mixed(key + i);
         sum += (bits & 0xFFFF) + (bits >> 16 & 0xFFFF) + (bits >> 32 & 0xFFFF) + (bits >> 48);
     }
     return (static_cast<double>(sum) - static_cast<double>(mean)) * 0x1p-16;

@@ -8,14 +8,14 @@
 namespace simulator {
 
 // Spreads a number over all 64 bits. Different numbers give different results.
-uint64_t mixed(uint64_t number);
+std::uint64_t mixed(std::uint64_t number);
 // A number for a text, for use with mixed().
-uint64_t keyOf(std::string_view text);
+std::uint64_t keyOf(std::string_view text);
 
 // Random numbers that belong to a key: evenly spread over 0 (inclusive) to 1 (exclusive)...
-double uniform(uint64_t key);
+double uniform(std::uint64_t key);
 // ...and normally distributed, with standard deviation 1 and within -6 and 6.
-double gaussian(uint64_t key);
+double gaussian(std::uint64_t key);
 
 // exp(-x) for x from 0 to infinity.
 double decay(double x);

@@ -13,7 +13,7 @@ struct Resource;
 
 // The maximum number of samples of a waveform, whatever a property asks for: 8 MiB of numbers, of
 // which a small controller must hold some copies.
-constexpr uint32_t mostSamples = 1u << 20;
+constexpr std::uint32_t mostSamples = 1u << 20;
 
 // The number is that of another property instead of the stored value.
 struct Follows {
@@ -30,7 +30,7 @@ struct Follows {
     // With a time constant: the target, and the number when it became the target.
     double target = 0.0;
     double start = 0.0;
-    int64_t changedAt = 0;
+    std::int64_t changedAt = 0;
 };
 
 // Wanders smoothly, at most `amplitude` away. Every `period` seconds it takes a new direction.
@@ -52,9 +52,9 @@ struct Quantity {
 
 // A record of samples, the first of them at the beginning of a period.
 struct Waveform {
-    enum class Shape { dc, noise, sawtooth, sine, square, triangle };
+    enum class Shape { Dc, Noise, Sawtooth, Sine, Square, Triangle };
 
-    Shape shape = Shape::dc;
+    Shape shape = Shape::Dc;
     // In Hz.
     double frequency = 0.0;
     double amplitude = 0.0;
@@ -67,9 +67,9 @@ struct Waveform {
 // How one property moves. Counts exclude everything else, a waveform everything but noise.
 struct Motion {
     // Determines the random numbers, together with the seed.
-    uint64_t key = 0;
+    std::uint64_t key = 0;
     // When the property was powered on or reset.
-    int64_t since = 0;
+    std::int64_t since = 0;
     std::optional<Follows> follows;
     std::optional<Drift> drift;
     // A standard deviation. There is a new random number each millisecond.
@@ -80,21 +80,22 @@ struct Motion {
 
 // Random numbers of one motion at one time.
 struct RandomStream {
-    uint64_t stream;
+    std::uint64_t stream;
     // Since the restart.
-    int64_t elapsed;
+    std::int64_t elapsed;
 };
 
 // The parts of a value, from what belongs to one motion alone.
 double driftAt(const Drift& drift, const RandomStream& random);
 // `index` is that of a sample in a record.
-double noiseAt(double deviation, const RandomStream& random, uint64_t index);
+double noiseAt(double deviation, const RandomStream& random, std::uint64_t index);
 // Modulo 2^64.
-uint64_t countAt(const Counts& counts, int64_t elapsed);
+std::uint64_t countAt(const Counts& counts, std::int64_t elapsed);
 // Before noise is added. A rate that is not above 0 leaves all samples at the first one.
-double sampleAt(const Waveform& waveform, double rate, const RandomStream& random, uint64_t index);
+double sampleAt(const Waveform& waveform, double rate, const RandomStream& random,
+                std::uint64_t index);
 // The number on its way to the target, for a time constant above 0.
-double laggedAt(const Follows& follows, int64_t now);
+double laggedAt(const Follows& follows, std::int64_t now);
 
 // The first element as a number. The value is of a type of numbers.
 double firstNumber(const Elements& value);

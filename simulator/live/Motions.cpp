@@ -13,11 +13,11 @@ namespace simulator {
 namespace {
 
 bool holds(const Property* condition) {
-    return condition == nullptr || std::get<List<uint8_t>>(condition->value).front() != 0;
+    return condition == nullptr || std::get<List<std::uint8_t>>(condition->value).front() != 0;
 }
 
 bool isThere(const Resource* owner) {
-    return owner == nullptr || owner->device->absence != Absence::removed;
+    return owner == nullptr || owner->device->absence != Absence::Removed;
 }
 
 double targetOf(const Follows& follows, double source) {
@@ -64,12 +64,12 @@ Elements limitedValue(const PropertyDefinition& definition, Fill fill) {
     return value;
 }
 
-Elements countedValue(const Property& property, uint64_t count) {
+Elements countedValue(const Property& property, std::uint64_t count) {
     return limitedValue(*property.definition, [&](auto& list) {
         using Number = typename std::decay_t<decltype(list)>::value_type;
         if constexpr (std::is_integral_v<Number>) {
             const Number first = std::get<std::decay_t<decltype(list)>>(property.value).front();
-            list.push_back(static_cast<Number>(static_cast<uint64_t>(first) + count));
+            list.push_back(static_cast<Number>(static_cast<std::uint64_t>(first) + count));
         }
     });
 }
@@ -93,11 +93,11 @@ const Motion* Motions::find(const Property& property) const {
     return found == motions.end() ? nullptr : &found->second;
 }
 
-RandomStream Motions::randomOf(const Motion& motion, int64_t now) const {
+RandomStream Motions::randomOf(const Motion& motion, std::int64_t now) const {
     return {mixed(seed) ^ motion.key, now - motion.since};
 }
 
-double Motions::numberAt(const Property& property, const Motion& motion, int64_t now) const {
+double Motions::numberAt(const Property& property, const Motion& motion, std::int64_t now) const {
     double number = 0.0;
     if (!motion.follows) {
         number = firstNumber(property.value);
@@ -113,22 +113,22 @@ double Motions::numberAt(const Property& property, const Motion& motion, int64_t
     return finite(number + noiseAt(motion.noise, random, 0));
 }
 
-Elements Motions::recordAt(const Property& property, const Motion& motion, int64_t now) const {
+Elements Motions::recordAt(const Property& property, const Motion& motion, std::int64_t now) const {
     const RandomStream random = randomOf(motion, now);
     const double rate = numberOf(motion.waveform->sampleRate);
-    const auto count = static_cast<uint32_t>(
+    const auto count = static_cast<std::uint32_t>(
         std::clamp(numberOf(motion.waveform->samples), 0.0, static_cast<double>(mostSamples)));
     return limitedValue(*property.definition, [&](auto& list) {
         using Number = typename std::decay_t<decltype(list)>::value_type;
         list.reserve(count);
-        for (uint32_t i = 0; i < count; ++i) {
+        for (std::uint32_t i = 0; i < count; ++i) {
             const double sample = sampleAt(*motion.waveform, rate, random, i);
             list.push_back(nearest<Number>(finite(sample + noiseAt(motion.noise, random, i))));
         }
     });
 }
 
-Elements Motions::valueAt(const Property& property, int64_t now) const {
+Elements Motions::valueAt(const Property& property, std::int64_t now) const {
     const Motion* motion = find(property);
     if (motion == nullptr) {
         return property.value;
@@ -146,7 +146,7 @@ Elements Motions::valueAt(const Property& property, int64_t now) const {
     });
 }
 
-void Motions::noteChange(const Resource& resource, int64_t now) noexcept {
+void Motions::noteChange(const Resource& resource, std::int64_t now) noexcept {
     const auto found = followers.find(&resource);
     if (found == followers.end()) {
         return;
@@ -162,7 +162,7 @@ void Motions::noteChange(const Resource& resource, int64_t now) noexcept {
     }
 }
 
-void Motions::restart(const Resource& resource, int64_t now) noexcept {
+void Motions::restart(const Resource& resource, std::int64_t now) noexcept {
     const auto found = owned.find(&resource);
     if (found != owned.end()) {
         for (Motion* motion : found->second) {

@@ -23,22 +23,22 @@ class Motions {
     const Motion* find(const Property& property) const;
 
     // The present value: the stored one unless the property moves.
-    Elements valueAt(const Property& property, int64_t now) const;
+    Elements valueAt(const Property& property, std::int64_t now) const;
 
     // To be called after stored values of a resource have changed.
-    void noteChange(const Resource& resource, int64_t now) noexcept;
+    void noteChange(const Resource& resource, std::int64_t now) noexcept;
     // To be called after a resource was reset: its motions begin again.
-    void restart(const Resource& resource, int64_t now) noexcept;
+    void restart(const Resource& resource, std::int64_t now) noexcept;
     // Puts everything that follows a value at its target, as if it had long been there.
     void settle() noexcept;
 
     // The seed of all random numbers.
-    uint64_t seed = 1;
+    std::uint64_t seed = 1;
 
   private:
-    RandomStream randomOf(const Motion& motion, int64_t now) const;
-    double numberAt(const Property& property, const Motion& motion, int64_t now) const;
-    Elements recordAt(const Property& property, const Motion& motion, int64_t now) const;
+    RandomStream randomOf(const Motion& motion, std::int64_t now) const;
+    double numberAt(const Property& property, const Motion& motion, std::int64_t now) const;
+    Elements recordAt(const Property& property, const Motion& motion, std::int64_t now) const;
 
     std::unordered_map<const Property*, Motion> motions;
     std::unordered_map<const Resource*, std::vector<Motion*>> owned;

@@ -5,11 +5,11 @@
 namespace simulator {
 
 std::string Resource::fullName() const {
-    return kind == Kind::device ? name : device->name + "/" + name;
+    return kind == Kind::Device ? name : device->name + "/" + name;
 }
 
 std::string Resource::describedName() const {
-    return kind == Kind::device ? device->firstName : device->firstName + "/" + name;
+    return kind == Kind::Device ? device->firstName : device->firstName + "/" + name;
 }
 
 Command* Resource::command(std::string_view commandName) {
@@ -46,10 +46,10 @@ void Device::dropAllPending() noexcept {
 }
 
 void expectPresent(const Device& device, Absence absence) {
-    if (absence == Absence::removed) {
+    if (absence == Absence::Removed) {
         throw Refusal(code::deviceRemoved).usage(tag::device, device.name);
     }
-    if (absence == Absence::connectionLost) {
+    if (absence == Absence::ConnectionLost) {
         throw Refusal(code::connectionLost).usage(tag::device, device.name);
     }
 }
@@ -62,7 +62,7 @@ Device& Chassis::addDevice(const std::string& name) {
 }
 
 Resource& Chassis::addPhysChan(Device& device, const std::string& name) {
-    device.physChans.push_back(std::make_unique<Resource>(Kind::physChan, name, device));
+    device.physChans.push_back(std::make_unique<Resource>(Kind::PhysChan, name, device));
     Resource& added = *device.physChans.back();
     device.parts.emplace(HashedName(added.foldedName), &added);
     return added;
@@ -109,7 +109,7 @@ Resource* Chassis::findPart(const Device& device, std::string_view name) const {
 }
 
 Resource* Chassis::find(std::string_view fullName) const {
-    const size_t slash = fullName.find('/');
+    const std::size_t slash = fullName.find('/');
     Device* device = findDevice(fullName.substr(0, slash));
     if (device == nullptr || slash == std::string_view::npos) {
         return device;
@@ -118,7 +118,7 @@ Resource* Chassis::find(std::string_view fullName) const {
 }
 
 Resource* Chassis::findDescribed(std::string_view fullName) const {
-    const size_t slash = fullName.find('/');
+    const std::size_t slash = fullName.find('/');
     const std::string folded = foldName(fullName.substr(0, slash));
     for (const auto& device : all) {
         if (foldName(device->firstName) == folded) {
@@ -139,7 +139,7 @@ Device& Chassis::device(std::string_view name) const {
 
 Resource& Chassis::physChan(std::string_view fullName) const {
     Resource* found = find(fullName);
-    if (found == nullptr || found->kind != Kind::physChan) {
+    if (found == nullptr || found->kind != Kind::PhysChan) {
         throw Refusal(code::unknownPhysChan).usage(tag::requestedValue, fullName);
     }
     return *found;
@@ -147,7 +147,7 @@ Resource& Chassis::physChan(std::string_view fullName) const {
 
 NvmemArea& Chassis::nvmemArea(std::string_view fullName) const {
     Resource* found = find(fullName);
-    if (found == nullptr || found->kind != Kind::nvmemArea) {
+    if (found == nullptr || found->kind != Kind::NvmemArea) {
         throw Refusal(code::unknownNvmemArea).usage(tag::requestedValue, fullName);
     }
     return static_cast<NvmemArea&>(*found);

@@ -17,12 +17,12 @@
 
 namespace simulator {
 
-enum class Kind { device, physChan, nvmemArea };
+enum class Kind { Device, PhysChan, NvmemArea };
 
 struct Device;
 
 // Why a device does not answer at the moment.
-enum class Absence { none, connectionLost, removed };
+enum class Absence { None, ConnectionLost, Removed };
 
 // Something that clients name. Resources exist as long as the chassis; their addresses identify
 // them, while their names may change.
@@ -54,21 +54,21 @@ struct Resource {
 };
 
 struct NvmemArea : Resource {
-    NvmemArea(const std::string& name, Device& device) : Resource(Kind::nvmemArea, name, device) {}
+    NvmemArea(const std::string& name, Device& device) : Resource(Kind::NvmemArea, name, device) {}
 
     NvmemMemory memory;
 };
 
 struct Device : Resource {
-    Device(const std::string& name, size_t place)
-        : Resource(Kind::device, name, *this), firstName(name), place(place) {}
+    Device(const std::string& name, std::size_t place)
+        : Resource(Kind::Device, name, *this), firstName(name), place(place) {}
 
     // The name in the description.
     const std::string firstName;
     // The index in the list of all devices.
-    const size_t place;
-    uint32_t slot = 0;
-    int32_t category = 0;
+    const std::size_t place;
+    std::uint32_t slot = 0;
+    std::int32_t category = 0;
     std::vector<std::unique_ptr<Resource>> physChans;
     std::vector<std::unique_ptr<NvmemArea>> nvmemAreas;
     // The modules in the slots of a chassis device; owned by the Chassis.
@@ -80,7 +80,7 @@ struct Device : Resource {
     double connectSeconds = 0.0;
     bool reachable = true;
     // While this is not none, calls that name the device or its parts are refused.
-    Absence absence = Absence::none;
+    Absence absence = Absence::None;
 
     // Calls visit(Resource&) for the device itself and all its parts.
     template <typename Visit>
@@ -134,9 +134,9 @@ class Chassis {
     const std::vector<std::unique_ptr<Device>>& devices() const { return all; }
 
     // The handle of the first session that is opened.
-    uint32_t firstSessionHandle = 1;
+    std::uint32_t firstSessionHandle = 1;
     // How often a name has changed.
-    uint64_t changes = 0;
+    std::uint64_t changes = 0;
     // Those that the description gives.
     Enumerations enumerations;
     Catalogue catalogue;

@@ -54,10 +54,10 @@ void PropertyChanges::add(const Command& command, Resource& resource) {
     }
     for (const CommandEffect& effect : command.effects) {
         Resource& owner =
-            effect.owner == CommandEffect::Owner::device ? *resource.device : resource;
+            effect.owner == CommandEffect::Owner::Device ? *resource.device : resource;
         Property& property = *owner.properties.find(effect.property);
         Change& change = of(owner, property);
-        if (effect.action == CommandEffect::Action::set) {
+        if (effect.action == CommandEffect::Action::Set) {
             change.value = effect.value;
             continue;
         }

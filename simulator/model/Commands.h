@@ -15,9 +15,9 @@ struct Resource;
 
 // What a command does to one property when it completes.
 struct CommandEffect {
-    enum class Action { set, add };
+    enum class Action { Set, Add };
     // Whose property it is.
-    enum class Owner { resource, device };
+    enum class Owner { Resource, Device };
 
     Action action;
     Owner owner;
@@ -39,7 +39,7 @@ struct CommandFailure {
     std::optional<State> when{};
     double probability = 1.0;
     // Only executions whose number is a multiple of this, which is at least 1.
-    uint32_t every = 1;
+    std::uint32_t every = 1;
 };
 
 struct Command {
@@ -53,9 +53,9 @@ struct Command {
     std::vector<CommandEffect> effects;
     std::optional<CommandFailure> fails;
     // A number that differs for each command of each resource, for the random decision to fail.
-    uint64_t number = 0;
+    std::uint64_t number = 0;
     // How often it was completed. A reset does not change it.
-    uint64_t executions = 0;
+    std::uint64_t executions = 0;
 };
 
 // What commands are going to do to properties. Everything that may run out of memory is done

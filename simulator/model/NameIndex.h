@@ -15,11 +15,11 @@ struct HashedName {
     bool operator==(const HashedName& other) const { return text == other.text; }
 
     std::string_view text;
-    size_t hash;
+    std::size_t hash;
 };
 
 struct HashOfName {
-    size_t operator()(const HashedName& name) const noexcept { return name.hash; }
+    std::size_t operator()(const HashedName& name) const noexcept { return name.hash; }
 };
 
 // Items by name, in no particular order. The names belong to the items.

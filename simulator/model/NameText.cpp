@@ -8,18 +8,18 @@
 #include <memory>
 #include <new>
 
+#include "common/digits.h"
+#include "common/utf8.h"
 #include "status/Refusal.h"
 
 namespace simulator {
 
+using common::isDigit;
+
 namespace {
 
-constexpr uint32_t longestRange = 1024;
-constexpr size_t longestName = 64;
-
-bool isDigit(char c) {
-    return c >= '0' && c <= '9';
-}
+constexpr std::uint32_t longestRange = 1024;
+constexpr std::size_t longestName = 64;
 
 bool isAscii(std::string_view text) {
     return std::all_of(text.begin(), text.end(), [](unsigned char c) { return c < 0x80; });
@@ -29,8 +29,8 @@ char foldAscii(char c) {
     return c >= 'A' && c <= 'Z' ? static_cast<char>(c - 'A' + 'a') : c;
 }
 
-uint32_t rangeNumber(std::string_view digits, std::string_view name) {
-    uint32_t number = 0;
+std::uint32_t rangeNumber(std::string_view digits, std::string_view name) {
+    std::uint32_t number = 0;
     const auto [end, error] = std::from_chars(digits.data(), digits.data() + digits.size(), number);
     if (error != std::errc() || end != digits.data() + digits.size()) {
         throw Refusal(code::invalidNameRange).usage(tag::requestedValue, name);
@@ -41,22 +41,22 @@ uint32_t rangeNumber(std::string_view digits, std::string_view name) {
 using Visit = std::function<void(const std::string&)>;
 
 void visitNames(std::string_view part, const Visit& visit) {
-    const size_t colon = part.find(':');
+    const std::size_t colon = part.find(':');
     if (colon == std::string_view::npos || part.find('/') == std::string_view::npos) {
         visit(std::string(part));
         return;
     }
-    size_t digits = colon;
+    std::size_t digits = colon;
     while (digits > 0 && isDigit(part[digits - 1])) {
         --digits;
     }
-    const uint32_t first = rangeNumber(part.substr(digits, colon - digits), part);
-    const uint32_t last = rangeNumber(part.substr(colon + 1), part);
+    const std::uint32_t first = rangeNumber(part.substr(digits, colon - digits), part);
+    const std::uint32_t last = rangeNumber(part.substr(colon + 1), part);
     if (first > last || last - first >= longestRange) {
         throw Refusal(code::invalidNameRange).usage(tag::requestedValue, part);
     }
     const std::string prefix(part.substr(0, digits));
-    for (uint32_t offset = 0; offset <= last - first; ++offset) {
+    for (std::uint32_t offset = 0; offset <= last - first; ++offset) {
         visit(prefix + std::to_string(first + offset));
     }
 }
@@ -64,19 +64,16 @@ void visitNames(std::string_view part, const Visit& visit) {
 // The number at the end of a name may be written as part of a range, where leading zeros are lost.
 bool endsInZeroPaddedNumber(std::string_view name) {
     const auto lastOther = std::find_if_not(name.rbegin(), name.rend(), isDigit);
-    const size_t digits = static_cast<size_t>(lastOther - name.rbegin());
+    const std::size_t digits = static_cast<std::size_t>(lastOther - name.rbegin());
     return digits > 1 && name[name.size() - digits] == '0';
 }
 
 bool isValidUtf8(std::string_view text) {
     while (!text.empty()) {
-        utf8proc_int32_t point = 0;
-        const auto length = utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(text.data()),
-                                             static_cast<utf8proc_ssize_t>(text.size()), &point);
-        if (length < 1) {
+        const common::Utf8Character character = common::takeCharacter(text);
+        if (!character.isValid()) {
             return false;
         }
-        text.remove_prefix(static_cast<size_t>(length));
     }
     return true;
 }
@@ -100,7 +97,7 @@ std::string foldName(std::string_view name) {
     if (length < 0) {
         return std::string(name);
     }
-    return std::string(reinterpret_cast<const char*>(folded), static_cast<size_t>(length));
+    return std::string(reinterpret_cast<const char*>(folded), static_cast<std::size_t>(length));
 }
 
 FoldedName::FoldedName(std::string_view name) {
@@ -114,8 +111,8 @@ FoldedName::FoldedName(std::string_view name) {
 }
 
 void forEachName(std::string_view joined, const Visit& visit) {
-    constexpr size_t none = std::string_view::npos;
-    size_t comma = joined.empty() ? none : 0;
+    constexpr std::size_t none = std::string_view::npos;
+    std::size_t comma = joined.empty() ? none : 0;
     while (comma != none) {
         comma = joined.find(',');
         visitNames(joined.substr(0, comma), visit);

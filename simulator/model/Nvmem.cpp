@@ -6,8 +6,8 @@
 
 namespace simulator {
 
-void NvmemMemory::expectInside(uint32_t address, uint32_t count) const {
-    if (uint64_t{address} + count > lasting.size()) {
+void NvmemMemory::expectInside(std::uint32_t address, std::uint32_t count) const {
+    if (std::uint64_t{address} + count > lasting.size()) {
         throw Refusal(code::nvmemOutOfRange)
             .usage(tag::nvmemAddress, address)
             .usage(tag::requestedBytes, count)
@@ -15,13 +15,13 @@ void NvmemMemory::expectInside(uint32_t address, uint32_t count) const {
     }
 }
 
-void NvmemMemory::read(uint32_t address, uint8_t* buffer, uint32_t count) const {
+void NvmemMemory::read(std::uint32_t address, std::uint8_t* buffer, std::uint32_t count) const {
     expectInside(address, count);
     std::copy_n(current().begin() + address, count, buffer);
 }
 
-void NvmemMemory::write(nQITRMCAPI100_Session session, uint32_t address, const uint8_t* bytes,
-                        uint32_t count) {
+void NvmemMemory::write(nQITRMCAPI100_Session session, std::uint32_t address,
+                        const std::uint8_t* bytes, std::uint32_t count) {
     expectInside(address, count);
     if (!pending) {
         pending = Pending{lasting, session};

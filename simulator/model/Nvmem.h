@@ -23,23 +23,25 @@ class NvmemMemory {
     };
 
     NvmemMemory() = default;
-    NvmemMemory(std::vector<uint8_t> content, WriteRules rules)
+    NvmemMemory(std::vector<std::uint8_t> content, WriteRules rules)
         : lasting(std::move(content)), rules(std::move(rules)) {}
 
     // Takes lasting content of the same size.
-    void restore(const std::vector<uint8_t>& content) { lasting = content; }
+    void restore(const std::vector<std::uint8_t>& content) { lasting = content; }
 
-    uint32_t size() const { return static_cast<uint32_t>(lasting.size()); }
+    std::uint32_t size() const { return static_cast<std::uint32_t>(lasting.size()); }
     bool hasPending() const { return pending.has_value(); }
     const WriteRules& writeRules() const { return rules; }
 
     // What is read: the lasting content with what was written since.
-    const std::vector<uint8_t>& current() const { return pending ? pending->content : lasting; }
+    const std::vector<std::uint8_t>& current() const {
+        return pending ? pending->content : lasting;
+    }
 
     // Refuse with nvmemOutOfRange when the bytes do not lie in the area.
-    void read(uint32_t address, uint8_t* buffer, uint32_t count) const;
-    void write(nQITRMCAPI100_Session session, uint32_t address, const uint8_t* bytes,
-               uint32_t count);
+    void read(std::uint32_t address, std::uint8_t* buffer, std::uint32_t count) const;
+    void write(nQITRMCAPI100_Session session, std::uint32_t address, const std::uint8_t* bytes,
+               std::uint32_t count);
 
     // Refuses with readOnlyNvmemArea, wrongSerialNumber and wrongPassword.
     void unlock(std::string_view given, std::string_view deviceSerialNumber,
@@ -52,14 +54,14 @@ class NvmemMemory {
 
   private:
     struct Pending {
-        std::vector<uint8_t> content;
+        std::vector<std::uint8_t> content;
         // The session that wrote last.
         nQITRMCAPI100_Session session;
     };
 
-    void expectInside(uint32_t address, uint32_t count) const;
+    void expectInside(std::uint32_t address, std::uint32_t count) const;
 
-    std::vector<uint8_t> lasting;
+    std::vector<std::uint8_t> lasting;
     WriteRules rules;
     std::optional<Pending> pending;
 };

@@ -6,13 +6,13 @@
 
 namespace simulator {
 
-void Enumeration::add(const std::string& item, int32_t number) {
+void Enumeration::add(const std::string& item, std::int32_t number) {
     items.emplace_back(item, number);
     byName.emplace(item, number);
     numbers.insert(number);
 }
 
-std::optional<int32_t> Enumeration::numberOf(std::string_view item) const {
+std::optional<std::int32_t> Enumeration::numberOf(std::string_view item) const {
     const auto found = byName.find(item);
     return found == byName.end() ? std::nullopt : std::optional(found->second);
 }
@@ -34,16 +34,16 @@ void PropertyDefinition::limit(Elements& value) const {
         value);
 }
 
-std::optional<size_t> PropertyDefinition::firstOutOfRange(const Elements& value) const {
+std::optional<std::size_t> PropertyDefinition::firstOutOfRange(const Elements& value) const {
     if (!least && !most) {
         return std::nullopt;
     }
     return std::visit(
-        [&](const auto& list) -> std::optional<size_t> {
+        [&](const auto& list) -> std::optional<std::size_t> {
             using Items = std::decay_t<decltype(list)>;
             const auto* low = least ? &std::get<Items>(*least).front() : nullptr;
             const auto* high = most ? &std::get<Items>(*most).front() : nullptr;
-            for (size_t i = 0; i < list.size(); ++i) {
+            for (std::size_t i = 0; i < list.size(); ++i) {
                 // Written so that what is not a number is outside too.
                 const bool inside =
                     (low == nullptr || list[i] >= *low) && (high == nullptr || list[i] <= *high);
@@ -56,12 +56,12 @@ std::optional<size_t> PropertyDefinition::firstOutOfRange(const Elements& value)
         value);
 }
 
-std::optional<size_t> PropertyDefinition::firstWithoutItem(const Elements& value) const {
+std::optional<std::size_t> PropertyDefinition::firstWithoutItem(const Elements& value) const {
     if (enumeration == nullptr) {
         return std::nullopt;
     }
-    const auto& numbers = std::get<List<int32_t>>(value);
-    for (size_t i = 0; i < numbers.size(); ++i) {
+    const auto& numbers = std::get<List<std::int32_t>>(value);
+    for (std::size_t i = 0; i < numbers.size(); ++i) {
         if (!enumeration->has(numbers[i])) {
             return i;
         }
@@ -126,7 +126,7 @@ void PropertyStore::dropAllPending() noexcept {
 }
 
 void Catalogue::add(Category category, const DefinitionPointer& definition) {
-    Part& part = parts[static_cast<size_t>(category)];
+    Part& part = parts[static_cast<std::size_t>(category)];
     part.definitions.push_back(definition);
     std::get<List<std::string>>(part.names).push_back(definition->name);
     part.byName.emplace(HashedName(definition->name), definition);

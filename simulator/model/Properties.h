@@ -17,28 +17,28 @@
 namespace simulator {
 
 // What kinds of things have properties.
-enum class Category { system, session, device, physChan, nvmemArea };
-inline constexpr size_t categoryCount = 5;
+enum class Category { System, Session, Device, PhysChan, NvmemArea };
+inline constexpr std::size_t categoryCount = 5;
 
 // The numbers of the enumeration "PropertyAccess".
-enum class PropertyAccess : int32_t { readOnly = 1, writeOnly = 2, readWrite = 3 };
+enum class PropertyAccess : std::int32_t { ReadOnly = 1, WriteOnly = 2, ReadWrite = 3 };
 
 struct Enumeration {
     std::string name;
     // By which the details of a status refer to the enumeration.
-    uint32_t id = 0;
+    std::uint32_t id = 0;
     // In the order of the description.
-    std::vector<std::pair<std::string, int32_t>> items;
+    std::vector<std::pair<std::string, std::int32_t>> items;
 
     // Adds an item. The name must be free.
-    void add(const std::string& item, int32_t number);
-    bool has(int32_t value) const { return numbers.count(value) != 0; }
+    void add(const std::string& item, std::int32_t number);
+    bool has(std::int32_t value) const { return numbers.count(value) != 0; }
     // Returns nothing when there is no such item.
-    std::optional<int32_t> numberOf(std::string_view item) const;
+    std::optional<std::int32_t> numberOf(std::string_view item) const;
 
   private:
-    std::map<std::string, int32_t, std::less<>> byName;
-    std::set<int32_t> numbers;
+    std::map<std::string, std::int32_t, std::less<>> byName;
+    std::set<std::int32_t> numbers;
 };
 
 // By their names.
@@ -47,8 +47,8 @@ using Enumerations = std::map<std::string, std::shared_ptr<const Enumeration>>;
 // Everything about a property but its value.
 struct PropertyDefinition {
     std::string name;
-    DataType type = DataType::text;
-    PropertyAccess access = PropertyAccess::readOnly;
+    DataType type = DataType::Text;
+    PropertyAccess access = PropertyAccess::ReadOnly;
     // Kept by the simulator itself, not stored as a value.
     bool computed = false;
     // Written values take effect at a commit.
@@ -68,8 +68,8 @@ struct PropertyDefinition {
     void limit(Elements& value) const;
     // The index of the first element outside of the limits, or that is no item of the enumeration.
     // The elements are of the property's type.
-    std::optional<size_t> firstOutOfRange(const Elements& value) const;
-    std::optional<size_t> firstWithoutItem(const Elements& value) const;
+    std::optional<std::size_t> firstOutOfRange(const Elements& value) const;
+    std::optional<std::size_t> firstWithoutItem(const Elements& value) const;
 };
 
 using DefinitionPointer = std::shared_ptr<const PropertyDefinition>;
@@ -155,7 +155,7 @@ class Catalogue {
         NameIndex<DefinitionPointer> byName;
     };
 
-    const Part& part(Category category) const { return parts[static_cast<size_t>(category)]; }
+    const Part& part(Category category) const { return parts[static_cast<std::size_t>(category)]; }
 
     std::array<Part, categoryCount> parts;
 };

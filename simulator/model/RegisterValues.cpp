@@ -36,61 +36,63 @@ Number numberOf(Bits bits) {
     return number;
 }
 
-uint64_t bitsOfElement(double number, uint32_t size) {
-    return size == sizeof(float) ? bitsOf<uint32_t>(narrowed(number)) : bitsOf<uint64_t>(number);
+std::uint64_t bitsOfElement(double number, std::uint32_t size) {
+    return size == sizeof(float) ? bitsOf<std::uint32_t>(narrowed(number))
+                                 : bitsOf<std::uint64_t>(number);
 }
 
 template <typename Integer>
-uint64_t bitsOfElement(Integer number, uint32_t) {
-    return static_cast<uint64_t>(number);
+std::uint64_t bitsOfElement(Integer number, std::uint32_t) {
+    return static_cast<std::uint64_t>(number);
 }
 
-uint64_t bitsOfElement(const std::string&, uint32_t) {
+std::uint64_t bitsOfElement(const std::string&, std::uint32_t) {
     return 0;
 }
 
-uint64_t extended(uint64_t bits, uint32_t size) {
-    const uint64_t sign = uint64_t{1} << (8 * size - 1);
+std::uint64_t extended(std::uint64_t bits, std::uint32_t size) {
+    const std::uint64_t sign = std::uint64_t{1} << (8 * size - 1);
     return (bits ^ sign) - sign;
 }
 
 }  // namespace
 
-std::vector<uint32_t> registerSizes(DataType type) {
+std::vector<std::uint32_t> registerSizes(DataType type) {
     switch (type) {
-        case DataType::boolean:
-        case DataType::int64:
-        case DataType::uint64:
+        case DataType::Boolean:
+        case DataType::Int64:
+        case DataType::Uint64:
             return {1, 2, 4, 8};
-        case DataType::int32:
-        case DataType::uint32:
+        case DataType::Int32:
+        case DataType::Uint32:
             return {1, 2, 4};
-        case DataType::real:
+        case DataType::Real:
             return {4, 8};
         default:
             return {};
     }
 }
 
-uint64_t toRegister(const Elements& value, uint32_t size) {
+std::uint64_t toRegister(const Elements& value, std::uint32_t size) {
     return std::visit([&](const auto& list) { return bitsOfElement(list.front(), size); }, value);
 }
 
-Elements fromRegister(DataType type, uint64_t bits, uint32_t size) {
+Elements fromRegister(DataType type, std::uint64_t bits, std::uint32_t size) {
     switch (type) {
-        case DataType::boolean:
-            return List<uint8_t>{bits != 0 ? uint8_t{1} : uint8_t{0}};
-        case DataType::int32:
-            return List<int32_t>{static_cast<int32_t>(extended(bits, size))};
-        case DataType::int64:
-            return List<int64_t>{static_cast<int64_t>(extended(bits, size))};
-        case DataType::uint32:
-            return List<uint32_t>{static_cast<uint32_t>(bits)};
-        case DataType::uint64:
-            return List<uint64_t>{bits};
+        case DataType::Boolean:
+            return List<std::uint8_t>{bits != 0 ? std::uint8_t{1} : std::uint8_t{0}};
+        case DataType::Int32:
+            return List<std::int32_t>{static_cast<std::int32_t>(extended(bits, size))};
+        case DataType::Int64:
+            return List<std::int64_t>{static_cast<std::int64_t>(extended(bits, size))};
+        case DataType::Uint32:
+            return List<std::uint32_t>{static_cast<std::uint32_t>(bits)};
+        case DataType::Uint64:
+            return List<std::uint64_t>{bits};
         default:
-            return List<double>{size == sizeof(float) ? numberOf<float>(static_cast<uint32_t>(bits))
-                                                      : numberOf<double>(bits)};
+            return List<double>{size == sizeof(float)
+                                    ? numberOf<float>(static_cast<std::uint32_t>(bits))
+                                    : numberOf<double>(bits)};
     }
 }
 

@@ -8,19 +8,19 @@ namespace simulator {
 
 namespace {
 
-constexpr uint64_t addressCount = uint64_t{1} << 32;
+constexpr std::uint64_t addressCount = std::uint64_t{1} << 32;
 
-uint64_t endOf(const RegisterBlock& block) {
-    return uint64_t{block.address} + block.bytes.size();
+std::uint64_t endOf(const RegisterBlock& block) {
+    return std::uint64_t{block.address} + block.bytes.size();
 }
 
 }  // namespace
 
-uint64_t RegisterBlock::read(uint32_t from, uint32_t count) {
-    const size_t offset = from - address;
-    uint64_t value = 0;
-    for (uint32_t i = count; i > 0; --i) {
-        uint8_t& byte = bytes[offset + i - 1];
+std::uint64_t RegisterBlock::read(std::uint32_t from, std::uint32_t count) {
+    const std::size_t offset = from - address;
+    std::uint64_t value = 0;
+    for (std::uint32_t i = count; i > 0; --i) {
+        std::uint8_t& byte = bytes[offset + i - 1];
         value = value << 8 | byte;
         if (clearsOnRead) {
             byte = 0;
@@ -29,27 +29,27 @@ uint64_t RegisterBlock::read(uint32_t from, uint32_t count) {
     return value;
 }
 
-void RegisterBlock::write(uint32_t to, uint32_t count, uint64_t value) {
-    const size_t offset = to - address;
-    for (uint32_t i = 0; i < count; ++i) {
-        uint8_t& byte = bytes[offset + i];
-        const auto written = static_cast<uint8_t>(value >> (8 * i));
-        byte = onesClear ? static_cast<uint8_t>(byte & ~written) : written;
+void RegisterBlock::write(std::uint32_t to, std::uint32_t count, std::uint64_t value) {
+    const std::size_t offset = to - address;
+    for (std::uint32_t i = 0; i < count; ++i) {
+        std::uint8_t& byte = bytes[offset + i];
+        const auto written = static_cast<std::uint8_t>(value >> (8 * i));
+        byte = onesClear ? static_cast<std::uint8_t>(byte & ~written) : written;
     }
 }
 
-size_t Registers::firstAfter(uint32_t address) const {
+std::size_t Registers::firstAfter(std::uint32_t address) const {
     const auto after = std::upper_bound(
         blocks.begin(), blocks.end(), address,
-        [](uint32_t left, const RegisterBlock& right) { return left < right.address; });
-    return static_cast<size_t>(after - blocks.begin());
+        [](std::uint32_t left, const RegisterBlock& right) { return left < right.address; });
+    return static_cast<std::size_t>(after - blocks.begin());
 }
 
 bool Registers::add(RegisterBlock block) {
     if (endOf(block) > addressCount) {
         return false;
     }
-    const size_t next = firstAfter(block.address);
+    const std::size_t next = firstAfter(block.address);
     if ((next > 0 && endOf(blocks[next - 1]) > block.address) ||
         (next < blocks.size() && endOf(block) > blocks[next].address)) {
         return false;
@@ -58,17 +58,17 @@ bool Registers::add(RegisterBlock block) {
     return true;
 }
 
-RegisterBlock& Registers::find(uint32_t address, uint32_t width) {
+RegisterBlock& Registers::find(std::uint32_t address, std::uint32_t width) {
     if (address % width != 0) {
         throw Refusal(code::misalignedRegister)
             .usage(tag::registerAddress, address)
             .usage(tag::registerWidth, width * 8);
     }
-    const size_t next = firstAfter(address);
+    const std::size_t next = firstAfter(address);
     if (next > 0) {
         RegisterBlock& block = blocks[next - 1];
         const bool fits = block.width == 0 || block.width == width;
-        if (fits && uint64_t{address} + width <= endOf(block)) {
+        if (fits && std::uint64_t{address} + width <= endOf(block)) {
             return block;
         }
     }
@@ -77,7 +77,7 @@ RegisterBlock& Registers::find(uint32_t address, uint32_t width) {
         .usage(tag::registerWidth, width * 8);
 }
 
-uint64_t Registers::read(RegisterBlock& block, uint32_t address, uint32_t width) {
+std::uint64_t Registers::read(RegisterBlock& block, std::uint32_t address, std::uint32_t width) {
     if (!block.clearsOnRead) {
         return block.read(address, width);
     }

@@ -17,14 +17,14 @@ struct RegisterBlock {
     // For people; may be empty.
     std::string name;
     std::string description;
-    uint32_t address = 0;
+    std::uint32_t address = 0;
     bool readable = true;
     bool writable = true;
     // The only width in bytes that is allowed, or 0 for any.
-    uint32_t width = 0;
+    std::uint32_t width = 0;
     // After power-on, and now. Of the same length, which is at least 1.
-    std::vector<uint8_t> initial;
-    std::vector<uint8_t> bytes;
+    std::vector<std::uint8_t> initial;
+    std::vector<std::uint8_t> bytes;
     // Bytes become 0 when they have been read.
     bool clearsOnRead = false;
     // A bit written as 1 becomes 0, and one written as 0 stays.
@@ -36,11 +36,11 @@ struct RegisterBlock {
     Resource* owner = nullptr;
     Property* property = nullptr;
 
-    uint32_t size() const { return static_cast<uint32_t>(bytes.size()); }
+    std::uint32_t size() const { return static_cast<std::uint32_t>(bytes.size()); }
     // Read or write `count` bytes (1, 2, 4 or 8) that lie in the block, with the side effects of
     // clearsOnRead and onesClear.
-    uint64_t read(uint32_t from, uint32_t count);
-    void write(uint32_t to, uint32_t count, uint64_t value);
+    std::uint64_t read(std::uint32_t from, std::uint32_t count);
+    void write(std::uint32_t to, std::uint32_t count, std::uint64_t value);
 };
 
 // The registers of one device. An access must be aligned to its width and lie in one block.
@@ -51,10 +51,10 @@ class Registers {
 
     // The block in which an access of width bytes (1, 2, 4 or 8) lies. Refuses with
     // misalignedRegister and unmappedRegister.
-    RegisterBlock& find(uint32_t address, uint32_t width);
+    RegisterBlock& find(std::uint32_t address, std::uint32_t width);
 
     // Reads from a block. Threads may do so at the same time, while nothing writes.
-    uint64_t read(RegisterBlock& block, uint32_t address, uint32_t width);
+    std::uint64_t read(RegisterBlock& block, std::uint32_t address, std::uint32_t width);
 
     void reset();
 
@@ -63,7 +63,7 @@ class Registers {
 
   private:
     // The index of the first block after an address.
-    size_t firstAfter(uint32_t address) const;
+    std::size_t firstAfter(std::uint32_t address) const;
 
     std::vector<RegisterBlock> blocks;
     // Held while a block is read whose bytes become 0.

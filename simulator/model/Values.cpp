@@ -7,15 +7,15 @@ namespace simulator {
 
 namespace {
 
-constexpr int32_t scalarTypes = 7;
+constexpr std::int32_t scalarTypes = 7;
 constexpr std::array<const char*, scalarTypes> scalarNames{"Bool",   "Double", "Int32", "Int64",
                                                            "String", "UInt32", "UInt64"};
 
-DataType fromNumber(int32_t number) {
+DataType fromNumber(std::int32_t number) {
     return static_cast<DataType>(number);
 }
-int32_t toNumber(DataType type) {
-    return static_cast<int32_t>(type);
+std::int32_t toNumber(DataType type) {
+    return static_cast<std::int32_t>(type);
 }
 
 std::string textOf(double number) {
@@ -44,12 +44,12 @@ DataType arrayType(DataType type) {
 }
 
 std::string typeName(DataType type) {
-    const auto index = static_cast<size_t>(toNumber(elementType(type)) - 1);
+    const auto index = static_cast<std::size_t>(toNumber(elementType(type)) - 1);
     return std::string(scalarNames[index]) + (isArray(type) ? "Array" : "");
 }
 
 std::optional<DataType> typeNamed(std::string_view name) {
-    for (int32_t number = 1; number <= 2 * scalarTypes; ++number) {
+    for (std::int32_t number = 1; number <= 2 * scalarTypes; ++number) {
         if (typeName(fromNumber(number)) == name) {
             return fromNumber(number);
         }
@@ -59,32 +59,32 @@ std::optional<DataType> typeNamed(std::string_view name) {
 
 Elements noElements(DataType type) {
     switch (elementType(type)) {
-        case DataType::boolean:
-            return List<uint8_t>();
-        case DataType::real:
+        case DataType::Boolean:
+            return List<std::uint8_t>();
+        case DataType::Real:
             return List<double>();
-        case DataType::int32:
-            return List<int32_t>();
-        case DataType::int64:
-            return List<int64_t>();
-        case DataType::uint32:
-            return List<uint32_t>();
-        case DataType::uint64:
-            return List<uint64_t>();
+        case DataType::Int32:
+            return List<std::int32_t>();
+        case DataType::Int64:
+            return List<std::int64_t>();
+        case DataType::Uint32:
+            return List<std::uint32_t>();
+        case DataType::Uint64:
+            return List<std::uint64_t>();
         default:
             return List<std::string>();
     }
 }
 
 DataType elementType(const Elements& elements) {
-    return fromNumber(static_cast<int32_t>(elements.index()) + 1);
+    return fromNumber(static_cast<std::int32_t>(elements.index()) + 1);
 }
 
-size_t elementCount(const Elements& elements) {
+std::size_t elementCount(const Elements& elements) {
     return std::visit([](const auto& list) { return list.size(); }, elements);
 }
 
-Elements elementAt(const Elements& elements, size_t index) {
+Elements elementAt(const Elements& elements, std::size_t index) {
     return std::visit(
         [&](const auto& list) -> Elements { return std::decay_t<decltype(list)>{list[index]}; },
         elements);

@@ -11,21 +11,21 @@
 namespace simulator {
 
 // The numbers of the enumeration "DataType".
-enum class DataType : int32_t {
-    boolean = 1,
-    real = 2,
-    int32 = 3,
-    int64 = 4,
-    text = 5,
-    uint32 = 6,
-    uint64 = 7,
-    booleanArray = 8,
-    realArray = 9,
-    int32Array = 10,
-    int64Array = 11,
-    textArray = 12,
-    uint32Array = 13,
-    uint64Array = 14
+enum class DataType : std::int32_t {
+    Boolean = 1,
+    Real = 2,
+    Int32 = 3,
+    Int64 = 4,
+    Text = 5,
+    Uint32 = 6,
+    Uint64 = 7,
+    BooleanArray = 8,
+    RealArray = 9,
+    Int32Array = 10,
+    Int64Array = 11,
+    TextArray = 12,
+    Uint32Array = 13,
+    Uint64Array = 14
 };
 
 bool isArray(DataType type);
@@ -46,15 +46,16 @@ struct List : std::vector<Item> {
 
 // A value of any type. The alternatives are in the order of the scalar types; a scalar is a list
 // of one. Booleans are 0 or 1.
-using Elements = std::variant<List<uint8_t>, List<double>, List<int32_t>, List<int64_t>,
-                              List<std::string>, List<uint32_t>, List<uint64_t>>;
+using Elements =
+    std::variant<List<std::uint8_t>, List<double>, List<std::int32_t>, List<std::int64_t>,
+                 List<std::string>, List<std::uint32_t>, List<std::uint64_t>>;
 
 // No elements, of the alternative that belongs to a scalar or array type.
 Elements noElements(DataType type);
 DataType elementType(const Elements& elements);
-size_t elementCount(const Elements& elements);
+std::size_t elementCount(const Elements& elements);
 // The element at an index as a value of its own.
-Elements elementAt(const Elements& elements, size_t index);
+Elements elementAt(const Elements& elements, std::size_t index);
 // Adds elements of the same alternative.
 void append(Elements& target, const Elements& more);
 

@@ -7,18 +7,18 @@ namespace simulator {
 
 namespace {
 
-constexpr int64_t callStep = 1000;
+constexpr std::int64_t callStep = 1000;
 // A double has this number, and the next one is out of range.
 constexpr double latest = 9223372036854774784.0;
 
 }  // namespace
 
-int64_t Clock::now() const {
+std::int64_t Clock::now() const {
     if (scale.byCalls) {
         return stepped;
     }
     const std::chrono::duration<double, std::micro> passed = Real::now() - start;
-    return static_cast<int64_t>(std::min(passed.count() * scale.factor, latest));
+    return static_cast<std::int64_t>(std::min(passed.count() * scale.factor, latest));
 }
 
 void Clock::noteCall() {

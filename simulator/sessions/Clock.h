@@ -16,11 +16,11 @@ class Clock {
 
     // Microseconds since the chassis was loaded. The time never goes back; it stays at
     // the largest number once that is reached, at the largest scale after 106 days.
-    int64_t now() const;
+    std::int64_t now() const;
     // A call of the driver begins: by calls, a millisecond has passed.
     void noteCall();
     // How many calls have begun.
-    uint64_t calls() const { return begun.load(std::memory_order_relaxed); }
+    std::uint64_t calls() const { return begun.load(std::memory_order_relaxed); }
 
     // Whether what takes time is over at once, with the clock moved on by skip().
     bool goesByCalls() const { return scale.byCalls; }
@@ -35,8 +35,8 @@ class Clock {
     TimeScale scale;
     Real::time_point start = Real::now();
     // By calls, the time itself in microseconds.
-    int64_t stepped = 0;
-    std::atomic<uint64_t> begun{0};
+    std::int64_t stepped = 0;
+    std::atomic<std::uint64_t> begun{0};
 };
 
 }  // namespace simulator

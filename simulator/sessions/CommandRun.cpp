@@ -14,14 +14,14 @@ bool isInState(const Resource& resource, const CommandFailure::State& state,
 
 // A random number from 0 to below 1, the same in every run for the same seed, command and number
 // of executions.
-double chance(uint64_t seed, uint64_t command, uint64_t executions) {
+double chance(std::uint64_t seed, std::uint64_t command, std::uint64_t executions) {
     return uniform(mixed(mixed(mixed(seed) + command) + executions));
 }
 
 // The status with which a command ends, or null.
 const Refusal* outcome(const Task& task, const Simulator& simulator) {
     const Command& command = *task.command;
-    const uint64_t number = command.executions + 1;
+    const std::uint64_t number = command.executions + 1;
     if (!command.fails || number % command.fails->every != 0 ||
         chance(simulator.motions.seed, command.number, number) >= command.fails->probability) {
         return nullptr;
@@ -34,7 +34,7 @@ const Refusal* outcome(const Task& task, const Simulator& simulator) {
 // Updates the values that follow changed properties.
 void noteOutcome(const Task& task, Simulator& simulator) noexcept {
     Motions& motions = simulator.motions;
-    const int64_t now = simulator.clock.now();
+    const std::int64_t now = simulator.clock.now();
     if (task.command->resets) {
         motions.restart(*task.resource, now);
     } else {

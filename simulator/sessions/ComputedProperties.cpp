@@ -51,7 +51,7 @@ Value presentNames(const Devices& devices) {
     ReadValue::Names names;
     names.reserve(devices.size());
     for (const auto& device : devices) {
-        if (device->absence != Absence::removed) {
+        if (device->absence != Absence::Removed) {
             names.push_back(device->name);
         }
     }
@@ -81,7 +81,7 @@ bool isModule(const Device& device) {
 }
 
 Value modules(const Subject& subject) {
-    constexpr int32_t chassisCategory = 1;
+    constexpr std::int32_t chassisCategory = 1;
     if (subject.device().category != chassisCategory || isModule(subject.device())) {
         return std::nullopt;
     }
@@ -96,62 +96,66 @@ Value slotNumber(const Subject& subject) {
 }
 
 constexpr Entry entries[] = {
-    {Category::system, "Sys.Devices",
+    {Category::System, "Sys.Devices",
      [](const Subject& subject) -> Value {
          return presentNames(subject.simulator.chassis->devices());
      }},
-    {Category::system, "Sys.ConfigChangeCount",
+    {Category::System, "Sys.ConfigChangeCount",
      [](const Subject& subject) -> Value {
-         return scalar<uint64_t>(subject.simulator.chassis->changes);
+         return scalar<std::uint64_t>(subject.simulator.chassis->changes);
      }},
-    {Category::system, "Sys.SystemProperties", propertyNames<Category::system>},
-    {Category::system, "Sys.SessionProperties", propertyNames<Category::session>},
-    {Category::system, "Sys.DeviceProperties", propertyNames<Category::device>},
-    {Category::system, "Sys.PhysChanProperties", propertyNames<Category::physChan>},
-    {Category::system, "Sys.NVMEMAreaProperties", propertyNames<Category::nvmemArea>},
-    {Category::session, "Session.ReservedDevices",
+    {Category::System, "Sys.SystemProperties", propertyNames<Category::System>},
+    {Category::System, "Sys.SessionProperties", propertyNames<Category::Session>},
+    {Category::System, "Sys.DeviceProperties", propertyNames<Category::Device>},
+    {Category::System, "Sys.PhysChanProperties", propertyNames<Category::PhysChan>},
+    {Category::System, "Sys.NVMEMAreaProperties", propertyNames<Category::NvmemArea>},
+    {Category::Session, "Session.ReservedDevices",
      [](const Subject& subject) -> Value {
          return deviceNames(subject.simulator.reservations.heldBy(subject.session.handle));
      }},
-    {Category::session, "Session.ConnectedDevices",
+    {Category::Session, "Session.ConnectedDevices",
      [](const Subject& subject) -> Value { return deviceNames(subject.session.connectedDevices); }},
-    {Category::session, "Session.DefaultDevices",
+    {Category::Session, "Session.DefaultDevices",
      [](const Subject& subject) -> Value { return deviceNames(subject.session.defaultDevices); }},
-    {Category::session, "Session.DefaultPhysChans",
+    {Category::Session, "Session.DefaultPhysChans",
      [](const Subject& subject) -> Value { return fullNames(subject.session.defaultPhysChans); }},
-    {Category::session, "Session.DefaultNVMEMAreas",
+    {Category::Session, "Session.DefaultNVMEMAreas",
      [](const Subject& subject) -> Value { return fullNames(subject.session.defaultNvmemAreas); }},
-    {Category::device, "Dev.Name",
+    {Category::Device, "Dev.Name",
      [](const Subject& subject) -> Value { return scalar<std::string>(subject.device().name); }},
-    {Category::device, "Dev.ProductCategory",
-     [](const Subject& subject) -> Value { return scalar<int32_t>(subject.device().category); }},
-    {Category::device, "Dev.Modules", modules},
-    {Category::device, "Dev.SlotNum", slotNumber},
-    {Category::device, "Dev.PhysChans",
+    {Category::Device, "Dev.ProductCategory",
+     [](const Subject& subject) -> Value {
+         return scalar<std::int32_t>(subject.device().category);
+     }},
+    {Category::Device, "Dev.Modules", modules},
+    {Category::Device, "Dev.SlotNum", slotNumber},
+    {Category::Device, "Dev.PhysChans",
      [](const Subject& subject) -> Value { return fullNames(subject.device().physChans); }},
-    {Category::device, "Dev.NVMEM.Areas",
+    {Category::Device, "Dev.NVMEM.Areas",
      [](const Subject& subject) -> Value { return fullNames(subject.device().nvmemAreas); }},
-    {Category::device, "Dev.Properties", ownPropertyNames},
-    {Category::device, "Dev.Commands", commandNames},
-    {Category::physChan, "PhysChan.Properties", ownPropertyNames},
-    {Category::physChan, "PhysChan.Commands", commandNames},
-    {Category::nvmemArea, "NVMEMArea.Size",
-     [](const Subject& subject) -> Value { return scalar<uint32_t>(subject.memory().size()); }},
-    {Category::nvmemArea, "NVMEMArea.Writable",
+    {Category::Device, "Dev.Properties", ownPropertyNames},
+    {Category::Device, "Dev.Commands", commandNames},
+    {Category::PhysChan, "PhysChan.Properties", ownPropertyNames},
+    {Category::PhysChan, "PhysChan.Commands", commandNames},
+    {Category::NvmemArea, "NVMEMArea.Size",
      [](const Subject& subject) -> Value {
-         return scalar<uint8_t>(subject.memory().writeRules().writable);
+         return scalar<std::uint32_t>(subject.memory().size());
      }},
-    {Category::nvmemArea, "NVMEMArea.SerialNumWanted",
+    {Category::NvmemArea, "NVMEMArea.Writable",
      [](const Subject& subject) -> Value {
-         return scalar<uint8_t>(subject.memory().writeRules().wantsSerialNumber);
+         return scalar<std::uint8_t>(subject.memory().writeRules().writable);
      }},
-    {Category::nvmemArea, "NVMEMArea.PasswordWanted",
+    {Category::NvmemArea, "NVMEMArea.SerialNumWanted",
      [](const Subject& subject) -> Value {
-         return scalar<uint8_t>(!subject.memory().writeRules().password.empty());
+         return scalar<std::uint8_t>(subject.memory().writeRules().wantsSerialNumber);
      }},
-    {Category::nvmemArea, "NVMEMArea.PendingChanges",
+    {Category::NvmemArea, "NVMEMArea.PasswordWanted",
      [](const Subject& subject) -> Value {
-         return scalar<uint8_t>(subject.memory().hasPending());
+         return scalar<std::uint8_t>(!subject.memory().writeRules().password.empty());
+     }},
+    {Category::NvmemArea, "NVMEMArea.PendingChanges",
+     [](const Subject& subject) -> Value {
+         return scalar<std::uint8_t>(subject.memory().hasPending());
      }},
 };
 
@@ -188,11 +192,11 @@ void setDefaultResources(const Resolver& resolver, Session& session, std::string
                          const std::vector<std::string>& names) {
     const std::string text = joined(names);
     if (property == "Session.DefaultPhysChans") {
-        session.defaultPhysChans = distinct(resolver.resources(Kind::physChan, text));
+        session.defaultPhysChans = distinct(resolver.resources(Kind::PhysChan, text));
     } else if (property == "Session.DefaultNVMEMAreas") {
-        session.defaultNvmemAreas = distinct(resolver.resources(Kind::nvmemArea, text));
+        session.defaultNvmemAreas = distinct(resolver.resources(Kind::NvmemArea, text));
     } else {
-        session.defaultDevices = owners(resolver.resources(Kind::device, text));
+        session.defaultDevices = owners(resolver.resources(Kind::Device, text));
     }
 }
 

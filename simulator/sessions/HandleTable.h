@@ -13,31 +13,31 @@ namespace simulator {
 template <typename Item>
 class HandleTable {
   public:
-    explicit HandleTable(uint32_t first = 1) : next(first) {}
+    explicit HandleTable(std::uint32_t first = 1) : next(first) {}
 
     // The number that the next item gets.
-    uint32_t upcoming() {
+    std::uint32_t upcoming() {
         while (next == 0 || items.count(next) != 0) {
             ++next;
         }
         return next;
     }
 
-    uint32_t add(Item item) {
-        const uint32_t handle = upcoming();
+    std::uint32_t add(Item item) {
+        const std::uint32_t handle = upcoming();
         items.emplace(handle, std::move(item));
         ++next;
         return handle;
     }
 
     // Returns null when there is no such item. The item stays where it is until it is removed.
-    Item* find(uint32_t handle) {
+    Item* find(std::uint32_t handle) {
         const auto found = items.find(handle);
         return found == items.end() ? nullptr : &found->second;
     }
 
     // Returns whether there was such an item.
-    bool remove(uint32_t handle) noexcept { return items.erase(handle) != 0; }
+    bool remove(std::uint32_t handle) noexcept { return items.erase(handle) != 0; }
 
     // In no particular order.
     template <typename Visit>
@@ -61,28 +61,28 @@ class HandleTable {
         }
     }
 
-    uint32_t size() const { return static_cast<uint32_t>(items.size()); }
+    std::uint32_t size() const { return static_cast<std::uint32_t>(items.size()); }
 
   private:
-    std::unordered_map<uint32_t, Item> items;
-    uint32_t next;
+    std::unordered_map<std::uint32_t, Item> items;
+    std::uint32_t next;
 };
 
 // A handle table that is thread-safe, for small items.
 template <typename Item>
 class GuardedHandleTable {
   public:
-    uint32_t add(const Item& item) {
+    std::uint32_t add(const Item& item) {
         const std::lock_guard<std::mutex> lock(mutex);
         return table.add(item);
     }
     // A copy of the item, or nothing.
-    std::optional<Item> find(uint32_t handle) {
+    std::optional<Item> find(std::uint32_t handle) {
         const std::lock_guard<std::mutex> lock(mutex);
         const Item* item = table.find(handle);
         return item != nullptr ? std::optional(*item) : std::nullopt;
     }
-    bool remove(uint32_t handle) noexcept {
+    bool remove(std::uint32_t handle) noexcept {
         const std::lock_guard<std::mutex> lock(mutex);
         return table.remove(handle);
     }
@@ -91,7 +91,7 @@ class GuardedHandleTable {
         const std::lock_guard<std::mutex> lock(mutex);
         table.removeIf(condition);
     }
-    uint32_t size() const {
+    std::uint32_t size() const {
         const std::lock_guard<std::mutex> lock(mutex);
         return table.size();
     }

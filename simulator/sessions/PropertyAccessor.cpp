@@ -10,12 +10,12 @@ namespace {
 
 Category categoryOf(Kind kind) {
     switch (kind) {
-        case Kind::physChan:
-            return Category::physChan;
-        case Kind::nvmemArea:
-            return Category::nvmemArea;
+        case Kind::PhysChan:
+            return Category::PhysChan;
+        case Kind::NvmemArea:
+            return Category::NvmemArea;
         default:
-            return Category::device;
+            return Category::Device;
     }
 }
 
@@ -44,7 +44,7 @@ Refusal about(const Code& reason, const PropertyDefinition& definition,
     return refusal;
 }
 
-void expectType(const PropertyDefinition& definition, DataType type, size_t places) {
+void expectType(const PropertyDefinition& definition, DataType type, std::size_t places) {
     if (places > 1 && (isArray(definition.type) || !isArray(type))) {
         throw about(code::severalResources, definition);
     }
@@ -65,7 +65,7 @@ std::vector<std::string> itemsOf(const Enumeration& enumeration) {
 }
 
 [[noreturn]] void refuseRange(const PropertyDefinition& definition, const Resource* resource,
-                              const Elements& value, size_t index) {
+                              const Elements& value, std::size_t index) {
     Refusal refusal = about(code::valueOutOfRange, definition, resource);
     refusal.usage(tag::requestedValue, firstText(elementAt(value, index)));
     if (definition.least) {
@@ -81,7 +81,7 @@ std::vector<std::string> itemsOf(const Enumeration& enumeration) {
 template <typename Visit>
 void forEachPart(const std::vector<Resource*>& resources, Visit visit) {
     for (Resource* resource : resources) {
-        if (resource->kind == Kind::device) {
+        if (resource->kind == Kind::Device) {
             resource->device->forEachResource(visit);
         } else {
             visit(*resource);
@@ -120,7 +120,7 @@ PropertyAccessor::Place PropertyAccessor::find(Category category, Resource* reso
 
 PropertyAccessor::Place PropertyAccessor::findIn(Category category, const HashedName& name) {
     PropertyStore& store =
-        category == Category::session ? session.properties : simulator.chassis->systemProperties;
+        category == Category::Session ? session.properties : simulator.chassis->systemProperties;
     return find(category, nullptr, store, name);
 }
 
@@ -129,14 +129,14 @@ PropertyAccessor::Place PropertyAccessor::findOn(Resource& resource, const Hashe
 }
 
 bool PropertyAccessor::isOfSession(const HashedName& name) const {
-    return simulator.chassis->catalogue.find(Category::session, name) != nullptr;
+    return simulator.chassis->catalogue.find(Category::Session, name) != nullptr;
 }
 
 std::vector<PropertyAccessor::Place> PropertyAccessor::findAll(std::string_view resources,
                                                                const HashedName& name) {
     std::vector<Place> places;
     if (isOfSession(name)) {
-        places.push_back(findIn(Category::session, name));
+        places.push_back(findIn(Category::Session, name));
         return places;
     }
     const auto found = simulator.resolver(session).anyResources(resources);
@@ -151,9 +151,9 @@ std::vector<PropertyAccessor::Place> PropertyAccessor::findAll(std::string_view 
     return places;
 }
 
-ReadValue PropertyAccessor::readOne(Place place, DataType type, size_t places) {
+ReadValue PropertyAccessor::readOne(Place place, DataType type, std::size_t places) {
     expectType(*place.definition, type, places);
-    if (place.definition->access == PropertyAccess::writeOnly) {
+    if (place.definition->access == PropertyAccess::WriteOnly) {
         throw about(code::writeOnlyProperty, *place.definition);
     }
     if (place.stored == nullptr) {
@@ -174,17 +174,17 @@ Elements PropertyAccessor::readAll(std::vector<Place> places, DataType type) {
 }
 
 ReadValue PropertyAccessor::readSystem(std::string_view name, DataType type) {
-    return readOne(findIn(Category::system, HashedName(name)), type);
+    return readOne(findIn(Category::System, HashedName(name)), type);
 }
 
 ReadValue PropertyAccessor::readSession(std::string_view name, DataType type) {
-    return readOne(findIn(Category::session, HashedName(name)), type);
+    return readOne(findIn(Category::Session, HashedName(name)), type);
 }
 
 ReadValue PropertyAccessor::read(std::string_view resources, std::string_view name, DataType type) {
     const HashedName hashed(name);
     if (isOfSession(hashed)) {
-        return readOne(findIn(Category::session, hashed), type);
+        return readOne(findIn(Category::Session, hashed), type);
     }
     if (Resource* resource = simulator.resolver(session).singleResource(resources)) {
         return readOne(findOn(*resource, hashed), type);
@@ -196,12 +196,12 @@ ReadValue PropertyAccessor::read(std::string_view resources, std::string_view na
 
 void PropertyAccessor::expectAcceptable(const Place& place, const Elements& value) const {
     const PropertyDefinition& definition = *place.definition;
-    if (definition.access == PropertyAccess::readOnly) {
+    if (definition.access == PropertyAccess::ReadOnly) {
         throw about(code::readOnlyProperty, definition, place.resource);
     }
     if (const auto index = definition.firstWithoutItem(value)) {
         throw about(code::valueNotEnumerated, definition, place.resource)
-            .usageEnum(tag::requestedValue, std::get<List<int32_t>>(value)[*index],
+            .usageEnum(tag::requestedValue, std::get<List<std::int32_t>>(value)[*index],
                        definition.enumeration->id)
             .usage(tag::allowedValues, itemsOf(*definition.enumeration));
     }
@@ -216,17 +216,17 @@ void PropertyAccessor::expectAcceptable(const Place& place, const Elements& valu
 void PropertyAccessor::writeAll(const std::vector<Place>& places, DataType type,
                                 const Elements& values) {
     std::vector<Elements> parts;
-    for (size_t i = 0; i < places.size(); ++i) {
+    for (std::size_t i = 0; i < places.size(); ++i) {
         expectType(*places[i].definition, type, places.size());
         if (places.size() > 1 && elementCount(values) != places.size()) {
             throw about(code::wrongElementCount, *places[i].definition)
-                .usage(tag::valueCount, static_cast<uint32_t>(elementCount(values)));
+                .usage(tag::valueCount, static_cast<std::uint32_t>(elementCount(values)));
         }
         parts.push_back(places.size() > 1 ? elementAt(values, i) : values);
         expectAcceptable(places[i], parts.back());
     }
     Change change = simulator.lasting.change();
-    for (size_t i = 0; i < places.size(); ++i) {
+    for (std::size_t i = 0; i < places.size(); ++i) {
         if (places[i].definition->needsCommit && places[i].resource != nullptr) {
             session.writtenDevices.insert(places[i].resource->device);
         }
@@ -235,7 +235,7 @@ void PropertyAccessor::writeAll(const std::vector<Place>& places, DataType type,
         }
     }
     simulator.lasting.keep(change);
-    for (size_t i = 0; i < places.size(); ++i) {
+    for (std::size_t i = 0; i < places.size(); ++i) {
         if (places[i].stored == nullptr) {
             setDefaultResources(simulator.resolver(session), session, places[i].definition->name,
                                 std::get<List<std::string>>(parts[i]));
@@ -255,11 +255,11 @@ void PropertyAccessor::noteChange(const Resource* resource) noexcept {
 }
 
 void PropertyAccessor::writeSystem(std::string_view name, DataType type, const Elements& values) {
-    writeAll({findIn(Category::system, HashedName(name))}, type, values);
+    writeAll({findIn(Category::System, HashedName(name))}, type, values);
 }
 
 void PropertyAccessor::writeSession(std::string_view name, DataType type, const Elements& values) {
-    writeAll({findIn(Category::session, HashedName(name))}, type, values);
+    writeAll({findIn(Category::Session, HashedName(name))}, type, values);
 }
 
 void PropertyAccessor::write(std::string_view resources, std::string_view name, DataType type,
@@ -290,8 +290,8 @@ void PropertyAccessor::commit(std::string_view resources) {
 
 OpenProperty PropertyAccessor::openDriverDefined(std::string_view name) {
     const HashedName hashed(name);
-    constexpr Category categories[] = {Category::session, Category::system, Category::device,
-                                       Category::physChan, Category::nvmemArea};
+    constexpr Category categories[] = {Category::Session, Category::System, Category::Device,
+                                       Category::PhysChan, Category::NvmemArea};
     for (const Category category : categories) {
         if (const auto& definition = simulator.chassis->catalogue.find(category, hashed)) {
             return {session.handle, definition.get(), nullptr};

@@ -55,7 +55,7 @@ class PropertyAccessor {
     Place findOn(Resource& resource, const HashedName& name);
     Place find(Category category, Resource* resource, PropertyStore& store, const HashedName& name);
     std::vector<Place> findAll(std::string_view resources, const HashedName& name);
-    ReadValue readOne(Place place, DataType type, size_t places = 1);
+    ReadValue readOne(Place place, DataType type, std::size_t places = 1);
     Elements readAll(std::vector<Place> places, DataType type);
     void writeAll(const std::vector<Place>& places, DataType type, const Elements& values);
     // Null for the system and the session.

@@ -7,7 +7,7 @@
 
 namespace simulator {
 
-uint64_t RegisterAccessor::readProperty(const RegisterBlock& block, uint32_t address) {
+std::uint64_t RegisterAccessor::readProperty(const RegisterBlock& block, std::uint32_t address) {
     const PropertyDefinition& definition = *block.property->definition;
     const std::string owner = block.owner->fullName();
     const ReadValue value =
@@ -15,7 +15,7 @@ uint64_t RegisterAccessor::readProperty(const RegisterBlock& block, uint32_t add
     return toRegister(value.elements(), block.size()) >> (8 * (address - block.address));
 }
 
-uint64_t RegisterAccessor::read(Device& device, uint32_t address, uint32_t width) {
+std::uint64_t RegisterAccessor::read(Device& device, std::uint32_t address, std::uint32_t width) {
     RegisterBlock& block = device.registers.find(address, width);
     if (!block.readable) {
         throw Refusal(code::writeOnlyRegister).usage(tag::registerAddress, address);
@@ -24,8 +24,8 @@ uint64_t RegisterAccessor::read(Device& device, uint32_t address, uint32_t width
                                      : device.registers.read(block, address, width);
 }
 
-void RegisterAccessor::writeProperty(const RegisterBlock& block, uint32_t address, uint32_t width,
-                                     uint64_t value) {
+void RegisterAccessor::writeProperty(const RegisterBlock& block, std::uint32_t address,
+                                     std::uint32_t width, std::uint64_t value) {
     const Property& property = *block.property;
     const PropertyDefinition& definition = *property.definition;
     RegisterBlock image;
@@ -41,8 +41,8 @@ void RegisterAccessor::writeProperty(const RegisterBlock& block, uint32_t addres
             fromRegister(definition.type, image.read(block.address, block.size()), block.size()));
 }
 
-const Refusal* RegisterAccessor::write(Device& device, uint32_t address, uint32_t width,
-                                       uint64_t value) {
+const Refusal* RegisterAccessor::write(Device& device, std::uint32_t address, std::uint32_t width,
+                                       std::uint64_t value) {
     simulator.reservations.expectWritable(session.handle, device);
     RegisterBlock& block = device.registers.find(address, width);
     if (!block.writable) {

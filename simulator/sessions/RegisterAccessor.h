@@ -12,18 +12,19 @@ class RegisterAccessor {
         : simulator(simulator), session(session) {}
 
     // Refuses with misalignedRegister, unmappedRegister and writeOnlyRegister.
-    uint64_t read(Device& device, uint32_t address, uint32_t width);
+    std::uint64_t read(Device& device, std::uint32_t address, std::uint32_t width);
 
     // Writes the register and carries out its command, or does neither. Refuses with
     // misalignedRegister, unmappedRegister and readOnlyRegister, where the property that the
     // register shows does not take the value, and where the command fails. Returns the warning of
     // the command, owned by the command, or null.
-    const Refusal* write(Device& device, uint32_t address, uint32_t width, uint64_t value);
+    const Refusal* write(Device& device, std::uint32_t address, std::uint32_t width,
+                         std::uint64_t value);
 
   private:
-    uint64_t readProperty(const RegisterBlock& block, uint32_t address);
-    void writeProperty(const RegisterBlock& block, uint32_t address, uint32_t width,
-                       uint64_t value);
+    std::uint64_t readProperty(const RegisterBlock& block, std::uint32_t address);
+    void writeProperty(const RegisterBlock& block, std::uint32_t address, std::uint32_t width,
+                       std::uint64_t value);
 
     Simulator& simulator;
     Session& session;

@@ -42,7 +42,7 @@ bool Reservations::isFree(const Request& request) const {
 }
 
 bool Reservations::competes(const Request& earlier, const Request& later) const {
-    return earlier.wait.end == Wait::End::none && earlier.wanted.conflictsWith(later.wanted) &&
+    return earlier.wait.end == Wait::End::None && earlier.wanted.conflictsWith(later.wanted) &&
            std::any_of(earlier.devices.begin(), earlier.devices.end(), [&](const Device* device) {
                return std::find(later.devices.begin(), later.devices.end(), device) !=
                       later.devices.end();
@@ -73,12 +73,12 @@ void Reservations::grant(Request& request) noexcept {
     for (auto& [session, devices] : request.held) {
         held.find(session)->second.merge(devices);
     }
-    request.wait.finish(Wait::End::done);
+    request.wait.finish(Wait::End::Done);
 }
 
 void Reservations::serveQueue() noexcept {
     for (Request* request : queue) {
-        if (request->wait.end == Wait::End::none && !mustQueue(*request) && isFree(*request)) {
+        if (request->wait.end == Wait::End::None && !mustQueue(*request) && isFree(*request)) {
             grant(*request);
         }
     }

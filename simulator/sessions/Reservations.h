@@ -13,13 +13,13 @@
 namespace simulator {
 
 // The numbers of the enumeration "ReservationAccess".
-inline constexpr int32_t readOnlyAccess = 1;
-inline constexpr int32_t readWriteAccess = 3;
+inline constexpr std::int32_t readOnlyAccess = 1;
+inline constexpr std::int32_t readWriteAccess = 3;
 
 // The reservation of a device that a session holds or asks for.
 struct Holding {
     nQITRMCAPI100_Session session;
-    int32_t access;
+    std::int32_t access;
     std::string group;
 
     // Whether two sessions cannot hold these at the same time. They can if both only read, or if

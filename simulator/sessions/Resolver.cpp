@@ -88,9 +88,9 @@ std::optional<std::vector<Resource*>> Resolver::tokenResources(std::string_view 
 
 Resource& Resolver::named(Kind kind, std::string_view name) const {
     switch (kind) {
-        case Kind::physChan:
+        case Kind::PhysChan:
             return chassis.physChan(name);
-        case Kind::nvmemArea:
+        case Kind::NvmemArea:
             return chassis.nvmemArea(name);
         default:
             return chassis.device(name);
@@ -98,7 +98,7 @@ Resource& Resolver::named(Kind kind, std::string_view name) const {
 }
 
 Resource& Resolver::named(std::string_view name) const {
-    const size_t slash = name.find('/');
+    const std::size_t slash = name.find('/');
     Device& device = chassis.device(name.substr(0, slash));
     if (slash == std::string_view::npos) {
         return device;
@@ -168,15 +168,15 @@ std::vector<Resource*> Resolver::mentioned(std::string_view joined) const {
 }
 
 std::vector<Device*> Resolver::devices(std::string_view joined) const {
-    const auto found = resources(Kind::device, joined);
+    const auto found = resources(Kind::Device, joined);
     expectSome(found);
     return owners(found);
 }
 
 std::vector<Device*> Resolver::devicesToConnect(std::string_view joined) const {
-    const auto found = owners(ofKind(Kind::device, joined));
+    const auto found = owners(ofKind(Kind::Device, joined));
     for (const Device* device : found) {
-        if (device->absence == Absence::removed) {
+        if (device->absence == Absence::Removed) {
             expectPresent(*device, device->absence);
         }
     }
@@ -187,13 +187,13 @@ std::vector<Device*> Resolver::devicesToConnect(std::string_view joined) const {
 }
 
 Device& Resolver::oneDevice(std::string_view joined) const {
-    const auto found = resources(Kind::device, joined);
+    const auto found = resources(Kind::Device, joined);
     expectOne(found);
     return *found.front()->device;
 }
 
 NvmemArea& Resolver::oneNvmemArea(std::string_view joined) const {
-    const auto found = resources(Kind::nvmemArea, joined);
+    const auto found = resources(Kind::NvmemArea, joined);
     expectOne(found);
     return static_cast<NvmemArea&>(*found.front());
 }

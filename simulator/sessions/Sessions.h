@@ -51,7 +51,7 @@ class Sessions {
     void remove(nQITRMCAPI100_Session handle) noexcept { table.remove(handle); }
 
     // Including those that are still opening.
-    uint32_t size() const { return table.size(); }
+    std::uint32_t size() const { return table.size(); }
 
   private:
     HandleTable<Session> table;

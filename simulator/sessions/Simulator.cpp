@@ -13,13 +13,13 @@ Simulator::Simulator(std::unique_ptr<Chassis> loaded, Motions motions, const Tim
 
 void Simulator::reset(Device& device) {
     device.reset();
-    const int64_t now = clock.now();
+    const std::int64_t now = clock.now();
     device.forEachResource([&](const Resource& resource) { motions.restart(resource, now); });
 }
 
 void Simulator::close(nQITRMCAPI100_Session session) {
     const auto isOfSession = [&](const auto& item) { return item.session == session; };
-    waits.endAll(session, Wait::End::closed);
+    waits.endAll(session, Wait::End::Closed);
     reservations.releaseAll(session);
     openProperties.removeIf(isOfSession);
     openCommands.removeIf(isOfSession);

@@ -23,7 +23,7 @@ double checkedTimeout(double seconds) {
 }
 
 void Wait::finish(End reason) noexcept {
-    if (end == End::none) {
+    if (end == End::None) {
         end = reason;
         wake.notify_one();
     }
@@ -58,7 +58,7 @@ Waits::Deadline Waits::wakeBefore(Deadline deadline) const {
 
 void Waits::sleepUntil(Deadline deadline, Wait& wait, WriteLock& lock) {
     const Waiting isWaiting(waiting, wait);
-    while (wait.end == Wait::End::none && std::chrono::steady_clock::now() < deadline) {
+    while (wait.end == Wait::End::None && std::chrono::steady_clock::now() < deadline) {
         wait.wake.wait_until(lock, wakeBefore(deadline));
         if (schedule != nullptr) {
             schedule->catchUp();
@@ -67,13 +67,13 @@ void Waits::sleepUntil(Deadline deadline, Wait& wait, WriteLock& lock) {
 }
 
 void Waits::expectUndisturbed(const Wait& wait) const {
-    if (wait.end == Wait::End::deviceAbsent) {
+    if (wait.end == Wait::End::DeviceAbsent) {
         expectPresent(*wait.absentDevice, wait.absence);
     }
-    if (wait.end == Wait::End::aborted) {
+    if (wait.end == Wait::End::Aborted) {
         throw Refusal(code::aborted);
     }
-    if (wait.end == Wait::End::closed) {
+    if (wait.end == Wait::End::Closed) {
         throw Refusal(code::unknownSession).usage(tag::sessionHandle, wait.session);
     }
 }
@@ -81,7 +81,7 @@ void Waits::expectUndisturbed(const Wait& wait) const {
 bool Waits::sleep(Wait& wait, double seconds, WriteLock& lock) {
     sleepUntil(std::chrono::steady_clock::now() + clock.realTime(seconds), wait, lock);
     expectUndisturbed(wait);
-    return wait.end == Wait::End::done;
+    return wait.end == Wait::End::Done;
 }
 
 void Waits::spend(Wait& wait, double seconds, WriteLock& lock) {
@@ -107,12 +107,12 @@ void Waits::endAll(nQITRMCAPI100_Session session, Wait::End reason) noexcept {
 
 void Waits::endAbout(const Device& device) noexcept {
     for (Wait* wait : waiting) {
-        if (wait->end == Wait::End::none && wait->devices != nullptr &&
+        if (wait->end == Wait::End::None && wait->devices != nullptr &&
             std::find(wait->devices->begin(), wait->devices->end(), &device) !=
                 wait->devices->end()) {
             wait->absentDevice = &device;
             wait->absence = device.absence;
-            wait->finish(Wait::End::deviceAbsent);
+            wait->finish(Wait::End::DeviceAbsent);
         }
     }
 }

@@ -22,18 +22,18 @@ double checkedTimeout(double seconds);
 class Schedule {
   public:
     // The time of the next event if there is none.
-    static constexpr int64_t never = std::numeric_limits<int64_t>::max();
+    static constexpr std::int64_t never = std::numeric_limits<std::int64_t>::max();
 
     virtual ~Schedule() = default;
     // The time of the next event, in microseconds of the simulated time.
-    virtual int64_t next() const = 0;
+    virtual std::int64_t next() const = 0;
     // Carries out the events that are due.
     virtual void catchUp() = 0;
 };
 
 // One waiting call of a session. It is on the stack of the waiting thread.
 struct Wait {
-    enum class End { none, done, aborted, closed, deviceAbsent };
+    enum class End { None, Done, Aborted, Closed, DeviceAbsent };
 
     // devices: what the call is about, for as long as it waits. May be null.
     explicit Wait(nQITRMCAPI100_Session session, const std::vector<Device*>* devices = nullptr)
@@ -43,10 +43,10 @@ struct Wait {
 
     const nQITRMCAPI100_Session session;
     const std::vector<Device*>* const devices;
-    End end = End::none;
-    // The device because of which the wait ended with End::deviceAbsent.
+    End end = End::None;
+    // The device because of which the wait ended with End::DeviceAbsent.
     const Device* absentDevice = nullptr;
-    Absence absence = Absence::none;
+    Absence absence = Absence::None;
     std::condition_variable_any wake;
 };
 
@@ -56,7 +56,7 @@ class Waits {
     explicit Waits(Clock& clock) : clock(clock) {}
 
     // Sleeps, with the mutex unlocked, until the wait ends or the simulated time is over. Returns
-    // whether the wait ended by Wait::End::done; refuses when the session was aborted or closed,
+    // whether the wait ended by Wait::End::Done; refuses when the session was aborted or closed,
     // and when one of the wait's devices does not answer any more. Where time goes by calls it
     // sleeps in real time, as simulated time might not advance otherwise.
     bool sleep(Wait& wait, double seconds, WriteLock& lock);

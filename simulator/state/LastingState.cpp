@@ -11,7 +11,7 @@ namespace simulator {
 
 namespace {
 
-constexpr uint32_t sessionBlock = 100;
+constexpr std::uint32_t sessionBlock = 100;
 constexpr const char* nextSessionItem = "Sys.NextSession";
 
 std::string keyOf(const std::string& resource, const std::string& item) {
@@ -50,10 +50,10 @@ void Change::content(const NvmemArea& area) {
     }
 }
 
-void Change::name(const Device& device, const std::string& newName, uint64_t changes) {
+void Change::name(const Device& device, const std::string& newName, std::uint64_t changes) {
     if (wanted) {
-        add(device.describedName(), nameItem, DataType::text, List<std::string>{newName});
-        add("", changesItem, DataType::uint64, List<uint64_t>{changes});
+        add(device.describedName(), nameItem, DataType::Text, List<std::string>{newName});
+        add("", changesItem, DataType::Uint64, List<std::uint64_t>{changes});
     }
 }
 
@@ -125,22 +125,22 @@ void LastingState::loadSessionNumber(Chassis& chassis) const {
     }
     for (const StateEntry& entry :
          readStateFile(folder->filePath(sessionsFile), sessionsFile, folder->read(sessionsFile))) {
-        const auto* number = std::get_if<List<uint32_t>>(&entry.value);
+        const auto* number = std::get_if<List<std::uint32_t>>(&entry.value);
         if (entry.item == nextSessionItem && number != nullptr && number->size() == 1) {
             chassis.firstSessionHandle = number->front();
         }
     }
 }
 
-void LastingState::reserveSessionNumber(uint32_t number) {
+void LastingState::reserveSessionNumber(std::uint32_t number) {
     // Numbers wrap around, and so does this difference.
     const bool isReserved = reservedEnd && *reservedEnd - number - 1 < sessionBlock;
     if (!folder || isReserved) {
         return;
     }
-    const uint32_t end = number + sessionBlock;
+    const std::uint32_t end = number + sessionBlock;
     StateText text;
-    text.add("", nextSessionItem, DataType::uint32, List<uint32_t>{end});
+    text.add("", nextSessionItem, DataType::Uint32, List<std::uint32_t>{end});
     folder->write(sessionsFile, text.file(sessionsFile));
     reservedEnd = end;
 }

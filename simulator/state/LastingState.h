@@ -24,7 +24,7 @@ class Change {
                   const Elements& value);
     void content(const NvmemArea& area);
     // The name that a device is to have, and how many names will have changed then.
-    void name(const Device& device, const std::string& newName, uint64_t changes);
+    void name(const Device& device, const std::string& newName, std::uint64_t changes);
 
   private:
     friend class LastingState;
@@ -57,10 +57,10 @@ class LastingState {
     // Makes sure that no later start gives out this number of a session again. Numbers are reserved
     // in blocks, so that few sessions wait for the disk; a restart continues after the last block.
     // Refuses with stateNotWritten.
-    void reserveSessionNumber(uint32_t number);
+    void reserveSessionNumber(std::uint32_t number);
 
   private:
-    using Generation = uint64_t;
+    using Generation = std::uint64_t;
     using Entries = std::map<std::string, StateEntry>;
 
     // Reads all files: the latest entry for each key.
@@ -73,11 +73,11 @@ class LastingState {
 
     std::optional<StateFolder> folder;
     // The first number after the block that was reserved last since the start.
-    std::optional<uint32_t> reservedEnd;
+    std::optional<std::uint32_t> reservedEnd;
     // Which file holds the latest value; 0 for none.
     std::map<std::string, Generation> holders;
     // How many latest values a file holds.
-    std::map<Generation, size_t> uses;
+    std::map<Generation, std::size_t> uses;
     Generation next = 1;
 };
 

@@ -60,11 +60,11 @@ void Restorer::takeProperty(const StateEntry& entry, PropertyStore& properties) 
 }
 
 void Restorer::takeContent(const StateEntry& entry, Resource& resource) {
-    if (resource.kind != Kind::nvmemArea) {
+    if (resource.kind != Kind::NvmemArea) {
         return;
     }
     NvmemMemory& memory = static_cast<NvmemArea&>(resource).memory;
-    const auto* bytes = std::get_if<List<uint8_t>>(&entry.value);
+    const auto* bytes = std::get_if<List<std::uint8_t>>(&entry.value);
     if (bytes == nullptr || bytes->size() != memory.size()) {
         complain(titleOf(entry), "the area has another size");
     } else {
@@ -82,7 +82,7 @@ void Restorer::takeName(const StateEntry& entry, Resource& resource) {
 }
 
 void Restorer::takeOfSystem(const StateEntry& entry) {
-    const auto* count = std::get_if<List<uint64_t>>(&entry.value);
+    const auto* count = std::get_if<List<std::uint64_t>>(&entry.value);
     if (entry.item == changesItem && count != nullptr && count->size() == 1) {
         chassis.changes = count->front();
     } else {
@@ -101,7 +101,7 @@ void Restorer::take(const StateEntry& entry) {
     }
     if (entry.item == contentItem) {
         takeContent(entry, *resource);
-    } else if (entry.item == nameItem && resource->kind == Kind::device) {
+    } else if (entry.item == nameItem && resource->kind == Kind::Device) {
         takeName(entry, *resource);
     } else {
         takeProperty(entry, resource->properties);

@@ -8,25 +8,25 @@ namespace {
 
 // The last character is the version of the format.
 constexpr std::string_view magic = "qitrmc-state 1\n";
-constexpr size_t numberSize = sizeof(uint64_t);
-constexpr size_t headSize = magic.size() + 2 * numberSize;
+constexpr std::size_t numberSize = sizeof(std::uint64_t);
+constexpr std::size_t headSize = magic.size() + 2 * numberSize;
 constexpr const char* remedy = "put a copy of the file back, or remove it to lose the values in it";
 
 template <typename Integer>
 void put(std::string& out, Integer number) {
-    for (size_t i = 0; i < sizeof number; ++i) {
-        out += static_cast<char>(static_cast<uint64_t>(number) >> (8 * i) & 0xFF);
+    for (std::size_t i = 0; i < sizeof number; ++i) {
+        out += static_cast<char>(static_cast<std::uint64_t>(number) >> (8 * i) & 0xFF);
     }
 }
 
 void put(std::string& out, double number) {
-    uint64_t bits = 0;
+    std::uint64_t bits = 0;
     std::memcpy(&bits, &number, sizeof bits);
     put(out, bits);
 }
 
 void put(std::string& out, std::string_view text) {
-    put(out, static_cast<uint32_t>(text.size()));
+    put(out, static_cast<std::uint32_t>(text.size()));
     out += text;
 }
 
@@ -41,7 +41,7 @@ class Scanner {
 
     bool atEnd() const { return rest.empty(); }
 
-    std::string_view bytes(size_t count) {
+    std::string_view bytes(std::size_t count) {
         if (count > rest.size()) {
             throw std::string("breaks off within a value");
         }
@@ -51,20 +51,20 @@ class Scanner {
     }
     template <typename Integer>
     void take(Integer& number) {
-        uint64_t bits = 0;
+        std::uint64_t bits = 0;
         const std::string_view taken = bytes(sizeof number);
-        for (size_t i = 0; i < taken.size(); ++i) {
-            bits |= uint64_t{static_cast<uint8_t>(taken[i])} << (8 * i);
+        for (std::size_t i = 0; i < taken.size(); ++i) {
+            bits |= std::uint64_t{static_cast<std::uint8_t>(taken[i])} << (8 * i);
         }
         number = static_cast<Integer>(bits);
     }
     void take(double& number) {
-        uint64_t bits = 0;
+        std::uint64_t bits = 0;
         take(bits);
         std::memcpy(&number, &bits, sizeof bits);
     }
     void take(std::string& text) {
-        uint32_t size = 0;
+        std::uint32_t size = 0;
         take(size);
         text = bytes(size);
     }
@@ -74,31 +74,31 @@ class Scanner {
 };
 
 // Detects every change of one byte, and others as well as 64 bits can.
-uint64_t checksum(std::string_view text) {
-    uint64_t sum = 0xCBF29CE484222325u;
+std::uint64_t checksum(std::string_view text) {
+    std::uint64_t sum = 0xCBF29CE484222325u;
     for (const char c : text) {
-        sum = (sum ^ static_cast<uint8_t>(c)) * 0x100000001B3u;
+        sum = (sum ^ static_cast<std::uint8_t>(c)) * 0x100000001B3u;
     }
     return sum;
 }
 
 StateEntry takeEntry(Scanner& scanner) {
     StateEntry entry{};
-    uint8_t type = 0;
-    uint32_t count = 0;
+    std::uint8_t type = 0;
+    std::uint32_t count = 0;
     scanner.take(entry.resource);
     scanner.take(entry.item);
     scanner.take(type);
     scanner.take(count);
-    if (type < static_cast<uint8_t>(DataType::boolean) ||
-        type > static_cast<uint8_t>(DataType::uint64Array)) {
+    if (type < static_cast<std::uint8_t>(DataType::Boolean) ||
+        type > static_cast<std::uint8_t>(DataType::Uint64Array)) {
         throw std::string("holds a value of no known type");
     }
     entry.type = static_cast<DataType>(type);
     entry.value = noElements(entry.type);
     std::visit(
         [&](auto& list) {
-            for (uint32_t i = 0; i < count; ++i) {
+            for (std::uint32_t i = 0; i < count; ++i) {
                 list.emplace_back();
                 scanner.take(list.back());
             }
@@ -108,7 +108,7 @@ StateEntry takeEntry(Scanner& scanner) {
 }
 
 // Returns the part of a file that holds the values.
-std::string_view checkedBody(uint64_t generation, std::string_view content) {
+std::string_view checkedBody(std::uint64_t generation, std::string_view content) {
     if (content.substr(0, magic.size()) != magic) {
         throw std::string("is no state file of this version");
     }
@@ -117,9 +117,9 @@ std::string_view checkedBody(uint64_t generation, std::string_view content) {
     }
     const std::string_view guarded = content.substr(0, content.size() - numberSize);
     Scanner head(content.substr(magic.size()));
-    uint64_t made = 0;
-    uint64_t size = 0;
-    uint64_t sum = 0;
+    std::uint64_t made = 0;
+    std::uint64_t size = 0;
+    std::uint64_t sum = 0;
     head.take(made);
     head.take(size);
     Scanner(content.substr(guarded.size())).take(sum);
@@ -139,11 +139,11 @@ std::string_view checkedBody(uint64_t generation, std::string_view content) {
 }  // namespace
 
 void StateText::addHead(std::string_view resource, std::string_view item, DataType type,
-                        size_t count) {
+                        std::size_t count) {
     put(body, resource);
     put(body, item);
-    put(body, static_cast<uint8_t>(type));
-    put(body, static_cast<uint32_t>(count));
+    put(body, static_cast<std::uint8_t>(type));
+    put(body, static_cast<std::uint32_t>(count));
 }
 
 void StateText::add(std::string_view resource, std::string_view item, DataType type,
@@ -158,23 +158,23 @@ void StateText::add(std::string_view resource, std::string_view item, DataType t
         value);
 }
 
-void StateText::add(std::string_view area, const std::vector<uint8_t>& content) {
-    addHead(area, "", DataType::booleanArray, content.size());
+void StateText::add(std::string_view area, const std::vector<std::uint8_t>& content) {
+    addHead(area, "", DataType::BooleanArray, content.size());
     body.append(content.begin(), content.end());
 }
 
-std::string StateText::file(uint64_t generation) const {
+std::string StateText::file(std::uint64_t generation) const {
     std::string out;
     out.reserve(headSize + body.size() + numberSize);
     out += magic;
     put(out, generation);
-    put(out, static_cast<uint64_t>(body.size()));
+    put(out, static_cast<std::uint64_t>(body.size()));
     out += body;
     put(out, checksum(out));
     return out;
 }
 
-std::vector<StateEntry> readStateFile(const std::string& path, uint64_t generation,
+std::vector<StateEntry> readStateFile(const std::string& path, std::uint64_t generation,
                                       std::string_view content) {
     try {
         Scanner scanner(checkedBody(generation, content));

@@ -33,20 +33,21 @@ class StateText {
     void add(std::string_view resource, std::string_view item, DataType type,
              const Elements& value);
     // Adds the content of an NVMEM area.
-    void add(std::string_view area, const std::vector<uint8_t>& content);
+    void add(std::string_view area, const std::vector<std::uint8_t>& content);
 
     // The whole file: head, values and checksum. Needs no values.
-    std::string file(uint64_t generation) const;
+    std::string file(std::uint64_t generation) const;
 
   private:
-    void addHead(std::string_view resource, std::string_view item, DataType type, size_t count);
+    void addHead(std::string_view resource, std::string_view item, DataType type,
+                 std::size_t count);
 
     std::string body;
 };
 
 // Reads the content of the file of a generation. `path` is for the text of the StateError that is
 // thrown when the content is not exactly what StateText::file() made.
-std::vector<StateEntry> readStateFile(const std::string& path, uint64_t generation,
+std::vector<StateEntry> readStateFile(const std::string& path, std::uint64_t generation,
                                       std::string_view content);
 
 }  // namespace simulator

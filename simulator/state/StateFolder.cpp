@@ -28,7 +28,7 @@ constexpr std::string_view sessionsName = "sessions";
 
 using FileName = std::array<char, 32>;
 
-FileName fileName(uint64_t generation) noexcept {
+FileName fileName(std::uint64_t generation) noexcept {
     FileName name{};
     if (generation == sessionsFile) {
         std::copy(sessionsName.begin(), sessionsName.end(), name.data());
@@ -40,8 +40,8 @@ FileName fileName(uint64_t generation) noexcept {
 }
 
 // Returns 0 for the name of another file.
-uint64_t generationOf(std::string_view name) {
-    uint64_t generation = 0;
+std::uint64_t generationOf(std::string_view name) {
+    std::uint64_t generation = 0;
     if (name.compare(0, prefix.size(), prefix) == 0) {
         std::from_chars(name.data() + prefix.size(), name.data() + name.size(), generation);
     }
@@ -57,7 +57,8 @@ int makeFolder(const std::string& path) {
     if (folder >= 0 || errno != ENOENT) {
         return folder;
     }
-    for (size_t end = path.find('/', 1); end != std::string::npos; end = path.find('/', end + 1)) {
+    for (std::size_t end = path.find('/', 1); end != std::string::npos;
+         end = path.find('/', end + 1)) {
         mkdir(path.substr(0, end).c_str(), 0777);
     }
     return mkdir(path.c_str(), 0777) == 0 || errno == EEXIST ? openFolder(path) : -1;
@@ -69,7 +70,7 @@ bool writeAll(int file, std::string_view content) {
         if (written < 0 && errno != EINTR) {
             return false;
         }
-        content.remove_prefix(written > 0 ? static_cast<size_t>(written) : 0);
+        content.remove_prefix(written > 0 ? static_cast<std::size_t>(written) : 0);
     }
     return true;
 }
@@ -125,17 +126,17 @@ void StateFolder::lock() const {
                      "end that process, or name another folder in QITRMC_SIM_STATE"};
 }
 
-std::string StateFolder::filePath(uint64_t generation) const {
+std::string StateFolder::filePath(std::uint64_t generation) const {
     return path + "/" + fileName(generation).data();
 }
 
-std::vector<uint64_t> StateFolder::generations() const {
+std::vector<std::uint64_t> StateFolder::generations() const {
     // Not std::filesystem, which ends the process when it runs out of memory here.
     const std::unique_ptr<DIR, int (*)(DIR*)> list(opendir(path.c_str()), closedir);
-    std::vector<uint64_t> found;
+    std::vector<std::uint64_t> found;
     errno = list ? 0 : errno;
     while (const dirent* file = list ? readdir(list.get()) : nullptr) {
-        const uint64_t generation = generationOf(file->d_name);
+        const std::uint64_t generation = generationOf(file->d_name);
         if (generation != 0) {
             found.push_back(generation);
         }
@@ -148,12 +149,12 @@ std::vector<uint64_t> StateFolder::generations() const {
     return found;
 }
 
-bool StateFolder::has(uint64_t generation) const {
+bool StateFolder::has(std::uint64_t generation) const {
     struct stat facts = {};
     return fstatat(folder, fileName(generation).data(), &facts, 0) == 0 || errno != ENOENT;
 }
 
-std::string StateFolder::read(uint64_t generation) const {
+std::string StateFolder::read(std::uint64_t generation) const {
     const auto refuse = [&] {
         throw StateError{filePath(generation),
                          std::string("cannot be read: ") + std::strerror(errno),
@@ -165,8 +166,8 @@ std::string StateFolder::read(uint64_t generation) const {
     if (file < 0 || fstat(file, &facts) != 0) {
         refuse();
     }
-    std::string content(static_cast<size_t>(facts.st_size), '\0');
-    size_t done = 0;
+    std::string content(static_cast<std::size_t>(facts.st_size), '\0');
+    std::size_t done = 0;
     while (done < content.size()) {
         const ssize_t count = ::read(file, content.data() + done, content.size() - done);
         if (count == 0) {
@@ -175,13 +176,13 @@ std::string StateFolder::read(uint64_t generation) const {
         if (count < 0 && errno != EINTR) {
             refuse();
         }
-        done += count > 0 ? static_cast<size_t>(count) : 0;
+        done += count > 0 ? static_cast<std::size_t>(count) : 0;
     }
     content.resize(done);
     return content;
 }
 
-void StateFolder::write(uint64_t generation, std::string_view content) const {
+void StateFolder::write(std::uint64_t generation, std::string_view content) const {
     const FileName name = fileName(generation);
     const std::string whole = filePath(generation);
     if (getpid() != owner) {
@@ -203,7 +204,7 @@ void StateFolder::write(uint64_t generation, std::string_view content) const {
     }
 }
 
-void StateFolder::remove(uint64_t generation) const noexcept {
+void StateFolder::remove(std::uint64_t generation) const noexcept {
     unlinkat(folder, fileName(generation).data(), 0);
 }
 

@@ -26,7 +26,7 @@ class Descriptor {
 };
 
 // Stands for the file "sessions", which is replaced as a whole, where a generation is wanted.
-inline constexpr uint64_t sessionsFile = 0;
+inline constexpr std::uint64_t sessionsFile = 0;
 
 // The folder in which one process keeps what lasts: a file for each change that still matters,
 // "change-1" and so on, and the file "sessions". Other files in it are left alone.
@@ -36,18 +36,18 @@ class StateFolder {
     // exist. Throws a StateError, for one when another process has it.
     explicit StateFolder(const std::string& path);
 
-    std::string filePath(uint64_t generation) const;
+    std::string filePath(std::uint64_t generation) const;
     // The generations of the files that are there, the oldest first. Throws a StateError.
-    std::vector<uint64_t> generations() const;
-    bool has(uint64_t generation) const;
+    std::vector<std::uint64_t> generations() const;
+    bool has(std::uint64_t generation) const;
     // The content of a file. Throws a StateError.
-    std::string read(uint64_t generation) const;
+    std::string read(std::uint64_t generation) const;
 
     // Makes a file. It is whole and on the disk when this returns. Refuses with stateNotWritten,
     // and then there is no such file of a change.
-    void write(uint64_t generation, std::string_view content) const;
+    void write(std::uint64_t generation, std::string_view content) const;
     // Removes a file if that can be done.
-    void remove(uint64_t generation) const noexcept;
+    void remove(std::uint64_t generation) const noexcept;
 
   private:
     void lock() const;

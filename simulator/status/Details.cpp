@@ -1,8 +1,8 @@
 #include "status/Details.h"
 
-#include <utf8proc.h>
-
 #include <cstdio>
+
+#include "common/utf8.h"
 
 namespace simulator {
 
@@ -36,15 +36,14 @@ std::string quotedList(const std::vector<std::string>& values) {
 std::string quoted(std::string_view text) {
     std::string out = "\"";
     while (!text.empty()) {
-        utf8proc_int32_t point = 0;
-        const auto length = utf8proc_iterate(reinterpret_cast<const utf8proc_uint8_t*>(text.data()),
-                                             static_cast<utf8proc_ssize_t>(text.size()), &point);
-        if (length == 1) {
-            appendEscaped(out, static_cast<unsigned char>(text.front()));
+        const common::Utf8Character character = common::takeCharacter(text);
+        if (!character.isValid()) {
+            out += replacementCharacter;
+        } else if (character.bytes.size() == 1) {
+            appendEscaped(out, static_cast<unsigned char>(character.bytes.front()));
         } else {
-            out += length > 1 ? text.substr(0, static_cast<size_t>(length)) : replacementCharacter;
+            out += character.bytes;
         }
-        text.remove_prefix(length > 0 ? static_cast<size_t>(length) : 1);
     }
     return out += '"';
 }
@@ -63,7 +62,7 @@ void Details::addUsage(std::string_view tag, std::string_view value) {
     addEntry("usage", tag, ",\"value\":" + quoted(value) + ",\"value_type\":\"string\"");
 }
 
-void Details::addUsage(std::string_view tag, uint32_t value) {
+void Details::addUsage(std::string_view tag, std::uint32_t value) {
     addEntry("usage", tag, ",\"value\":" + std::to_string(value) + ",\"value_type\":\"uint32_t\"");
 }
 
@@ -71,7 +70,7 @@ void Details::addUsage(std::string_view tag, const std::vector<std::string>& val
     addEntry("usage", tag, ",\"value\":" + quotedList(values) + ",\"value_type\":\"string\"");
 }
 
-void Details::addUsageEnum(std::string_view tag, int32_t value, uint32_t id) {
+void Details::addUsageEnum(std::string_view tag, std::int32_t value, std::uint32_t id) {
     addEntry("usage", tag,
              ",\"value\":" + std::to_string(value) +
                  ",\"value_type\":{\"type\":\"enum\",\"id\":" + std::to_string(id) + "}");
@@ -89,7 +88,7 @@ void Details::addEmpty() {
     addEntry("empty", "", "");
 }
 
-void Details::addCause(int32_t code, const char* constant, const Details& details) {
+void Details::addCause(std::int32_t code, const char* constant, const Details& details) {
     causes.push_back("{\"code\":" + std::to_string(code) + "," + details.members(constant) + "}");
 }
 

@@ -17,10 +17,10 @@ class Details {
   public:
     // Labelled values. `tag` is the key of the label.
     void addUsage(std::string_view tag, std::string_view value);
-    void addUsage(std::string_view tag, uint32_t value);
+    void addUsage(std::string_view tag, std::uint32_t value);
     void addUsage(std::string_view tag, const std::vector<std::string>& values);
     // A value that the translator shows by the name it has in the enumeration of attribute `id`.
-    void addUsageEnum(std::string_view tag, int32_t value, uint32_t id);
+    void addUsageEnum(std::string_view tag, std::int32_t value, std::uint32_t id);
     // Phrases without a value. `term` is the key of the phrase.
     void addElaboration(std::string_view term);
     void addHeader(std::string_view term);
@@ -28,7 +28,7 @@ class Details {
     void addEmpty();
     // A failure that led to this one. `constant` may be null, here and below. One cause is written
     // as an object, several as an array.
-    void addCause(int32_t code, const char* constant, const Details& details);
+    void addCause(std::int32_t code, const char* constant, const Details& details);
 
     // The whole JSON text of a status.
     std::string text(const char* constant) const;

@@ -4,14 +4,14 @@
 
 namespace simulator {
 
-Refusal::Refusal(int32_t code, std::optional<std::string> name) : reason{code, nullptr} {
+Refusal::Refusal(std::int32_t code, std::optional<std::string> name) : reason{code, nullptr} {
     if (name) {
         constant = std::make_shared<const std::string>(std::move(*name));
         reason.constant = constant->c_str();
     }
 }
 
-Refusal& Refusal::usageEnum(std::string_view tag, int32_t value, uint32_t id) {
+Refusal& Refusal::usageEnum(std::string_view tag, std::int32_t value, std::uint32_t id) {
     details.addUsageEnum(tag, value, id);
     return *this;
 }

@@ -17,14 +17,14 @@ class Refusal {
     explicit Refusal(const Code& code) : reason(code) {}
     // A status that the driver itself does not know. `name` is what its details carry as
     // its constant; they can do without.
-    Refusal(int32_t code, std::optional<std::string> name);
+    Refusal(std::int32_t code, std::optional<std::string> name);
 
     template <typename Value>
     Refusal& usage(std::string_view tag, const Value& value) {
         details.addUsage(tag, value);
         return *this;
     }
-    Refusal& usageEnum(std::string_view tag, int32_t value, uint32_t id);
+    Refusal& usageEnum(std::string_view tag, std::int32_t value, std::uint32_t id);
     Refusal& elaboration(std::string_view term);
     Refusal& header(std::string_view term);
     Refusal& empty();
@@ -33,7 +33,7 @@ class Refusal {
     // Replaces the details by this text, unchanged. It need not be JSON.
     Refusal& ownText(std::string text);
 
-    int32_t code() const { return reason.number; }
+    std::int32_t code() const { return reason.number; }
     std::string text() const { return whole ? *whole : details.text(reason.constant); }
 
   private:

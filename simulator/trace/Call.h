@@ -14,7 +14,7 @@ namespace simulator {
 template <typename Item>
 struct InputArray {
     const Item* items;
-    uint32_t count;
+    std::uint32_t count;
 };
 
 // Where the function puts one value, an array, or bytes in a buffer of the caller.
@@ -25,24 +25,24 @@ struct Output {
 template <typename Item>
 struct OutputArray {
     Item** place;
-    uint32_t* count;
+    std::uint32_t* count;
 };
 struct OutputBytes {
-    uint8_t* buffer;
-    uint32_t size;
+    std::uint8_t* buffer;
+    std::uint32_t size;
 };
 
 // One argument of a call, as passed to the C function.
 struct Argument {
-    using Value =
-        std::variant<uint8_t, uint16_t, uint32_t, uint64_t, int32_t, int64_t, double, const char*,
-                     InputArray<uint8_t>, InputArray<uint32_t>, InputArray<uint64_t>,
-                     InputArray<int32_t>, InputArray<int64_t>, InputArray<double>,
-                     InputArray<const char*>, Output<uint8_t>, Output<uint16_t>, Output<uint32_t>,
-                     Output<uint64_t>, Output<int32_t>, Output<int64_t>, Output<double>,
-                     Output<char*>, OutputArray<uint8_t>, OutputArray<uint32_t>,
-                     OutputArray<uint64_t>, OutputArray<int32_t>, OutputArray<int64_t>,
-                     OutputArray<double>, OutputArray<char*>, OutputBytes>;
+    using Value = std::variant<
+        std::uint8_t, std::uint16_t, std::uint32_t, std::uint64_t, std::int32_t, std::int64_t,
+        double, const char*, InputArray<std::uint8_t>, InputArray<std::uint32_t>,
+        InputArray<std::uint64_t>, InputArray<std::int32_t>, InputArray<std::int64_t>,
+        InputArray<double>, InputArray<const char*>, Output<std::uint8_t>, Output<std::uint16_t>,
+        Output<std::uint32_t>, Output<std::uint64_t>, Output<std::int32_t>, Output<std::int64_t>,
+        Output<double>, Output<char*>, OutputArray<std::uint8_t>, OutputArray<std::uint32_t>,
+        OutputArray<std::uint64_t>, OutputArray<std::int32_t>, OutputArray<std::int64_t>,
+        OutputArray<double>, OutputArray<char*>, OutputBytes>;
 
     // Whether the function puts something there.
     bool isOutput() const { return value.index() >= firstOutput; }
@@ -51,7 +51,7 @@ struct Argument {
     Value value;
 
   private:
-    static constexpr size_t firstOutput = 15;
+    static constexpr std::size_t firstOutput = 15;
 };
 
 // One call of the driver, for traces and faults. It refers to the arguments of the caller, so it is
@@ -71,7 +71,7 @@ class Call {
         return add(name, item);
     }
     template <typename Item>
-    Call& in(const char* name, const Item* items, uint32_t count) {
+    Call& in(const char* name, const Item* items, std::uint32_t count) {
         return add(name, InputArray<Item>{items, count});
     }
     template <typename Item>
@@ -79,10 +79,10 @@ class Call {
         return add(name, Output<Item>{place});
     }
     template <typename Item>
-    Call& out(const char* name, Item** place, uint32_t* count) {
+    Call& out(const char* name, Item** place, std::uint32_t* count) {
         return add(name, OutputArray<Item>{place, count});
     }
-    Call& out(const char* name, uint8_t* buffer, uint32_t size) {
+    Call& out(const char* name, std::uint8_t* buffer, std::uint32_t size) {
         return add(name, OutputBytes{buffer, size});
     }
 
@@ -97,7 +97,7 @@ class Call {
     const Argument* end() const { return arguments.data() + count; }
 
   private:
-    static constexpr size_t most = 6;
+    static constexpr std::size_t most = 6;
 
     Call& add(const char* name, Argument::Value value);
 
@@ -105,7 +105,7 @@ class Call {
     nQITRMCAPI100_Session handle = 0;
     const char* resourceText = nullptr;
     std::array<Argument, most> arguments{};
-    size_t count = 0;
+    std::size_t count = 0;
 };
 
 }  // namespace simulator

@@ -10,8 +10,8 @@ namespace simulator {
 
 namespace {
 
-constexpr size_t longestText = 200;
-constexpr uint32_t mostItems = 16;
+constexpr std::size_t longestText = 200;
+constexpr std::uint32_t mostItems = 16;
 
 std::string itemText(const char* text) {
     if (text == nullptr) {
@@ -35,12 +35,12 @@ std::string itemText(Integer number) {
 }
 
 template <typename Item>
-std::string listText(const Item* items, uint32_t count) {
+std::string listText(const Item* items, std::uint32_t count) {
     if (items == nullptr) {
         return "null";
     }
     std::string text = "[";
-    for (uint32_t i = 0; i < std::min(count, mostItems); ++i) {
+    for (std::uint32_t i = 0; i < std::min(count, mostItems); ++i) {
         text += (i == 0 ? "" : ",") + itemText(items[i]);
     }
     return text + (count > mostItems ? ",...(" + std::to_string(count) + ")]" : "]");

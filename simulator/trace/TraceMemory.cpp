@@ -6,7 +6,7 @@ namespace simulator {
 
 namespace {
 
-constexpr size_t mostLines = 2000;
+constexpr std::size_t mostLines = 2000;
 constexpr std::chrono::seconds patience(10);
 
 }  // namespace
@@ -29,13 +29,13 @@ void TraceMemory::keep(const std::string& line) {
     }
 }
 
-TraceMemory::Lines TraceMemory::read(uint64_t from) {
+TraceMemory::Lines TraceMemory::read(std::uint64_t from) {
     const std::lock_guard<std::mutex> lock(mutex);
     lastRead = Clock::now();
     on = true;
     Lines result;
     result.next = first + kept.size();
-    const uint64_t begin = from < first || from > result.next ? first : from;
+    const std::uint64_t begin = from < first || from > result.next ? first : from;
     result.lines.assign(kept.begin() + static_cast<std::ptrdiff_t>(begin - first), kept.end());
     return result;
 }

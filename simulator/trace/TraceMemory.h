@@ -16,7 +16,7 @@ class TraceMemory {
   public:
     struct Lines {
         std::vector<std::string> lines;
-        uint64_t next = 0;  // the number of the first line that is not there yet
+        std::uint64_t next = 0;  // the number of the first line that is not there yet
     };
 
     // Whether lines are kept at the moment.
@@ -27,7 +27,7 @@ class TraceMemory {
 
     // The lines that are kept, from a number on. Lines are numbered from 0; a number that is not
     // there yet means the oldest line.
-    Lines read(uint64_t from);
+    Lines read(std::uint64_t from);
 
   private:
     using Clock = std::chrono::steady_clock;
@@ -35,7 +35,7 @@ class TraceMemory {
     std::atomic<bool> on{false};
     std::mutex mutex;
     Clock::time_point lastRead;
-    uint64_t first = 0;  // the number of the oldest line
+    std::uint64_t first = 0;  // the number of the oldest line
     std::deque<std::string> kept;
 };
 

@@ -13,14 +13,11 @@ FILES_WITH_UNDERSCORES = {"luaopen_stdint.h", "stdpath_util.cpp", "stdpath_util.
                           "relocations_complete.cpp", "relocations_lacking.cpp",
                           "relocations_unresolved.cpp"}
 
-# Of these the types and the enumerators keep their own spelling for now.
-OUTSIDE_SIMULATOR = [path for path in cpp_files() if "simulator" not in path.parts]
-
 TEST = r"^(?:TYPED_)?TEST(?:_F|_P)?\(\s*(\w+),\s*(\w+)"
 
 
 def test_fixed_width_integers_and_sizes_are_those_of_std():
-    assert matches(r"(?<![:\w])(u?int(8|16|32|64)_t|size_t|ptrdiff_t|u?intptr_t)\b", OUTSIDE_SIMULATOR) == []
+    assert matches(r"(?<![:\w])(u?int(8|16|32|64)_t|size_t|ptrdiff_t|u?intptr_t)\b", cpp_files()) == []
 
 
 def test_constants_are_written_as_variables_are():
@@ -29,7 +26,7 @@ def test_constants_are_written_as_variables_are():
 
 
 def test_enumerators_are_written_as_types_are():
-    bodies = matches(r"\benum class \w+[^{;]*\{[^}]*\}", OUTSIDE_SIMULATOR)
+    bodies = matches(r"\benum class \w+[^{;]*\{[^}]*\}", cpp_files())
     names = [name for body in bodies for name in re.findall(r"[{,]\s*(\w+)", body)]
     assert "PhysicalChannel" in names
     assert [name for name in names if not name[0].isupper()] == []

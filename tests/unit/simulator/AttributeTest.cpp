@@ -33,16 +33,16 @@ class Opened {
         nQITRMCAPI100_freeString(given);
         return copy;
     }
-    int32_t number(const char* attribute) const {
+    std::int32_t number(const char* attribute) const {
         Status status;
-        int32_t value = -99;
+        std::int32_t value = -99;
         nQITRMCAPI100_getPropertyPropertyInt32(handle, attribute, &value, &status);
         EXPECT_EQ(status.code, 0) << status.text();
         return value;
     }
     bool flag(const char* attribute) const {
         Status status;
-        uint8_t value = 99;
+        std::uint8_t value = 99;
         nQITRMCAPI100_getPropertyPropertyBool(handle, attribute, &value, &status);
         EXPECT_EQ(status.code, 0) << status.text();
         return value != 0;
@@ -77,7 +77,7 @@ TEST_F(AttributeTest, MissingTextsAreEmpty) {
 }
 
 TEST_F(AttributeTest, DataTypesHaveTheirNumbers) {
-    const std::vector<std::pair<const char*, int32_t>> types{
+    const std::vector<std::pair<const char*, std::int32_t>> types{
         {"DMM.AutoRange", 1},    {"DMM.Range", 2},       {"DMM.Offset", 3},
         {"DMM.TriggerDelay", 4}, {"DMM.Note", 5},        {"DMM.SampleCount", 6},
         {"DMM.TriggerCount", 7}, {"DMM.InputsInUse", 8}, {"DMM.Readings", 9},
@@ -93,11 +93,12 @@ TEST_F(AttributeTest, AnEnumerationIsListedInItsOrder) {
     EXPECT_TRUE(function.flag("Prop.IsEnum"));
     EXPECT_EQ(function.text("Prop.Enum.Name"), "MeasurementFunction");
     Status status;
-    int32_t* numbers = nullptr;
-    uint32_t count = 0;
+    std::int32_t* numbers = nullptr;
+    std::uint32_t count = 0;
     nQITRMCAPI100_getPropertyPropertyInt32Array(function.handle, "Prop.Enum.Values", &numbers,
                                                 &count, &status);
-    EXPECT_EQ(std::vector<int32_t>(numbers, numbers + count), (std::vector<int32_t>{0, 1, 2, 10}));
+    EXPECT_EQ(std::vector<std::int32_t>(numbers, numbers + count),
+              (std::vector<std::int32_t>{0, 1, 2, 10}));
     nQITRMCAPI100_freeArray(numbers);
     char** names = nullptr;
     nQITRMCAPI100_getPropertyPropertyStringArray(function.handle, "Prop.Enum.ValueNames", &names,
@@ -158,7 +159,7 @@ TEST_F(AttributeTest, AClosedHandleIsRefused) {
     nQITRMCAPI100_closeProperty(handle, &twice);
     EXPECT_EQ(twice.code, -250973);
     Status read;
-    int32_t value = 0;
+    std::int32_t value = 0;
     nQITRMCAPI100_getPropertyPropertyInt32(handle, "Prop.DataType", &value, &read);
     EXPECT_EQ(read.code, -250973);
 }
@@ -186,7 +187,7 @@ TEST_F(AttributeTest, EnumerationsOfTheDriverTranslateBothWays) {
                                  "String",      "UInt32",     "UInt64",     "BoolArray",
                                  "DoubleArray", "Int32Array", "Int64Array", "StringArray",
                                  "UInt32Array", "UInt64Array"};
-    for (int32_t number = 1; number <= 14; ++number) {
+    for (std::int32_t number = 1; number <= 14; ++number) {
         EXPECT_STREQ(nQITRMCAPI100_translateStaticEnumValueToString("DataType", number),
                      types[number - 1]);
         EXPECT_EQ(nQITRMCAPI100_translateStaticEnumStringToValue("DataType", types[number - 1]),

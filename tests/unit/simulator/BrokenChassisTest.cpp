@@ -131,7 +131,7 @@ TEST(BrokenChassisTest, ALongTextIsCutBetweenCharactersAndNotInsideOne) {
     const std::string rest(30, 'y');
     // Characters of two, three and four bytes, once crossing byte 40 and once ending there.
     for (const std::string character : {"\xC3\xA9", "\xE2\x82\xAC", "\xF0\x9F\x98\x80"}) {
-        for (size_t inside = 1; inside < character.size(); ++inside) {
+        for (std::size_t inside = 1; inside < character.size(); ++inside) {
             expectShown(std::string(40 - inside, 'x'), character + rest);
         }
         expectShown(std::string(40 - character.size(), 'x') + character, rest);

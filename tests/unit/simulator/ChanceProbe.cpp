@@ -1,17 +1,18 @@
 // Executes a command 256 times, and prints a digit for each time: 1 where it fails. Another command
 // is executed in between.
 
+#include <cstdint>
 #include <cstdio>
 
 #include "qitrmcapi.h"
 
 namespace {
 
-int32_t refuseToGrow(qierr_Status*, uint32_t) {
+std::int32_t refuseToGrow(qierr_Status*, std::uint32_t) {
     return 0;
 }
 
-int32_t execute(nQITRMCAPI100_Session session, const char* device, const char* command) {
+std::int32_t execute(nQITRMCAPI100_Session session, const char* device, const char* command) {
     qierr_Status status{0, 0, refuseToGrow, nullptr};
     nQITRMCAPI100_executeGenericCommand(session, device, command, 0.0, &status);
     return status.code;

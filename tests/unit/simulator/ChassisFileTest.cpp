@@ -88,13 +88,13 @@ TEST(ChassisFileTest, TheFileAddsPropertiesOfTheDriver) {
     EXPECT_EQ(session.systemList("Sys.DeviceProperties").back(), "Dev.Phase");
     EXPECT_EQ(get(getInt32, session, "Slow", "Dev.Phase"), 0);
     EXPECT_EQ(get(getDouble, session, "Größe/Kanal3", "PhysChan.Gain"), 4.0);
-    EXPECT_EQ(get(getUInt64, session, "Größe/cal1", "NVMEMArea.Wear"), uint64_t{3});
+    EXPECT_EQ(get(getUInt64, session, "Größe/cal1", "NVMEMArea.Wear"), std::uint64_t{3});
 }
 
 TEST(ChassisFileTest, TheFileSetsValues) {
     Session session;
     Status status;
-    uint8_t simulated = 1;
+    std::uint8_t simulated = 1;
     nQITRMCAPI100_getSystemPropertyBool(session, "Sys.Simulated", &simulated, &status);
     EXPECT_EQ(simulated, 0);
     double gain = 0;
@@ -110,7 +110,7 @@ TEST(ChassisFileTest, AddedNumbersWrapAround) {
     nQITRMCAPI100_executeGenericCommand(session, "Counter", "Count", 1.0, &status);
     EXPECT_EQ(status.code, 0) << status.text();
     EXPECT_EQ(get(getInt32, session, "Counter", "Count.Signed"), -2147483647 - 1);
-    EXPECT_EQ(get(getUInt64, session, "Counter", "Count.Unsigned"), uint64_t{1});
+    EXPECT_EQ(get(getUInt64, session, "Counter", "Count.Unsigned"), std::uint64_t{1});
     EXPECT_EQ(get(getDouble, session, "Counter", "Count.Real"), -0.25);
 }
 

@@ -17,15 +17,15 @@ TEST_F(CommandTest, ResourcesListTheirCommands) {
 TEST_F(CommandTest, ACommandActsOnItsResource) {
     EXPECT_EQ(execute(session, "Mod2/ch1", "PSU.On", 0.0).code, 0);
     EXPECT_EQ(getArray(getBools, session, "Mod2/ch0:1", "PSU.OutputEnabled"),
-              (std::vector<uint8_t>{0, 1}));
+              (std::vector<std::uint8_t>{0, 1}));
 }
 
 TEST_F(CommandTest, ACommandActsOnEachResourceOnce) {
     EXPECT_EQ(execute(session, "Mod1,mod1", "DMM.Trigger", 0.0).code, 0);
-    EXPECT_EQ(get(getUInt64, session, "Mod1", "DMM.TriggerCount"), uint64_t{1});
+    EXPECT_EQ(get(getUInt64, session, "Mod1", "DMM.TriggerCount"), std::uint64_t{1});
     EXPECT_EQ(execute(session, "Mod2/ch0:1", "PSU.On", 0.0).code, 0);
     EXPECT_EQ(getArray(getBools, session, "Mod2/ch0:1", "PSU.OutputEnabled"),
-              (std::vector<uint8_t>{1, 1}));
+              (std::vector<std::uint8_t>{1, 1}));
 }
 
 TEST_F(CommandTest, ACommandMayResetSettings) {
@@ -55,7 +55,7 @@ TEST_F(CommandTest, AnUnknownCommandIsRefusedWithItsResource) {
     EXPECT_EQ(outcome.text,
               detailsOf("unknownCommand", usage("CommandName", "\"DMM.Trigger\"") + "," +
                                               usage("ResourceName", "\"Mod2\"")));
-    EXPECT_EQ(get(getUInt64, session, "Mod1", "DMM.TriggerCount"), uint64_t{0});
+    EXPECT_EQ(get(getUInt64, session, "Mod1", "DMM.TriggerCount"), std::uint64_t{0});
 }
 
 TEST_F(CommandTest, AMisspeltCommandIsRefusedWithTheNearestName) {

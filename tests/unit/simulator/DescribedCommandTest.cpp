@@ -13,11 +13,11 @@ class DescribedCommandTest : public testing::Test {
   protected:
     ~DescribedCommandTest() override { EXPECT_EQ(resetDevices(session, "Unit"), 0); }
 
-    int32_t run(const char* command, const char* resources = "Unit") {
+    std::int32_t run(const char* command, const char* resources = "Unit") {
         return execute(session, resources, command, 1.0).code;
     }
-    uint32_t runs() { return get(getUInt32, session, "Unit", "Runs").value; }
-    uint64_t cycles() { return get(getUInt64, session, "Unit", "Cycles").value; }
+    std::uint32_t runs() { return get(getUInt32, session, "Unit", "Runs").value; }
+    std::uint64_t cycles() { return get(getUInt64, session, "Unit", "Cycles").value; }
 
     Session session{"Unit"};
 };
@@ -64,7 +64,7 @@ TEST_F(DescribedCommandTest, APropertyOfAFailureMayBeAnArrayOrSecret) {
 }
 
 TEST_F(DescribedCommandTest, EachThirdExecutionFails) {
-    for (const int32_t expected : {0, 0, -3, 0, 0, -3}) {
+    for (const std::int32_t expected : {0, 0, -3, 0, 0, -3}) {
         EXPECT_EQ(run("Third"), expected);
     }
     EXPECT_EQ(runs(), 4u);
@@ -132,7 +132,7 @@ TEST_F(DescribedCommandTest, AChannelCountsOnItsDevice) {
 }
 
 TEST_F(DescribedCommandTest, AFailureOfOneResourceLeavesAllWithoutEffect) {
-    EXPECT_EQ(set(setBool, session, "Unit/ch1", "Fault", uint8_t{1}).code, 0);
+    EXPECT_EQ(set(setBool, session, "Unit/ch1", "Fault", std::uint8_t{1}).code, 0);
     EXPECT_EQ(run("Switch", "Unit/ch0:1"), -6);
     EXPECT_EQ(getArray(getDoubles, session, "Unit/ch0:1", "Level"),
               (std::vector<double>{0.0, 0.0}));

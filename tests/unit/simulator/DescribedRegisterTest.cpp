@@ -13,7 +13,7 @@ class DescribedRegisterTest : public testing::Test {
   protected:
     ~DescribedRegisterTest() override { EXPECT_EQ(resetDevices(session, "Unit"), 0); }
 
-    uint64_t at(uint32_t address, uint32_t bits) {
+    std::uint64_t at(std::uint32_t address, std::uint32_t bits) {
         switch (bits) {
             case 8:
                 return checked(read(read8, session, "Unit", address));
@@ -25,16 +25,16 @@ class DescribedRegisterTest : public testing::Test {
                 return checked(read(read64, session, "Unit", address));
         }
     }
-    Outcome put(uint32_t address, uint32_t value) {
+    Outcome put(std::uint32_t address, std::uint32_t value) {
         return tryWrite(write32, session, "Unit", address, value);
     }
-    uint32_t runs() { return get(getUInt32, session, "Unit", "Runs").value; }
+    std::uint32_t runs() { return get(getUInt32, session, "Unit", "Runs").value; }
 
     Session session{"Unit"};
 
   private:
     template <typename Number>
-    static uint64_t checked(const Answer<Number>& answer) {
+    static std::uint64_t checked(const Answer<Number>& answer) {
         EXPECT_EQ(answer.code, 0) << answer.text;
         return answer.value;
     }
@@ -52,26 +52,26 @@ TEST_F(DescribedRegisterTest, BytesAreClearedAfterTheyAreRead) {
     EXPECT_EQ(at(8, 8), 0x09u);
     EXPECT_EQ(at(8, 32), 0x0c0b0a00u);
     EXPECT_EQ(at(12, 32), 0x100f0e0du);
-    EXPECT_EQ(write(write8, session, "Unit", 3, uint8_t{7}), 0);
+    EXPECT_EQ(write(write8, session, "Unit", 3, std::uint8_t{7}), 0);
     EXPECT_EQ(at(0, 32), 0x07000000u);
     EXPECT_EQ(at(0, 32), 0u);
 }
 
 TEST_F(DescribedRegisterTest, OneOfManyReadersGetsABitThatReadingClears) {
     EXPECT_EQ(at(0, 64), 0x0807060504030201u);
-    constexpr uint32_t writes = 100;
-    std::atomic<uint32_t> seen{0};
+    constexpr std::uint32_t writes = 100;
+    std::atomic<std::uint32_t> seen{0};
     std::atomic<bool> stopped{false};
     std::vector<std::thread> readers;
     for (int i = 0; i < 3; ++i) {
         readers.emplace_back([&] {
             while (!stopped) {
-                seen += static_cast<uint32_t>(at(0, 8));
+                seen += static_cast<std::uint32_t>(at(0, 8));
             }
         });
     }
-    for (uint32_t i = 0; i < writes; ++i) {
-        EXPECT_EQ(write(write8, session, "Unit", 0, uint8_t{1}), 0);
+    for (std::uint32_t i = 0; i < writes; ++i) {
+        EXPECT_EQ(write(write8, session, "Unit", 0, std::uint8_t{1}), 0);
         while (seen <= i) {
             std::this_thread::yield();
         }
@@ -85,27 +85,27 @@ TEST_F(DescribedRegisterTest, OneOfManyReadersGetsABitThatReadingClears) {
 
 TEST_F(DescribedRegisterTest, APartialWriteDoesNotStoreTheNoiseOfTheOtherBytes) {
     for (int i = 0; i < 20; ++i) {
-        EXPECT_EQ(write(write32, session, "Unit", 640, uint32_t{0x100}), 0);
-        EXPECT_EQ(write(write8, session, "Unit", 640, uint8_t{0x50}), 0);
+        EXPECT_EQ(write(write32, session, "Unit", 640, std::uint32_t{0x100}), 0);
+        EXPECT_EQ(write(write8, session, "Unit", 640, std::uint8_t{0x50}), 0);
         // The value read has noise with a standard deviation of 6, limited to six times that.
         EXPECT_NEAR(static_cast<double>(at(640, 32)), 0x150, 36.0);
     }
 }
 
 TEST_F(DescribedRegisterTest, WritingOnesClearsTheirBits) {
-    EXPECT_EQ(write(write8, session, "Unit", 16, uint8_t{0x0f}), 0);
-    EXPECT_EQ(write(write16, session, "Unit", 18, uint16_t{0x8001}), 0);
+    EXPECT_EQ(write(write8, session, "Unit", 16, std::uint8_t{0x0f}), 0);
+    EXPECT_EQ(write(write16, session, "Unit", 18, std::uint16_t{0x8001}), 0);
     EXPECT_EQ(at(16, 64), 0xffffffff7ffefff0u);
-    EXPECT_EQ(write(write64, session, "Unit", 16, uint64_t{0}), 0);
+    EXPECT_EQ(write(write64, session, "Unit", 16, std::uint64_t{0}), 0);
     EXPECT_EQ(at(16, 64), 0xffffffff7ffefff0u);
-    EXPECT_EQ(write(write64, session, "Unit", 16, ~uint64_t{0}), 0);
+    EXPECT_EQ(write(write64, session, "Unit", 16, ~std::uint64_t{0}), 0);
     EXPECT_EQ(at(16, 64), 0u);
     EXPECT_EQ(resetDevices(session, "Unit"), 0);
-    EXPECT_EQ(at(16, 64), ~uint64_t{0});
+    EXPECT_EQ(at(16, 64), ~std::uint64_t{0});
 }
 
 TEST_F(DescribedRegisterTest, AWriteOnlyRegisterIsNotRead) {
-    EXPECT_EQ(write(write64, session, "Unit", 24, uint64_t{1}), 0);
+    EXPECT_EQ(write(write64, session, "Unit", 24, std::uint64_t{1}), 0);
     const auto answer = read(read16, session, "Unit", 26);
     EXPECT_EQ(answer.code, -250935);
     EXPECT_EQ(answer.text, detailsOf("writeOnlyRegister", atRegister(26)));
@@ -122,8 +122,8 @@ TEST_F(DescribedRegisterTest, OnlyTheWidthOfTheBlockIsAllowed) {
     EXPECT_EQ(narrow.text, detailsOf("unmappedRegister", where(40, 32)));
     EXPECT_EQ(read(read8, session, "Unit", 34).code, -250978);
     EXPECT_EQ(read(read16, session, "Unit", 36).code, -250978);
-    EXPECT_EQ(write(write32, session, "Unit", 44, uint32_t{1}), -250978);
-    EXPECT_EQ(write(write8, session, "Unit", 40, uint8_t{1}), -250978);
+    EXPECT_EQ(write(write32, session, "Unit", 44, std::uint32_t{1}), -250978);
+    EXPECT_EQ(write(write8, session, "Unit", 40, std::uint8_t{1}), -250978);
     EXPECT_EQ(at(40, 64), 0u);
 }
 
@@ -167,39 +167,39 @@ TEST_F(DescribedRegisterTest, RealNumbersAreBinaryFloatingPoint) {
 TEST_F(DescribedRegisterTest, BooleansAreOneOrZero) {
     EXPECT_EQ(at(147, 8), 1u);
     EXPECT_EQ(at(148, 32), 1u);
-    EXPECT_EQ(write(write8, session, "Unit", 147, uint8_t{0}), 0);
+    EXPECT_EQ(write(write8, session, "Unit", 147, std::uint8_t{0}), 0);
     EXPECT_EQ(at(148, 32), 0u);
     EXPECT_EQ(put(148, 0x100).code, 0);
-    EXPECT_EQ(get(getBool, session, "Unit", "Flag"), uint8_t{1});
+    EXPECT_EQ(get(getBool, session, "Unit", "Flag"), std::uint8_t{1});
     EXPECT_EQ(at(148, 32), 1u);
 }
 
 TEST_F(DescribedRegisterTest, WritingARegisterWritesItsProperty) {
-    EXPECT_EQ(write(write64, session, "Unit", 152, uint64_t{0xc059000000000000}), 0);
+    EXPECT_EQ(write(write64, session, "Unit", 152, std::uint64_t{0xc059000000000000}), 0);
     EXPECT_EQ(get(getDouble, session, "Unit", "Gain"), -100.0);
     EXPECT_EQ(put(160, 0x42c80000).code, 0);
     EXPECT_EQ(get(getDouble, session, "Unit", "Gain"), 100.0);
     EXPECT_EQ(put(140, 0x80000000).code, 0);
     EXPECT_EQ(get(getInt32, session, "Unit", "Signed"), -2147483647 - 1);
-    EXPECT_EQ(write(write16, session, "Unit", 144, uint16_t{0x8000}), 0);
+    EXPECT_EQ(write(write16, session, "Unit", 144, std::uint16_t{0x8000}), 0);
     EXPECT_EQ(get(getInt32, session, "Unit", "Signed"), -32768);
-    EXPECT_EQ(write(write16, session, "Unit", 144, uint16_t{0x7fff}), 0);
+    EXPECT_EQ(write(write16, session, "Unit", 144, std::uint16_t{0x7fff}), 0);
     EXPECT_EQ(get(getInt32, session, "Unit", "Signed"), 32767);
-    EXPECT_EQ(write(write8, session, "Unit", 146, uint8_t{0xff}), 0);
+    EXPECT_EQ(write(write8, session, "Unit", 146, std::uint8_t{0xff}), 0);
     EXPECT_EQ(get(getInt32, session, "Unit", "Signed"), -1);
-    EXPECT_EQ(write(write16, session, "Unit", 180, uint16_t{0xff00}), 0);
-    EXPECT_EQ(get(getInt64, session, "Unit", "Long"), int64_t{-256});
+    EXPECT_EQ(write(write16, session, "Unit", 180, std::uint16_t{0xff00}), 0);
+    EXPECT_EQ(get(getInt64, session, "Unit", "Long"), std::int64_t{-256});
 }
 
 TEST_F(DescribedRegisterTest, WritingAPartOfAValueKeepsTheRest) {
-    EXPECT_EQ(write(write8, session, "Unit", 129, uint8_t{0xff}), 0);
-    EXPECT_EQ(get(getUInt64, session, "Unit", "Wide"), uint64_t{0x010203040506ff08});
-    EXPECT_EQ(write(write16, session, "Unit", 134, uint16_t{0xabcd}), 0);
-    EXPECT_EQ(get(getUInt64, session, "Unit", "Wide"), uint64_t{0xabcd03040506ff08});
+    EXPECT_EQ(write(write8, session, "Unit", 129, std::uint8_t{0xff}), 0);
+    EXPECT_EQ(get(getUInt64, session, "Unit", "Wide"), std::uint64_t{0x010203040506ff08});
+    EXPECT_EQ(write(write16, session, "Unit", 134, std::uint16_t{0xabcd}), 0);
+    EXPECT_EQ(get(getUInt64, session, "Unit", "Wide"), std::uint64_t{0xabcd03040506ff08});
 }
 
 TEST_F(DescribedRegisterTest, ARegisterShowsAPropertyOfAChannel) {
-    EXPECT_EQ(write(write64, session, "Unit", 512, uint64_t{0x4014000000000000}), 0);
+    EXPECT_EQ(write(write64, session, "Unit", 512, std::uint64_t{0x4014000000000000}), 0);
     EXPECT_EQ(getArray(getDoubles, session, "Unit/ch0:1", "Level"),
               (std::vector<double>{0.0, 5.0}));
     EXPECT_EQ(resetDevices(session, "Unit"), 0);
@@ -238,8 +238,8 @@ TEST_F(DescribedRegisterTest, TheAccessOfTheBlockIsCheckedFirst) {
 }
 
 TEST_F(DescribedRegisterTest, APendingValueIsShownAfterItsCommit) {
-    EXPECT_EQ(write(write8, session, "Unit", 168, uint8_t{0x11}), 0);
-    EXPECT_EQ(write(write8, session, "Unit", 169, uint8_t{0x22}), 0);
+    EXPECT_EQ(write(write8, session, "Unit", 168, std::uint8_t{0x11}), 0);
+    EXPECT_EQ(write(write8, session, "Unit", 169, std::uint8_t{0x22}), 0);
     EXPECT_EQ(at(168, 32), 1u);
     Status status;
     nQITRMCAPI100_commitPropertiesGeneric(session, "Unit", &status);
@@ -250,8 +250,8 @@ TEST_F(DescribedRegisterTest, APendingValueIsShownAfterItsCommit) {
 
 TEST_F(DescribedRegisterTest, WritingAPropertyNeedsWriteAccessToTheDevice) {
     Session other;
-    EXPECT_EQ(write(write32, other, "Unit", 140, uint32_t{1}), -250811);
-    EXPECT_EQ(write(write32, other, "Unit", 48, uint32_t{1}), -250811);
+    EXPECT_EQ(write(write32, other, "Unit", 140, std::uint32_t{1}), -250811);
+    EXPECT_EQ(write(write32, other, "Unit", 48, std::uint32_t{1}), -250811);
     EXPECT_EQ(read(read32, other, "Unit", 140), 0xfffffffeu);
     EXPECT_EQ(runs(), 0u);
 }
@@ -260,7 +260,7 @@ TEST_F(DescribedRegisterTest, AWriteRunsACommand) {
     EXPECT_EQ(put(48, 0x01020304).code, 0);
     EXPECT_EQ(runs(), 1u);
     EXPECT_EQ(at(48, 32), 0x01020304u);
-    EXPECT_EQ(write(write8, session, "Unit", 51, uint8_t{0}), 0);
+    EXPECT_EQ(write(write8, session, "Unit", 51, std::uint8_t{0}), 0);
     EXPECT_EQ(runs(), 2u);
     EXPECT_EQ(at(48, 32), 0x00020304u);
     EXPECT_EQ(runs(), 2u);

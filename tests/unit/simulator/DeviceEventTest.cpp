@@ -9,36 +9,36 @@ using namespace drivertest;
 
 namespace {
 
-constexpr int32_t deviceRemoved = -250940;
-constexpr int32_t connectionLost = -250941;
-constexpr int32_t deviceUnreachable = -250988;
+constexpr std::int32_t deviceRemoved = -250940;
+constexpr std::int32_t connectionLost = -250941;
+constexpr std::int32_t deviceUnreachable = -250988;
 
 const std::string pulled = "{\"events\":[{\"device\":\"Mod2\",\"event\":\"pulled\"}]}";
 const std::string lost = "{\"events\":[{\"device\":\"Mod2\",\"event\":\"connection_lost\"}]}";
 
 class DeviceEventTest : public BenchTest {
   protected:
-    int32_t readTemperature(const char* device) {
+    std::int32_t readTemperature(const char* device) {
         return get(getDouble, session, device, "Dev.Temperature").code;
     }
-    int32_t connect(const char* devices) {
+    std::int32_t connect(const char* devices) {
         Status status;
         nQITRMCAPI100_connectToDevices(session, devices, 0.0, &status);
         return status.code;
     }
-    int32_t codeOf(void (*function)(Handle, const char*, qierr_Status*), const char* names) {
+    std::int32_t codeOf(void (*function)(Handle, const char*, qierr_Status*), const char* names) {
         Status status;
         function(session, names, &status);
         return status.code;
     }
-    uint64_t changeCount() {
+    std::uint64_t changeCount() {
         Status status;
-        uint64_t count = 0;
+        std::uint64_t count = 0;
         nQITRMCAPI100_getSystemPropertyUInt64(session, "Sys.ConfigChangeCount", &count, &status);
         return count;
     }
     // Every kind of operation on Mod2 and its parts.
-    std::vector<int32_t> codesOfOperations() {
+    std::vector<std::int32_t> codesOfOperations() {
         Status writing;
         nQITRMCAPI100_writeRegisterUInt8(session, "Mod2", 256, 1, &writing);
         Status executing;
@@ -73,7 +73,7 @@ class DeviceEventTest : public BenchTest {
 
 TEST_F(DeviceEventTest, OperationsOnARemovedModuleFail) {
     const FaultsInForce faults(pulled);
-    EXPECT_EQ(codesOfOperations(), std::vector<int32_t>(16, deviceRemoved));
+    EXPECT_EQ(codesOfOperations(), std::vector<std::int32_t>(16, deviceRemoved));
     EXPECT_EQ(connect("Mod2"), deviceRemoved);
     EXPECT_EQ(get(getDouble, session, "Mod2", "Dev.Temperature").text,
               detailsOf("deviceRemoved", usage("Device", "\"Mod2\"")));
@@ -82,7 +82,7 @@ TEST_F(DeviceEventTest, OperationsOnARemovedModuleFail) {
 
 TEST_F(DeviceEventTest, OperationsOnALostDeviceFail) {
     const FaultsInForce faults(lost);
-    EXPECT_EQ(codesOfOperations(), std::vector<int32_t>(16, connectionLost));
+    EXPECT_EQ(codesOfOperations(), std::vector<std::int32_t>(16, connectionLost));
     EXPECT_EQ(get(getDouble, session, "Mod2/ch1", "PSU.Voltage").text,
               detailsOf("connectionLost", usage("Device", "\"Mod2\"")));
     EXPECT_EQ(readTemperature("Mod1"), 0);
@@ -173,7 +173,7 @@ TEST_F(DeviceEventTest, AnInsertedModuleIsInItsStateAfterPowerOn) {
     ASSERT_EQ(set(setDouble, session, "Mod2/ch0", "PSU.CurrentLimit", 2.0).code, 0);
     Status writing;
     nQITRMCAPI100_writeRegisterUInt8(session, "Mod2", 256, 7, &writing);
-    const uint8_t bytes[] = {1, 2};
+    const std::uint8_t bytes[] = {1, 2};
     nQITRMCAPI100_setNvmemBytes(session, "Mod2/user", 0, bytes, 1, "", "", &writing);
     nQITRMCAPI100_commitNvmemGeneric(session, "Mod2/user", &writing);
     nQITRMCAPI100_setNvmemBytes(session, "Mod2/user", 1, bytes + 1, 1, "", "", &writing);
@@ -184,14 +184,14 @@ TEST_F(DeviceEventTest, AnInsertedModuleIsInItsStateAfterPowerOn) {
     EXPECT_EQ(codeOf(nQITRMCAPI100_commitPropertiesGeneric, "Supply"), 0);
     EXPECT_EQ(get(getDouble, session, "Supply/ch0", "PSU.CurrentLimit"), 0.1);
     Status reading;
-    uint8_t value = 9;
+    std::uint8_t value = 9;
     nQITRMCAPI100_readRegisterUInt8(session, "Supply", 256, &value, &reading);
     EXPECT_EQ(value, 0);
-    uint8_t content[] = {9, 9};
+    std::uint8_t content[] = {9, 9};
     nQITRMCAPI100_getNvmemBytes(session, "Supply/user", 0, content, 2, &reading);
     EXPECT_EQ(reading.code, 0) << reading.text();
     EXPECT_EQ(std::vector<int>(content, content + 2), (std::vector<int>{1, 0}));
-    const uint8_t nothing = 0;
+    const std::uint8_t nothing = 0;
     nQITRMCAPI100_setNvmemBytes(session, "Supply/user", 0, &nothing, 1, "", "", &reading);
     nQITRMCAPI100_commitNvmemGeneric(session, "Supply/user", &reading);
     nQITRMCAPI100_renameDevice(session, "Supply", "Mod2", &reading);
@@ -206,7 +206,7 @@ TEST_F(DeviceEventTest, TheNameOfARemovedModuleStaysReserved) {
 }
 
 TEST_F(DeviceEventTest, RemovingAndInsertingChangeTheConfiguration) {
-    const uint64_t before = changeCount();
+    const std::uint64_t before = changeCount();
     {
         const FaultsInForce faults(pulled);
         EXPECT_EQ(changeCount(), before + 1);
@@ -218,7 +218,7 @@ TEST_F(DeviceEventTest, RemovingAndInsertingChangeTheConfiguration) {
 
 TEST_F(DeviceEventTest, AnEventInTheOldAndTheNewPlanContinues) {
     FaultsInForce faults(pulled);
-    const uint64_t before = changeCount();
+    const std::uint64_t before = changeCount();
     faults.replace(pulled);
     EXPECT_EQ(changeCount(), before);
     EXPECT_EQ(readTemperature("Mod2"), deviceRemoved);

@@ -121,12 +121,12 @@ TEST_F(DeviceTest, TwoDevicesCanSwapTheirNames) {
 TEST_F(DeviceTest, RenamesAreCounted) {
     const auto changes = [&] {
         Status status;
-        uint64_t count = 0;
+        std::uint64_t count = 0;
         nQITRMCAPI100_getSystemPropertyUInt64(session, "Sys.ConfigChangeCount", &count, &status);
         EXPECT_EQ(status.code, 0) << status.text();
         return count;
     };
-    const uint64_t before = changes();
+    const std::uint64_t before = changes();
     EXPECT_EQ(rename(session, "Bench", "Rack").code, 0);
     EXPECT_EQ(rename(session, "Rack", "Bench").code, 0);
     EXPECT_EQ(rename(session, "Bench", "Mod1").code, -250986);

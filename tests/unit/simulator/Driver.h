@@ -26,7 +26,7 @@ class Status : public qierr_Status {
         EXPECT_GE(capacity, 3u);
         const std::string content(json);
         EXPECT_EQ(json[capacity - 1], 'J');
-        for (uint32_t i = static_cast<uint32_t>(content.size()); i + 1 < capacity; ++i) {
+        for (std::uint32_t i = static_cast<std::uint32_t>(content.size()); i + 1 < capacity; ++i) {
             EXPECT_EQ(json[i], '\0') << "at byte " << i;
         }
         return content;
@@ -35,10 +35,10 @@ class Status : public qierr_Status {
     // Makes every later growth fail.
     void starve() { reallocJson = &Status::refuse; }
 
-    uint32_t growths = 0;
+    std::uint32_t growths = 0;
 
   private:
-    static int32_t grow(qierr_Status* status, uint32_t size) {
+    static std::int32_t grow(qierr_Status* status, std::uint32_t size) {
         auto& self = *static_cast<Status*>(status);
         ++self.growths;
         auto* bigger = static_cast<char*>(std::calloc(1, size));
@@ -51,7 +51,7 @@ class Status : public qierr_Status {
         self.capacity = size;
         return 1;
     }
-    static int32_t refuse(qierr_Status*, uint32_t) { return 0; }
+    static std::int32_t refuse(qierr_Status*, std::uint32_t) { return 0; }
 };
 
 // The text of a status with one labelled value or none.
@@ -69,7 +69,7 @@ inline std::string usage(const std::string& tag, const std::string& value) {
 using Names = std::vector<std::string>;
 using Handle = nQITRMCAPI100_Session;
 
-inline Names takeNames(char** array, uint32_t count) {
+inline Names takeNames(char** array, std::uint32_t count) {
     Names names(array, array + count);
     nQITRMCAPI100_freeStringArray(array, count);
     return names;
@@ -83,7 +83,7 @@ class Session {
         nQITRMCAPI100_initializeSessionWithoutResources(&handle, &status);
         EXPECT_EQ(status.code, 0) << status.text();
     }
-    explicit Session(const char* devices, int32_t access = 3, const char* group = "") {
+    explicit Session(const char* devices, std::int32_t access = 3, const char* group = "") {
         Status status;
         nQITRMCAPI100_initializeSessionWithDevices(&handle, devices, 60.0, access, group, 0.0,
                                                    &status);
@@ -95,7 +95,7 @@ class Session {
 
     operator Handle() const { return handle; }
 
-    int32_t close() {
+    std::int32_t close() {
         if (handle == 0) {
             return 0;
         }
@@ -104,18 +104,18 @@ class Session {
         handle = 0;
         return status.code;
     }
-    int32_t abort() {
+    std::int32_t abort() {
         Status status;
         nQITRMCAPI100_abortSession(handle, &status);
         return status.code;
     }
-    int32_t reserve(const char* devices, int32_t access = 3, const char* group = "",
-                    double timeout = 0.0) {
+    std::int32_t reserve(const char* devices, std::int32_t access = 3, const char* group = "",
+                         double timeout = 0.0) {
         Status status;
         nQITRMCAPI100_reserveDevices(handle, devices, access, group, timeout, &status);
         return status.code;
     }
-    int32_t unreserve(const char* devices) {
+    std::int32_t unreserve(const char* devices) {
         Status status;
         nQITRMCAPI100_unreserveDevices(handle, devices, &status);
         return status.code;
@@ -123,7 +123,7 @@ class Session {
     Names list(const char* property) {
         Status status;
         char** array = nullptr;
-        uint32_t count = 0;
+        std::uint32_t count = 0;
         nQITRMCAPI100_getSessionPropertyStringArray(handle, property, &array, &count, &status);
         EXPECT_EQ(status.code, 0) << status.text();
         return takeNames(array, count);
@@ -131,7 +131,7 @@ class Session {
     Names systemList(const char* property) {
         Status status;
         char** array = nullptr;
-        uint32_t count = 0;
+        std::uint32_t count = 0;
         nQITRMCAPI100_getSystemPropertyStringArray(handle, property, &array, &count, &status);
         EXPECT_EQ(status.code, 0) << status.text();
         return takeNames(array, count);
@@ -139,7 +139,7 @@ class Session {
     Names deviceList(const char* device, const char* property) {
         Status status;
         char** array = nullptr;
-        uint32_t count = 0;
+        std::uint32_t count = 0;
         nQITRMCAPI100_getGenericPropertyStringArray(handle, device, property, &array, &count,
                                                     &status);
         EXPECT_EQ(status.code, 0) << status.text();

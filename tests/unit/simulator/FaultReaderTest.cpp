@@ -7,7 +7,7 @@ using namespace drivertest;
 
 namespace {
 
-constexpr int32_t invalidFaults = -250942;
+constexpr std::int32_t invalidFaults = -250942;
 
 void expectRefused(const std::string& json, const std::string& reason) {
     const Setting setting = setFaults(json);
@@ -109,11 +109,11 @@ TEST(FaultReaderTest, AMethodStandsForItsFunctions) {
     Session session("Mod1");
     const FaultsInForce faults(oneFault("\"method\":\"readRegister\",\"status\":{\"code\":-77}"));
     Status reading;
-    uint8_t byte = 0;
+    std::uint8_t byte = 0;
     nQITRMCAPI100_readRegisterUInt8(session, "Mod1", 0, &byte, &reading);
     EXPECT_EQ(reading.code, -77);
     Status wide;
-    uint64_t number = 0;
+    std::uint64_t number = 0;
     nQITRMCAPI100_readRegisterUInt64(session, "Mod1", 0, &number, &wide);
     EXPECT_EQ(wide.code, -77);
     Status writing;

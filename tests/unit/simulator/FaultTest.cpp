@@ -7,16 +7,16 @@ using namespace drivertest;
 
 namespace {
 
-constexpr int32_t failure = -77;
+constexpr std::int32_t failure = -77;
 const std::string failing = "\"status\":{\"code\":-77}";
 
 class FaultTest : public BenchTest {
   protected:
-    int32_t readTemperature(const char* device = "Mod1") {
+    std::int32_t readTemperature(const char* device = "Mod1") {
         return get(getDouble, session, device, "Dev.Temperature").code;
     }
-    std::vector<int32_t> codesOfReads(int count) {
-        std::vector<int32_t> codes;
+    std::vector<std::int32_t> codesOfReads(int count) {
+        std::vector<std::int32_t> codes;
         for (int i = 0; i < count; ++i) {
             codes.push_back(readTemperature());
         }
@@ -24,7 +24,7 @@ class FaultTest : public BenchTest {
     }
 };
 
-using Codes = std::vector<int32_t>;
+using Codes = std::vector<std::int32_t>;
 
 TEST_F(FaultTest, WithoutFaultsEverythingWorks) {
     const FaultsInForce none("{}");
@@ -240,7 +240,7 @@ TEST_F(FaultTest, AFailureAfterTheCallFreesItsOutputs) {
     const FaultsInForce faults(oneFault("\"moment\":\"after\"," + failing));
     Status status;
     char** names = nullptr;
-    uint32_t count = 7;
+    std::uint32_t count = 7;
     nQITRMCAPI100_getSystemPropertyStringArray(session, "Sys.Devices", &names, &count, &status);
     EXPECT_EQ(status.code, failure);
     EXPECT_EQ(names, nullptr);
@@ -248,7 +248,7 @@ TEST_F(FaultTest, AFailureAfterTheCallFreesItsOutputs) {
     EXPECT_EQ(getText(session, "Mod1", "Dev.ProductName").value, "");
     EXPECT_EQ(get(getDouble, session, "Mod2", "Dev.Temperature").value, 0.0);
     EXPECT_EQ(getArray(getDoubles, session, "Mod1", "DMM.Readings").value.size(), 0u);
-    uint8_t bytes[] = {9, 9, 9, 9};
+    std::uint8_t bytes[] = {9, 9, 9, 9};
     Status reading;
     nQITRMCAPI100_getNvmemBytes(session, "Mod1/calibration", 1, bytes, 3, &reading);
     EXPECT_EQ(reading.code, failure);
@@ -271,13 +271,13 @@ TEST_F(FaultTest, AFailureAfterOpeningAPropertyOrCommandClosesItAgain) {
     // The numbers of closed handles are not reused soon, so the next handle shows how many there
     // were. Each of them is tried.
     const auto open = [&](auto function, const char* name) {
-        uint32_t handle = 0;
+        std::uint32_t handle = 0;
         Status status;
         function(session, "Mod1", name, &handle, &status);
         return handle;
     };
-    const uint32_t property = open(nQITRMCAPI100_openGenericProperty, "DMM.Range");
-    const uint32_t command = open(nQITRMCAPI100_openGenericCommand, "DMM.Trigger");
+    const std::uint32_t property = open(nQITRMCAPI100_openGenericProperty, "DMM.Range");
+    const std::uint32_t command = open(nQITRMCAPI100_openGenericCommand, "DMM.Trigger");
     {
         const FaultsInForce faults(
             oneFault("\"function\":\"open*\",\"moment\":\"after\"," + failing));

@@ -13,14 +13,14 @@ using namespace drivertest;
 
 namespace {
 
-constexpr int32_t deviceRemoved = -250940;
-constexpr int32_t connectionLost = -250941;
-constexpr int32_t aborted = -250963;
-constexpr int32_t unknownSession = -250955;
+constexpr std::int32_t deviceRemoved = -250940;
+constexpr std::int32_t connectionLost = -250941;
+constexpr std::int32_t aborted = -250963;
+constexpr std::int32_t unknownSession = -250955;
 
-using Result = std::future<int32_t>;
+using Result = std::future<std::int32_t>;
 
-Result later(std::function<int32_t()> call) {
+Result later(std::function<std::int32_t()> call) {
     return std::async(std::launch::async, std::move(call));
 }
 
@@ -29,7 +29,7 @@ bool isReady(const Result& result) {
 }
 
 // Calls `act` repeatedly until the call that it is meant for has returned.
-int32_t resultAfter(Result& result, const std::function<void()>& act) {
+std::int32_t resultAfter(Result& result, const std::function<void()>& act) {
     while (!isReady(result)) {
         act();
         std::this_thread::yield();
@@ -37,11 +37,11 @@ int32_t resultAfter(Result& result, const std::function<void()>& act) {
     return result.get();
 }
 
-int32_t readTemperature(Handle session, const char* device) {
+std::int32_t readTemperature(Handle session, const char* device) {
     return get(getDouble, session, device, "Dev.Temperature").code;
 }
 
-int32_t execute(Handle session, const char* resource, const char* command) {
+std::int32_t execute(Handle session, const char* resource, const char* command) {
     Status status;
     nQITRMCAPI100_executeGenericCommand(session, resource, command, 60.0, &status);
     return status.code;
@@ -99,7 +99,7 @@ TEST(FaultWaitTest, OtherFaultsEndADelay) {
     Result opening = later([&] {
         began = true;
         const Session session;
-        return int32_t{0};
+        return std::int32_t{0};
     });
     while (!began) {
         std::this_thread::yield();
@@ -131,7 +131,7 @@ TEST(FaultWaitTest, AFaultThatIsReplacedDuringItsDelayStillApplies) {
         oneFault("\"function\":\"getGeneric*\",\"delay\":0.05,\"status\":{\"code\":-77}"));
     std::atomic<bool> isThrough{false};
     Result reading = later([&] {
-        const int32_t code = readTemperature(session, "Mod1");
+        const std::int32_t code = readTemperature(session, "Mod1");
         isThrough = true;
         return code;
     });

@@ -7,7 +7,7 @@ namespace drivertest {
 
 // The result of qitrmcsim_setFaults: the code, and the message.
 struct Setting {
-    int32_t code;
+    std::int32_t code;
     std::string reason;
 };
 
@@ -17,7 +17,7 @@ inline std::ostream& operator<<(std::ostream& out, const Setting& setting) {
 
 inline Setting setFaults(const std::string& json) {
     char* reason = nullptr;
-    const int32_t code = qitrmcsim_setFaults(json.c_str(), &reason);
+    const std::int32_t code = qitrmcsim_setFaults(json.c_str(), &reason);
     const Setting setting{code, reason != nullptr ? reason : ""};
     nQITRMCAPI100_freeString(reason);
     return setting;

@@ -13,9 +13,9 @@ std::string output(const std::string& members) {
 
 template <typename Item>
 struct Lent {
-    int32_t code = 0;
+    std::int32_t code = 0;
     Item* array = nullptr;
-    uint32_t count = 0;
+    std::uint32_t count = 0;
 };
 
 template <typename Item>
@@ -31,13 +31,13 @@ Lent<Item> lend(ArrayGetter<Item> getter, Handle session, const char* property,
 class FaultyOutputTest : public BenchTest {
   protected:
     template <typename Item>
-    void expectNull(ArrayGetter<Item> getter, const char* property, uint32_t count) {
+    void expectNull(ArrayGetter<Item> getter, const char* property, std::uint32_t count) {
         const Lent<Item> lent = lend(getter, session, property);
         EXPECT_EQ(lent.code, 0);
         EXPECT_EQ(lent.array, nullptr);
         EXPECT_EQ(lent.count, count);
     }
-    void expectNullArrays(uint32_t count) {
+    void expectNullArrays(std::uint32_t count) {
         expectNull(getBools, "DMM.InputsInUse", count);
         expectNull(getDoubles, "DMM.Readings", count);
         expectNull(getInt32s, "DMM.Trims", count);
@@ -74,7 +74,7 @@ TEST_F(FaultyOutputTest, NumbersStayAsTheyAre) {
     const FaultsInForce faults(output("\"null\":true,\"count\":5"));
     EXPECT_EQ(get(getDouble, session, "Mod1", "DMM.Range"), 10.0);
     EXPECT_EQ(get(getUInt32, session, "Mod1/user", "NVMEMArea.Size"), 256u);
-    uint8_t bytes[4] = {};
+    std::uint8_t bytes[4] = {};
     Status status;
     nQITRMCAPI100_getNvmemBytes(session, "Mod1/calibration", 0, bytes, 4, &status);
     EXPECT_EQ(status.code, 0);
@@ -90,7 +90,7 @@ TEST_F(FaultyOutputTest, TextsInArraysBecomeNull) {
     nQITRMCAPI100_freeStringArray(lent.array, lent.count);
     EXPECT_EQ(getText(session, "Mod2", "Dev.ProductName"), std::string("Power supply"));
     EXPECT_EQ(getArray(getInt32s, session, "Mod1", "DMM.Trims"),
-              (std::vector<int32_t>{0, -1, 2, -3}));
+              (std::vector<std::int32_t>{0, -1, 2, -3}));
 }
 
 TEST_F(FaultyOutputTest, TextsBecomeLong) {
@@ -105,17 +105,17 @@ TEST_F(FaultyOutputTest, TextsBecomeLong) {
 TEST_F(FaultyOutputTest, ArraysOfAllTypesGetTheCountOfTheFault) {
     const FaultsInForce faults(output("\"count\":6"));
     EXPECT_EQ(getArray(getBools, session, "Mod1", "DMM.InputsInUse"),
-              (std::vector<uint8_t>{1, 1, 0, 0, 1, 1}));
+              (std::vector<std::uint8_t>{1, 1, 0, 0, 1, 1}));
     EXPECT_EQ(getArray(getDoubles, session, "Mod1", "DMM.Readings"),
               (std::vector<double>{0.5, -0.25, 1.75, 0.5, -0.25, 1.75}));
     EXPECT_EQ(getArray(getInt32s, session, "Mod1", "DMM.Trims"),
-              (std::vector<int32_t>{0, -1, 2, -3, 0, -1}));
+              (std::vector<std::int32_t>{0, -1, 2, -3, 0, -1}));
     EXPECT_EQ(getArray(getInt64s, session, "Mod1", "DMM.Timestamps"),
-              (std::vector<int64_t>{-1, 0, INT64_MAX, -1, 0, INT64_MAX}));
+              (std::vector<std::int64_t>{-1, 0, INT64_MAX, -1, 0, INT64_MAX}));
     EXPECT_EQ(getArray(getUInt32s, session, "Mod1", "DMM.Histogram"),
-              (std::vector<uint32_t>{0, 1, UINT32_MAX, 0, 1, UINT32_MAX}));
+              (std::vector<std::uint32_t>{0, 1, UINT32_MAX, 0, 1, UINT32_MAX}));
     EXPECT_EQ(getArray(getUInt64s, session, "Mod1", "DMM.Totals"),
-              (std::vector<uint64_t>{0, UINT64_MAX, 0, UINT64_MAX, 0, UINT64_MAX}));
+              (std::vector<std::uint64_t>{0, UINT64_MAX, 0, UINT64_MAX, 0, UINT64_MAX}));
     EXPECT_EQ(labels(), (Names{"A", "B", "C", "D", "A", "B"}));
     EXPECT_EQ(getTexts(session, "Mod5", "SW.Routes"), Names(6, ""));
 }
@@ -123,7 +123,7 @@ TEST_F(FaultyOutputTest, ArraysOfAllTypesGetTheCountOfTheFault) {
 TEST_F(FaultyOutputTest, ArraysBecomeShorterAndEmpty) {
     FaultsInForce faults(output("\"count\":1"));
     EXPECT_EQ(labels(), Names{"A"});
-    EXPECT_EQ(getArray(getInt32s, session, "Mod1", "DMM.Trims"), std::vector<int32_t>{0});
+    EXPECT_EQ(getArray(getInt32s, session, "Mod1", "DMM.Trims"), std::vector<std::int32_t>{0});
     faults.replace(output("\"count\":0"));
     expectNullArrays(0);
 }

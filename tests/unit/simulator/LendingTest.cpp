@@ -23,7 +23,7 @@ char* lentText(const Session& session) {
 
 TEST(Outstanding, CountsEachTextUntilItIsFreed) {
     const Session session;
-    const uint32_t before = outstanding().texts;
+    const std::uint32_t before = outstanding().texts;
     char* first = lentText(session);
     char* second = lentText(session);
     EXPECT_EQ(outstanding().texts, before + 2);
@@ -37,7 +37,7 @@ TEST(Outstanding, CountsAnArrayOfTextsAsOneThing) {
     Session session;
     Status status;
     char** array = nullptr;
-    uint32_t count = 0;
+    std::uint32_t count = 0;
     const auto before = outstanding();
     nQITRMCAPI100_getSystemPropertyStringArray(session, "Sys.Devices", &array, &count, &status);
     EXPECT_EQ(outstanding().textArrays, before.textArrays + 1);
@@ -50,8 +50,8 @@ TEST(Outstanding, CountsArraysOfNumbersAndNotThoseOfTheCaller) {
     const Session session;
     Status status;
     double* array = nullptr;
-    uint32_t count = 0;
-    const uint32_t before = outstanding().numberArrays;
+    std::uint32_t count = 0;
+    const std::uint32_t before = outstanding().numberArrays;
     nQITRMCAPI100_getGenericPropertyDoubleArray(session, "Mod1", "DMM.Readings", &array, &count,
                                                 &status);
     EXPECT_EQ(outstanding().numberArrays, before + 1);
@@ -85,7 +85,7 @@ TEST(Outstanding, AFailedCallLendsNothing) {
     const Session session;
     Status status;
     char* text = nullptr;
-    const uint32_t before = outstanding().texts;
+    const std::uint32_t before = outstanding().texts;
     nQITRMCAPI100_getGenericPropertyString(session, "Mod1", "No.Such", &text, &status);
     EXPECT_LT(status.code, 0);
     EXPECT_EQ(outstanding().texts, before);

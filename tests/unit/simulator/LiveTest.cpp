@@ -130,7 +130,7 @@ class LiveTest : public testing::Test {
     }
 
     // Milliseconds since the reset of the device. The next call is one later.
-    uint64_t time() { return get(getUInt64, session, "Mover", "Time.Ms").value; }
+    std::uint64_t time() { return get(getUInt64, session, "Mover", "Time.Ms").value; }
     double real(const char* property) { return get(getDouble, session, "Mover", property).value; }
     void command(const char* name) {
         Status status;
@@ -176,7 +176,7 @@ TEST_F(LiveTest, CountersCountExactlyAndWrap) {
     // 2 + 20 * 51 = 1022 ms have passed, and one more with each of these.
     EXPECT_EQ(get(getInt32, session, "Mover", "Count.Signed"), -2147483273);
     EXPECT_EQ(get(getUInt32, session, "Mover", "Count.Unsigned"), 728u);
-    EXPECT_EQ(get(getInt64, session, "Mover", "Count.Long"), int64_t{-9223372036854775591});
+    EXPECT_EQ(get(getInt64, session, "Mover", "Count.Long"), std::int64_t{-9223372036854775591});
     EXPECT_EQ(get(getUInt32, session, "Mover", "Count.Slow"), 7u);
     EXPECT_EQ(get(getUInt32, session, "Mover", "Count.Limited"), 250u);
 }
@@ -211,7 +211,7 @@ TEST_F(LiveTest, FollowingWithALagMatchesTheFormula) {
     write("Set", 1.0);
     const double start = 21.0 * (1.0 - std::exp(-0.055 / 0.05));
     EXPECT_NEAR(real("Lagging"), 3.0 + (start - 3.0) * std::exp(-0.001 / 0.05), 1e-12);
-    EXPECT_EQ(set(setBool, session, "Mover", "On", uint8_t{0}).code, 0);
+    EXPECT_EQ(set(setBool, session, "Mover", "On", std::uint8_t{0}).code, 0);
     command("Pass.Day");
     EXPECT_EQ(real("Lagging"), 0.0);
 }
@@ -250,9 +250,9 @@ TEST_F(LiveTest, NumbersBeyondTheTypeStopAtItsEnds) {
     write("Set", -2147483647.4);
     EXPECT_EQ(get(getInt32, session, "Mover", "Small"), 2147483647);
     write("Set", 1e30);
-    EXPECT_EQ(get(getUInt64, session, "Mover", "Large"), uint64_t{18446744073709551615u});
+    EXPECT_EQ(get(getUInt64, session, "Mover", "Large"), std::uint64_t{18446744073709551615u});
     write("Set", -1.0);
-    EXPECT_EQ(get(getUInt64, session, "Mover", "Large"), uint64_t{0});
+    EXPECT_EQ(get(getUInt64, session, "Mover", "Large"), std::uint64_t{0});
 }
 
 TEST_F(LiveTest, NumbersAreAlwaysFinite) {
@@ -273,7 +273,7 @@ TEST_F(LiveTest, ChannelsFollowTheChannelOfTheSameNumber) {
     Status status;
     nQITRMCAPI100_commitPropertiesGeneric(session, "Source", &status);
     EXPECT_EQ(record("Meter/in0:2", "Level"), (std::vector<double>{0.0, 2.5, 0.5}));
-    EXPECT_EQ(set(setBool, session, "Source/out1", "Switch", uint8_t{0}).code, 0);
+    EXPECT_EQ(set(setBool, session, "Source/out1", "Switch", std::uint8_t{0}).code, 0);
     EXPECT_EQ(record("Meter/in0:2", "Level"), still);
 }
 
@@ -313,7 +313,7 @@ Moments momentsOf(const std::vector<double>& numbers) {
     }
     double variance = 0.0;
     double covariance = 0.0;
-    for (size_t i = 0; i < numbers.size(); ++i) {
+    for (std::size_t i = 0; i < numbers.size(); ++i) {
         variance += (numbers[i] - mean) * (numbers[i] - mean) / count;
         covariance += i == 0 ? 0.0 : (numbers[i] - mean) * (numbers[i - 1] - mean) / count;
     }
@@ -348,7 +348,7 @@ TEST_F(LiveTest, EachPropertyHasRandomNumbersOfItsOwn) {
 
 void expectSamples(const std::vector<double>& samples, const std::vector<double>& expected) {
     ASSERT_EQ(samples.size(), expected.size());
-    for (size_t i = 0; i < samples.size(); ++i) {
+    for (std::size_t i = 0; i < samples.size(); ++i) {
         EXPECT_NEAR(samples[i], expected[i], 1e-12) << "sample " << i;
     }
 }
@@ -365,7 +365,7 @@ TEST_F(LiveTest, WaveformsMatchTheirFormulasSampleBySample) {
     expectSamples(record("Scope/ch0", "Sawtooth"),
                   {-1.0, -0.75, -0.5, -0.25, 0.0, 0.25, 0.5, 0.75, -1.0, -0.75});
     EXPECT_EQ(getArray(getInt32s, session, "Scope/ch0", "Steps"),
-              (std::vector<int32_t>{-100, -50, 0, 40, -100}));
+              (std::vector<std::int32_t>{-100, -50, 0, 40, -100}));
 }
 
 TEST_F(LiveTest, TheSineOfEachPartOfATurnIsThatOfTheLibrary) {
@@ -374,8 +374,8 @@ TEST_F(LiveTest, TheSineOfEachPartOfATurnIsThatOfTheLibrary) {
     const auto samples = record("Scope/ch0", "Sine");
     ASSERT_EQ(samples.size(), 1000u);
     for (int i = 0; i < 1000; ++i) {
-        ASSERT_NEAR(samples[static_cast<size_t>(i)], 1.0 + 3.0 * std::sin(2.0 * M_PI * i / 1000.0),
-                    1e-14);
+        ASSERT_NEAR(samples[static_cast<std::size_t>(i)],
+                    1.0 + 3.0 * std::sin(2.0 * M_PI * i / 1000.0), 1e-14);
     }
 }
 
@@ -433,26 +433,26 @@ TEST_F(LiveTest, EventsBeginAndEndAtTheirTimes) {
                         "lasts": 0.002},
                        {"device": "Mover", "event": "connection_lost", "after": 0.006,
                         "lasts": 0.001}]})");
-    std::vector<int32_t> codes;
+    std::vector<std::int32_t> codes;
     for (int call = 0; call < 7; ++call) {
         codes.push_back(get(getDouble, session, "Mover", "Set").code);
     }
     // A millisecond passes at the beginning of each call.
-    EXPECT_EQ(codes, (std::vector<int32_t>{0, 0, -250941, -250941, 0, -250941, 0}));
+    EXPECT_EQ(codes, (std::vector<std::int32_t>{0, 0, -250941, -250941, 0, -250941, 0}));
 }
 
 TEST_F(LiveTest, AFaultAppliesToAndCountsTheCallsOfItsTime) {
     const auto codesWith = [&](const std::string& members) {
         const FaultsInForce faults(
             oneFault("\"function\":\"abortSession\",\"status\":{\"code\":-77}," + members));
-        std::vector<int32_t> codes;
+        std::vector<std::int32_t> codes;
         for (int call = 0; call < 5; ++call) {
             codes.push_back(session.abort());
         }
         return codes;
     };
     // A millisecond passes at the beginning of each call.
-    using Codes = std::vector<int32_t>;
+    using Codes = std::vector<std::int32_t>;
     EXPECT_EQ(codesWith("\"after\":0.003"), (Codes{0, 0, -77, -77, -77}));
     EXPECT_EQ(codesWith("\"lasts\":0.003"), (Codes{-77, -77, 0, 0, 0}));
     EXPECT_EQ(codesWith("\"after\":0.003,\"lasts\":0.002"), (Codes{0, 0, -77, -77, 0}));

@@ -19,7 +19,7 @@ void loadChassis(const std::string& description) {
 }
 
 void loadFaults(const std::string& description) {
-    static const auto described = simulator::parseChassis(simulator::embedded::bench);
+    static const auto described = simulator::parseChassis(embedded::bench);
     simulator::readFaults(description, *described.chassis);
 }
 

@@ -45,7 +45,7 @@ TEST(MemoryTest, ReadingATextOfSeveralDevices) {
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
                          char** array = nullptr;
-                         uint32_t count = 0;
+                         std::uint32_t count = 0;
                          nQITRMCAPI100_getGenericPropertyStringArray(
                              session, "Mod1,Mod2", "Dev.ProductName", &array, &count, status);
                          nQITRMCAPI100_freeStringArray(array, count);
@@ -61,7 +61,7 @@ TEST(MemoryTest, ListsOfManyDevicesDoNotAccumulateBeforeTheyAreRefused) {
     }
     Status status;
     char** array = nullptr;
-    uint32_t count = 0;
+    std::uint32_t count = 0;
     const long before = liveAllocations;
     mostAllocations = before;
     nQITRMCAPI100_getGenericPropertyStringArray(session, devices.c_str(), "Dev.Properties", &array,
@@ -98,7 +98,7 @@ TEST(MemoryTest, ReadingARecord) {
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
                          double* array = nullptr;
-                         uint32_t count = 0;
+                         std::uint32_t count = 0;
                          nQITRMCAPI100_getGenericPropertyDoubleArray(
                              session, "Mod4/ch0", "DIG.Waveform", &array, &count, status);
                          EXPECT_EQ(count, status->code == 0 ? 1024u : 0u);
@@ -130,7 +130,7 @@ TEST(MemoryTest, SwitchingOnWhatIsFollowed) {
                          const bool on = status->code == 0;
                          allowed = -1;
                          EXPECT_EQ(get(getBool, session, "Mod2/ch0", "PSU.OutputEnabled"),
-                                   static_cast<uint8_t>(on));
+                                   static_cast<std::uint8_t>(on));
                          const double measured =
                              get(getDouble, session, "Mod2/ch0", "PSU.MeasuredVoltage").value;
                          EXPECT_TRUE(on || measured < 6 * 0.0005) << measured;
@@ -148,7 +148,7 @@ Number valueOf(Getter<Number> getter, Handle session, const char* resource, cons
 
 TEST(MemoryTest, ARegisterRunsItsCommandOrIsNotWritten) {
     Session session("Mod1");
-    uint64_t count = 0;
+    std::uint64_t count = 0;
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
                          nQITRMCAPI100_writeRegisterUInt32(session, "Mod1", 1028, 1, status);
@@ -161,7 +161,7 @@ TEST(MemoryTest, ARegisterRunsItsCommandOrIsNotWritten) {
 
 TEST(MemoryTest, ARegisterWritesItsPropertyOrNothing) {
     Session session("Mod2");
-    constexpr uint64_t two = 0x4000000000000000;
+    constexpr std::uint64_t two = 0x4000000000000000;
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
                          nQITRMCAPI100_writeRegisterUInt64(session, "Mod2", 1032, two, status);
@@ -176,7 +176,7 @@ TEST(MemoryTest, ReadingARegisterThatShowsAProperty) {
     Session session("Mod1");
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
-                         uint64_t value = 9;
+                         std::uint64_t value = 9;
                          nQITRMCAPI100_readRegisterUInt64(session, "Mod1", 1032, &value, status);
                          EXPECT_EQ(value, 0u);
                      }),
@@ -189,7 +189,7 @@ TEST(MemoryTest, ACommandActsOnAllChannelsOrNone) {
                      [&](qierr_Status* status) {
                          nQITRMCAPI100_executeGenericCommand(session, "Mod2/ch0:1", "PSU.On", 0.0,
                                                              status);
-                         const uint8_t on = status->code == 0 ? 1 : 0;
+                         const std::uint8_t on = status->code == 0 ? 1 : 0;
                          EXPECT_EQ(valueOf(getBool, session, "Mod2/ch0", "PSU.OutputEnabled"), on);
                          EXPECT_EQ(valueOf(getBool, session, "Mod2/ch1", "PSU.OutputEnabled"), on);
                      }),
@@ -248,7 +248,7 @@ TEST(MemoryTest, Renaming) {
 
 TEST(MemoryTest, WritingNvmem) {
     Session session("Mod5");
-    const uint8_t byte = 1;
+    const std::uint8_t byte = 1;
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
                          nQITRMCAPI100_setNvmemBytes(session, "Mod5/user", 0, &byte, 1, "", "",
@@ -299,7 +299,7 @@ TEST(MemoryTest, AFailureByAFault) {
     EXPECT_GT(starve(-77,
                      [&](qierr_Status* status) {
                          char** array = nullptr;
-                         uint32_t count = 0;
+                         std::uint32_t count = 0;
                          nQITRMCAPI100_getGenericPropertyStringArray(
                              session, "Mod1,Mod2", "Dev.ProductName", &array, &count, status);
                          EXPECT_EQ(array, nullptr);
@@ -315,7 +315,7 @@ TEST(MemoryTest, OutputsOfAFault) {
         EXPECT_GT(starve(0,
                          [&](qierr_Status* status) {
                              char** array = nullptr;
-                             uint32_t count = 0;
+                             std::uint32_t count = 0;
                              nQITRMCAPI100_getGenericPropertyStringArray(
                                  session, "Mod1", "DMM.Labels", &array, &count, status);
                              EXPECT_EQ(array == nullptr, status->code != 0);
@@ -325,7 +325,7 @@ TEST(MemoryTest, OutputsOfAFault) {
         EXPECT_GT(starve(0,
                          [&](qierr_Status* status) {
                              double* array = nullptr;
-                             uint32_t count = 0;
+                             std::uint32_t count = 0;
                              nQITRMCAPI100_getGenericPropertyDoubleArray(
                                  session, "Mod1", "DMM.Readings", &array, &count, status);
                              EXPECT_EQ(array == nullptr, status->code != 0);
@@ -340,7 +340,7 @@ TEST(MemoryTest, ADelay) {
     const FaultsInForce faults(oneFault("\"function\":\"readRegister*\",\"delay\":0.001"));
     EXPECT_GT(starve(0,
                      [&](qierr_Status* status) {
-                         uint8_t value = 0;
+                         std::uint8_t value = 0;
                          nQITRMCAPI100_readRegisterUInt8(session, "Mod1", 0, &value, status);
                      }),
               0);

@@ -18,13 +18,13 @@ constexpr int clients = 6;
 // Each client does so many, and goes on until every kind that counts has succeeded.
 constexpr int operations = 250;
 constexpr int mostOperations = 400 * operations;
-constexpr size_t operationKinds = 9;
+constexpr std::size_t operationKinds = 9;
 // Those that leave their status: writing, commands, connecting, resetting, renaming.
-constexpr std::array<size_t, 5> countedKinds{2, 3, 4, 5, 7};
-constexpr int32_t faultCode = -77;
-constexpr int32_t faultWarning = 77;
-constexpr int32_t aborted = -250963;
-constexpr uint32_t areaBytes = 16;
+constexpr std::array<std::size_t, 5> countedKinds{2, 3, 4, 5, 7};
+constexpr std::int32_t faultCode = -77;
+constexpr std::int32_t faultWarning = 77;
+constexpr std::int32_t aborted = -250963;
+constexpr std::uint32_t areaBytes = 16;
 const std::array<const char*, 4> modules{"Mod1", "Mod2", "Mod4", "Mod5"};
 const std::array<const char*, 3> selfTests{"DMM.SelfTest", "PSU.SelfTest", "DIG.SelfTest"};
 
@@ -46,7 +46,7 @@ struct Bench {
     std::array<std::atomic<int>, operationKinds> successes{};
     bool eachKindSucceeded() const {
         return std::all_of(countedKinds.begin(), countedKinds.end(),
-                           [&](size_t kind) { return successes[kind] > 0; });
+                           [&](std::size_t kind) { return successes[kind] > 0; });
     }
     // How many clients have exclusive access to each module.
     std::array<std::atomic<int>, 4> owners{};
@@ -76,7 +76,7 @@ class Client {
     }
 
   private:
-    size_t below(size_t end) { return random() % end; }
+    std::size_t below(std::size_t end) { return random() % end; }
     std::atomic<Handle>& anyShared() { return bench.sessions[below(bench.sessions.size())]; }
     const char* anyModule() { return modules[below(modules.size())]; }
 
@@ -93,7 +93,7 @@ class Client {
     // Repeats until the session is closed, because faults keep sessions open, and so does another
     // client that aborts a delayed close.
     static void close(Handle session) {
-        int32_t code = faultCode;
+        std::int32_t code = faultCode;
         while (code == faultCode || code == aborted) {
             Status status;
             nQITRMCAPI100_closeSession(session, &status);
@@ -129,7 +129,7 @@ class Client {
     void useShared() {
         const Handle session = anyShared();
         Status status;
-        const size_t operation = below(operationKinds);
+        const std::size_t operation = below(operationKinds);
         switch (operation) {
             case 0:
                 readText(session);
@@ -142,7 +142,7 @@ class Client {
                                                        static_cast<double>(below(30)), &status);
                 break;
             case 3: {
-                const size_t module = below(3);
+                const std::size_t module = below(3);
                 nQITRMCAPI100_executeGenericCommand(session, modules[module], selfTests[module],
                                                     1.0, &status);
                 break;
@@ -181,7 +181,7 @@ class Client {
     static void readRecord(Handle session) {
         Status status;
         double* samples = nullptr;
-        uint32_t count = 0;
+        std::uint32_t count = 0;
         nQITRMCAPI100_getGenericPropertyDoubleArray(session, "Mod4/ch0", "DIG.Waveform", &samples,
                                                     &count, &status);
         expectSound(status);
@@ -208,11 +208,11 @@ class Client {
     // The bytes of an area are written together, so they are read together.
     static void readArea(Handle session) {
         Status status;
-        std::array<uint8_t, areaBytes> bytes{};
+        std::array<std::uint8_t, areaBytes> bytes{};
         nQITRMCAPI100_getNvmemBytes(session, "Mod1/user", 0, bytes.data(), areaBytes, &status);
         expectSound(status);
-        EXPECT_EQ(std::vector<uint8_t>(bytes.begin(), bytes.end()),
-                  std::vector<uint8_t>(areaBytes, bytes[0]));
+        EXPECT_EQ(std::vector<std::uint8_t>(bytes.begin(), bytes.end()),
+                  std::vector<std::uint8_t>(areaBytes, bytes[0]));
     }
 
     // On a session that no other client uses.
@@ -224,7 +224,7 @@ class Client {
         if (session == 0) {
             return;
         }
-        const size_t module = below(2);
+        const std::size_t module = below(2);
         Status status;
         nQITRMCAPI100_reserveDevices(session, modules[module], 3, "", 5.0, &status);
         expectSound(status);
@@ -237,7 +237,7 @@ class Client {
     }
 
     void writeArea(Handle session) {
-        const std::vector<uint8_t> bytes(areaBytes, static_cast<uint8_t>(below(256)));
+        const std::vector<std::uint8_t> bytes(areaBytes, static_cast<std::uint8_t>(below(256)));
         Status status;
         nQITRMCAPI100_setNvmemBytes(session, "Mod1/user", 0, bytes.data(), areaBytes, "", "",
                                     &status);
@@ -253,7 +253,7 @@ class Client {
 
 // Changes the faults while clients are at work.
 void changeFaults(const std::atomic<int>& atWork) {
-    for (size_t i = 0; atWork > 0; ++i) {
+    for (std::size_t i = 0; atWork > 0; ++i) {
         EXPECT_EQ(qitrmcsim_setFaults(faultPlans[i % faultPlans.size()], nullptr), 0);
         std::this_thread::yield();
     }
@@ -309,7 +309,7 @@ TEST(MixedClientsTest, LeaveNothingOpenAndNeverShareAnExclusiveDevice) {
         nQITRMCAPI100_closeSession(session, &status);
     }
     expectNothingOutstanding();
-    for (const size_t kind : countedKinds) {
+    for (const std::size_t kind : countedKinds) {
         EXPECT_GT(bench.successes[kind], 0) << "operation " << kind;
     }
     Status renaming;

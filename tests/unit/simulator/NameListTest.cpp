@@ -6,7 +6,7 @@ using namespace drivertest;
 
 namespace {
 
-int32_t codeOfOpening(const char* channels, std::string* text = nullptr) {
+std::int32_t codeOfOpening(const char* channels, std::string* text = nullptr) {
     Status status;
     Handle handle = 0;
     nQITRMCAPI100_initializeSessionWithPhysChans(&handle, channels, 60.0, 1, "", 0.0, &status);
@@ -56,7 +56,7 @@ TEST(NameListTest, TheListsOfAnUnknownDeviceAreRefused) {
     Session session;
     Status status;
     char** array = reinterpret_cast<char**>(&status);
-    uint32_t count = 9;
+    std::uint32_t count = 9;
     nQITRMCAPI100_getGenericPropertyStringArray(session, "Mod3", "Dev.PhysChans", &array, &count,
                                                 &status);
     EXPECT_EQ(status.code, -250956);

@@ -4,9 +4,9 @@ using namespace drivertest;
 
 namespace {
 
-using Bytes = std::vector<uint8_t>;
+using Bytes = std::vector<std::uint8_t>;
 
-Answer<Bytes> read(Handle session, const char* area, uint32_t address, uint32_t size) {
+Answer<Bytes> read(Handle session, const char* area, std::uint32_t address, std::uint32_t size) {
     Answer<Bytes> answer;
     answer.value.resize(size, 0xEE);
     Status status;
@@ -17,16 +17,16 @@ Answer<Bytes> read(Handle session, const char* area, uint32_t address, uint32_t 
     return answer;
 }
 
-Outcome write(Handle session, const char* area, uint32_t address, const Bytes& bytes,
+Outcome write(Handle session, const char* area, std::uint32_t address, const Bytes& bytes,
               const char* serialNumber = "", const char* password = "") {
     Status status;
     nQITRMCAPI100_setNvmemBytes(session, area, address, bytes.data(),
-                                static_cast<uint32_t>(bytes.size()), serialNumber, password,
+                                static_cast<std::uint32_t>(bytes.size()), serialNumber, password,
                                 &status);
     return {status.code, status.text()};
 }
 
-int32_t commit(Handle session, const char* resources) {
+std::int32_t commit(Handle session, const char* resources) {
     Status status;
     nQITRMCAPI100_commitNvmemGeneric(session, resources, &status);
     return status.code;
@@ -57,14 +57,14 @@ TEST_F(NvmemTest, ZeroBytesCanBeReadAnywhereInTheArea) {
 TEST_F(NvmemTest, BytesOutsideOfTheAreaAreRefused) {
     const auto answer = read(session, "Mod1/user", 250, 7);
     EXPECT_EQ(answer.code, -250981);
-    const auto number = [](const char* tag, uint32_t value) {
+    const auto number = [](const char* tag, std::uint32_t value) {
         return std::string("{\"type\":\"usage\",\"usage\":\"kUsageType") + tag +
                "\",\"value\":" + std::to_string(value) + ",\"value_type\":\"uint32_t\"}";
     };
     EXPECT_EQ(answer.text, detailsOf("nvmemOutOfRange", number("NvmemAddress", 250) + "," +
                                                             number("RequestedBytes", 7) + "," +
                                                             number("NvmemAreaSize", 256)));
-    uint8_t byte = 0;
+    std::uint8_t byte = 0;
     Status huge;
     nQITRMCAPI100_getNvmemBytes(session, "Mod1/user", 1, &byte, 4294967295u, &huge);
     EXPECT_EQ(huge.code, -250981);
@@ -74,13 +74,13 @@ TEST_F(NvmemTest, BytesOutsideOfTheAreaAreRefused) {
 TEST_F(NvmemTest, WrittenBytesAreReadBackAtOnce) {
     EXPECT_EQ(write(session, "Mod1/user", 254, {7, 8}).code, 0);
     EXPECT_EQ(read(session, "Mod1/user", 253, 3), (Bytes{0, 7, 8}));
-    EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.PendingChanges"), uint8_t{1});
+    EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.PendingChanges"), std::uint8_t{1});
 }
 
 TEST_F(NvmemTest, OnlyCommittedBytesSurviveAReset) {
     EXPECT_EQ(write(session, "Mod1/user", 0, {1, 2}).code, 0);
     EXPECT_EQ(commit(session, "Mod1/user"), 0);
-    EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.PendingChanges"), uint8_t{0});
+    EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.PendingChanges"), std::uint8_t{0});
     EXPECT_EQ(write(session, "Mod1/user", 1, {9}).code, 0);
     EXPECT_EQ(resetDevices(session, "Mod1"), 0);
     EXPECT_EQ(read(session, "Mod1/user", 0, 3), (Bytes{1, 2, 0}));

@@ -1,6 +1,7 @@
 // Opens three sessions, and prints for each a line with the code and the text of the status, and
 // the handle.
 
+#include <cstdint>
 #include <cstdio>
 #include <cstdlib>
 
@@ -8,7 +9,7 @@
 
 namespace {
 
-int32_t grow(qierr_Status* status, uint32_t size) {
+std::int32_t grow(qierr_Status* status, std::uint32_t size) {
     char* bigger = static_cast<char*>(std::realloc(status->json, size));
     if (bigger == nullptr) {
         return 0;

@@ -9,7 +9,7 @@ using namespace drivertest;
 
 namespace {
 
-std::string textFrom(int32_t (*function)(char**)) {
+std::string textFrom(std::int32_t (*function)(char**)) {
     char* json = nullptr;
     EXPECT_EQ(function(&json), 0);
     const std::string text = json != nullptr ? json : "";
@@ -17,7 +17,7 @@ std::string textFrom(int32_t (*function)(char**)) {
     return text;
 }
 
-rapidjson::Document traceFrom(uint64_t number) {
+rapidjson::Document traceFrom(std::uint64_t number) {
     char* json = nullptr;
     EXPECT_EQ(qitrmcsim_readTrace(number, &json), 0);
     rapidjson::Document trace;
@@ -83,7 +83,7 @@ TEST_F(PanelTest, FaultsInForceAreReturnedAsTheyWereSet) {
 }
 
 TEST_F(PanelTest, TheTraceIsReadPieceByPiece) {
-    const uint64_t first = traceFrom(0)["next"].GetUint64();
+    const std::uint64_t first = traceFrom(0)["next"].GetUint64();
     Status status;
     double value = 0.0;
     nQITRMCAPI100_getGenericPropertyDouble(session, "Mod1", "DMM.Range", &value, &status);
@@ -103,7 +103,7 @@ TEST_F(PanelTest, ANumberOfAnEarlierProcessShowsTheWholeTrace) {
 }
 
 TEST_F(PanelTest, TheTraceKeepsTheLatestLines) {
-    const uint64_t first = traceFrom(0)["next"].GetUint64();
+    const std::uint64_t first = traceFrom(0)["next"].GetUint64();
     for (int i = 0; i < 2001; ++i) {
         Status status;
         nQITRMCAPI100_abortSession(session, &status);
@@ -114,7 +114,7 @@ TEST_F(PanelTest, TheTraceKeepsTheLatestLines) {
 }
 
 TEST_F(PanelTest, CallsAreCounted) {
-    const uint64_t before = qitrmcsim_countCalls();
+    const std::uint64_t before = qitrmcsim_countCalls();
     Status status;
     nQITRMCAPI100_abortSession(session, &status);
     nQITRMCAPI100_abortSession(session, &status);

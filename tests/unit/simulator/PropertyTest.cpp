@@ -9,29 +9,29 @@ namespace {
 using PropertyTest = BenchTest;
 
 TEST_F(PropertyTest, ScalarsOfEachTypeAreRead) {
-    EXPECT_EQ(get(getBool, session, "Mod1", "DMM.AutoRange"), uint8_t{1});
+    EXPECT_EQ(get(getBool, session, "Mod1", "DMM.AutoRange"), std::uint8_t{1});
     EXPECT_EQ(get(getDouble, session, "Mod1", "DMM.Range"), 10.0);
     EXPECT_EQ(get(getInt32, session, "Mod1", "DMM.Offset"), 0);
-    EXPECT_EQ(get(getInt64, session, "Mod1", "DMM.TriggerDelay"), int64_t{0});
+    EXPECT_EQ(get(getInt64, session, "Mod1", "DMM.TriggerDelay"), std::int64_t{0});
     EXPECT_EQ(getText(session, "Mod1", "Dev.ProductName"), std::string("Multimeter"));
     EXPECT_EQ(get(getUInt32, session, "Mod1", "Dev.ProductNum"), 5110u);
-    EXPECT_EQ(get(getUInt64, session, "Mod1", "DMM.TriggerCount"), uint64_t{0});
+    EXPECT_EQ(get(getUInt64, session, "Mod1", "DMM.TriggerCount"), std::uint64_t{0});
 }
 
 TEST_F(PropertyTest, ArraysOfEachTypeAreRead) {
     EXPECT_EQ(getArray(getBools, session, "Mod1", "DMM.InputsInUse"),
-              (std::vector<uint8_t>{1, 1, 0, 0}));
+              (std::vector<std::uint8_t>{1, 1, 0, 0}));
     EXPECT_EQ(getArray(getDoubles, session, "Mod1", "DMM.Readings"),
               (std::vector<double>{0.5, -0.25, 1.75}));
     EXPECT_EQ(getArray(getInt32s, session, "Mod1", "DMM.Trims"),
-              (std::vector<int32_t>{0, -1, 2, -3}));
+              (std::vector<std::int32_t>{0, -1, 2, -3}));
     EXPECT_EQ(getArray(getInt64s, session, "Mod1", "DMM.Timestamps"),
-              (std::vector<int64_t>{-1, 0, std::numeric_limits<int64_t>::max()}));
+              (std::vector<std::int64_t>{-1, 0, std::numeric_limits<std::int64_t>::max()}));
     EXPECT_EQ(getTexts(session, "Mod1", "DMM.Labels"), (Names{"A", "B", "C", "D"}));
     EXPECT_EQ(getArray(getUInt32s, session, "Mod1", "DMM.Histogram"),
-              (std::vector<uint32_t>{0, 1, 4294967295u}));
+              (std::vector<std::uint32_t>{0, 1, 4294967295u}));
     EXPECT_EQ(getArray(getUInt64s, session, "Mod1", "DMM.Totals"),
-              (std::vector<uint64_t>{0, 18446744073709551615u}));
+              (std::vector<std::uint64_t>{0, 18446744073709551615u}));
 }
 
 TEST_F(PropertyTest, AnEmptyArrayIsNullWithCountZero) {
@@ -39,14 +39,15 @@ TEST_F(PropertyTest, AnEmptyArrayIsNullWithCountZero) {
 }
 
 TEST_F(PropertyTest, ScalarsAreWritten) {
-    EXPECT_EQ(set(setBool, session, "Mod1", "DMM.AutoRange", uint8_t{0}).code, 0);
-    EXPECT_EQ(get(getBool, session, "Mod1", "DMM.AutoRange"), uint8_t{0});
+    EXPECT_EQ(set(setBool, session, "Mod1", "DMM.AutoRange", std::uint8_t{0}).code, 0);
+    EXPECT_EQ(get(getBool, session, "Mod1", "DMM.AutoRange"), std::uint8_t{0});
     EXPECT_EQ(set(setDouble, session, "Mod1", "DMM.Range", 0.1).code, 0);
     EXPECT_EQ(get(getDouble, session, "Mod1", "DMM.Range"), 0.1);
     EXPECT_EQ(set(setInt32, session, "Mod1", "DMM.Offset", -1000).code, 0);
     EXPECT_EQ(get(getInt32, session, "Mod1", "DMM.Offset"), -1000);
-    EXPECT_EQ(set(setInt64, session, "Mod1", "DMM.TriggerDelay", int64_t{-5000000000}).code, 0);
-    EXPECT_EQ(get(getInt64, session, "Mod1", "DMM.TriggerDelay"), int64_t{-5000000000});
+    EXPECT_EQ(set(setInt64, session, "Mod1", "DMM.TriggerDelay", std::int64_t{-5000000000}).code,
+              0);
+    EXPECT_EQ(get(getInt64, session, "Mod1", "DMM.TriggerDelay"), std::int64_t{-5000000000});
     EXPECT_EQ(set(setText, session, "Mod1", "DMM.Note", "für später").code, 0);
     EXPECT_EQ(getText(session, "Mod1", "DMM.Note"), std::string("für später"));
     EXPECT_EQ(set(setUInt32, session, "Mod1", "DMM.SampleCount", 1000000u).code, 0);
@@ -54,12 +55,13 @@ TEST_F(PropertyTest, ScalarsAreWritten) {
 }
 
 TEST_F(PropertyTest, ArraysAreWrittenWhole) {
-    const std::vector<uint8_t> flags{0, 7, 255};
+    const std::vector<std::uint8_t> flags{0, 7, 255};
     EXPECT_EQ(setArray(setBools, session, "Mod1", "DMM.InputsInUse", flags).code, 0);
     EXPECT_EQ(getArray(getBools, session, "Mod1", "DMM.InputsInUse"),
-              (std::vector<uint8_t>{0, 1, 1}));
+              (std::vector<std::uint8_t>{0, 1, 1}));
     EXPECT_EQ(setArray(setInt32s, session, "Mod1", "DMM.Trims", {127, -128}).code, 0);
-    EXPECT_EQ(getArray(getInt32s, session, "Mod1", "DMM.Trims"), (std::vector<int32_t>{127, -128}));
+    EXPECT_EQ(getArray(getInt32s, session, "Mod1", "DMM.Trims"),
+              (std::vector<std::int32_t>{127, -128}));
     EXPECT_EQ(setArray(setTexts, session, "Mod1", "DMM.Labels", {"x", ""}).code, 0);
     EXPECT_EQ(getTexts(session, "Mod1", "DMM.Labels"), (Names{"x", ""}));
     EXPECT_EQ(setArray(setTexts, session, "Mod1", "DMM.Labels", {}).code, 0);
@@ -72,14 +74,14 @@ TEST_F(PropertyTest, AScalarOfSeveralResourcesIsAnArray) {
               (std::vector<double>{5.0, 12.0}));
     EXPECT_EQ(get(getDouble, session, "Mod2/ch1", "PSU.Voltage"), 12.0);
     EXPECT_EQ(getArray(getUInt32s, session, "Mod4,Mod1,Mod4", "Dev.SlotNum"),
-              (std::vector<uint32_t>{4, 1, 4}));
+              (std::vector<std::uint32_t>{4, 1, 4}));
     EXPECT_EQ(getTexts(session, "Mod1,Mod2", "Dev.ProductName"),
               (Names{"Multimeter", "Power supply"}));
 }
 
 TEST_F(PropertyTest, TokensStandForSeveralResources) {
     EXPECT_EQ(getArray(getUInt32s, session, "$DefaultDevices", "Dev.SlotNum"),
-              (std::vector<uint32_t>{1, 2, 4, 5}));
+              (std::vector<std::uint32_t>{1, 2, 4, 5}));
 }
 
 TEST_F(PropertyTest, SeveralResourcesNeedOneElementEach) {
@@ -144,7 +146,7 @@ TEST_F(PropertyTest, AMisspeltPropertyIsRefusedWithTheNearestName) {
               refusal("Far.From.Everything", usage("ResourceName", "\"Mod1\"")));
     Status status;
     char** names = nullptr;
-    uint32_t count = 0;
+    std::uint32_t count = 0;
     nQITRMCAPI100_getSystemPropertyStringArray(session, "Sys.Device", &names, &count, &status);
     EXPECT_EQ(status.text(), refusal("Sys.Device", usage("NearestName", "\"Sys.Devices\"")));
     Status opening;
@@ -162,7 +164,7 @@ TEST_F(PropertyTest, ResourcesMustBeNamed) {
 }
 
 TEST_F(PropertyTest, AReadOnlyPropertyIsNotWritten) {
-    const Outcome outcome = set(setUInt64, session, "Mod1", "DMM.TriggerCount", uint64_t{1});
+    const Outcome outcome = set(setUInt64, session, "Mod1", "DMM.TriggerCount", std::uint64_t{1});
     EXPECT_EQ(outcome.code, -250968);
     EXPECT_EQ(outcome.text,
               detailsOf("readOnlyProperty", usage("PropertyName", "\"DMM.TriggerCount\"") + "," +
@@ -277,7 +279,7 @@ TEST_F(PropertyTest, AnUnreservedDeviceMayBeWritten) {
 
 TEST_F(PropertyTest, SystemPropertiesOfEachTypeAreReadAndWritten) {
     Status status;
-    uint8_t flag = 7;
+    std::uint8_t flag = 7;
     nQITRMCAPI100_getSystemPropertyBool(session, "Sys.Simulated", &flag, &status);
     EXPECT_EQ(flag, 1);
     double interval = 0;
@@ -294,7 +296,7 @@ TEST_F(PropertyTest, SystemPropertiesOfEachTypeAreReadAndWritten) {
 
 TEST_F(PropertyTest, SystemPropertiesAreRefusedLikeOthers) {
     Status unknown;
-    uint8_t flag = 7;
+    std::uint8_t flag = 7;
     nQITRMCAPI100_getSystemPropertyBool(session, "Sys.Nothing", &flag, &unknown);
     EXPECT_EQ(unknown.code, -250964);
     EXPECT_EQ(flag, 0);
@@ -305,7 +307,7 @@ TEST_F(PropertyTest, SystemPropertiesAreRefusedLikeOthers) {
     nQITRMCAPI100_setSystemPropertyDouble(session, "Sys.DiscoveryInterval", 0.5, &range);
     EXPECT_EQ(range.code, -250971);
     Status type;
-    uint64_t number = 7;
+    std::uint64_t number = 7;
     nQITRMCAPI100_getSystemPropertyUInt64(session, "Sys.Simulated", &number, &type);
     EXPECT_EQ(type.code, -250965);
     EXPECT_EQ(number, 0u);
@@ -376,9 +378,10 @@ TEST_F(PropertyTest, TheChassisKnowsItsModulesAndItsAddress) {
 
 TEST_F(PropertyTest, AreasHavePropertiesThatDescribeThem) {
     EXPECT_EQ(get(getUInt32, session, "Mod1/calibration", "NVMEMArea.Size"), 1024u);
-    EXPECT_EQ(get(getBool, session, "Mod1/calibration", "NVMEMArea.PasswordWanted"), uint8_t{1});
-    EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.SerialNumWanted"), uint8_t{0});
-    EXPECT_EQ(get(getBool, session, "Mod5/calibration", "NVMEMArea.Writable"), uint8_t{0});
+    EXPECT_EQ(get(getBool, session, "Mod1/calibration", "NVMEMArea.PasswordWanted"),
+              std::uint8_t{1});
+    EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.SerialNumWanted"), std::uint8_t{0});
+    EXPECT_EQ(get(getBool, session, "Mod5/calibration", "NVMEMArea.Writable"), std::uint8_t{0});
 }
 
 TEST_F(PropertyTest, ATextOfADeviceIsReadDirectly) {

@@ -5,8 +5,8 @@
 namespace drivertest {
 
 template <typename Number>
-Answer<Number> read(void (*function)(Handle, const char*, uint32_t, Number*, qierr_Status*),
-                    Handle session, const char* device, uint32_t address) {
+Answer<Number> read(void (*function)(Handle, const char*, std::uint32_t, Number*, qierr_Status*),
+                    Handle session, const char* device, std::uint32_t address) {
     Answer<Number> answer;
     answer.value = 99;
     Status status;
@@ -17,16 +17,16 @@ Answer<Number> read(void (*function)(Handle, const char*, uint32_t, Number*, qie
 }
 
 template <typename Number>
-Outcome tryWrite(void (*function)(Handle, const char*, uint32_t, Number, qierr_Status*),
-                 Handle session, const char* device, uint32_t address, Number value) {
+Outcome tryWrite(void (*function)(Handle, const char*, std::uint32_t, Number, qierr_Status*),
+                 Handle session, const char* device, std::uint32_t address, Number value) {
     Status status;
     function(session, device, address, value, &status);
     return {status.code, status.text()};
 }
 
 template <typename Number>
-int32_t write(void (*function)(Handle, const char*, uint32_t, Number, qierr_Status*),
-              Handle session, const char* device, uint32_t address, Number value) {
+std::int32_t write(void (*function)(Handle, const char*, std::uint32_t, Number, qierr_Status*),
+                   Handle session, const char* device, std::uint32_t address, Number value) {
     return tryWrite(function, session, device, address, value).code;
 }
 
@@ -40,11 +40,11 @@ constexpr auto write32 = nQITRMCAPI100_writeRegisterUInt32;
 constexpr auto write64 = nQITRMCAPI100_writeRegisterUInt64;
 
 // The details of a status about a register.
-inline std::string atRegister(uint32_t address) {
+inline std::string atRegister(std::uint32_t address) {
     return "{\"type\":\"usage\",\"usage\":\"kUsageTypeRegisterAddress\",\"value\":" +
            std::to_string(address) + ",\"value_type\":\"uint32_t\"}";
 }
-inline std::string where(uint32_t address, uint32_t bits) {
+inline std::string where(std::uint32_t address, std::uint32_t bits) {
     return atRegister(address) +
            ",{\"type\":\"usage\",\"usage\":\"kUsageTypeRegisterWidth\",\"value\":" +
            std::to_string(bits) + ",\"value_type\":\"uint32_t\"}";

@@ -6,7 +6,7 @@ using namespace drivertest;
 
 namespace {
 
-constexpr int32_t taken = -250811;
+constexpr std::int32_t taken = -250811;
 
 TEST(ReservationTest, ReadWriteIsExclusive) {
     Session holder("Mod1", 3);
@@ -131,7 +131,7 @@ TEST(ReservationTest, ATokenOfAnotherKindIsRefused) {
 
 TEST(ReservationTest, OtherAccessesAreRefused) {
     Session session;
-    for (const int32_t access : {0, 2, 4, -1}) {
+    for (const std::int32_t access : {0, 2, 4, -1}) {
         EXPECT_EQ(session.reserve("Mod1", access), -250961) << access;
     }
 }

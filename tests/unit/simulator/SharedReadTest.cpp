@@ -37,7 +37,7 @@ class Reader {
     void startAgain() { longest = Real::duration::zero(); }
     // With the call that is under way.
     Real::duration longestCall() const {
-        for (const uint64_t before = calls; calls <= before + 1;) {
+        for (const std::uint64_t before = calls; calls <= before + 1;) {
             std::this_thread::yield();
         }
         return longest;
@@ -46,7 +46,7 @@ class Reader {
   private:
     Session session;
     std::atomic<bool> stopped{false};
-    std::atomic<uint64_t> calls{0};
+    std::atomic<std::uint64_t> calls{0};
     std::atomic<Real::duration> longest{Real::duration::zero()};
     std::thread thread;
 };
@@ -54,7 +54,7 @@ class Reader {
 Real::duration readRecord(Handle session) {
     Status status;
     double* record = nullptr;
-    uint32_t count = 0;
+    std::uint32_t count = 0;
     const auto start = Real::now();
     nQITRMCAPI100_getGenericPropertyDoubleArray(session, "Mod4/ch0", "DIG.Waveform", &record,
                                                 &count, &status);
@@ -85,14 +85,14 @@ TEST(SharedReadTest, AShortReadingCallDoesNotWaitForALongOne) {
 
 TEST(SharedReadTest, ManyThreadsMayOpenAndClosePropertiesAtOnce) {
     Session session("Mod4");
-    const uint32_t before = outstanding().openProperties;
+    const std::uint32_t before = outstanding().openProperties;
     const auto openAndClose = [&] {
         for (int i = 0; i < 1000; ++i) {
             Status status;
             nQITRMCAPI100_Property handle = 0;
             nQITRMCAPI100_openGenericProperty(session, "Mod4", "DIG.RecordLength", &handle,
                                               &status);
-            int32_t type = 0;
+            std::int32_t type = 0;
             nQITRMCAPI100_getPropertyPropertyInt32(handle, "Prop.DataType", &type, &status);
             nQITRMCAPI100_closeProperty(handle, &status);
             EXPECT_EQ(status.code, 0);

@@ -71,11 +71,11 @@ namespace drivertest {
 
 namespace {
 
-constexpr int32_t outOfMemory = -250950;
+constexpr std::int32_t outOfMemory = -250950;
 
 // Makes each allocation of a call fail in turn. Every attempt must end in outOfMemory, or in the
 // code that the call has when memory suffices. Returns how many allocations the call makes.
-long starve(int32_t usual, const std::function<void(qierr_Status*)>& call) {
+long starve(std::int32_t usual, const std::function<void(qierr_Status*)>& call) {
     for (long count = 0;; ++count) {
         Status status;
         allowed = count;

@@ -17,9 +17,9 @@ constexpr const char* fileRemedy =
     "; put a copy of the file back, or remove it to lose the values in it";
 
 // The bytes in a file for a number of this size.
-std::string number(uint64_t value, size_t bytes) {
+std::string number(std::uint64_t value, std::size_t bytes) {
     std::string text;
-    for (size_t i = 0; i < bytes; ++i) {
+    for (std::size_t i = 0; i < bytes; ++i) {
         text += static_cast<char>(value >> (8 * i) & 0xFF);
     }
     return text;
@@ -29,20 +29,20 @@ std::string text(const std::string& content) {
     return number(content.size(), 4) + content;
 }
 
-std::string entry(const std::string& resource, const std::string& item, uint8_t type,
-                  uint32_t count, const std::string& elements) {
+std::string entry(const std::string& resource, const std::string& item, std::uint8_t type,
+                  std::uint32_t count, const std::string& elements) {
     return text(resource) + text(item) + number(type, 1) + number(count, 4) + elements;
 }
 
 std::string withChecksum(const std::string& content) {
-    uint64_t sum = 14695981039346656037u;
+    std::uint64_t sum = 14695981039346656037u;
     for (const char c : content) {
         sum = (sum ^ static_cast<unsigned char>(c)) * 1099511628211u;
     }
     return content + number(sum, 8);
 }
 
-std::string fileOf(uint64_t change, const std::string& entries) {
+std::string fileOf(std::uint64_t change, const std::string& entries) {
     return withChecksum("qitrmc-state 1\n" + number(change, 8) + number(entries.size(), 8) +
                         entries);
 }
@@ -71,7 +71,7 @@ class StateFaultTest : public testing::Test {
                                        " is not used: " + reason + "\n");
     }
     // Commits a byte to an area in a process of its own.
-    void commitByte(uint8_t byte) const {
+    void commitByte(std::uint8_t byte) const {
         EXPECT_EQ(state.run([&] {
             Session session("Mod1");
             EXPECT_EQ(writeArea(session, "Mod1/user", {byte}).code, 0);
@@ -79,7 +79,7 @@ class StateFaultTest : public testing::Test {
         }),
                   "");
     }
-    void expectByte(uint8_t byte) const {
+    void expectByte(std::uint8_t byte) const {
         EXPECT_EQ(state.run([&] {
             Session session("Mod1");
             EXPECT_EQ(readArea(session, "Mod1/user", 1), Bytes{byte});
@@ -213,7 +213,7 @@ TEST_F(StateFaultTest, AFileIsWrittenInItsDocumentedFormat) {
 TEST_F(StateFaultTest, AFileTruncatedAnywhereIsRefused) {
     commitByte(1);
     const std::string whole = contentOf(state.file("change-1"));
-    for (size_t size = 0; size < whole.size(); ++size) {
+    for (std::size_t size = 0; size < whole.size(); ++size) {
         state.put("change-1", whole.substr(0, size));
         const std::string errors = state.run([] { EXPECT_EQ(openSession().code, -250930); });
         EXPECT_NE(errors.find("change-1: "), std::string::npos) << "at " << size;
@@ -226,7 +226,7 @@ TEST_F(StateFaultTest, AFileWithAnyByteChangedIsRefused) {
     commitByte(1);
     const std::string whole = contentOf(state.file("change-1"));
     unsigned change = 1;
-    for (size_t place = 0; place < whole.size(); ++place) {
+    for (std::size_t place = 0; place < whole.size(); ++place) {
         std::string edited = whole;
         edited[place] = static_cast<char>(edited[place] ^ static_cast<char>(change));
         change = change % 255 + 1;
@@ -356,17 +356,18 @@ void limitFileSize(rlim_t bytes) {
 TEST_F(StateFaultTest, AFullDiskAtAnyByteKeepsTheOldContent) {
     commitByte(1);
     const auto before = state.files();
-    const size_t size = before.at("change-1").size();
+    const std::size_t size = before.at("change-1").size();
     EXPECT_EQ(state.run([&] {
         Session session("Mod1");
         EXPECT_EQ(writeArea(session, "Mod1/user", {2}).code, 0);
-        for (size_t room = 0; room < size; ++room) {
+        for (std::size_t room = 0; room < size; ++room) {
             limitFileSize(room);
             expectNotWritten(commitNvmem(session, "Mod1/user"), state.file("change-2"),
                              "File too large");
             EXPECT_EQ(state.files(), before) << "room for " << room;
             EXPECT_FALSE(std::filesystem::exists(state.file("unfinished")));
-            EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.PendingChanges"), uint8_t{1});
+            EXPECT_EQ(get(getBool, session, "Mod1/user", "NVMEMArea.PendingChanges"),
+                      std::uint8_t{1});
         }
         EXPECT_EQ(readArea(session, "Mod1/user", 1), Bytes{2});
         EXPECT_EQ(resetDevices(session, "Mod1"), 0);

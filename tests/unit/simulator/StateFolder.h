@@ -79,9 +79,9 @@ class StateFolder {
     std::string chassis;
 };
 
-using Bytes = std::vector<uint8_t>;
+using Bytes = std::vector<std::uint8_t>;
 
-inline Bytes readArea(Handle session, const char* area, uint32_t size) {
+inline Bytes readArea(Handle session, const char* area, std::uint32_t size) {
     Bytes bytes(size);
     Status status;
     nQITRMCAPI100_getNvmemBytes(session, area, 0, bytes.data(), size, &status);
@@ -91,8 +91,8 @@ inline Bytes readArea(Handle session, const char* area, uint32_t size) {
 
 inline Outcome writeArea(Handle session, const char* area, const Bytes& bytes) {
     Status status;
-    nQITRMCAPI100_setNvmemBytes(session, area, 0, bytes.data(), static_cast<uint32_t>(bytes.size()),
-                                "", "", &status);
+    nQITRMCAPI100_setNvmemBytes(session, area, 0, bytes.data(),
+                                static_cast<std::uint32_t>(bytes.size()), "", "", &status);
     return {status.code, status.text()};
 }
 
@@ -114,9 +114,9 @@ inline Outcome renameDevice(Handle session, const char* device, const char* name
     return {status.code, status.text()};
 }
 
-inline uint64_t changeCount(Handle session) {
+inline std::uint64_t changeCount(Handle session) {
     Status status;
-    uint64_t count = 0;
+    std::uint64_t count = 0;
     nQITRMCAPI100_getSystemPropertyUInt64(session, "Sys.ConfigChangeCount", &count, &status);
     EXPECT_EQ(status.code, 0) << status.text();
     return count;

@@ -13,7 +13,7 @@ using namespace drivertest;
 
 namespace {
 
-constexpr uint32_t areaSize = 65536;
+constexpr std::uint32_t areaSize = 65536;
 
 // Two areas on two devices, large enough that writing them takes a while.
 constexpr const char* description = R"({"devices": [
@@ -22,18 +22,19 @@ constexpr const char* description = R"({"devices": [
 ]})";
 
 // The content of an area in a round: the number of the round, repeated.
-Bytes contentOfRound(uint32_t round) {
+Bytes contentOfRound(std::uint32_t round) {
     Bytes bytes;
-    for (uint32_t i = 0; i < areaSize / 4; ++i) {
-        for (uint32_t shift = 0; shift < 32; shift += 8) {
-            bytes.push_back(static_cast<uint8_t>(round >> shift));
+    for (std::uint32_t i = 0; i < areaSize / 4; ++i) {
+        for (std::uint32_t shift = 0; shift < 32; shift += 8) {
+            bytes.push_back(static_cast<std::uint8_t>(round >> shift));
         }
     }
     return bytes;
 }
 
-uint32_t roundOf(const Bytes& bytes) {
-    return bytes[0] | uint32_t{bytes[1]} << 8 | uint32_t{bytes[2]} << 16 | uint32_t{bytes[3]} << 24;
+std::uint32_t roundOf(const Bytes& bytes) {
+    return bytes[0] | std::uint32_t{bytes[1]} << 8 | std::uint32_t{bytes[2]} << 16 |
+           std::uint32_t{bytes[3]} << 24;
 }
 
 // Commits one round after the other to both areas at once, and writes the number of each to the
@@ -41,7 +42,7 @@ uint32_t roundOf(const Bytes& bytes) {
 void commitForEver(int pipe) {
     Session session("A,B");
     const Bytes found = readArea(session, "A/user", areaSize);
-    uint32_t round = roundOf(found);
+    std::uint32_t round = roundOf(found);
     // A torn or mixed content is reported as an impossible round.
     if (found != contentOfRound(round) || readArea(session, "B/user", areaSize) != found) {
         round = UINT32_MAX;
@@ -59,8 +60,8 @@ void commitForEver(int pipe) {
 
 // What a process reported before it was killed.
 struct Report {
-    uint32_t found = UINT32_MAX;
-    uint32_t committed = UINT32_MAX;
+    std::uint32_t found = UINT32_MAX;
+    std::uint32_t committed = UINT32_MAX;
 };
 
 // Kills a process some time after it started, or after its first commit.
@@ -98,7 +99,7 @@ TEST(StateKillTest, AKilledProcessLeavesACompleteContentNotOlderThanItsLastCommi
     state.chassis = file.path;
     std::mt19937 random(testing::UnitTest::GetInstance()->random_seed());
     std::uniform_int_distribution<int> microseconds(0, 10000);
-    uint32_t committed = 0;
+    std::uint32_t committed = 0;
     int cutOff = 0;
     int unacknowledged = 0;
     for (int i = 0; i < kills; ++i) {
@@ -114,7 +115,7 @@ TEST(StateKillTest, AKilledProcessLeavesACompleteContentNotOlderThanItsLastCommi
         "%d kills, %u commits; %d kills while a file was written, %d after it was there "
         "and before the commit returned\n",
         kills, static_cast<unsigned>(committed), cutOff, unacknowledged);
-    EXPECT_GE(committed, static_cast<uint32_t>(kills / 2));
+    EXPECT_GE(committed, static_cast<std::uint32_t>(kills / 2));
 }
 
 }  // namespace

@@ -65,7 +65,7 @@ TEST_F(StateMemoryTest, CommittingNvmem) {
         nQITRMCAPI100_commitNvmemGeneric(session, "A", status);
         allowed = -1;
         EXPECT_EQ(get(getBool, session, "A/user", "NVMEMArea.PendingChanges"),
-                  uint8_t{status->code != 0});
+                  std::uint8_t{status->code != 0});
     });
 }
 

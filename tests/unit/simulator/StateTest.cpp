@@ -64,7 +64,7 @@ TEST_F(StateTest, CommittedBytesSurviveARestart) {
         EXPECT_EQ(readArea(session, "Größe/user", 4), (Bytes{0, 1, 255, 0}));
         EXPECT_EQ(readArea(session, "Second/user", 4), (Bytes{9, 0, 0, 0}));
         EXPECT_EQ(readArea(session, "Größe/more", 2), (Bytes{0, 0}));
-        EXPECT_EQ(get(getBool, session, "Größe/user", "NVMEMArea.PendingChanges"), uint8_t{0});
+        EXPECT_EQ(get(getBool, session, "Größe/user", "NVMEMArea.PendingChanges"), std::uint8_t{0});
     });
 }
 
@@ -105,7 +105,7 @@ TEST_F(StateTest, BytesThatWereNotCommittedAreLost) {
 
 TEST_F(StateTest, ObsoleteFilesAreRemoved) {
     run([](Session& session) {
-        for (uint8_t i = 0; i < 5; ++i) {
+        for (std::uint8_t i = 0; i < 5; ++i) {
             EXPECT_EQ(writeArea(session, "Größe/user", {i}).code, 0);
             EXPECT_EQ(writeArea(session, "Second/user", {i}).code, 0);
             EXPECT_EQ(commitNvmem(session, i < 3 ? "Größe/user,Second/user" : "Größe/user").code,
@@ -181,10 +181,11 @@ TEST_F(StateTest, OnlyPersistentPropertiesSurviveARestart) {
         EXPECT_EQ(getTexts(session, "Größe/ch0:1", "PhysChan.Comment"), (Names{"a", ""}));
         EXPECT_EQ(get(getDouble, session, "Größe", "P.Real"), -0.1);
         EXPECT_EQ(getTexts(session, "Größe", "P.Labels"), (Names{"x", "", "ü"}));
-        EXPECT_EQ(getArray(getBools, session, "Größe", "P.Flags"), (std::vector<uint8_t>{1, 0}));
+        EXPECT_EQ(getArray(getBools, session, "Größe", "P.Flags"),
+                  (std::vector<std::uint8_t>{1, 0}));
         EXPECT_EQ(get(getInt32, session, "Größe", "P.Fleeting"), 1);
         Status status;
-        uint8_t enabled = 1;
+        std::uint8_t enabled = 1;
         double interval = 0;
         nQITRMCAPI100_getSystemPropertyBool(session, "Sys.DiscoveryEnabled", &enabled, &status);
         nQITRMCAPI100_getSystemPropertyDouble(session, "Sys.DiscoveryInterval", &interval, &status);
@@ -209,7 +210,7 @@ TEST_F(StateTest, ChangesOfPersistentPropertiesByCommandsSurviveARestart) {
         EXPECT_EQ(execute(session, "Name").code, 0);
     });
     run([](Session& session) {
-        EXPECT_EQ(get(getUInt64, session, "Größe", "Dev.Hours"), uint64_t{17});
+        EXPECT_EQ(get(getUInt64, session, "Größe", "Dev.Hours"), std::uint64_t{17});
         EXPECT_EQ(get(getInt32, session, "Größe", "P.Fleeting"), 1);
         EXPECT_EQ(getText(session, "Größe", "Dev.Comment"), std::string("worked"));
     });

@@ -43,7 +43,7 @@ TEST(StatusTextTest, ExistingRoomIsUsed) {
 
 TEST(StatusTextTest, RoomThatJustFitsIsEnough) {
     Status status;
-    status.reallocJson(&status, static_cast<uint32_t>(refusal.size() + 2));
+    status.reallocJson(&status, static_cast<std::uint32_t>(refusal.size() + 2));
     refuse(status);
     EXPECT_EQ(status.growths, 1u);
     EXPECT_EQ(status.text(), refusal);
@@ -51,7 +51,7 @@ TEST(StatusTextTest, RoomThatJustFitsIsEnough) {
 
 TEST(StatusTextTest, RoomThatIsOneByteShortGrows) {
     Status status;
-    status.reallocJson(&status, static_cast<uint32_t>(refusal.size() + 1));
+    status.reallocJson(&status, static_cast<std::uint32_t>(refusal.size() + 1));
     refuse(status);
     EXPECT_EQ(status.growths, 2u);
     EXPECT_EQ(status.text(), refusal);

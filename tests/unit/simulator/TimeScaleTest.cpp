@@ -19,7 +19,7 @@ using Real = std::chrono::steady_clock;
 TEST(TimeScaleTest, ACommandTakesAThousandthOfItsTime) {
     Session session("Mod1");
     Status status;
-    const uint32_t before = get(getUInt32, session, "Mod1/ch0", "DMM.SampleClock").value;
+    const std::uint32_t before = get(getUInt32, session, "Mod1/ch0", "DMM.SampleClock").value;
     const auto start = Real::now();
     nQITRMCAPI100_executeGenericCommand(session, "Mod1", "DMM.Calibrate", 60.0, &status);
     EXPECT_EQ(status.code, 0) << status.text();

@@ -26,7 +26,7 @@ class TraceTest : public testing::Test {
     Names lines() const {
         const Names all = allLines();
         Names fresh;
-        for (size_t i = linesBefore; i < all.size(); ++i) {
+        for (std::size_t i = linesBefore; i < all.size(); ++i) {
             std::smatch parts;
             const std::regex form(R"(\d+\.\d{6} t\d+ (.*) \[\d+ us\])");
             EXPECT_TRUE(std::regex_match(all[i], parts, form)) << all[i];
@@ -45,7 +45,7 @@ class TraceTest : public testing::Test {
     }
 
   private:
-    size_t linesBefore = 0;
+    std::size_t linesBefore = 0;
 };
 
 std::string handleText(const Session& session) {
@@ -86,9 +86,9 @@ TEST_F(TraceTest, ACallWithANegativeStatusIsNotTraced) {
 TEST_F(TraceTest, ArraysAndBytesAreListed) {
     const Session session;
     Status status;
-    const int32_t trims[] = {1, -2, 3, -4};
+    const std::int32_t trims[] = {1, -2, 3, -4};
     nQITRMCAPI100_setGenericPropertyInt32Array(session, "Mod1", "DMM.Trims", trims, 4, &status);
-    uint8_t bytes[2] = {0, 0};
+    std::uint8_t bytes[2] = {0, 0};
     nQITRMCAPI100_getNvmemBytes(session, "Mod1/calibration", 2, bytes, 2, &status);
     EXPECT_EQ(lines()[1], "setGenericPropertyInt32Array(session=" + handleText(session) +
                               ", resources=\"Mod1\", property=\"DMM.Trims\", array=[1,-2,3,-4]) "
@@ -102,7 +102,7 @@ TEST_F(TraceTest, LongValuesAreTruncatedAndNullsAreNamed) {
     Status status;
     const std::string longText(300, 'x');
     nQITRMCAPI100_setGenericPropertyString(session, "Mod1", "DMM.Note", longText.c_str(), &status);
-    uint8_t bytes[20] = {};
+    std::uint8_t bytes[20] = {};
     nQITRMCAPI100_getNvmemBytes(session, "Mod1/calibration", 0, bytes, 20, &status);
     nQITRMCAPI100_connectToDevices(session, nullptr, 1.5, &status);
     EXPECT_NE(lines()[1].find("value=\"" + longText.substr(0, 200) + "\"...(300 bytes)) -> 0"),

@@ -7,7 +7,7 @@ namespace drivertest {
 // The result of a call: its code, the details if it failed, and the value.
 template <typename Value>
 struct Answer {
-    int32_t code = 0;
+    std::int32_t code = 0;
     std::string text;
     Value value{};
 };
@@ -25,11 +25,12 @@ bool operator==(const Answer<Value>& answer, const Value& expected) {
 template <typename Number>
 using Getter = void (*)(Handle, const char*, const char*, Number*, qierr_Status*);
 template <typename Number>
-using ArrayGetter = void (*)(Handle, const char*, const char*, Number**, uint32_t*, qierr_Status*);
+using ArrayGetter = void (*)(Handle, const char*, const char*, Number**, std::uint32_t*,
+                             qierr_Status*);
 template <typename Number>
 using Setter = void (*)(Handle, const char*, const char*, Number, qierr_Status*);
 template <typename Number>
-using ArraySetter = void (*)(Handle, const char*, const char*, const Number*, uint32_t,
+using ArraySetter = void (*)(Handle, const char*, const char*, const Number*, std::uint32_t,
                              qierr_Status*);
 
 template <typename Number>
@@ -61,7 +62,7 @@ Answer<std::vector<Number>> getArray(ArrayGetter<Number> getter, Handle session,
     Answer<std::vector<Number>> answer;
     Status status;
     Number* array = nullptr;
-    uint32_t count = 0;
+    std::uint32_t count = 0;
     getter(session, resources, property, &array, &count, &status);
     answer.value.assign(array, array + count);
     nQITRMCAPI100_freeArray(array);
@@ -74,7 +75,7 @@ inline Answer<Names> getTexts(Handle session, const char* resources, const char*
     Answer<Names> answer;
     Status status;
     char** array = nullptr;
-    uint32_t count = 0;
+    std::uint32_t count = 0;
     nQITRMCAPI100_getGenericPropertyStringArray(session, resources, property, &array, &count,
                                                 &status);
     answer.value = takeNames(array, count);
@@ -85,7 +86,7 @@ inline Answer<Names> getTexts(Handle session, const char* resources, const char*
 
 // The result of a write: the code and the details.
 struct Outcome {
-    int32_t code;
+    std::int32_t code;
     std::string text;
 };
 
@@ -105,36 +106,36 @@ template <typename Number>
 Outcome setArray(ArraySetter<Number> setter, Handle session, const char* resources,
                  const char* property, const std::vector<Number>& values) {
     Status status;
-    setter(session, resources, property, values.data(), static_cast<uint32_t>(values.size()),
+    setter(session, resources, property, values.data(), static_cast<std::uint32_t>(values.size()),
            &status);
     return {status.code, status.text()};
 }
 
-constexpr Getter<uint8_t> getBool = nQITRMCAPI100_getGenericPropertyBool;
+constexpr Getter<std::uint8_t> getBool = nQITRMCAPI100_getGenericPropertyBool;
 constexpr Getter<double> getDouble = nQITRMCAPI100_getGenericPropertyDouble;
-constexpr Getter<int32_t> getInt32 = nQITRMCAPI100_getGenericPropertyInt32;
-constexpr Getter<int64_t> getInt64 = nQITRMCAPI100_getGenericPropertyInt64;
-constexpr Getter<uint32_t> getUInt32 = nQITRMCAPI100_getGenericPropertyUInt32;
-constexpr Getter<uint64_t> getUInt64 = nQITRMCAPI100_getGenericPropertyUInt64;
-constexpr ArrayGetter<uint8_t> getBools = nQITRMCAPI100_getGenericPropertyBoolArray;
+constexpr Getter<std::int32_t> getInt32 = nQITRMCAPI100_getGenericPropertyInt32;
+constexpr Getter<std::int64_t> getInt64 = nQITRMCAPI100_getGenericPropertyInt64;
+constexpr Getter<std::uint32_t> getUInt32 = nQITRMCAPI100_getGenericPropertyUInt32;
+constexpr Getter<std::uint64_t> getUInt64 = nQITRMCAPI100_getGenericPropertyUInt64;
+constexpr ArrayGetter<std::uint8_t> getBools = nQITRMCAPI100_getGenericPropertyBoolArray;
 constexpr ArrayGetter<double> getDoubles = nQITRMCAPI100_getGenericPropertyDoubleArray;
-constexpr ArrayGetter<int32_t> getInt32s = nQITRMCAPI100_getGenericPropertyInt32Array;
-constexpr ArrayGetter<int64_t> getInt64s = nQITRMCAPI100_getGenericPropertyInt64Array;
-constexpr ArrayGetter<uint32_t> getUInt32s = nQITRMCAPI100_getGenericPropertyUInt32Array;
-constexpr ArrayGetter<uint64_t> getUInt64s = nQITRMCAPI100_getGenericPropertyUInt64Array;
-constexpr Setter<uint8_t> setBool = nQITRMCAPI100_setGenericPropertyBool;
+constexpr ArrayGetter<std::int32_t> getInt32s = nQITRMCAPI100_getGenericPropertyInt32Array;
+constexpr ArrayGetter<std::int64_t> getInt64s = nQITRMCAPI100_getGenericPropertyInt64Array;
+constexpr ArrayGetter<std::uint32_t> getUInt32s = nQITRMCAPI100_getGenericPropertyUInt32Array;
+constexpr ArrayGetter<std::uint64_t> getUInt64s = nQITRMCAPI100_getGenericPropertyUInt64Array;
+constexpr Setter<std::uint8_t> setBool = nQITRMCAPI100_setGenericPropertyBool;
 constexpr Setter<double> setDouble = nQITRMCAPI100_setGenericPropertyDouble;
-constexpr Setter<int32_t> setInt32 = nQITRMCAPI100_setGenericPropertyInt32;
-constexpr Setter<int64_t> setInt64 = nQITRMCAPI100_setGenericPropertyInt64;
-constexpr Setter<uint32_t> setUInt32 = nQITRMCAPI100_setGenericPropertyUInt32;
-constexpr Setter<uint64_t> setUInt64 = nQITRMCAPI100_setGenericPropertyUInt64;
+constexpr Setter<std::int32_t> setInt32 = nQITRMCAPI100_setGenericPropertyInt32;
+constexpr Setter<std::int64_t> setInt64 = nQITRMCAPI100_setGenericPropertyInt64;
+constexpr Setter<std::uint32_t> setUInt32 = nQITRMCAPI100_setGenericPropertyUInt32;
+constexpr Setter<std::uint64_t> setUInt64 = nQITRMCAPI100_setGenericPropertyUInt64;
 constexpr Setter<const char*> setText = nQITRMCAPI100_setGenericPropertyString;
-constexpr ArraySetter<uint8_t> setBools = nQITRMCAPI100_setGenericPropertyBoolArray;
+constexpr ArraySetter<std::uint8_t> setBools = nQITRMCAPI100_setGenericPropertyBoolArray;
 constexpr ArraySetter<double> setDoubles = nQITRMCAPI100_setGenericPropertyDoubleArray;
-constexpr ArraySetter<int32_t> setInt32s = nQITRMCAPI100_setGenericPropertyInt32Array;
-constexpr ArraySetter<int64_t> setInt64s = nQITRMCAPI100_setGenericPropertyInt64Array;
-constexpr ArraySetter<uint32_t> setUInt32s = nQITRMCAPI100_setGenericPropertyUInt32Array;
-constexpr ArraySetter<uint64_t> setUInt64s = nQITRMCAPI100_setGenericPropertyUInt64Array;
+constexpr ArraySetter<std::int32_t> setInt32s = nQITRMCAPI100_setGenericPropertyInt32Array;
+constexpr ArraySetter<std::int64_t> setInt64s = nQITRMCAPI100_setGenericPropertyInt64Array;
+constexpr ArraySetter<std::uint32_t> setUInt32s = nQITRMCAPI100_setGenericPropertyUInt32Array;
+constexpr ArraySetter<std::uint64_t> setUInt64s = nQITRMCAPI100_setGenericPropertyUInt64Array;
 constexpr ArraySetter<const char*> setTexts = nQITRMCAPI100_setGenericPropertyStringArray;
 
 inline Outcome execute(Handle session, const char* resources, const char* command, double timeout) {
@@ -144,7 +145,7 @@ inline Outcome execute(Handle session, const char* resources, const char* comman
 }
 
 // Restores devices to their state after power-on.
-inline int32_t resetDevices(Handle session, const char* devices) {
+inline std::int32_t resetDevices(Handle session, const char* devices) {
     Status status;
     nQITRMCAPI100_resetDevices(session, devices, &status);
     return status.code;

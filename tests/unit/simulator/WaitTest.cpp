@@ -14,19 +14,19 @@ namespace {
 
 constexpr double longTime = 60.0;
 
-std::future<int32_t> reserveLater(Session& session, const char* devices, int32_t access = 3,
-                                  double timeout = longTime) {
+std::future<std::int32_t> reserveLater(Session& session, const char* devices,
+                                       std::int32_t access = 3, double timeout = longTime) {
     return std::async(std::launch::async, [&session, devices, access, timeout] {
         return session.reserve(devices, access, "", timeout);
     });
 }
 
-bool isReady(const std::future<int32_t>& result) {
+bool isReady(const std::future<std::int32_t>& result) {
     return result.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
 }
 
 // Calls `act` repeatedly until the call that it is meant for has returned.
-int32_t resultAfter(std::future<int32_t>& result, const std::function<void()>& act) {
+std::int32_t resultAfter(std::future<std::int32_t>& result, const std::function<void()>& act) {
     while (!isReady(result)) {
         act();
         std::this_thread::yield();
@@ -137,12 +137,12 @@ TEST(WaitTest, WaitsAreServedInTheOrderOfArrival) {
     const std::array<const char*, 3> wanted{"Mod1,Mod2", "Mod1,Mod4", "Mod1,Mod5"};
     const std::array<const char*, 3> signs{"Mod2", "Mod4", "Mod5"};
     std::mutex mutex;
-    std::vector<size_t> order;
-    std::vector<std::future<int32_t>> results;
-    for (size_t i = 0; i < wanted.size(); ++i) {
+    std::vector<std::size_t> order;
+    std::vector<std::future<std::int32_t>> results;
+    for (std::size_t i = 0; i < wanted.size(); ++i) {
         results.push_back(std::async(std::launch::async, [&, i] {
             Session session;
-            const int32_t code = session.reserve(wanted[i], 3, "", longTime);
+            const std::int32_t code = session.reserve(wanted[i], 3, "", longTime);
             const std::lock_guard<std::mutex> lock(mutex);
             order.push_back(i);
             return code;
@@ -153,7 +153,7 @@ TEST(WaitTest, WaitsAreServedInTheOrderOfArrival) {
     for (auto& result : results) {
         EXPECT_EQ(result.get(), 0);
     }
-    EXPECT_EQ(order, (std::vector<size_t>{0, 1, 2}));
+    EXPECT_EQ(order, (std::vector<std::size_t>{0, 1, 2}));
 }
 
 // A session that wants two devices is not passed by those that want one of them.
@@ -165,7 +165,7 @@ TEST(WaitTest, ASessionThatWaitsForTwoDevicesIsNotOvertaken) {
     const auto waiter = [&](int number, const char* devices) {
         return std::async(std::launch::async, [&, number, devices] {
             Session session;
-            const int32_t code = session.reserve(devices, 3, "", longTime);
+            const std::int32_t code = session.reserve(devices, 3, "", longTime);
             const std::lock_guard<std::mutex> lock(mutex);
             order.push_back(number);
             return code;
@@ -220,7 +220,7 @@ TEST(WaitTest, ADeviceHasOneHolderAtATime) {
     for (int worker = 0; worker < threads; ++worker) {
         workers.emplace_back([&, worker] {
             for (int round = 0; round < rounds; ++round) {
-                const size_t index = static_cast<size_t>(worker + round) % devices.size();
+                const std::size_t index = static_cast<std::size_t>(worker + round) % devices.size();
                 Status status;
                 Handle handle = 0;
                 nQITRMCAPI100_initializeSessionWithDevices(&handle, devices[index], 60.0, 3, "",
@@ -242,7 +242,7 @@ TEST(WaitTest, ADeviceHasOneHolderAtATime) {
 
 TEST(WaitTest, HundredsOfThreadsWaitForOneDevice) {
     Session holder("Mod4");
-    std::vector<std::future<int32_t>> results;
+    std::vector<std::future<std::int32_t>> results;
     for (int i = 0; i < 200; ++i) {
         results.push_back(std::async(std::launch::async, [] {
             Session session;
@@ -255,7 +255,7 @@ TEST(WaitTest, HundredsOfThreadsWaitForOneDevice) {
     }
 }
 
-int32_t execute(Session& session, const char* resources, const char* command, double timeout) {
+std::int32_t execute(Session& session, const char* resources, const char* command, double timeout) {
     Status status;
     nQITRMCAPI100_executeGenericCommand(session, resources, command, timeout, &status);
     return status.code;
@@ -304,7 +304,7 @@ TEST(WaitTest, ClosingEndsACommand) {
 TEST(WaitTest, SessionsOfAllKindsWorkConcurrently) {
     constexpr int rounds = 40;
     std::vector<std::future<int>> workers;
-    const auto start = [&](const std::function<int32_t(Session&)>& act) {
+    const auto start = [&](const std::function<std::int32_t(Session&)>& act) {
         workers.push_back(std::async(std::launch::async, [act] {
             int failures = 0;
             for (int round = 0; round < rounds; ++round) {
@@ -338,7 +338,8 @@ TEST(WaitTest, SessionsOfAllKindsWorkConcurrently) {
             return status.code;
         });
         start([](Session& session) {
-            return static_cast<int32_t>(session.deviceList("Mod1", "Dev.PhysChans").size()) - 4;
+            return static_cast<std::int32_t>(session.deviceList("Mod1", "Dev.PhysChans").size()) -
+                   4;
         });
         start([](Session& session) {
             Status status;
