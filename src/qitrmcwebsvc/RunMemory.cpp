@@ -1,6 +1,8 @@
 #include "qitrmcwebsvc/RunMemory.h"
 
+#include <algorithm>
 #include <cstdlib>
+#include <cstring>
 #include <new>
 
 namespace nQITRMCWEBSVC100 {
@@ -17,7 +19,7 @@ void* RunMemory::Malloc(std::size_t size) {
     return Realloc(nullptr, 0, size);
 }
 
-void* RunMemory::Realloc(void* block, std::size_t, std::size_t newSize) {
+void* RunMemory::Realloc(void* block, std::size_t currentSize, std::size_t newSize) {
     if (newSize == 0) {
         Free(block);
         return nullptr;
@@ -25,8 +27,36 @@ void* RunMemory::Realloc(void* block, std::size_t, std::size_t newSize) {
     if (newSize > static_cast<std::size_t>(-1) - sizeof(Link)) {
         throw std::bad_alloc();
     }
-    Link* const old = block ? linkOf(block) : nullptr;
-    Link* const link = static_cast<Link*>(std::realloc(old, sizeof(Link) + newSize));
+    const bool isInFirst = block && !linkOf(block)->next;
+    if (!block || isInFirst) {
+        void* const moved = takeFromFirst(newSize);
+        void* const fresh = moved ? moved : reallocate(nullptr, newSize);
+        if (block) {
+            std::memcpy(fresh, block, std::min(currentSize, newSize));
+        }
+        return fresh;
+    }
+    return reallocate(linkOf(block), newSize);
+}
+
+// Null if there is too little room.
+void* RunMemory::takeFromFirst(std::size_t size) noexcept {
+    if (size > firstSize) {
+        return nullptr;
+    }
+    const std::size_t needed =
+        sizeof(Link) + (size + alignof(Link) - 1) / alignof(Link) * alignof(Link);
+    if (needed > firstSize - used) {
+        return nullptr;
+    }
+    Link* const link = new (first + used) Link{nullptr, nullptr};
+    used += needed;
+    return link + 1;
+}
+
+// `old` is null for a new block.
+void* RunMemory::reallocate(Link* old, std::size_t size) {
+    Link* const link = static_cast<Link*>(std::realloc(old, sizeof(Link) + size));
     if (!link) {
         throw std::bad_alloc();
     }
@@ -39,10 +69,10 @@ void* RunMemory::Realloc(void* block, std::size_t, std::size_t newSize) {
 }
 
 void RunMemory::Free(void* block) noexcept {
-    if (!block) {
+    Link* const link = block ? linkOf(block) : nullptr;
+    if (!link || !link->next) {
         return;
     }
-    Link* const link = linkOf(block);
     link->previous->next = link->next;
     link->next->previous = link->previous;
     std::free(link);

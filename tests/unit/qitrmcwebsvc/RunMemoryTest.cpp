@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <cstdint>
 #include <cstring>
 #include <limits>
@@ -34,6 +35,23 @@ TEST(RunMemory, KeepsTheContentOfABlockThatGrows) {
     EXPECT_EQ(std::memcmp(block, "12345678", 8), 0);
     block = memory.Realloc(block, 100000, 4);
     EXPECT_EQ(std::memcmp(block, "1234", 4), 0);
+}
+
+TEST(RunMemory, KeepsTheContentOfEachOfManyGrowingBlocks) {
+    constexpr std::size_t count = 50;
+    RunMemory memory;
+    unsigned char* blocks[count] = {};
+    for (std::size_t size = 1; size < 1000; size *= 3) {
+        for (std::size_t i = 0; i < count; ++i) {
+            blocks[i] = static_cast<unsigned char*>(memory.Realloc(blocks[i], size / 3, size));
+            std::memset(blocks[i] + size / 3, static_cast<int>(i), size - size / 3);
+        }
+    }
+    for (std::size_t i = 0; i < count; ++i) {
+        EXPECT_TRUE(std::all_of(blocks[i], blocks[i] + 729, [i](int byte) {
+            return byte == static_cast<int>(i);
+        })) << i;
+    }
 }
 
 TEST(RunMemory, ReturnsNullForNoBytes) {
