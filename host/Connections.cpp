@@ -1,6 +1,7 @@
 #include "host/Connections.h"
 
 #include <sys/socket.h>
+#include <time.h>
 
 #include <algorithm>
 #include <chrono>
@@ -10,14 +11,14 @@ namespace host {
 
 namespace {
 
-constexpr std::chrono::seconds longestWayIn(1);
+constexpr std::chrono::seconds longestWait(1);
 constexpr std::uint32_t patienceWhenFull = 2;
 constexpr std::uint32_t notWaiting = 0;
 
 std::uint32_t secondsNow() noexcept {
-    using namespace std::chrono;
-    const auto now = duration_cast<seconds>(steady_clock::now().time_since_epoch());
-    return static_cast<std::uint32_t>(now.count()) + 1;  // never notWaiting
+    timespec now = {};
+    clock_gettime(CLOCK_MONOTONIC_COARSE, &now);
+    return static_cast<std::uint32_t>(now.tv_sec) + 1;  // never notWaiting
 }
 
 }  // namespace
@@ -37,10 +38,20 @@ Connections::Connections(std::uint32_t most, std::uint32_t patience) noexcept
 
 bool Connections::waitForPlace() noexcept {
     std::unique_lock<std::mutex> lock(mutex);
-    changed.wait_for(lock, longestWayIn, [this] { return closed || !placeKept; });
     changed.wait(lock, [this] { return closed || open.size() < most; });
-    placeKept = true;
     return !closed;
+}
+
+void Connections::waitForRemoval() noexcept {
+    std::unique_lock<std::mutex> lock(mutex);
+    if (!closed) {
+        changed.wait_for(lock, longestWait);
+    }
+}
+
+void Connections::waitUntilEmpty() noexcept {
+    std::unique_lock<std::mutex> lock(mutex);
+    changed.wait(lock, [this] { return open.empty(); });
 }
 
 void Connections::close() noexcept {
@@ -51,8 +62,6 @@ void Connections::close() noexcept {
 
 Connection* Connections::add(int socket) noexcept {
     const std::lock_guard<std::mutex> lock(mutex);
-    placeKept = false;
-    changed.notify_one();
     try {
         Connection& connection = open.emplace_front(socket);
         connection.self = open.begin();
@@ -69,7 +78,7 @@ void Connections::remove(Connection* connection) noexcept {
     }
     const std::lock_guard<std::mutex> lock(mutex);
     open.erase(connection->self);
-    changed.notify_one();
+    changed.notify_all();
 }
 
 void Connections::shutOverdue() noexcept {
@@ -82,6 +91,13 @@ void Connections::shutOverdue() noexcept {
         if (since != notWaiting && since < now && now - since > limit) {
             shutdown(connection.socket, SHUT_RDWR);
         }
+    }
+}
+
+void Connections::shutAll() noexcept {
+    const std::lock_guard<std::mutex> lock(mutex);
+    for (const Connection& connection : open) {
+        shutdown(connection.socket, SHUT_RDWR);
     }
 }
 

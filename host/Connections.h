@@ -27,20 +27,24 @@ class Connection {
     std::list<Connection>::iterator self;
 };
 
-// The open connections. Every connection has a thread of its own, so one that keeps the host
-// waiting costs a place; this is where it loses it. All functions may be called from any thread.
+// The open connections. One whose client keeps the host waiting costs a place; this is where it
+// loses it. All functions may be called from any thread.
 class Connections {
   public:
     // most: how many connections the host takes at once. patience: how many seconds it waits for a
     // client's step.
     Connections(std::uint32_t most, std::uint32_t patience) noexcept;
 
-    // Waits until fewer connections are open than the host takes, and keeps that place for the next
-    // add(). When the client that had the place before was never added, it waits a second for it.
-    // False once close() was called. For one thread, which then lets a client in.
+    // Waits until fewer connections are open than the host takes. False once close() was called.
     bool waitForPlace() noexcept;
 
-    // Ends every waitForPlace().
+    // Waits until a connection is removed, a second at most.
+    void waitForRemoval() noexcept;
+
+    // Waits until there is no connection.
+    void waitUntilEmpty() noexcept;
+
+    // Ends every wait for a place.
     void close() noexcept;
 
     // Remembers a connection until remove(). Null when memory runs out; the socket is then shut.
@@ -53,12 +57,14 @@ class Connections {
     // places are taken, longer than two seconds. To be called about once a second.
     void shutOverdue() noexcept;
 
+    // Shuts each connection.
+    void shutAll() noexcept;
+
   private:
     const std::uint32_t most;
     const std::uint32_t patience;
     std::mutex mutex;
     std::condition_variable changed;
-    bool placeKept = false;
     bool closed = false;
     std::list<Connection> open;
 };

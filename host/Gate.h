@@ -1,5 +1,6 @@
 #pragma once
 
+#include <atomic>
 #include <chrono>
 #include <condition_variable>
 #include <cstdint>
@@ -13,40 +14,40 @@ class Gate {
   public:
     // Lets a request in; false once the gate is shut.
     bool enter() {
-        const std::lock_guard<std::mutex> lock(mutex);
-        inFlight += shut ? 0 : 1;
-        return !shut;
+        if ((state.fetch_add(one) & shut) == 0) {
+            return true;
+        }
+        leave();
+        return false;
     }
 
     // The end of a request that was let in.
     void leave() {
-        const std::lock_guard<std::mutex> lock(mutex);
-        if (--inFlight == 0) {
-            empty.notify_all();
+        if (state.fetch_sub(one) != (shut | one)) {
+            return;
         }
-    }
-
-    void close() {
         const std::lock_guard<std::mutex> lock(mutex);
-        shut = true;
+        empty.notify_all();
     }
 
-    bool isClosed() {
-        const std::lock_guard<std::mutex> lock(mutex);
-        return shut;
-    }
+    void close() { state |= shut; }
 
-    // Waits until no request is in flight; false when the time runs out before that.
+    bool isClosed() const { return (state & shut) != 0; }
+
+    // Waits until no request is in flight; false when the time runs out before that. To be called
+    // once the gate is shut.
     bool waitUntilEmpty(std::chrono::milliseconds time) {
         std::unique_lock<std::mutex> lock(mutex);
-        return empty.wait_for(lock, time, [this] { return inFlight == 0; });
+        return empty.wait_for(lock, time, [this] { return state < one; });
     }
 
   private:
+    static constexpr std::uint32_t shut = 1;
+    static constexpr std::uint32_t one = 2;
+
+    std::atomic<std::uint32_t> state{0};  // shut once it is shut, and one for each request
     std::mutex mutex;
     std::condition_variable empty;
-    std::uint32_t inFlight = 0;
-    bool shut = false;
 };
 
 }  // namespace host

@@ -63,6 +63,10 @@ void setThreads(Options& options, const std::string& option, const std::string& 
     options.threads = parseNumber(option, text, 1, mostThreads);
 }
 
+void setConnections(Options& options, const std::string& option, const std::string& text) {
+    options.connections = parseNumber(option, text, 1, mostConnections);
+}
+
 void setMaxBody(Options& options, const std::string& option, const std::string& text) {
     options.maxBody = parseNumber(option, text, 1, std::numeric_limits<std::uint32_t>::max());
 }
@@ -172,10 +176,11 @@ constexpr OptionWithValue optionsWithValue[] = {
      "(QITRMC_SIM_TIME_SCALE; 0.001 to 1000000), or \"calls\": time\n"
      "goes by the calls of the driver alone",
      setTimeScale},
-    {"--threads", "N",
-     "most connections at once, each with a thread of its own\n"
-     "(512; 1 to 900)",
-     setThreads},
+    {"--threads", "N", "most requests that are worked on at once (512; 1 to 900)", setThreads},
+    {"--connections", "N",
+     "most connections at once (16384; 1 to 1000000, each takes two\n"
+     "file descriptors)",
+     setConnections},
     {"--max-body", "BYTES",
      "largest request body; a larger one is answered with 413\n"
      "(16777216)",

@@ -20,6 +20,7 @@ struct Options {
     std::string seed;                   // 64-bit number; empty: leave the driver's own choice
     std::string timeScale;              // number or "calls"; empty: leave the driver's own choice
     std::uint32_t threads = 512;        // 1 to mostThreads
+    std::uint32_t connections = 16384;  // 1 to mostConnections
     std::uint32_t maxBody = 16 * 1024 * 1024;  // bytes, 1 and more
     std::uint32_t timeout = 30;                // seconds, 1 to longestTimeout
     std::vector<std::string> hostNames;        // names of this machine besides its addresses
@@ -32,8 +33,8 @@ struct Options {
     bool noMetrics = false;      // no /metrics, and nothing is counted
 };
 
-// Every connection takes a thread and a file descriptor, of which a process has 1024.
 constexpr std::uint32_t mostThreads = 900;
+constexpr std::uint32_t mostConnections = 1000000;
 constexpr std::uint32_t longestTimeout = 86400;
 // Simulated seconds in one real second.
 constexpr double smallestTimeScale = 0.001;

@@ -1,34 +1,21 @@
 #pragma once
 
 #include <chrono>
-#include <cstdint>
-#include <memory>
-#include <string>
 #include <thread>
 
+#include "host/Client.h"
 #include "host/Connections.h"
 #include "host/Gate.h"
 #include "host/ListenSocket.h"
 #include "host/OriginPolicy.h"
 #include "host/Plugin.h"
 #include "host/Site.h"
-
-struct MHD_Daemon;
+#include "host/Workers.h"
 
 namespace host {
 
-struct ServerSettings {
-    std::uint32_t threads = 0;  // most connections at once
-    std::uint32_t maxBody = 0;  // bytes
-    std::uint32_t timeout = 0;  // seconds
-    bool tls = false;           // HTTPS with these two, both PEM text
-    std::string tlsCertificate;
-    std::string tlsKey;
-    bool passTransport = false;  // the plug-in sees "https" behind TLS, else always "http"
-};
-
-// The HTTP server. Each connection has a thread, which also runs the plug-in, so no client waits
-// for another one's request.
+// The HTTP server. A few threads serve all connections and run the plug-in; while a request lasts,
+// another thread serves the other connections, so no client waits for another one's request.
 class Server {
   public:
     // Starts to serve. The plug-in, the socket, the policy and the site must outlive the server.
@@ -51,19 +38,15 @@ class Server {
     bool waitForRequests(std::chrono::milliseconds time);
 
   private:
-    struct Callbacks;
-
-    MHD_Daemon* startDaemon();
     void acceptClients() noexcept;
+    void acceptClient() noexcept;
 
-    const Plugin& plugin;
     ListenSocket& socket;
     const ServerSettings settings;
-    const OriginPolicy& policy;
-    const Site& site;
     Connections connections;
     Gate gate;
-    std::unique_ptr<MHD_Daemon, void (*)(MHD_Daemon*)> daemon;
+    const Service service;
+    Workers workers;
     std::thread acceptor;
 };
 

@@ -1,5 +1,6 @@
 #include <signal.h>
 #include <stdlib.h>
+#include <sys/resource.h>
 
 #include <cerrno>
 #include <cstdio>
@@ -72,6 +73,7 @@ void configureDriver(const Options& options) {
 host::ServerSettings settingsOf(const Options& options) {
     host::ServerSettings settings;
     settings.threads = options.threads;
+    settings.connections = options.connections;
     settings.maxBody = options.maxBody;
     settings.timeout = options.timeout;
     settings.tls = !options.tlsKey.empty();
@@ -133,6 +135,14 @@ void takeChargeOfSignals() {
     signal(SIGPIPE, SIG_IGN);
 }
 
+// A connection takes two descriptors, and many systems let a process have 1024 unless it asks.
+void raiseDescriptorLimit() {
+    rlimit limit = {};
+    getrlimit(RLIMIT_NOFILE, &limit);
+    limit.rlim_cur = limit.rlim_max;
+    setrlimit(RLIMIT_NOFILE, &limit);
+}
+
 void serveUntilSignal(host::Server& server) {
     const sigset_t signals = endSignals();
     while (sigtimedwait(&signals, nullptr, &tick) < 0) {
@@ -175,6 +185,7 @@ void reportThingsNotGivenBack() {
 
 void runHost(const Options& options) {
     takeChargeOfSignals();
+    raiseDescriptorLimit();
     configureDriver(options);
     const host::ServerSettings settings = settingsOf(options);
     host::StaticFiles files = filesOf(options);

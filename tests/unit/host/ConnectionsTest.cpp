@@ -107,21 +107,26 @@ TEST(Connections, HaveAFreeSlotUntilTheLimitIsReached) {
     EXPECT_TRUE(place.get());
 }
 
-TEST(Connections, KeepASlotForTheClientThatIsConnecting) {
+TEST(Connections, AreEmptyOnceTheLastIsRemoved) {
     const Pair pair;
     Connections connections(10, 1);
-    EXPECT_TRUE(connections.waitForPlace());
-    std::future<bool> next =
-        std::async(std::launch::async, [&] { return connections.waitForPlace(); });
-    EXPECT_EQ(next.wait_for(moment), std::future_status::timeout);
-    connections.add(pair.host());
-    EXPECT_TRUE(next.get());
+    connections.waitUntilEmpty();
+    Connection* last = connections.add(pair.host());
+    std::future<void> empty = std::async(std::launch::async, [&] { connections.waitUntilEmpty(); });
+    EXPECT_EQ(empty.wait_for(moment), std::future_status::timeout);
+    connections.remove(last);
+    empty.get();
 }
 
-TEST(Connections, GiveTheSlotOfAClientThatNeverConnectsToTheNext) {
-    Connections connections(1, 1);
-    EXPECT_TRUE(connections.waitForPlace());
-    EXPECT_TRUE(connections.waitForPlace());
+TEST(Connections, ShutEachConnectionAtTheEnd) {
+    const Pair working;
+    const Pair waiting;
+    Connections connections(10, 1);
+    connections.add(working.host())->workForClient();
+    connections.add(waiting.host());
+    connections.shutAll();
+    EXPECT_TRUE(working.isShut());
+    EXPECT_TRUE(waiting.isShut());
 }
 
 TEST(Connections, EndTheWaitForASlotWhenTheyAreClosed) {

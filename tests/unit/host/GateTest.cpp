@@ -53,6 +53,7 @@ TEST(Gate, WakesTheWaiterWhenTheLastRequestLeaves) {
     Gate gate;
     gate.enter();
     gate.enter();
+    gate.close();
     std::thread requests([&] {
         gate.leave();
         gate.leave();

@@ -35,6 +35,7 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
     EXPECT_EQ(options.seed, "");
     EXPECT_EQ(options.timeScale, "");
     EXPECT_EQ(options.threads, 512u);
+    EXPECT_EQ(options.connections, 16384u);
     EXPECT_EQ(options.maxBody, 16777216u);
     EXPECT_EQ(options.timeout, 30u);
     EXPECT_THAT(options.hostNames, ElementsAre());
@@ -49,12 +50,12 @@ TEST(Options, WithoutArgumentsTheHostServesOnTheLoopbackPort) {
 
 TEST(Options, EachOptionSetsItsOwnField) {
     const Options options = parseOptions(
-        {"--listen",        "0.0.0.0:81", "--plugin",    "p.so",   "--chassis",      "c.json",
-         "--state",         "s",          "--faults",    "f.json", "--seed",         "7",
-         "--time-scale",    "8",          "--trace",     "t",      "--threads",      "3",
-         "--max-body",      "4",          "--timeout",   "5",      "--tls-cert",     "cert.pem",
-         "--tls-key",       "key.pem",    "--host-name", "lab",    "--allow-origin", "http://a:1",
-         "--pass-transport"});
+        {"--listen",      "0.0.0.0:81", "--plugin",        "p.so",   "--chassis",      "c.json",
+         "--state",       "s",          "--faults",        "f.json", "--seed",         "7",
+         "--time-scale",  "8",          "--trace",         "t",      "--threads",      "3",
+         "--max-body",    "4",          "--timeout",       "5",      "--tls-cert",     "cert.pem",
+         "--tls-key",     "key.pem",    "--host-name",     "lab",    "--allow-origin", "http://a:1",
+         "--connections", "6",          "--pass-transport"});
     EXPECT_EQ(options.address, "0.0.0.0");
     EXPECT_EQ(options.port, "81");
     EXPECT_EQ(options.plugin, "p.so");
@@ -65,6 +66,7 @@ TEST(Options, EachOptionSetsItsOwnField) {
     EXPECT_EQ(options.seed, "7");
     EXPECT_EQ(options.timeScale, "8");
     EXPECT_EQ(options.threads, 3u);
+    EXPECT_EQ(options.connections, 6u);
     EXPECT_EQ(options.maxBody, 4u);
     EXPECT_EQ(options.timeout, 5u);
     EXPECT_THAT(options.hostNames, ElementsAre("lab"));
@@ -146,6 +148,8 @@ TEST(Options, NumbersOutsideTheirRangeAreRefused) {
               "--threads takes a number from 1 to 900, not \"0\".");
     EXPECT_EQ(usageErrorOf({"--threads", "901"}),
               "--threads takes a number from 1 to 900, not \"901\".");
+    EXPECT_EQ(usageErrorOf({"--connections", "0"}),
+              "--connections takes a number from 1 to 1000000, not \"0\".");
     EXPECT_EQ(usageErrorOf({"--max-body", "0"}),
               "--max-body takes a number from 1 to 4294967295, not \"0\".");
     EXPECT_EQ(usageErrorOf({"--max-body", "4294967296"}),

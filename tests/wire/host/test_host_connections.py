@@ -110,14 +110,14 @@ def test_many_clients_at_once_each_get_their_own_answer(host):
 
 
 def test_more_clients_than_connection_slots_are_all_served(start_host):
-    host = start_host("--threads", "2")
+    host = start_host("--connections", "2")
     with concurrent.futures.ThreadPoolExecutor(16) as pool:
         answers = pool.map(lambda i: host.post(b"%d" % i, "Echo")[2], range(200))
         assert list(answers) == [b"%d" % i for i in range(200)]
 
 
 def test_clients_beyond_the_connection_limit_wait_for_a_slot(start_host):
-    host = start_host("--threads", "2")
+    host = start_host("--connections", "2")
     with contextlib.ExitStack() as stack:
         clients = [stack.enter_context(host.raw_socket()) for _ in range(200)]
         for client in clients:
@@ -198,8 +198,21 @@ def test_a_request_in_the_plugin_outlives_the_timeout(start_host):
     assert waiting[0].result()[::2] == (200, b"released")
 
 
+def test_ten_thousand_idle_clients_keep_no_other_out(start_host):
+    resource.setrlimit(resource.RLIMIT_NOFILE, (resource.getrlimit(resource.RLIMIT_NOFILE)[1],) * 2)
+    host = start_host("--timeout", "86400")
+    with contextlib.ExitStack() as stack:
+        for number in range(10000):
+            idle = stack.enter_context(host.raw_socket())
+            if number % 10 == 0:
+                idle.sendall(b"POST /qit")
+        begin = time.monotonic()
+        assert host.post(b"abc", "Echo")[2] == b"abc"
+        assert time.monotonic() - begin < 10
+
+
 def test_silent_clients_in_all_slots_are_disconnected_long_before_the_timeout(start_host):
-    host = start_host("--threads", "3", "--timeout", "86400")
+    host = start_host("--connections", "3", "--timeout", "86400")
     with contextlib.ExitStack() as stack:
         silent = [stack.enter_context(host.raw_socket()) for _ in range(6)]
         for client in silent:
@@ -373,8 +386,8 @@ def test_lack_of_memory_fails_one_request_only(start_host, entry, body):
 
 
 @needs_memory_limit
-def test_clients_that_get_no_thread_take_no_connection_slot(start_host):
-    host = start_host("--threads", "2")
+def test_clients_that_get_no_memory_take_no_connection_slot(start_host):
+    host = start_host("--connections", "2")
     with host.raw_socket() as holder:
         holder.sendall(raw_post("Echo", b"abc"))
         assert read_response(holder) == (200, b"abc")
@@ -382,6 +395,7 @@ def test_clients_that_get_no_thread_take_no_connection_slot(start_host):
         for _ in range(10):
             with host.raw_socket() as client, contextlib.suppress(ConnectionResetError):
                 client.sendall(raw_post("Echo", b"abc"))
-                assert client.recv(1000) == b""
+                # Small allocations succeed as long as the heap has room.
+                assert client.recv(1000)[:15] in (b"", b"HTTP/1.1 200 OK")
         limit_memory(host, resource.RLIM_INFINITY)
         assert host.post(b"abc", "Echo")[2] == b"abc"
