@@ -1,8 +1,9 @@
-// The reference for the whole service: an HTTP server with the same library and threads as the
-// development host, which responds to every POST with one fixed text.
+// The reference for the whole service: an HTTP server with the same library as the development
+// host, which responds to every POST with one fixed text.
 //
-// Usage: qitrmc-bench-bare-server TEXT. Prints the same line as the host, and runs until its
-// standard input ends.
+// Usage: qitrmc-bench-bare-server TEXT loop|threads. With "loop" two threads serve all connections,
+// the library's fastest mode; with "threads" each connection has one. Prints the same line as the
+// host, and runs until its standard input ends.
 
 #include <microhttpd.h>
 
@@ -31,16 +32,26 @@ MHD_Result answer(void* text, MHD_Connection* connection, const char*, const cha
     return result;
 }
 
+MHD_Daemon* startLoop(char* text) {
+    return MHD_start_daemon(MHD_USE_EPOLL_INTERNAL_THREAD | MHD_USE_TURBO, 0, nullptr, nullptr,
+                            answer, text, MHD_OPTION_THREAD_POOL_SIZE, 2u, MHD_OPTION_END);
+}
+
+MHD_Daemon* startThreads(char* text) {
+    return MHD_start_daemon(
+        MHD_USE_INTERNAL_POLLING_THREAD | MHD_USE_THREAD_PER_CONNECTION | MHD_USE_POLL, 0, nullptr,
+        nullptr, answer, text, MHD_OPTION_END);
+}
+
 }  // namespace
 
 int main(int count, char** arguments) {
-    if (count != 2) {
-        std::fprintf(stderr, "usage: %s TEXT\n", arguments[0]);
+    if (count != 3) {
+        std::fprintf(stderr, "usage: %s TEXT loop|threads\n", arguments[0]);
         return 2;
     }
-    MHD_Daemon* const daemon = MHD_start_daemon(
-        MHD_USE_INTERNAL_POLLING_THREAD | MHD_USE_THREAD_PER_CONNECTION | MHD_USE_POLL, 0, nullptr,
-        nullptr, answer, arguments[1], MHD_OPTION_END);
+    MHD_Daemon* const daemon = std::strcmp(arguments[2], "loop") == 0 ? startLoop(arguments[1])
+                                                                      : startThreads(arguments[1]);
     if (daemon == nullptr) {
         std::fprintf(stderr, "cannot listen\n");
         return 1;

@@ -1,12 +1,12 @@
 #!/usr/bin/python3
 """Measures the whole service over HTTP: measure_service.py BUILD_DIR RESULTS.json
 
-Requests per second with wrk, compared with a server of the same HTTP library that responds with a
-fixed text; the memory of the process; the time to start. All in one run, alternating, on loopback.
+Requests per second, latency, processor time and context switches under wrk, beside servers of the
+same HTTP library that respond with a fixed text and beside servers made with other libraries; the
+memory of the process; the time to start. All in one run, in turns, on loopback.
 """
 
 import contextlib
-import http.client
 import json
 import os
 import pathlib
@@ -14,93 +14,83 @@ import re
 import statistics
 import subprocess
 import sys
-import time
-import urllib.parse
 
-HERE = pathlib.Path(__file__).resolve().parent
-ROUNDS = 3
-SECONDS = 3
-CONNECTIONS = 16
+from http_servers import (HERE, Server, bare_command, call, get_property, host_command,
+                          open_session, peer_commands, post)
+
+ROUNDS = 5
+SECONDS = 1
+CONNECTIONS = (1, 16, 64, 256)
 STARTS = 11
 MIXED_REQUESTS = 10000
+MICROSECONDS = {"us": 1, "ms": 1e3, "s": 1e6}
 
 
-class Server:
-    """A process that listens on a free port and prints its address."""
-
-    def __init__(self, *command):
-        begin = time.perf_counter()
-        self.process = subprocess.Popen([str(word) for word in command], stdin=subprocess.PIPE,
-                                        stdout=subprocess.PIPE, text=True)
-        line = self.process.stdout.readline()
-        self.start_ms = (time.perf_counter() - begin) * 1000
-        if not line.startswith("Listening on "):
-            self.process.kill()
-            raise SystemExit(f"{command[0]} did not start: {line!r}")
-        self.url = line.split()[-1]
-
-    def __enter__(self):
-        return self
-
-    def __exit__(self, *_):
-        self.process.terminate()
-        self.process.wait()
-        self.process.stdin.close()
-        self.process.stdout.close()
-
-    def connection(self):
-        return http.client.HTTPConnection(urllib.parse.urlsplit(self.url).netloc)
-
-    def resident_kib(self):
-        status = pathlib.Path(f"/proc/{self.process.pid}/status").read_text()
-        return int(re.search(r"VmRSS:\s+(\d+) kB", status)[1])
+def microseconds(text):
+    number, unit = re.fullmatch(r"([\d.]+)(us|ms|s)", text).groups()
+    return float(number) * MICROSECONDS[unit]
 
 
-def call(method, **params):
-    return json.dumps({"jsonrpc": "2.0", "id": 1, "method": method, "params": params},
-                      separators=(",", ":"))
-
-
-def post(connection, body):
-    connection.request("POST", "/qitrmc/Call", body)
-    return connection.getresponse().read().decode()
-
-
-def open_session(connection):
-    return json.loads(post(connection, call("initializeSession")))["result"]["session_id"]
-
-
-def get_property(session, device="Mod1"):
-    return call("getProperty", session_id=session, devices=[device], property="Dev.Temperature")
-
-
-def requests_per_second(server, script, body=""):
+def load(server, script, body, connections):
     """One run of wrk. A response other than HTTP 200 ends the measurement."""
+    before = server.used()
     report = subprocess.run(
-        ["wrk", "-t2", f"-c{CONNECTIONS}", f"-d{SECONDS}s", "-s", HERE / script, server.url],
+        ["wrk", "-t1", f"-c{connections}", f"-d{SECONDS}s", "--latency", "-s", HERE / script,
+         server.url],
         env={**os.environ, "BODY": body}, check=True, capture_output=True, text=True).stdout
+    after = server.used()
     if "Non-2xx" in report or "Socket errors" in report:
         raise SystemExit(report)
-    return float(re.search(r"Requests/sec:\s+([\d.]+)", report)[1])
+    count = int(re.search(r"(\d+) requests in", report)[1])
+    user, system, switches = (late - early for late, early in zip(after, before))
+    percentile = dict(re.findall(r"(50|99)%\s+([\d.]+[mu]?s)", report))
+    return {"requests_per_second": float(re.search(r"Requests/sec:\s+([\d.]+)", report)[1]),
+            "median_us": microseconds(percentile["50"]), "p99_us": microseconds(percentile["99"]),
+            "user_us": user / count * 1e6, "system_us": system / count * 1e6,
+            "switches": switches / count}
 
 
-def measure_throughput(host, bare_server):
+def summary(runs):
+    """Each measure of the runs as its median, least and greatest value."""
+    return {name: [function(run[name] for run in runs) for function in (statistics.median, min, max)]
+            for name in runs[0]}
+
+
+def measure_kinds(kinds):
+    """Loads of each kind in turns: {connections: {kind: summary}}."""
+    measured = {}
+    for connections in CONNECTIONS:
+        runs = {kind: [] for kind in kinds}
+        for _ in range(ROUNDS):
+            for kind, (server, script, body) in kinds.items():
+                runs[kind].append(load(server, script, body, connections))
+        measured[connections] = {kind: summary(some) for kind, some in runs.items()}
+    return measured
+
+
+def measure_load(host, build):
     with contextlib.closing(host.connection()) as connection:
         session = open_session(connection)
         good, bad = get_property(session), get_property(session, "NoSuchDevice")
         answer = post(connection, good)
         if "result" not in answer or "error" not in post(connection, bad):
             raise SystemExit(f"not the expected outcome: {answer}")
-    with Server(bare_server, answer) as bare:
-        kinds = {
-            "fixed text, no service": (bare, "post.lua", good),
-            "getProperty": (host, "post.lua", good),
-            "initializeSession, closeSession": (host, "sessions.lua"),
-            "an error": (host, "post.lua", bad),
-        }
-        rounds = [{kind: requests_per_second(*arguments) for kind, arguments in kinds.items()}
-                  for _ in range(ROUNDS)]
-    return {kind: statistics.median(one[kind] for one in rounds) for kind in kinds}
+    value = json.loads(answer)["result"]["value"]
+    with contextlib.ExitStack() as stack:
+        bare = {f"fixed text, {name}": stack.enter_context(
+            Server(*bare_command(build, answer, kind)))
+            for name, kind in (("event loop", "loop"), ("thread a connection", "threads"))}
+        peers = {name: stack.enter_context(Server(*command))
+                 for name, command in peer_commands(build, value).items()}
+        for name, peer in peers.items():
+            with contextlib.closing(peer.connection()) as connection:
+                if json.loads(post(connection, good)).get("result") != {"value": value}:
+                    raise SystemExit(f"{name} does not answer the request")
+        kinds = {name: (server, "post.lua", good) for name, server in {**bare, **peers}.items()}
+        kinds["getProperty"] = (host, "post.lua", good)
+        kinds["initializeSession, closeSession"] = (host, "sessions.lua", "")
+        kinds["an error"] = (host, "post.lua", bad)
+        return measure_kinds(kinds)
 
 
 def send_mixed_requests(connection, session):
@@ -135,15 +125,13 @@ def start_time(*command):
 
 def main():
     build, results = pathlib.Path(sys.argv[1]), pathlib.Path(sys.argv[2])
-    host_program = (build / "bin" / "qitrmc-host", "--listen", "127.0.0.1:0")
-    bare_server = build / "bin" / "qitrmc-bench-bare-server"
-    with Server(*host_program) as host:
-        throughput = measure_throughput(host, bare_server)
+    with Server(*host_command(build)) as host:
+        loads = measure_load(host, build)
     measured = {
-        "requests_per_second": throughput,
-        "resident_kib": measure_memory(host_program),
-        "start_ms": {"the service": start_time(*host_program),
-                     "fixed text, no service": start_time(bare_server, "{}")},
+        "loads": loads,
+        "resident_kib": measure_memory(host_command(build)),
+        "start_ms": {"the service": start_time(*host_command(build)),
+                     "fixed text": start_time(*bare_command(build, "{}", "loop"))},
     }
     results.write_text(json.dumps(measured, indent=1))
 

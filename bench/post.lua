@@ -2,3 +2,4 @@
 
 wrk.method = "POST"
 wrk.body = os.getenv("BODY")
+wrk.headers["Content-Type"] = "application/json"

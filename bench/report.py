@@ -1,10 +1,11 @@
 #!/usr/bin/python3
 """Prints the tables of a benchmark run and, as its last lines, the important ratios:
 
-    report.py BENCHMARKS.json SERVICE.json
+    report.py BENCHMARKS.json SERVICE.json HTTP_GROWTH.json [PICTURES]
 
-Either file may be missing, for example after a run with a filter. Times are medians of processor
-time, which is least affected by other work on the machine.
+Draws the growth as SVG pictures into the folder PICTURES. Each file may be missing, for example after
+a run with a filter. Times are medians of processor time, which is least affected by other work on the
+machine.
 """
 
 import json
@@ -12,6 +13,8 @@ import math
 import pathlib
 import re
 import sys
+
+from plot import svg
 
 
 class Benchmarks:
@@ -85,6 +88,33 @@ def report_growth(benchmarks):
         yield "steepest growth, as an exponent: {:.2f} ({})".format(*max(exponents))
 
 
+def report_http_growth(series_of):
+    rows = [("what grows over HTTP", "from", "to", "us", "us each", "exponent")]
+    exponents = []
+    for case, series in series_of.items():
+        count, time = series[-1]
+        exponents.append((exponent(series), case))
+        rows.append((case, str(series[0][0]), str(count), f"{time:.0f}", f"{time / count:.4f}",
+                     f"{exponents[-1][0]:.2f}"))
+    if exponents:
+        print_table("Growing requests over HTTP, processor time of the server", rows)
+        yield "steepest growth over HTTP, as an exponent: {:.2f} ({})".format(*max(exponents))
+
+
+def draw(folder, benchmarks, http_growth):
+    in_process = benchmarks.groups("growth")
+    failing = {case for case in in_process if case.endswith(("Name", "Deep", "Skipped"))}
+    pictures = {
+        "growth-in-process": {case: some for case, some in in_process.items()
+                              if case not in failing},
+        "growth-of-failures": {case: in_process[case] for case in sorted(failing)},
+        "growth-over-http": http_growth,
+    }
+    for name, lines in pictures.items():
+        if lines:
+            (folder / f"{name}.svg").write_text(svg(lines, ("count", "microseconds")))
+
+
 def report_sessions(benchmarks):
     rows = [("requests with open sessions", "sessions", "us", "to one session")]
     ratios = []
@@ -127,19 +157,53 @@ def report_doubles(benchmarks):
         yield f"parsing doubles, nearest to one unit off: {', '.join(ratios)}"
 
 
+GOALS = {"fixed text, event loop": (0.9, 0.6), "libjson-rpc-cpp": (None, 1.1), "Node": (None, 1.5)}
+SUBJECT = "getProperty"
+MOST_USER_US = 7.0
+
+
+def report_loads(loads):
+    """Tables of what wrk measured, and the ratios with their goals: (one connection, more)."""
+    for connections, kinds in loads.items():
+        rows = [("requests", "in a second", "from", "to", "median us", "99 % us", "user us",
+                 "system us", "switches")]
+        for kind, measures in kinds.items():
+            rate, least, most = measures["requests_per_second"]
+            rows.append((kind, f"{rate:.0f}", f"{least:.0f}", f"{most:.0f}",
+                         f"{measures['median_us'][0]:.0f}", f"{measures['p99_us'][0]:.0f}",
+                         f"{measures['user_us'][0]:.1f}", f"{measures['system_us'][0]:.1f}",
+                         f"{measures['switches'][0]:.2f}"))
+        print_table(f"Over HTTP, connections: {connections}", rows)
+        yield from ratios_of(connections, kinds)
+
+
+def ratios_of(connections, kinds):
+    rate = kinds[SUBJECT]["requests_per_second"][0]
+    for peer, goals in GOALS.items():
+        if peer not in kinds:
+            yield f"{SUBJECT} to {peer}, {connections} connections: not measured"
+            continue
+        goal = goals[0 if connections == "1" else 1]
+        ratio = rate / kinds[peer]["requests_per_second"][0]
+        verdict = "" if goal is None else f" (goal: at least {goal}{missed(ratio >= goal)})"
+        yield f"{SUBJECT} to {peer}, {connections} connections: {ratio:.2f}{verdict}"
+    user = kinds[SUBJECT]["user_us"][0]
+    yield (f"user time of {SUBJECT}, {connections} connections: {user:.1f} us "
+           f"(goal: at most {MOST_USER_US}{missed(user <= MOST_USER_US)})")
+
+
+def missed(reached):
+    return "" if reached else "; missed"
+
+
 def report_service(service):
     if not service:
         return
-    rates = service["requests_per_second"]
-    bare = next(iter(rates.values()))
-    print_table("Over HTTP", [("requests", "in a second", "to fixed text")] + [
-        (kind, f"{rate:.0f}", f"{rate / bare:.2f}") for kind, rate in rates.items()])
+    yield from report_loads(service["loads"])
     print_table("Memory of the process", [("resident", "MiB")] + [
         (moment, f"{kib / 1024:.1f}") for moment, kib in service["resident_kib"].items()])
     print_table("Start", [("until it listens", "ms")] + [
         (what, f"{time:.1f}") for what, time in service["start_ms"].items()])
-    others = [f"{kind} {rate / bare:.2f}" for kind, rate in list(rates.items())[1:]]
-    yield f"requests in a second to those of a fixed text: {', '.join(others)}"
 
 
 def read(path):
@@ -147,13 +211,16 @@ def read(path):
 
 
 def main():
-    benchmarks, service = map(read, map(pathlib.Path, sys.argv[1:3]))
+    benchmarks, service, http_growth = map(read, map(pathlib.Path, sys.argv[1:4]))
     measured = Benchmarks(benchmarks)
     ratios = []
     for report in (report_requests, report_growth, report_sessions, report_failures,
                    report_doubles):
         ratios += report(measured)
     ratios += report_service(service)
+    ratios += report_http_growth(http_growth)
+    if sys.argv[4:]:
+        draw(pathlib.Path(sys.argv[4]), measured, http_growth)
     print("\nRatios")
     for line in ratios:
         print(line)
