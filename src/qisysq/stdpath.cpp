@@ -2,7 +2,9 @@
 
 #include <cstdlib>
 #include <cstring>
+#include <mutex>
 
+#include "qisysq/FileIdentity.h"
 #include "qisysq/StandardDirectories.h"
 #include "qisysq/installRoot.h"
 #include "qisysq/stdpath_util.h"
@@ -31,12 +33,55 @@ void trimDirectory(qihtl::String* text, qierr_Status* status) {
     text->trimStart(whiteSpace);
 }
 
+// The directory that a file contains, kept as long as the file does not change. Texts that do not
+// fit are not kept.
+class KeptDirectory {
+  public:
+    bool get(const char* wantedPath, const FileIdentity& wanted, qihtl::String* text,
+             qierr_Status* status) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        const bool isKept = identity == wanted && std::strcmp(path, wantedPath) == 0;
+        if (isKept) {
+            text->assign(directory, status);
+        }
+        return isKept;
+    }
+
+    void set(const qihtl::String& newPath, const FileIdentity& newIdentity,
+             const qihtl::String& text) {
+        const std::lock_guard<std::mutex> lock(mutex);
+        if (newPath.length() < sizeof path && text.length() < sizeof directory &&
+            std::strlen(text.c_str()) == text.length()) {
+            std::strcpy(path, newPath.c_str());
+            std::strcpy(directory, text.c_str());
+            identity = newIdentity;
+        }
+    }
+
+  private:
+    std::mutex mutex;
+    char path[256] = "";
+    FileIdentity identity;
+    char directory[256] = "";
+};
+
 }  // namespace
 
 void getSharedDir(qihtl::String* directory, qierr_Status* status) {
+    static KeptDirectory kept;
     qihtl::String path;
     assignRooted("/etc/qinstal/share/share.dir", &path, status);
     if (status->code < 0) {
+        return;
+    }
+    const timespec now = fileTime();
+    struct stat info;
+    if (stat(path.c_str(), &info) != 0) {
+        assignRooted("/usr/local/qinstal/share", directory, status);
+        return;
+    }
+    const FileIdentity identity(info);
+    if (kept.get(path.c_str(), identity, directory, status)) {
         return;
     }
     qierr::Status fileStatus;
@@ -48,6 +93,9 @@ void getSharedDir(qihtl::String* directory, qierr_Status* status) {
     }
     trimDirectory(&text, status);
     directory->assign(text.c_str(), text.length(), status);
+    if (status->code >= 0 && identity.isSettled(now)) {
+        kept.set(path, identity, *directory);
+    }
 }
 
 void getCommonAppDataDir(qihtl::String* directory, qierr_Status* status) {

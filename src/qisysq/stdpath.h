@@ -11,7 +11,7 @@
 namespace qisysq {
 
 // The shared data directory: the content of the installed file share.dir, or the default if that
-// file cannot be read. Reads the file on each call.
+// file cannot be read. A change of the file shows at the next call.
 void getSharedDir(qihtl::String* directory, qierr_Status* status);
 
 // The directory of application data that is common to all users.

@@ -6,7 +6,12 @@
 namespace qixlator {
 
 DirectoryWalker::DirectoryWalker() noexcept
-    : path{}, entryAvailable(false), handle(nullptr), current(nullptr) {}
+    : path{},
+      directoryInfo{},
+      hasInfo(false),
+      entryAvailable(false),
+      handle(nullptr),
+      current(nullptr) {}
 
 DirectoryWalker::~DirectoryWalker() {
     if (handle != nullptr) {
@@ -24,6 +29,8 @@ bool DirectoryWalker::open(const char* directory) {
         return false;
     }
     std::strcpy(path, directory);
+    // Before the entries are read, so that a later change of the directory shows.
+    hasInfo = stat(path, &directoryInfo) == 0;
     handle = opendir(path);
     if (handle == nullptr) {
         errno = ENOENT;

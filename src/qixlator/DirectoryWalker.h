@@ -33,6 +33,9 @@ class DirectoryWalker {
     // ENOENT.
     bool open(const char* directory);
 
+    // The directory as it was when it was opened; null if that is unknown.
+    const struct stat* info() const { return hasInfo ? &directoryInfo : nullptr; }
+
     // Whether there is a current entry.
     bool hasEntry() const { return entryAvailable; }
     // Describes the current entry. Returns 0 or an errno value; ENAMETOOLONG if its name or path is
@@ -43,6 +46,8 @@ class DirectoryWalker {
 
   private:
     char path[FileEntry::pathSize];
+    struct stat directoryInfo;
+    bool hasInfo;
     bool entryAvailable;
     DIR* handle;
     struct dirent* current;

@@ -9,6 +9,7 @@
 #include "qisysq/stdpath_util.h"
 #include "qixlator/DirectoryWalker.h"
 #include "qixlator/ExplanationFile.h"
+#include "qixlator/KeptSearches.h"
 #include "qixlator/reportFailure.h"
 
 namespace qixlator {
@@ -73,13 +74,15 @@ bool isExplanationFile(const FileEntry& entry) {
 }
 
 void searchEntries(DirectoryWalker* walker, FileEntry* entry, const char* directory,
-                   std::int32_t code, qihtl::String* output, qierr_Status* status) {
+                   std::int32_t code, SearchRecording* recording, qihtl::String* output,
+                   qierr_Status* status) {
     for (; walker->hasEntry(); walker->advance()) {
         const int error = walker->describe(entry);
         if (error != 0) {
             reportDirectory("qixlator", "get file info failed", directory, error, status);
             return;
         }
+        recording->addEntry(entry->name, entry->info);
         if (isExplanationFile(*entry)) {
             findErrorDescriptionFromFile(entry->path, code, output, status);
         }
@@ -119,7 +122,7 @@ void findErrorDescriptionFromFile(const char* path, std::int32_t code, qihtl::St
 void findErrorDescriptionFromDir(const char* directory, std::int32_t code, qihtl::String* output,
                                  qierr_Status* status) {
     output->clear();
-    if (status->code < 0) {
+    if (status->code < 0 || KeptSearches::ofProcess().find(directory, code, output, status)) {
         return;
     }
     OnHeap<DirectoryWalker> walker;
@@ -128,11 +131,17 @@ void findErrorDescriptionFromDir(const char* directory, std::int32_t code, qihtl
         reportNoMemory(status);
         return;
     }
+    // Begins before anything is looked at.
+    SearchRecording recording(directory, code);
     if (!walker.get()->open(directory)) {
         reportDirectory("debug", "open dir failed", directory, errno, status);
         return;
     }
-    searchEntries(walker.get(), entry.get(), directory, code, output, status);
+    recording.addDirectory(walker.get()->info());
+    searchEntries(walker.get(), entry.get(), directory, code, &recording, output, status);
+    if (status->code >= 0) {
+        recording.keep(*output);
+    }
 }
 
 void findErrorDescriptionFromErrorsDir(const char* errorsDirectory, std::int32_t code,

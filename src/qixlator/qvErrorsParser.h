@@ -20,7 +20,8 @@
 //
 // A search replaces `output` by the description. An empty output with a status that is not negative
 // means that there is no description. If the status is already negative, a search only clears
-// `output`. A search keeps no state and may run on any thread.
+// `output`. A search may run on any thread. The results of searches of a directory are kept, and
+// given again as long as neither the directory nor any file that the search looked at has changed.
 namespace qixlator {
 
 // Searches one file up to the first block for the code. A file that does not begin like an

@@ -4,7 +4,9 @@
 
 #include <cstdlib>
 #include <string>
+#include <thread>
 
+#include "qisysq/FileIdentity.h"
 #include "support/TestRoot.h"
 
 namespace {
@@ -58,6 +60,21 @@ TEST_F(StdpathTest, AnEmptyFileMeansAnEmptySharedDirectory) {
 
 TEST_F(StdpathTest, AFileThatCannotBeReadCountsAsMissing) {
     root.makeDirectory("/etc/qinstal/share/share.dir");
+    EXPECT_EQ(get(qisysq::getSharedDir), root.locate("/usr/local/qinstal/share"));
+}
+
+TEST_F(StdpathTest, AChangeOfAnOldFileShowsAtTheNextCall) {
+    EXPECT_EQ(sharedDirFor("/one"), "/one");
+    struct stat info;
+    ASSERT_EQ(stat(root.locate("/etc/qinstal/share/share.dir").c_str(), &info), 0);
+    const qisysq::FileIdentity identity(info);
+    while (!identity.isSettled(qisysq::fileTime())) {
+        std::this_thread::yield();
+    }
+    EXPECT_EQ(get(qisysq::getSharedDir), "/one");
+    EXPECT_EQ(get(qisysq::getSharedDir), "/one") << "the kept text";
+    EXPECT_EQ(sharedDirFor("/two"), "/two");
+    root.remove("/etc/qinstal/share/share.dir");
     EXPECT_EQ(get(qisysq::getSharedDir), root.locate("/usr/local/qinstal/share"));
 }
 

@@ -142,17 +142,21 @@ TEST_F(HostileExplanationFilesTest, ALineOfMillionsOfBytesIsSkippedOrReadComplet
 TEST_F(HostileExplanationFilesTest, ADescriptionWithoutMemoryIsAFailure) {
     root.write("/dir/a.txt", document(block("-1", std::string(100000, 'x') + "\n")));
     const std::int64_t blocks = FaultyAllocator::liveBlocks();
-    // The two allocations for the search come first, then the text as it grows.
-    for (int allocation = 2; allocation < 10; ++allocation) {
+    int failures = 0;
+    bool hasFailed = true;
+    for (int allocation = 0; hasFailed; ++allocation) {
         qihtl::String text;
         qierr::Status failure;
         FaultyAllocator::failAt(allocation);
         qixlator::findErrorDescriptionFromDir(root.locate("/dir").c_str(), -1, &text, &failure);
-        EXPECT_TRUE(FaultyAllocator::hasFailed());
+        hasFailed = FaultyAllocator::hasFailed();
         FaultyAllocator::succeed();
-        EXPECT_EQ(failure.code, -52000);
-        EXPECT_TRUE(text.empty());
+        failures += failure.code == -52000 ? 1 : 0;
+        // Without memory to record the search it succeeds all the same.
+        EXPECT_EQ(failure.code == 0 ? 100000u : 0u, text.length()) << allocation;
     }
+    // The two for the search, and the text as it grows.
+    EXPECT_LE(10, failures);
     EXPECT_EQ(FaultyAllocator::liveBlocks(), blocks);
 }
 
