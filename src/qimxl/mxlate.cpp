@@ -17,14 +17,21 @@ constexpr const char* registrationText =
     "\",\"qiSharedErrorsDir\":\"$_qiShared32Dir/errors\","
     "\"MIErrorsDir\":\"$_qiShared32Dir/mierrors\"}}";
 
-XlatorInterface* create(const char* name, const char* registrationInfo, qierr_Status* status) {
+// A session of this program lasts for one translation.
+XlatorInterface* createLocal(const char* name, const char* registrationInfo, qierr_Status* status) {
+    return qixlatorlua::createLuaXlator(name, registrationInfo, qixlatorlua::LuaRuntime::Prepared,
+                                        status);
+}
+
+XlatorInterface* createExported(const char* name, const char* registrationInfo,
+                                qierr_Status* status) {
     return qixlatorlua::createLuaXlator(name, registrationInfo, qixlatorlua::LuaRuntime::Fast,
                                         status);
 }
 
 const qixlator::XlatorRegistration localRegistration(qixlator::localRegistrations(), xlatorName,
-                                                     registrationText, create);
+                                                     registrationText, createLocal);
 const qixlator::XlatorRegistration exportedRegistration(qixlator::exportedRegistrations(),
-                                                        xlatorName, nullptr, create);
+                                                        xlatorName, nullptr, createExported);
 
 }  // namespace

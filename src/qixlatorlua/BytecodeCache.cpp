@@ -27,7 +27,7 @@ int writeDump(lua_State*, const void* data, std::size_t size, void* context) {
 }  // namespace
 
 BytecodeCache::BytecodeCache(EmbeddedFiles files, qierr_Status* status) {
-    // Nothing below raises a Lua error: loading is protected, and dumping does not allocate.
+    // Nothing below raises a Lua error, since loading is protected.
     lua_State* L = lua_newstate(allocatePlainly, nullptr);
     if (L == nullptr) {
         qihtl_reportMemoryFull(status);
@@ -35,23 +35,18 @@ BytecodeCache::BytecodeCache(EmbeddedFiles files, qierr_Status* status) {
     }
     for (const EmbeddedFile& file : files) {
         if (isLuaFile(file) && status->code >= 0) {
-            compile(L, file, status);
+            check(L, file, status);
         }
     }
     lua_close(L);
 }
 
-void BytecodeCache::compile(lua_State* L, const EmbeddedFile& file, qierr_Status* status) {
+void BytecodeCache::check(lua_State* L, const EmbeddedFile& file, qierr_Status* status) {
     Script script{&file, {}, {}};
     const int result = luaL_loadbuffer(L, file.data, file.size, file.name);
-    if (result == 0) {
-        Dump dump{&script.bytecode, status};
-        lua_dump(L, writeDump, &dump);
-        // The cache is kept until the process ends, so unused capacity is released.
-        script.bytecode.shrink();
-    } else if (result == LUA_ERRMEM) {
+    if (result == LUA_ERRMEM) {
         qihtl_reportMemoryFull(status);
-    } else {
+    } else if (result != 0) {
         script.failure.assign(lua_tostring(L, -1), status);
     }
     lua_settop(L, 0);
@@ -75,8 +70,8 @@ const BytecodeCache* BytecodeCache::ofEmbeddedFiles() {
     }
 }
 
-const BytecodeCache::Script* BytecodeCache::find(const char* module, std::size_t length) const {
-    for (const Script& script : scripts) {
+BytecodeCache::Script* BytecodeCache::find(const char* module, std::size_t length) const {
+    for (Script& script : scripts) {
         if (script.failure.empty() && moduleNameLength(*script.file) == length &&
             std::memcmp(script.file->name, module, length) == 0) {
             return &script;
@@ -85,17 +80,46 @@ const BytecodeCache::Script* BytecodeCache::find(const char* module, std::size_t
     return nullptr;
 }
 
+int BytecodeCache::push(lua_State* L, Script* script) const {
+    const char* name = script->file->name;
+    mutex.lock();
+    const bool isCompiled = !script->bytecode.empty();
+    mutex.unlock();
+    if (isCompiled) {
+        return luaL_loadbuffer(L, script->bytecode.c_str(), script->bytecode.length(), name);
+    }
+    const int result = luaL_loadbuffer(L, script->file->data, script->file->size, name);
+    if (result == 0) {
+        keepBytecode(L, script);
+    }
+    return result;
+}
+
+// Stores the bytecode of the function on top of the stack. Raises no Lua error. If memory runs out
+// nothing is stored, and the next state compiles the script again.
+void BytecodeCache::keepBytecode(lua_State* L, Script* script) const {
+    qierr::Status status;
+    qihtl::String bytecode;
+    Dump dump{&bytecode, &status};
+    lua_dump(L, writeDump, &dump);
+    // The cache is kept until the process ends, so unused capacity is released.
+    bytecode.shrink();
+    const std::lock_guard<std::mutex> lock(mutex);
+    if (status.code >= 0 && script->bytecode.empty()) {
+        script->bytecode.assign(bytecode.c_str(), bytecode.length(), &status);
+    }
+}
+
 // The __index function of package.preload. Its arguments are that table and the name of a module.
 int BytecodeCache::load(lua_State* L) {
     const auto* cache = static_cast<const BytecodeCache*>(lua_touserdata(L, lua_upvalueindex(1)));
     std::size_t length = 0;
     const char* module = lua_tolstring(L, 2, &length);
-    const Script* script = module == nullptr ? nullptr : cache->find(module, length);
+    Script* script = module == nullptr ? nullptr : cache->find(module, length);
     if (script == nullptr) {
         return 0;
     }
-    if (luaL_loadbuffer(L, script->bytecode.c_str(), script->bytecode.length(),
-                        script->file->name) != 0) {
+    if (cache->push(L, script) != 0) {
         return lua_error(L);
     }
     lua_pushvalue(L, 2);
@@ -125,6 +149,7 @@ int BytecodeCache::install(lua_State* L) const {
 }
 
 std::uint64_t BytecodeCache::size() const {
+    const std::lock_guard<std::mutex> lock(mutex);
     std::uint64_t bytes = 0;
     for (const Script& script : scripts) {
         bytes += script.bytecode.length();

@@ -13,10 +13,9 @@ void* allocatePlainly(void*, void* block, std::size_t oldSize, std::size_t newSi
 
 LuaArena::~LuaArena() {
     while (pieces != nullptr) {
-        Piece* next = pieces->next;
-        qihtl_realloc(pieces, 0);
-        pieces = next;
+        removePiece(pieces);
     }
+    qihtl_realloc(copy, 0);
 }
 
 void* LuaArena::allocate(void* arena, void* block, std::size_t oldSize, std::size_t newSize) {
@@ -37,7 +36,9 @@ LuaArena::Piece* LuaArena::getPiece(Piece* old, std::size_t size) {
     if (old == nullptr) {
         piece->next = pieces;
         piece->prev = nullptr;
+        piece->kept = false;
     }
+    piece->size = size;
     (piece->prev == nullptr ? pieces : piece->prev->next) = piece;
     if (piece->next != nullptr) {
         piece->next->prev = piece;
@@ -45,13 +46,21 @@ LuaArena::Piece* LuaArena::getPiece(Piece* old, std::size_t size) {
     return piece;
 }
 
+void LuaArena::removePiece(Piece* piece) {
+    (piece->prev == nullptr ? pieces : piece->prev->next) = piece->next;
+    if (piece->next != nullptr) {
+        piece->next->prev = piece->prev;
+    }
+    qihtl_realloc(piece, 0);
+}
+
 bool LuaArena::addChunk() {
     Piece* piece = getPiece(nullptr, chunkSize);
     if (piece == nullptr) {
         return false;
     }
-    room = reinterpret_cast<char*>(piece + 1);
-    roomSize = chunkSize;
+    small.room = reinterpret_cast<char*>(piece + 1);
+    small.roomSize = chunkSize;
     return true;
 }
 
@@ -63,12 +72,12 @@ void* LuaArena::getSmall(std::size_t size) {
         return block;
     }
     const std::size_t rounded = (size + grain - 1) / grain * grain;
-    if (rounded > roomSize && !addChunk()) {
+    if (rounded > small.roomSize && !addChunk()) {
         return nullptr;
     }
-    void* block = room;
-    room += rounded;
-    roomSize -= rounded;
+    void* block = small.room;
+    small.room += rounded;
+    small.roomSize -= rounded;
     return block;
 }
 
@@ -81,7 +90,7 @@ void* LuaArena::get(std::size_t size) {
 }
 
 void LuaArena::give(void* block, std::size_t size) {
-    if (block == nullptr) {
+    if (block == nullptr || !reuse) {
         return;
     }
     if (size <= largestSmall) {
@@ -91,17 +100,18 @@ void LuaArena::give(void* block, std::size_t size) {
         return;
     }
     Piece* piece = static_cast<Piece*>(block) - 1;
-    (piece->prev == nullptr ? pieces : piece->prev->next) = piece->next;
-    if (piece->next != nullptr) {
-        piece->next->prev = piece->prev;
+    if (!piece->kept) {
+        removePiece(piece);
     }
-    qihtl_realloc(piece, 0);
 }
 
 void* LuaArena::resize(void* block, std::size_t oldSize, std::size_t newSize) {
     if (oldSize > largestSmall && newSize > largestSmall) {
-        Piece* piece = getPiece(static_cast<Piece*>(block) - 1, newSize);
-        return piece != nullptr ? piece + 1 : newSize <= oldSize ? block : nullptr;
+        Piece* old = static_cast<Piece*>(block) - 1;
+        if (!old->kept) {
+            Piece* piece = getPiece(old, newSize);
+            return piece != nullptr ? piece + 1 : newSize <= oldSize ? block : nullptr;
+        }
     }
     void* moved = get(newSize);
     if (moved == nullptr) {
@@ -111,6 +121,62 @@ void* LuaArena::resize(void* block, std::size_t oldSize, std::size_t newSize) {
     std::memcpy(moved, block, oldSize < newSize ? oldSize : newSize);
     give(block, oldSize);
     return moved;
+}
+
+// The room at the end of the current chunk contains no blocks.
+std::size_t LuaArena::usedSize(const Piece* piece) const {
+    const auto* content = reinterpret_cast<const char*>(piece + 1);
+    const bool isCurrentChunk = small.room + small.roomSize == content + piece->size;
+    return isCurrentChunk ? piece->size - small.roomSize : piece->size;
+}
+
+std::size_t LuaArena::usedSize() const {
+    std::size_t size = 0;
+    for (const Piece* piece = pieces; piece != nullptr; piece = piece->next) {
+        size += usedSize(piece);
+    }
+    return size;
+}
+
+bool LuaArena::keep() {
+    copySize = usedSize();
+    copy = static_cast<char*>(qihtl_realloc(nullptr, copySize));
+    if (copy == nullptr) {
+        return false;
+    }
+    char* to = copy;
+    for (Piece* piece = pieces; piece != nullptr; piece = piece->next) {
+        std::memcpy(to, piece + 1, usedSize(piece));
+        to += usedSize(piece);
+        piece->kept = true;
+    }
+    keptSmall = small;
+    return true;
+}
+
+std::size_t LuaArena::keptSize() const {
+    std::size_t size = copySize;
+    for (const Piece* piece = pieces; piece != nullptr; piece = piece->next) {
+        size += piece->kept ? sizeof(Piece) + piece->size : 0;
+    }
+    return size;
+}
+
+void LuaArena::release() {
+    // New pieces are added at the front, so all of them are before the kept ones.
+    while (pieces != nullptr && !pieces->kept) {
+        removePiece(pieces);
+    }
+}
+
+void LuaArena::restore() {
+    small = keptSmall;
+    reuse = true;
+    const char* from = copy;
+    for (Piece* piece = pieces; piece != nullptr; piece = piece->next) {
+        std::memcpy(piece + 1, from, usedSize(piece));
+        from += usedSize(piece);
+    }
 }
 
 }  // namespace qixlatorlua

@@ -11,7 +11,11 @@ void* allocatePlainly(void* context, void* block, std::size_t oldSize, std::size
 
 // The memory of one state, for the length of one translation. Small blocks are cut from large
 // chunks; freed blocks are kept in a list for each size; all memory is released with the arena.
-// Used by one thread.
+// Used by one thread at a time.
+//
+// A state contains the addresses of its own blocks and nothing else that changes, so a copy of all
+// its memory that is written back to the same addresses is the same state again. `keep` makes such
+// a copy, and `restore` writes it back.
 class LuaArena {
   public:
     LuaArena() noexcept = default;
@@ -22,11 +26,30 @@ class LuaArena {
     // A lua_Alloc with the arena as its context.
     static void* allocate(void* arena, void* block, std::size_t oldSize, std::size_t newSize);
 
+    // The bytes that a copy of the blocks needs.
+    std::size_t usedSize() const;
+    // Copies all blocks as they are now. From then on their memory belongs to the arena until the
+    // arena is destroyed, even if they are freed. Returns false if memory runs out. Called at most
+    // once.
+    bool keep();
+    bool isKept() const { return copy != nullptr; }
+    // The memory of the kept blocks and of their copy, in bytes.
+    std::size_t keptSize() const;
+    // Releases the memory that was added since `keep`. The kept blocks are invalid until `restore`.
+    void release();
+    // Gives the kept blocks the content that they had at `keep`.
+    void restore();
+
+    // From now on freed blocks are not reused. Makes closing the state faster.
+    void stopReuse() { reuse = false; }
+
   private:
     // The header of each piece of memory that the arena has allocated.
     struct alignas(8) Piece {
         Piece* next;
         Piece* prev;
+        std::size_t size;
+        bool kept;
     };
     struct FreeBlock {
         FreeBlock* next;
@@ -34,19 +57,30 @@ class LuaArena {
     static constexpr std::size_t grain = 8;
     static constexpr std::size_t largestSmall = 512;
     static constexpr std::size_t chunkSize = 32 * 1024;
+    // Where the next small block comes from.
+    struct SmallBlocks {
+        char* room;
+        std::size_t roomSize;
+        FreeBlock* freeLists[largestSmall / grain];
+    };
 
     void* get(std::size_t size);
     void* getSmall(std::size_t size);
     void give(void* block, std::size_t size);
     void* resize(void* block, std::size_t oldSize, std::size_t newSize);
     Piece* getPiece(Piece* old, std::size_t size);
+    void removePiece(Piece* piece);
     bool addChunk();
-    FreeBlock*& freeBlocks(std::size_t size) { return freeLists[(size - 1) / grain]; }
+    std::size_t usedSize(const Piece* piece) const;
+    FreeBlock*& freeBlocks(std::size_t size) { return small.freeLists[(size - 1) / grain]; }
 
     Piece* pieces = nullptr;
-    char* room = nullptr;
-    std::size_t roomSize = 0;
-    FreeBlock* freeLists[largestSmall / grain] = {};
+    SmallBlocks small = {};
+    bool reuse = true;
+    // The contents of the kept pieces one after the other, in the order of the list.
+    char* copy = nullptr;
+    std::size_t copySize = 0;
+    SmallBlocks keptSmall = {};
 };
 
 }  // namespace qixlatorlua

@@ -7,6 +7,7 @@
 #include "embedded/preload.h"
 #include "qixlatorlua/BytecodeCache.h"
 #include "qixlatorlua/LuaMemory.h"
+#include "qixlatorlua/PreparedStates.h"
 #include "qixlatorlua/libraries.h"
 
 namespace qixlatorlua {
@@ -66,7 +67,7 @@ int preloadProtected(lua_State* L) {
 }
 
 bool preloadScripts(lua_State* L, LuaRuntime runtime, qierr_Status* status) {
-    Preload preload{runtime == LuaRuntime::Fast ? BytecodeCache::ofEmbeddedFiles() : nullptr, 0};
+    Preload preload{runtime == LuaRuntime::Plain ? nullptr : BytecodeCache::ofEmbeddedFiles(), 0};
     const int result = lua_cpcall(L, preloadProtected, &preload);
     if (result != 0 || preload.result != 0) {
         reportLuaFailure(L, result, "failed to add embedded modules to preload table", status);
@@ -100,7 +101,7 @@ const char* messageOnTop(lua_State* L, char* buffer, std::size_t size) {
 }  // namespace
 
 lua_State* openState(LuaRuntime runtime, qierr_Status* status) {
-    lua_State* L = runtime == LuaRuntime::Fast ? newFastState() : newPlainState();
+    lua_State* L = runtime == LuaRuntime::Plain ? newPlainState() : newFastState();
     if (L == nullptr) {
         reportNoState(status);
         return nullptr;
@@ -116,13 +117,18 @@ void closeState(lua_State* L) {
     if (L == nullptr) {
         return;
     }
+    LuaArena* arena = arenaOf(L);
+    if (arena == nullptr) {
+        lua_close(L);
+    } else {
+        PreparedStates::ofProcess().close(L, arena);
+    }
+}
+
+LuaArena* arenaOf(lua_State* L) {
     void* context = nullptr;
     lua_getallocf(L, &context);
-    lua_close(L);
-    if (context != nullptr) {
-        static_cast<LuaArena*>(context)->~LuaArena();
-        qihtl_realloc(context, 0);
-    }
+    return static_cast<LuaArena*>(context);
 }
 
 qierr_Writer reportLuaFailure(lua_State* L, int result, const char* what, qierr_Status* status) {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include "qierr/Writer.h"
+#include "qixlatorlua/LuaMemory.h"
 #include "qixlatorlua/LuaXlator.h"
 
 namespace qixlatorlua {
@@ -11,6 +12,9 @@ lua_State* openState(LuaRuntime runtime, qierr_Status* status);
 
 // Closes a state and frees its memory. The state may be null.
 void closeState(lua_State* L);
+
+// The arena of a state; null for LuaRuntime::Plain.
+LuaArena* arenaOf(lua_State* L);
 
 // Sets qiapalerr_softwareFaultAPALInternalUseOnly for an error of the interpreter. `result` is the
 // result of the protected call; the message is on top of the stack. Begins the object

@@ -7,6 +7,7 @@
 #include "qihtl/Allocator.h"
 #include "qixlator/qixlator.h"
 #include "qixlatorlua/LuaState.h"
+#include "qixlatorlua/PreparedStates.h"
 
 // The functions that run inside lua_cpcall must not own resources: a Lua error is a longjmp that
 // skips destructors.
@@ -56,6 +57,25 @@ bool setUp(lua_State* L, Setup setup, qierr_Status* status) {
         qierr_Writer_addString(writer, "registrationInfo", setup.registrationInfo);
     }
     return result == 0;
+}
+
+// A state that is set up: a prepared one, or else a new one.
+lua_State* findState(Setup setup, LuaRuntime runtime, qierr_Status* status) {
+    const bool isPrepared = runtime == LuaRuntime::Prepared;
+    PreparedStates& states = PreparedStates::ofProcess();
+    lua_State* L = isPrepared ? states.take(setup.name, setup.registrationInfo) : nullptr;
+    if (L != nullptr) {
+        return L;
+    }
+    L = openState(runtime, status);
+    if (L == nullptr || !setUp(L, setup, status)) {
+        closeState(L);
+        return nullptr;
+    }
+    if (isPrepared) {
+        states.add(L, setup.name, setup.registrationInfo);
+    }
+    return L;
 }
 
 // ---- Descriptions -------------------------------------------------------------------------------
@@ -189,13 +209,11 @@ XlatorInterface* createLuaXlator(const char* name, const char* registrationInfo,
         return nullptr;
     }
     auto* xlator = new (memory) LuaXlator{{16, destroy, getStaticDesc, getDynamicDesc}, nullptr};
-    lua_State* L = openState(runtime, status);
-    if (L == nullptr || !setUp(L, {name, registrationInfo}, status)) {
-        closeState(L);
+    xlator->L = findState({name, registrationInfo}, runtime, status);
+    if (xlator->L == nullptr) {
         destroy(xlator);
         return nullptr;
     }
-    xlator->L = L;
     return xlator;
 }
 

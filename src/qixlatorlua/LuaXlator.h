@@ -14,13 +14,17 @@ struct LuaXlator : XlatorInterface {
 };
 
 // How a Lua state loads its scripts and allocates its memory. Results, failures and the output on
-// standard error are the same for both.
+// standard error are the same for all.
 enum class LuaRuntime {
     // Compiles every script and allocates each block separately.
     Plain,
     // Loads a script as bytecode when it is required, and allocates from an arena. The bytecode is
     // compiled once in the process; if there is no memory for it, every script is compiled.
     Fast,
+    // As Fast, but a state is only set up for the first translator; each further one gets a copy of
+    // it as it was before its first use (see PreparedStates). For translators that are destroyed
+    // after one translation, since the number of these states is limited.
+    Prepared,
 };
 
 // Creates a translator: opens a state with the libraries and embedded scripts and configures it

@@ -18,7 +18,7 @@ TEST(ConcurrencyTest, SessionsOfDifferentThreadsAreIndependent) {
     root.write("/usr/local/qinstal/share/errors/English/a.txt",
                "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"-1\">\nText.\n"
                "</qierror>\n</qidocument>\n");
-    constexpr int threadCount = 4;
+    constexpr int threadCount = 8;
     std::vector<std::string> results(threadCount);
     std::vector<std::thread> threads;
     for (int number = 0; number < threadCount; ++number) {

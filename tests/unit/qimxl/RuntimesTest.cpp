@@ -15,8 +15,8 @@ namespace {
 
 using qixlatorlua::LuaRuntime;
 
-// Compares the fast way of running the translator with the plain one: texts, statuses, tracebacks
-// and lines on standard error must be the same.
+// Compares the faster ways of running the translator with the plain one: texts, statuses,
+// tracebacks and lines on standard error must be the same.
 class RuntimesTest : public testing::Test {
   protected:
     RuntimesTest() {
@@ -50,10 +50,12 @@ class RuntimesTest : public testing::Test {
 
     static void compare(std::int32_t code, const char* json, std::uint32_t attributes,
                         const char* format = "json1") {
-        EXPECT_EQ(observe(LuaRuntime::Plain, code, json, attributes, format),
-                  observe(LuaRuntime::Fast, code, json, attributes, format))
-            << "code " << code << ", attributes " << attributes << ", json "
-            << (json == nullptr ? "(null)" : json);
+        const std::string plain = observe(LuaRuntime::Plain, code, json, attributes, format);
+        for (const LuaRuntime runtime : {LuaRuntime::Fast, LuaRuntime::Prepared}) {
+            EXPECT_EQ(plain, observe(runtime, code, json, attributes, format))
+                << "code " << code << ", attributes " << attributes << ", json "
+                << (json == nullptr ? "(null)" : json);
+        }
     }
 
     TestRoot root;
