@@ -1,22 +1,27 @@
-// Measures the production of the text of a failure: with the translator of the service, and for
-// comparison with LuaRuntime::Plain, which compiles every script for each failure. Both are called
-// through describeStatus. "peakBytes" is the maximum memory in use during one call, "keptBytes" the
-// memory that the process keeps afterwards.
+// Measures failures. "request" is a whole request with one unknown name. "translated" is the
+// production of the text of a failure alone, and "compiledEachTime" the same with
+// LuaRuntime::Plain, which compiles every script for each failure; both are called through
+// describeStatus. "peakBytes" is the maximum memory in use during one call beyond what is kept,
+// "keptBytes" the memory that the process keeps afterwards, "systemNs" the system time of a call.
 
 #include <benchmark/benchmark.h>
 #include <malloc.h>
+#include <sys/resource.h>
 
 #include <algorithm>
 #include <cstdint>
 #include <cstdlib>
 #include <string>
 
+#include "Service.h"
 #include "qierr/Writer.h"
 #include "qihtl/Allocator.h"
 #include "qitrmcwebsvc/describeStatus.h"
+#include "qixlator/KeptSearches.h"
 #include "qixlator/Registration.h"
 #include "qixlatorlua/BytecodeCache.h"
 #include "qixlatorlua/LuaXlator.h"
+#include "qixlatorlua/PreparedStates.h"
 
 namespace {
 
@@ -72,6 +77,29 @@ void fillStatus(qierr_Status* status, const char* translator) {
     addUsageString(qierr_orderedData(translator, status), "kUsageTypeSessionId", "_session7");
 }
 
+double systemNanoseconds() {
+    rusage usage{};
+    ::getrusage(RUSAGE_THREAD, &usage);
+    return usage.ru_stime.tv_sec * 1e9 + usage.ru_stime.tv_usec * 1e3;
+}
+
+template <typename Action>
+void measure(benchmark::State& state, Action action) {
+    const std::int64_t before = liveBytes;
+    peakBytes = before;
+    const double systemBefore = systemNanoseconds();
+    for (auto _ : state) {
+        action();
+    }
+    state.counters["systemNs"] =
+        benchmark::Counter(systemNanoseconds() - systemBefore, benchmark::Counter::kAvgIterations);
+    state.counters["peakBytes"] = static_cast<double>(peakBytes - before);
+    state.counters["keptBytes"] =
+        static_cast<double>(qixlatorlua::BytecodeCache::ofEmbeddedFiles()->size() +
+                            qixlatorlua::PreparedStates::ofProcess().size() +
+                            qixlator::KeptSearches::ofProcess().size());
+}
+
 std::string describe(const char* translator) {
     qierr::Status status;
     fillStatus(&status, translator);
@@ -83,16 +111,21 @@ void failure(benchmark::State& state, const char* translator) {
         describe(fastName) != describe(plainName)) {
         state.SkipWithError("the words are not those expected");
     }
-    const std::int64_t before = liveBytes;
-    peakBytes = before;
-    for (auto _ : state) {
-        benchmark::DoNotOptimize(describe(translator));
-    }
-    state.counters["peakBytes"] = static_cast<double>(peakBytes - before);
-    state.counters["keptBytes"] =
-        static_cast<double>(qixlatorlua::BytecodeCache::ofEmbeddedFiles()->size());
+    measure(state, [&] { benchmark::DoNotOptimize(describe(translator)); });
 }
 
+void request(benchmark::State& state) {
+    Service service;
+    const std::string text = Service::request(
+        "getProperty", R"("session_id":")" + service.openSession("Mod1") +
+                           R"(","devices":["Mod99"],"property":"Dev.Temperature")");
+    if (service.answer(text).find("Mod99") == std::string::npos) {
+        state.SkipWithError(service.answer(text).c_str());
+    }
+    measure(state, [&] { benchmark::DoNotOptimize(service.answer(text)); });
+}
+
+BENCHMARK(request)->Name("failure/request");
 BENCHMARK_CAPTURE(failure, translated, fastName);
 BENCHMARK_CAPTURE(failure, compiledEachTime, plainName);
 
