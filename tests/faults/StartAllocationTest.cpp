@@ -3,8 +3,9 @@
 
 #include "ServiceTest.h"
 #include "support/allocationFaults.h"
+#include "support/sanitizers.h"
 
-#if defined(__SANITIZE_ADDRESS__)
+#if defined(QITRMC_ADDRESS_SANITIZER)
 #include <sanitizer/lsan_interface.h>
 #endif
 
@@ -20,7 +21,7 @@ class StartAllocationTest : public ServiceTest,
 
     // Initialises with one fault. Returns how that ended if the fault was reached.
     std::optional<Start> startWithFault(int successes) {
-#if defined(__SANITIZE_ADDRESS__)
+#if defined(QITRMC_ADDRESS_SANITIZER)
         // The JSON library leaks what it has compiled so far when memory for the rest of a schema
         // runs out. That can happen only at the start.
         __lsan::ScopedDisabler expected;

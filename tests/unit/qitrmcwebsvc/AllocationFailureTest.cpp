@@ -6,8 +6,9 @@
 #include "embedded/EmbeddedFiles.h"
 #include "requests.h"
 #include "support/allocationFaults.h"
+#include "support/sanitizers.h"
 
-#if defined(__SANITIZE_ADDRESS__)
+#if defined(QITRMC_ADDRESS_SANITIZER)
 #include <sanitizer/lsan_interface.h>
 #endif
 
@@ -122,7 +123,7 @@ TEST_P(EachExtent, JsonTextsAreParsedCopiedAndWrittenOrRunOutOfMemory) {
 // The JSON library leaks what it has compiled so far when memory for the rest runs out. That can
 // only happen at the start of the service, which then fails.
 TEST_P(EachExtent, AValidatorIsBuiltOrRunsOutOfMemory) {
-#if defined(__SANITIZE_ADDRESS__)
+#if defined(QITRMC_ADDRESS_SANITIZER)
     __lsan::ScopedDisabler expected;
 #endif
     withFaultAtEachAllocation(

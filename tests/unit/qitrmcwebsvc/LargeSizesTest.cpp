@@ -18,7 +18,7 @@ constexpr std::size_t beyond32Bits = static_cast<std::size_t>(std::uint64_t{1} <
 // Notes what it is asked for and gives nothing, so that no memory is needed for a large size.
 class NotingAllocator {
   public:
-    static const bool kNeedFree = true;
+    [[maybe_unused]] static const bool kNeedFree = true;
 
     void* Malloc(std::size_t size) {
         noted = size;

@@ -1,6 +1,7 @@
 #include <sys/resource.h>
 
 #include "support/ProcedureFixture.h"
+#include "support/sanitizers.h"
 
 namespace {
 
@@ -48,7 +49,7 @@ TEST_F(NvmemTest, ReadingFailsWithTheDriversError) {
     EXPECT_EQ(statusText, R"({"from":"driver"})");
 }
 
-#if !defined(__SANITIZE_ADDRESS__) && !defined(__SANITIZE_THREAD__)
+#if !defined(QITRMC_ADDRESS_SANITIZER) && !defined(QITRMC_THREAD_SANITIZER)
 TEST_F(NvmemTest, ARequestForTooManyBytesUsesNoMemoryBeforeTheDriverRefusesIt) {
     fail("getNvmemBytes", -250999);
     rusage before{};
