@@ -1,5 +1,6 @@
 """The npm packages of clients/typescript, installed beside the build as its lock file says."""
 
+import fcntl
 import functools
 import json
 import shutil
@@ -18,20 +19,22 @@ def fault_of_installing(folder):
     """Why the packages are not there; empty when they are."""
     if shutil.which("npm") is None:
         return "npm is not installed"
-    if is_installed(folder):
-        return ""
     folder.mkdir(parents=True, exist_ok=True)
-    for name in FILES:
-        shutil.copy(PROJECT / name, folder)
-    npm = subprocess.run(["npm", "ci"], cwd=folder, capture_output=True, text=True, timeout=PATIENCE)
-    return f"npm ci failed: {npm.stderr.strip()[-500:]}" if npm.returncode else ""
+    with open(folder / "lock", "w") as lock:
+        fcntl.flock(lock, fcntl.LOCK_EX)  # files of tests run side by side
+        if is_installed(folder):
+            return ""
+        for name in FILES:
+            shutil.copy(PROJECT / name, folder)
+        npm = subprocess.run(["npm", "ci"], cwd=folder, capture_output=True, text=True, timeout=PATIENCE)
+        return f"npm ci failed: {npm.stderr.strip()[-500:]}" if npm.returncode else ""
 
 
 def is_installed(folder):
     """Whether a former run installed what the lock file says now."""
-    lock = folder / "package-lock.json"
+    copied = folder / "package-lock.json"
     marker = folder / "node_modules" / ".package-lock.json"
-    return marker.exists() and lock.read_bytes() == (PROJECT / lock.name).read_bytes()
+    return marker.exists() and copied.read_bytes() == (PROJECT / copied.name).read_bytes()
 
 
 def packages():
