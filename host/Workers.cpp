@@ -30,8 +30,8 @@ constexpr std::uint32_t ticksWithSurplus = 250;
 // How many ticks without any work let the supervisor sleep until there is some.
 constexpr std::uint32_t ticksUntilSleep = 50;
 
-// The thread sanitizer knows that a descriptor which is added is handed over to the thread that waits
-// for it, but not that one which is modified is.
+// The thread sanitizer knows that a descriptor which is added is handed over to the thread that
+// waits for it, but not that one which is modified is.
 #if defined(__SANITIZE_THREAD__)
 constexpr bool canModify = false;
 #else
