@@ -26,7 +26,7 @@ def test_no_budget_is_exceeded(architecture):
 
 
 def test_the_page_names_every_budget():
-    page = (ROOT / "docs/performance.md").read_text(encoding="utf-8")
+    page = (ROOT / "docs/performance.md").read_text(encoding="utf-8").split("\n## Budgets\n")[1]
     rows = re.findall(r"^\| (.+?) \|" + 4 * r" ([\d,]+|-) \|" + "$", page, re.MULTILINE)
     documented = {row[0]: (row[2], row[4]) for row in rows}
     assert documented == {
