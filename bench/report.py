@@ -214,7 +214,7 @@ def report_service(service):
 
 
 def read(path):
-    return json.loads(path.read_text()) if path.exists() else {}
+    return json.loads(path.read_text() or "{}") if path.exists() else {}
 
 
 def main():
