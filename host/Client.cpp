@@ -200,15 +200,13 @@ MHD_Daemon* Client::startDaemon(const Service& service, Client* client) noexcept
         {MHD_OPTION_HTTPS_MEM_CERT, 0, const_cast<char*>(settings.tlsCertificate.c_str())},
         {MHD_OPTION_HTTPS_MEM_KEY, 0, const_cast<char*>(settings.tlsKey.c_str())},
         {MHD_OPTION_END, 0, nullptr}};
-    return MHD_start_daemon(flags, 0, nullptr, nullptr, Callbacks::onRequest, client,       //
-                            MHD_OPTION_CONNECTION_LIMIT, 1u,                                //
-                            MHD_OPTION_SIGPIPE_HANDLED_BY_APP, 1,                           //
-                            MHD_OPTION_NOTIFY_CONNECTION, Callbacks::onConnection, client,  //
-                            MHD_OPTION_URI_LOG_CALLBACK, Callbacks::onRequestLine, client,  //
-                            MHD_OPTION_UNESCAPE_CALLBACK, Callbacks::keepEscapes, client,   //
-                            MHD_OPTION_NOTIFY_COMPLETED, Callbacks::onEnd, client,          //
-                            MHD_OPTION_ARRAY, settings.tls ? tlsOptions : &tlsOptions[2],
-                            MHD_OPTION_END);
+    return MHD_start_daemon(flags, 0, nullptr, nullptr, Callbacks::onRequest, client,
+                            MHD_OPTION_CONNECTION_LIMIT, 1u, MHD_OPTION_SIGPIPE_HANDLED_BY_APP, 1,
+                            MHD_OPTION_NOTIFY_CONNECTION, Callbacks::onConnection, client,
+                            MHD_OPTION_URI_LOG_CALLBACK, Callbacks::onRequestLine, client,
+                            MHD_OPTION_UNESCAPE_CALLBACK, Callbacks::keepEscapes, client,
+                            MHD_OPTION_NOTIFY_COMPLETED, Callbacks::onEnd, client, MHD_OPTION_ARRAY,
+                            settings.tls ? tlsOptions : &tlsOptions[2], MHD_OPTION_END);
 }
 
 // Hands the socket over to an instance of the library. It takes the socket in at its first run.

@@ -19,8 +19,8 @@ constexpr const char* usualModules[] = {"commonTerms_eng", "qimxl_defaultAttrTab
 
 using Lock = std::lock_guard<std::mutex>;
 
-// The JSON module has a buffer that is not in the memory of the state. It releases the buffer when
-// it is told not to keep it, and makes a new one when it is told to keep it.
+// The JSON module has a buffer outside the memory of the state. Its function encode_keep_buffer
+// frees the buffer when called with false, and allocates a new one when called with true.
 void setJsonBuffer(lua_State* L, bool isKept) {
     lua_getfield(L, LUA_REGISTRYINDEX, "_LOADED");
     lua_getfield(L, -1, "cjson");
