@@ -41,7 +41,7 @@ struct Service {
 // a time serves an instance and runs the plug-in for it, so only a connection with an instance of
 // its own leaves the others free while a request lasts. The instance is made when the client sends
 // something, which keeps connections cheap that are only open.
-class Client : public Readable {
+class Client : public Watched {
   public:
     // Takes over the socket. The service must outlive the client. Throws std::bad_alloc; the socket
     // then stays the caller's.
@@ -52,7 +52,8 @@ class Client : public Readable {
     Client(const Client&) = delete;
     Client& operator=(const Client&) = delete;
 
-    int descriptor() const override { return readable; }
+    int descriptor() const override { return watched; }
+    std::uint32_t events() const override { return awaited; }
     bool serve() noexcept override;
 
     // Whether the library takes the settings.
@@ -61,8 +62,11 @@ class Client : public Readable {
   private:
     struct Callbacks;
 
-    static MHD_Daemon* startDaemon(const Service& service, Client* client) noexcept;
+    static MHD_Daemon* startDaemon(const Service& service, Client* client, bool inSet) noexcept;
     bool begin() noexcept;
+    bool watchesSocket() const noexcept { return watched == socket; }
+    void run(std::uint32_t ready) noexcept;
+    void updateAwaited() noexcept;
 
     const Service& service;
     const sockaddr_storage address;
@@ -70,7 +74,9 @@ class Client : public Readable {
     const std::string localAddress;  // canonical, of this machine's end; empty when it is unknown
     Connection* place;
     MHD_Daemon* daemon = nullptr;  // null until the client sends something
-    int readable;                  // the socket, which the instance owns as soon as there is one
+    const int socket;              // the instance owns it as soon as there is one
+    int watched;                   // the socket or a descriptor of the instance
+    std::uint32_t awaited;         // events of epoll
     bool isOpen = false;           // for the library
 };
 

@@ -178,7 +178,7 @@ constexpr OptionWithValue optionsWithValue[] = {
      setTimeScale},
     {"--threads", "N", "most requests that are worked on at once (512; 1 to 900)", setThreads},
     {"--connections", "N",
-     "most connections at once (16384; 1 to 1000000, each takes two\n"
+     "most connections at once (16384; 1 to 1000000, each takes up to two\n"
      "file descriptors)",
      setConnections},
     {"--max-body", "BYTES",

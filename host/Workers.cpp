@@ -47,11 +47,11 @@ bool startThread(pthread_t& thread, void* (*function)(void*), void* argument) {
     return error == 0;
 }
 
-bool setWatched(int readySet, int operation, Readable* readable) {
+bool setWatched(int readySet, int operation, Watched* watched) {
     epoll_event event = {};
-    event.events = EPOLLIN | EPOLLONESHOT;
-    event.data.ptr = readable;
-    return epoll_ctl(readySet, operation, readable->descriptor(), &event) == 0;
+    event.events = watched->events() | EPOLLONESHOT;
+    event.data.ptr = watched;
+    return epoll_ctl(readySet, operation, watched->descriptor(), &event) == 0;
 }
 
 }  // namespace
@@ -91,8 +91,8 @@ void Workers::end() noexcept {
     close(endEvent);
 }
 
-bool Workers::watch(Readable* readable) noexcept {
-    return setWatched(readySet, EPOLL_CTL_ADD, readable);
+bool Workers::watch(Watched* watched) noexcept {
+    return setWatched(readySet, EPOLL_CTL_ADD, watched);
 }
 
 void* Workers::run(void* argument) {
@@ -108,30 +108,30 @@ void Workers::serveUntilEnd(Worker& worker) noexcept {
         if (epoll_wait(readySet, &event, 1, -1) != 1) {
             continue;
         }
-        auto* readable = static_cast<Readable*>(event.data.ptr);
-        if (readable == nullptr) {
+        auto* watched = static_cast<Watched*>(event.data.ptr);
+        if (watched == nullptr) {
             return;
         }
         ++worker.progress;
         if (supervisorSleeps) {
             wakeSupervisor();
         }
-        serve(readable);
+        serve(watched);
         ++worker.progress;
     }
 }
 
-void Workers::serve(Readable* readable) noexcept {
-    const int before = readable->descriptor();
-    bool goesOn = readable->serve();
-    if (canModify && goesOn && readable->descriptor() == before) {
-        goesOn = setWatched(readySet, EPOLL_CTL_MOD, readable);
+void Workers::serve(Watched* watched) noexcept {
+    const int before = watched->descriptor();
+    bool goesOn = watched->serve();
+    if (canModify && goesOn && watched->descriptor() == before) {
+        goesOn = setWatched(readySet, EPOLL_CTL_MOD, watched);
     } else if (goesOn) {
         epoll_ctl(readySet, EPOLL_CTL_DEL, before, nullptr);
-        goesOn = setWatched(readySet, EPOLL_CTL_ADD, readable);
+        goesOn = setWatched(readySet, EPOLL_CTL_ADD, watched);
     }
     if (!goesOn) {
-        delete readable;
+        delete watched;
     }
 }
 

@@ -11,19 +11,20 @@
 
 namespace host {
 
-// Something that has work to do whenever a file descriptor is readable.
-class Readable {
+// Something that has work to do whenever a file descriptor is ready.
+class Watched {
   public:
-    virtual ~Readable() = default;
+    virtual ~Watched() = default;
 
-    // Only serve() may change it.
+    // Only serve() may change these two. The events are those of epoll, without flags.
     virtual int descriptor() const = 0;
+    virtual std::uint32_t events() const = 0;
 
     // Does the work that there is. False when this is to be destroyed.
     virtual bool serve() noexcept = 0;
 };
 
-// Threads that serve what is readable, each of them one thing at a time. As many work as the
+// Threads that serve what is ready, each of them one thing at a time. As many work as the
 // machine has processors, and one more. When a call of serve() lasts longer than a moment, another
 // thread takes the place of the one that is in it, so that a call that waits delays no other one.
 class Workers {
@@ -37,9 +38,9 @@ class Workers {
     Workers(const Workers&) = delete;
     Workers& operator=(const Workers&) = delete;
 
-    // From now on one thread at a time serves `readable`, which belongs to the workers. False when
-    // memory runs out; `readable` is then as it was.
-    bool watch(Readable* readable) noexcept;
+    // From now on one thread at a time serves `watched`, which belongs to the workers. False when
+    // memory runs out; `watched` is then as it was.
+    bool watch(Watched* watched) noexcept;
 
   private:
     // One thread. The number is odd while it serves something.
@@ -58,7 +59,7 @@ class Workers {
     static void* run(void* worker);
     static void* runSupervisor(void* workers);
     void serveUntilEnd(Worker& worker) noexcept;
-    void serve(Readable* readable) noexcept;
+    void serve(Watched* watched) noexcept;
     bool isSurplus() noexcept;
     void supervise();
     bool startWorker();

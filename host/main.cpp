@@ -135,7 +135,8 @@ void takeChargeOfSignals() {
     signal(SIGPIPE, SIG_IGN);
 }
 
-// A connection takes two descriptors, and many systems let a process have 1024 unless it asks.
+// A connection takes up to two descriptors, and many systems let a process have 1024 unless it
+// asks.
 void raiseDescriptorLimit() {
     rlimit limit = {};
     getrlimit(RLIMIT_NOFILE, &limit);

@@ -1,6 +1,7 @@
 #include "host/Workers.h"
 
 #include <gtest/gtest.h>
+#include <sys/epoll.h>
 #include <sys/eventfd.h>
 #include <unistd.h>
 
@@ -14,40 +15,41 @@
 
 namespace {
 
-using host::Readable;
+using host::Watched;
 using host::Workers;
 
 constexpr std::chrono::minutes patience(1);
 constexpr std::uint32_t most = 20;
 
 // Calls a function for each event that is sent to it, and ends after the event 0.
-class Receiver : public Readable {
+class Receiver : public Watched {
   public:
     explicit Receiver(std::function<void()> work) : work(std::move(work)) {}
     ~Receiver() override {
-        close(events);
+        close(received);
         destroyed.set_value();
     }
 
-    int descriptor() const override { return events; }
+    int descriptor() const override { return received; }
+    std::uint32_t events() const override { return EPOLLIN; }
     bool serve() noexcept override {
         eventfd_t kind = 0;
-        eventfd_read(events, &kind);
+        eventfd_read(received, &kind);
         if (kind < endKind) {
             work();
         }
         return kind < endKind;
     }
 
-    void send() const { eventfd_write(events, 1); }
-    void end() const { eventfd_write(events, endKind); }
+    void send() const { eventfd_write(received, 1); }
+    void end() const { eventfd_write(received, endKind); }
     std::future<void> destruction() { return destroyed.get_future(); }
 
   private:
     static constexpr eventfd_t endKind = 1000000000;
 
     const std::function<void()> work;
-    const int events = eventfd(0, EFD_CLOEXEC);
+    const int received = eventfd(0, EFD_CLOEXEC);
     std::promise<void> destroyed;
 };
 
@@ -80,6 +82,31 @@ TEST(Workers, ServeWhatIsReadable) {
     std::promise<void> served;
     Receivers receivers(workers);
     receivers.add([&] { served.set_value(); }).send();
+    EXPECT_EQ(served.get_future().wait_for(patience), std::future_status::ready);
+}
+
+// Can be written to at once, and ends when it is served.
+class Writer : public Watched {
+  public:
+    explicit Writer(std::promise<void>& served) : served(served) {}
+    ~Writer() override { close(sent); }
+
+    int descriptor() const override { return sent; }
+    std::uint32_t events() const override { return EPOLLOUT; }
+    bool serve() noexcept override {
+        served.set_value();
+        return false;
+    }
+
+  private:
+    const int sent = eventfd(0, EFD_CLOEXEC);
+    std::promise<void>& served;
+};
+
+TEST(Workers, ServeWhatIsWritable) {
+    std::promise<void> served;
+    Workers workers(most);
+    EXPECT_TRUE(workers.watch(new Writer(served)));
     EXPECT_EQ(served.get_future().wait_for(patience), std::future_status::ready);
 }
 

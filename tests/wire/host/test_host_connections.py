@@ -211,6 +211,19 @@ def test_ten_thousand_idle_clients_keep_no_other_out(start_host):
         assert time.monotonic() - begin < 10
 
 
+@pytest.mark.parametrize("is_encrypted", [False, True], ids=["http", "https"])
+def test_a_connection_with_a_large_descriptor_is_served_like_any_other(start_host, certificate,
+                                                                       is_encrypted):
+    resource.setrlimit(resource.RLIMIT_NOFILE, (resource.getrlimit(resource.RLIMIT_NOFILE)[1],) * 2)
+    options = ("--tls-cert", certificate[0], "--tls-key", certificate[1]) if is_encrypted else ()
+    host = start_host("--timeout", "86400", *options)
+    text = b"x" * 3000000
+    with contextlib.ExitStack() as stack:
+        for _ in range(1100):
+            stack.enter_context(host.raw_socket())
+        assert host.post(text, "Echo")[2] == text
+
+
 def test_silent_clients_in_all_slots_are_disconnected_long_before_the_timeout(start_host):
     host = start_host("--connections", "3", "--timeout", "86400")
     with contextlib.ExitStack() as stack:
