@@ -2,6 +2,7 @@
 
 import importlib.machinery
 import importlib.util
+import subprocess
 
 import pytest
 
@@ -16,6 +17,27 @@ def test_headers_and_symbols_are_as_recorded():
     recorded = {path.name: path.read_text(encoding="utf-8")
                 for path in record_abi.RECORD.glob("*.txt")}
     assert record_abi.record() == recorded, "record a wanted change with scripts/record-abi"
+
+
+@pytest.fixture(scope="module")
+def types(tmp_path_factory):
+    """A folder with the types of the libraries as they are now."""
+    folder = tmp_path_factory.mktemp("types")
+    record_abi.types(folder)
+    return folder
+
+
+def test_every_library_has_a_record_of_its_types(types):
+    assert {path.name for path in types.iterdir()} == {
+        path.name for path in record_abi.RECORD.glob("*.xml")}
+
+
+@pytest.mark.parametrize("recorded", sorted(record_abi.RECORD.glob("*.xml")), ids=lambda path: path.stem)
+def test_the_types_of_exported_functions_are_as_recorded(types, recorded):
+    result = subprocess.run(["abidiff", "--harmless", recorded, types / recorded.name],
+                            capture_output=True, text=True)
+    assert (result.returncode, result.stdout, result.stderr) == (0, "", ""), (
+        f"{result.stdout}\nrecord a wanted change with scripts/record-abi")
 
 
 @pytest.mark.parametrize("architecture", record_abi.ARCHITECTURES)
