@@ -90,7 +90,7 @@ void* LuaArena::get(std::size_t size) {
 }
 
 void LuaArena::give(void* block, std::size_t size) {
-    if (block == nullptr || !reuse) {
+    if (block == nullptr) {
         return;
     }
     if (size <= largestSmall) {
@@ -171,7 +171,6 @@ void LuaArena::release() {
 
 void LuaArena::restore() {
     small = keptSmall;
-    reuse = true;
     const char* from = copy;
     for (Piece* piece = pieces; piece != nullptr; piece = piece->next) {
         std::memcpy(piece + 1, from, usedSize(piece));

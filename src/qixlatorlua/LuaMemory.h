@@ -1,5 +1,6 @@
 #pragma once
 
+#include <csetjmp>
 #include <cstddef>
 
 // Allocators for Lua states. Both functions follow the rules of lua_Alloc; in particular, shrinking
@@ -40,8 +41,9 @@ class LuaArena {
     // Gives the kept blocks the content that they had at `keep`.
     void restore();
 
-    // From now on freed blocks are not reused. Makes closing the state faster.
-    void stopReuse() { reuse = false; }
+    // Where the last finalizer continues while the state is closed; null otherwise. Belongs to
+    // closeWithoutFreeing.
+    std::jmp_buf* closing = nullptr;
 
   private:
     // The header of each piece of memory that the arena has allocated.
@@ -76,7 +78,6 @@ class LuaArena {
 
     Piece* pieces = nullptr;
     SmallBlocks small = {};
-    bool reuse = true;
     // The contents of the kept pieces one after the other, in the order of the list.
     char* copy = nullptr;
     std::size_t copySize = 0;

@@ -8,6 +8,7 @@
 #include "qixlatorlua/BytecodeCache.h"
 #include "qixlatorlua/LuaMemory.h"
 #include "qixlatorlua/PreparedStates.h"
+#include "qixlatorlua/closing.h"
 #include "qixlatorlua/libraries.h"
 
 namespace qixlatorlua {
@@ -25,7 +26,7 @@ lua_State* newFastState() {
     }
     auto* arena = new (memory) LuaArena();
     lua_State* L = lua_newstate(LuaArena::allocate, arena);
-    if (L == nullptr) {
+    if (L == nullptr || lua_cpcall(L, prepareClosing, nullptr) != 0) {
         arena->~LuaArena();
         qihtl_realloc(arena, 0);
         return nullptr;

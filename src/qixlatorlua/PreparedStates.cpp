@@ -6,6 +6,7 @@
 #include <new>
 
 #include "qixlatorlua/LuaState.h"
+#include "qixlatorlua/closing.h"
 
 // The functions that run inside lua_cpcall must not own resources: a Lua error is a longjmp that
 // skips destructors.
@@ -197,8 +198,7 @@ void PreparedStates::empty(Slot* slot) {
 }
 
 void PreparedStates::close(lua_State* L, LuaArena* arena) {
-    arena->stopReuse();
-    lua_close(L);
+    closeWithoutFreeing(L);
     if (!arena->isKept()) {
         destroy(arena);
         return;

@@ -152,6 +152,10 @@ TEST_F(PreparedStatesTest, NoScriptLeavesATraceForTheNextTranslation) {
              "setmetatable(_G, { __newindex = error })",
              "collectgarbage()",
              "collectgarbage('restart')",
+             "for key in pairs(debug.getregistry()) do debug.getregistry()[key] = nil end "
+             "collectgarbage()",
+             "for _, value in pairs(debug.getregistry()) do local methods = "
+             "debug.getmetatable(value) if methods then methods.__gc = nil end end",
              "local all = {} for i = 1, 20000 do all[i] = 'text ' .. i end",
              "local text = string.rep('x', 3000000) require('cjson').encode(text)",
              "require('cjson').encode_keep_buffer(false)",
@@ -231,6 +235,34 @@ TEST_F(PreparedStatesTest, WhatIsKeptIsLimited) {
     EXPECT_GT(PreparedStates::ofProcess().size(), 2u * 128 * 1024);
     // Leaves room for the bytecode of the English scripts and for the results of searches.
     EXPECT_LE(PreparedStates::ofProcess().size(), 900u * 1024);
+}
+
+// Appends a text to a file when the userdata that it defines is finalized.
+std::string finalizerThatWrites(const std::string& path, const char* text, const char* then) {
+    return "getmetatable(newproxy(true)).__gc = function() local file = io.open('" + path +
+           "', 'a') file:write('" + text + "') file:close() " + then + " end\n";
+}
+
+TEST_F(PreparedStatesTest, TheFinalizersOfAScriptRunFromTheNewestUserdataToTheOldest) {
+    const char* registrationInfo = qixlator::localRegistrations().find(name)->registrationInfo;
+    const std::string path = root.locate("/finalized");
+    const std::string script = finalizerThatWrites(path, "oldest. ", "") +
+                               finalizerThatWrites(path, "middle, ", "error('x')") +
+                               finalizerThatWrites(path, "newest, ", "string.rep('x', 100000)");
+    const std::string read = "return io.open('" + path + "'):read('*a')";
+    // What a script removes from the registry is needed to run only the finalizers.
+    const std::string remove =
+        "for key in pairs(debug.getregistry()) do if type(key) == 'userdata' then "
+        "debug.getregistry()[key] = nil end end collectgarbage()\n";
+    for (const LuaRuntime runtime : {LuaRuntime::Plain, LuaRuntime::Fast, LuaRuntime::Prepared}) {
+        for (const std::string& before : {std::string(), remove}) {
+            runOnce(("os.remove('" + path + "')").c_str());
+            XlatorInterface* xlator = createAs(runtime, registrationInfo);
+            EXPECT_EQ(run(xlator, (before + script).c_str()), "");
+            xlator->destroy(xlator);
+            EXPECT_EQ(runOnce(read.c_str()), "newest, middle, oldest. ");
+        }
+    }
 }
 
 TEST_F(PreparedStatesTest, FilesThatAScriptLeavesOpenAreClosed) {
