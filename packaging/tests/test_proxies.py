@@ -22,7 +22,8 @@ client() {
   client lab clients; client stranger strangers; } >/dev/null 2>&1
 """
 
-# Both chassis, and call NAME OPTIONS...: prints the body and the status of a request to rack.example.
+# Both chassis, and call NAME OPTIONS...: prints the status of a request to rack.example and keeps its body.
+# stop_chassis halts the server of the first: connections to it open, and nothing answers.
 CHASSIS = r"""
 cp /usr/share/doc/qitrmc-host/examples/instance.conf /etc/qitrmc-host/rack2.conf
 systemctl start qitrmc-host
@@ -37,6 +38,7 @@ call() {
 }
 post() { call "$@" -d "$BODY"; }
 known='-u lab:secret'
+stop_chassis() { kill -STOP "$(cat /run/qitrmc-host.pid)"; }
 """
 
 NGINX = r"""
@@ -162,12 +164,43 @@ def test_too_many_requests_are_answered_with_429(proxied):
     assert counts["200"] >= 100
 
 
-def test_the_answer_of_an_hour_is_waited_for(proxied):
-    name = {"nginx": "nginx.conf", "haproxy": "haproxy.cfg"}[proxied.name]
-    text = (machine.ROOT / "packaging/proxy" / name).read_text()
-    waits = {"nginx": ["proxy_read_timeout 3700s;"],
-             "haproxy": ["timeout client 3700s", "timeout server 3700s"]}[proxied.name]
-    assert all(wait in text for wait in waits)
+def test_more_than_64_connections_from_one_address_are_answered_with_429(proxied):
+    """All open connections wait for the chassis until their client gives up."""
+    counts = dict(line.split()[::-1] for line in proxied("""
+      stop_chassis
+      printf 'url = "https://rack.example/rack1/qitrmc/Call"\\noutput = /dev/null\\n%.0s' $(seq 70) >/tmp/urls
+      { curl -sk --parallel-immediate -Z --parallel-max 70 --max-time 8 --resolve '*:443:127.0.0.1' $known \\
+          -d "$BODY" -w '%{http_code}\\n' -K /tmp/urls || true; } | sort | uniq -c
+    """))  # noqa: E501
+    assert counts == {"000": "64", "429": "6"}
+
+
+def test_names_that_are_not_configured_are_refused(proxied):
+    answers = proxied("post other.example/rack1/qitrmc/Call $known")
+    assert answers == [{"nginx": "000", "haproxy": "421"}[proxied.name]]
+
+
+def test_a_body_of_unknown_length_does_not_pass_the_limit(proxied):
+    answers = proxied("""
+      head -c 16777217 /dev/zero | tr '\\0' ' ' >/tmp/more
+      call rack.example/rack1/qitrmc/Call $known -H Expect: -H 'Transfer-Encoding: chunked' --data-binary @/tmp/more
+    """)  # noqa: E501
+    assert answers == [{"nginx": "413", "haproxy": "411"}[proxied.name]]
+
+
+def test_an_answer_is_waited_for_longer_than_an_hour_and_then_504_is_sent(proxied):
+    """With a second in place of the 3700 of the example."""
+    restart = {"nginx": "nginx -s stop; while [ -e /run/nginx.pid ]; do :; done; nginx",
+               "haproxy": "kill $(pidof haproxy); while pidof haproxy; do :; done; haproxy -D -f $file"}
+    file = {"nginx": "/etc/nginx/conf.d/qitrmc.conf", "haproxy": "/etc/haproxy/haproxy.cfg"}[proxied.name]
+    assert proxied(f"""
+      file={file}
+      sed -i 's/3700s/1s/' $file
+      {restart[proxied.name]}
+      wait_for --resolve '*:443:127.0.0.1' https://rack.example/
+      stop_chassis
+      post rack.example/rack1/qitrmc/Call $known
+    """) == ["504"]
 
 
 def test_the_check_notices_what_is_missing(proxied):
@@ -178,11 +211,7 @@ def test_the_check_notices_what_is_missing(proxied):
       mv /usr/local/qinstal /usr/local/away
       check || true
       mv /usr/local/away /usr/local/qinstal
-      for process in /proc/[0-9]*; do
-        if tr '\\0' ' ' <$process/cmdline | grep -q '^/usr/bin/qitrmc-host.*127.0.0.1:8080'; then
-          kill -STOP ${process#/proc/}
-        fi
-      done
+      stop_chassis
       check || true
     """)
     assert answers == ["all is well",
@@ -202,3 +231,27 @@ def test_haproxy_takes_out_a_chassis_without_explanations(proxied):
       until [ "$(post rack.example/rack1/qitrmc/Call $known)" = 200 ]; do :; done
       echo back
     """) == ["200", "back"]
+
+
+def test_haproxy_takes_out_a_chassis_that_does_not_answer(proxied):
+    if proxied.name != "haproxy":
+        pytest.skip("nginx does not look at the answers of checks")
+    assert proxied("""
+      post rack.example/rack1/qitrmc/Call $known
+      stop_chassis
+      until [ "$(post rack.example/rack1/qitrmc/Call $known --max-time 1)" = 503 ]; do :; done
+      post rack.example/rack2/qitrmc/Call $known
+    """) == ["200", "200"]
+
+
+def test_haproxy_takes_out_a_chassis_while_a_reservation_waits(proxied):
+    """The check needs a session too. The request that waits is not cut off."""
+    if proxied.name != "haproxy":
+        pytest.skip("nginx does not look at the answers of checks")
+    assert proxied("""
+      BODY='{"jsonrpc":"2.0","id":1,"method":"initializeSession","params":{"devices":["Mod1"],"reservation_timeout":3600}}'
+      post rack.example/rack1/qitrmc/Call $known
+      curl -sk --resolve '*:443:127.0.0.1' https://rack.example/rack1/qitrmc/Call $known -d "$BODY" >/tmp/waiting &
+      until [ "$(post rack.example/rack1/qitrmc/Call $known --max-time 1)" = 503 ]; do :; done
+      kill -0 $! && wc -c </tmp/waiting
+    """) == ["200", "0"]  # noqa: E501
