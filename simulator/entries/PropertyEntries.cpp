@@ -7,7 +7,8 @@ using namespace simulator;
 
 namespace {
 
-struct SystemProperty {
+struct OwnProperty {
+    Category category;
     nQITRMCAPI100_Session session;
     const char* name;
 
@@ -16,28 +17,11 @@ struct SystemProperty {
     }
     ReadValue read(Simulator& simulator, DataType type) const {
         return PropertyAccessor(simulator, simulator.sessions.get(session))
-            .readSystem(required(name, "property"), type);
+            .readIn(category, required(name, "property"), type);
     }
     void write(Simulator& simulator, DataType type, const Elements& values) const {
         PropertyAccessor(simulator, simulator.sessions.get(session))
-            .writeSystem(required(name, "property"), type, values);
-    }
-};
-
-struct SessionProperty {
-    nQITRMCAPI100_Session session;
-    const char* name;
-
-    Call describe(const char* function) const {
-        return Call(function).session(session).in("property", name);
-    }
-    ReadValue read(Simulator& simulator, DataType type) const {
-        return PropertyAccessor(simulator, simulator.sessions.get(session))
-            .readSession(required(name, "property"), type);
-    }
-    void write(Simulator& simulator, DataType type, const Elements& values) const {
-        PropertyAccessor(simulator, simulator.sessions.get(session))
-            .writeSession(required(name, "property"), type, values);
+            .writeIn(category, required(name, "property"), type, values);
     }
 };
 
@@ -45,53 +29,53 @@ struct SessionProperty {
 
 void nQITRMCAPI100_getSystemPropertyBool(nQITRMCAPI100_Session session, const char* property,
                                          std::uint8_t* value, qierr_Status* status) {
-    getScalar(__func__, SystemProperty{session, property}, value, status);
+    getScalar(__func__, OwnProperty{Category::System, session, property}, value, status);
 }
 
 void nQITRMCAPI100_getSystemPropertyDouble(nQITRMCAPI100_Session session, const char* property,
                                            double* value, qierr_Status* status) {
-    getScalar(__func__, SystemProperty{session, property}, value, status);
+    getScalar(__func__, OwnProperty{Category::System, session, property}, value, status);
 }
 
 void nQITRMCAPI100_getSystemPropertyUInt64(nQITRMCAPI100_Session session, const char* property,
                                            std::uint64_t* value, qierr_Status* status) {
-    getScalar(__func__, SystemProperty{session, property}, value, status);
+    getScalar(__func__, OwnProperty{Category::System, session, property}, value, status);
 }
 
 void nQITRMCAPI100_getSystemPropertyStringArray(nQITRMCAPI100_Session session, const char* property,
                                                 char*** array, std::uint32_t* count,
                                                 qierr_Status* status) {
-    getArray(__func__, SystemProperty{session, property}, array, count, status);
+    getArray(__func__, OwnProperty{Category::System, session, property}, array, count, status);
 }
 
 void nQITRMCAPI100_setSystemPropertyBool(nQITRMCAPI100_Session session, const char* property,
                                          std::uint8_t value, qierr_Status* status) {
-    setScalar(__func__, SystemProperty{session, property}, value, status);
+    setScalar(__func__, OwnProperty{Category::System, session, property}, value, status);
 }
 
 void nQITRMCAPI100_setSystemPropertyDouble(nQITRMCAPI100_Session session, const char* property,
                                            double value, qierr_Status* status) {
-    setScalar(__func__, SystemProperty{session, property}, value, status);
+    setScalar(__func__, OwnProperty{Category::System, session, property}, value, status);
 }
 
 void nQITRMCAPI100_getSessionPropertyDouble(nQITRMCAPI100_Session session, const char* property,
                                             double* value, qierr_Status* status) {
-    getScalar(__func__, SessionProperty{session, property}, value, status);
+    getScalar(__func__, OwnProperty{Category::Session, session, property}, value, status);
 }
 
 void nQITRMCAPI100_getSessionPropertyStringArray(nQITRMCAPI100_Session session,
                                                  const char* property, char*** array,
                                                  std::uint32_t* count, qierr_Status* status) {
-    getArray(__func__, SessionProperty{session, property}, array, count, status);
+    getArray(__func__, OwnProperty{Category::Session, session, property}, array, count, status);
 }
 
 void nQITRMCAPI100_setSessionPropertyDouble(nQITRMCAPI100_Session session, const char* property,
                                             double value, qierr_Status* status) {
-    setScalar(__func__, SessionProperty{session, property}, value, status);
+    setScalar(__func__, OwnProperty{Category::Session, session, property}, value, status);
 }
 
 void nQITRMCAPI100_setSessionPropertyStringArray(nQITRMCAPI100_Session session,
                                                  const char* property, const char* const* array,
                                                  std::uint32_t count, qierr_Status* status) {
-    setArray(__func__, SessionProperty{session, property}, array, count, status);
+    setArray(__func__, OwnProperty{Category::Session, session, property}, array, count, status);
 }

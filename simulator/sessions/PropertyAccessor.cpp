@@ -173,12 +173,8 @@ Elements PropertyAccessor::readAll(std::vector<Place> places, DataType type) {
     return all;
 }
 
-ReadValue PropertyAccessor::readSystem(std::string_view name, DataType type) {
-    return readOne(findIn(Category::System, HashedName(name)), type);
-}
-
-ReadValue PropertyAccessor::readSession(std::string_view name, DataType type) {
-    return readOne(findIn(Category::Session, HashedName(name)), type);
+ReadValue PropertyAccessor::readIn(Category category, std::string_view name, DataType type) {
+    return readOne(findIn(category, HashedName(name)), type);
 }
 
 ReadValue PropertyAccessor::read(std::string_view resources, std::string_view name, DataType type) {
@@ -254,12 +250,9 @@ void PropertyAccessor::noteChange(const Resource* resource) noexcept {
     }
 }
 
-void PropertyAccessor::writeSystem(std::string_view name, DataType type, const Elements& values) {
-    writeAll({findIn(Category::System, HashedName(name))}, type, values);
-}
-
-void PropertyAccessor::writeSession(std::string_view name, DataType type, const Elements& values) {
-    writeAll({findIn(Category::Session, HashedName(name))}, type, values);
+void PropertyAccessor::writeIn(Category category, std::string_view name, DataType type,
+                               const Elements& values) {
+    writeAll({findIn(category, HashedName(name))}, type, values);
 }
 
 void PropertyAccessor::write(std::string_view resources, std::string_view name, DataType type,

@@ -18,14 +18,13 @@ class PropertyAccessor {
     PropertyAccessor(Simulator& simulator, Session& session)
         : simulator(simulator), session(session) {}
 
-    ReadValue readSystem(std::string_view name, DataType type);
-    ReadValue readSession(std::string_view name, DataType type);
+    // category: that of the system or of the session.
+    ReadValue readIn(Category category, std::string_view name, DataType type);
     // A name that is the session's is read there, whatever the resources are.
     ReadValue read(std::string_view resources, std::string_view name, DataType type);
 
     // Write all values or none. What needs a commit waits for it.
-    void writeSystem(std::string_view name, DataType type, const Elements& values);
-    void writeSession(std::string_view name, DataType type, const Elements& values);
+    void writeIn(Category category, std::string_view name, DataType type, const Elements& values);
     void write(std::string_view resources, std::string_view name, DataType type,
                const Elements& values);
 
