@@ -18,7 +18,8 @@
  *     "$DefaultDevices", "$DefaultNVMEMAreas", "$DefaultPhysChans" and "$ReservedDevices" are
  *     replaced by the session's own lists.
  *   - Texts and arrays that are returned belong to the caller, who frees them with
- *     nQITRMCAPI100_freeString, nQITRMCAPI100_freeArray or nQITRMCAPI100_freeStringArray.
+ *     nQITRMCAPI100_freeString, nQITRMCAPI100_freeArray or nQITRMCAPI100_freeStringArray. Arrays of
+ *     texts may only be read until then: several callers may have the same one.
  *   - Booleans are one byte: 0 false, anything else true.
  *   - Times are in seconds.
  */

@@ -59,7 +59,10 @@ void lendList(const std::vector<Text>& list, char*** array, std::uint32_t* count
 }
 
 inline void lendArray(const ReadValue& read, char*** array, std::uint32_t* count) {
-    if (const ReadValue::Names* names = read.names()) {
+    if (const SharedTexts* shared = read.sharedNames()) {
+        *array = shared->lend();
+        *count = shared->count();
+    } else if (const ReadValue::Names* names = read.names()) {
         lendList(*names, array, count);
     } else {
         lendList(std::get<List<std::string>>(read.elements()), array, count);

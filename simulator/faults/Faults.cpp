@@ -149,7 +149,7 @@ void Faults::change(Device& device, Absence absence) {
     if (absence == Absence::Removed || device.absence == Absence::Removed) {
         ++simulator.chassis->changes;
     }
-    device.absence = absence;
+    simulator.chassis->setAbsence(device, absence);
     const std::int64_t now = simulator.clock.now();
     device.forEachResource(
         [&](const Resource& resource) { simulator.motions.noteChange(resource, now); });

@@ -1,6 +1,5 @@
 #include "lending/Ledger.h"
 
-#include <algorithm>
 #include <cstdint>
 #include <new>
 
@@ -23,33 +22,55 @@ std::size_t Ledger::partOf(const void* address) noexcept {
 void Ledger::lend(const void* address, Item item) {
     Part& part = parts[partOf(address)];
     const std::lock_guard<std::mutex> lock(part.mutex);
-    part.items.emplace(address, item);
+    ++part.uses.try_emplace(address, Use{item}).first->second.loans;
 }
 
-bool Ledger::takeBack(const void* address, Item item) noexcept {
+Ledger::Return Ledger::takeBack(const void* address, Item item) noexcept {
     Part& part = parts[partOf(address)];
     const std::lock_guard<std::mutex> lock(part.mutex);
-    const auto found = part.items.find(address);
-    if (found == part.items.end() || found->second != item) {
-        return false;
+    const auto found = part.uses.find(address);
+    if (found == part.uses.end() || found->second.item != item || found->second.loans == 0) {
+        return Return::NotLent;
     }
-    part.items.erase(found);
-    return true;
+    --found->second.loans;
+    return part.removeUnused(found) ? Return::Unused : Return::StillUsed;
+}
+
+void Ledger::keep(const void* address) noexcept {
+    Part& part = parts[partOf(address)];
+    const std::lock_guard<std::mutex> lock(part.mutex);
+    part.uses.find(address)->second.isKept = true;
+}
+
+bool Ledger::release(const void* address) noexcept {
+    Part& part = parts[partOf(address)];
+    const std::lock_guard<std::mutex> lock(part.mutex);
+    const auto found = part.uses.find(address);
+    found->second.isKept = false;
+    return part.removeUnused(found);
+}
+
+bool Ledger::Part::removeUnused(std::unordered_map<const void*, Use>::iterator place) noexcept {
+    const bool isUnused = !place->second.isKept && place->second.loans == 0;
+    if (isUnused) {
+        uses.erase(place);
+    }
+    return isUnused;
 }
 
 bool Ledger::has(const void* address) const noexcept {
     const Part& part = parts[partOf(address)];
     const std::lock_guard<std::mutex> lock(part.mutex);
-    return part.items.count(address) != 0;
+    return part.uses.count(address) != 0;
 }
 
 std::size_t Ledger::count(Item item) const noexcept {
     std::size_t count = 0;
     for (const Part& part : parts) {
         const std::lock_guard<std::mutex> lock(part.mutex);
-        count += static_cast<std::size_t>(
-            std::count_if(part.items.begin(), part.items.end(),
-                          [&](const auto& entry) { return entry.second == item; }));
+        for (const auto& [address, use] : part.uses) {
+            count += use.item == item ? use.loans : 0;
+        }
     }
     return count;
 }

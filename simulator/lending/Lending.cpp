@@ -16,6 +16,15 @@ void reportMisuse(const char* function, const char* item) noexcept {
                  function, item);
 }
 
+// Takes back memory, and frees it after its last use. Returns whether it was lent as such an item.
+bool takeBack(void* memory, Ledger::Item item) noexcept {
+    const Ledger::Return outcome = Ledger::instance().takeBack(memory, item);
+    if (outcome == Ledger::Return::Unused) {
+        std::free(memory);
+    }
+    return outcome != Ledger::Return::NotLent;
+}
+
 }  // namespace
 
 void* lendMemory(std::size_t size, Ledger::Item item) {
@@ -42,22 +51,19 @@ void takeBackText(char* text) noexcept {
     if (text == nullptr) {
         return;
     }
-    if (Ledger::instance().takeBack(text, Ledger::Item::Text)) {
-        std::free(text);
-    } else {
+    if (!takeBack(text, Ledger::Item::Text)) {
         reportMisuse("freeString", "a text");
     }
 }
 
 void takeBackNumbers(void* array) noexcept {
-    Ledger& ledger = Ledger::instance();
-    if (array == nullptr) {
+    if (array == nullptr || takeBack(array, Ledger::Item::Numbers)) {
         return;
     }
-    if (ledger.takeBack(array, Ledger::Item::Numbers) || !ledger.has(array)) {
-        std::free(array);
-    } else {
+    if (Ledger::instance().has(array)) {
         reportMisuse("freeArray", "an array of numbers");
+    } else {
+        std::free(array);
     }
 }
 
@@ -65,9 +71,7 @@ void takeBackTexts(char** array) noexcept {
     if (array == nullptr) {
         return;
     }
-    if (Ledger::instance().takeBack(array, Ledger::Item::Texts)) {
-        std::free(array);
-    } else {
+    if (!takeBack(array, Ledger::Item::Texts)) {
         reportMisuse("freeStringArray", "an array of texts");
     }
 }

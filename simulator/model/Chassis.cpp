@@ -58,6 +58,7 @@ Device& Chassis::addDevice(const std::string& name) {
     all.push_back(std::make_unique<Device>(name, all.size()));
     Device& added = *all.back();
     byName.emplace(HashedName(added.foldedName), &added);
+    namesOfPresent.discard();
     return added;
 }
 
@@ -86,10 +87,12 @@ void Chassis::rename(Device& device, const std::string& newName,
     device.foldedName.swap(folded);
     entry.key() = HashedName(device.foldedName);
     byName.insert(std::move(entry));
+    namesOfPresent.discard();
     ++changes;
 }
 
 void Chassis::rename(const std::map<Device*, std::string>& names) {
+    namesOfPresent.discard();
     for (const auto& [device, name] : names) {
         device->name = name;
         device->foldedName = foldName(name);
@@ -98,6 +101,11 @@ void Chassis::rename(const std::map<Device*, std::string>& names) {
     for (const auto& device : all) {
         byName.emplace(HashedName(device->foldedName), device.get());
     }
+}
+
+void Chassis::setAbsence(Device& device, Absence absence) noexcept {
+    device.absence = absence;
+    namesOfPresent.discard();
 }
 
 Device* Chassis::findDevice(std::string_view name) const {

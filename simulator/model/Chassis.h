@@ -8,6 +8,7 @@
 #include <string_view>
 #include <vector>
 
+#include "lending/SharedTexts.h"
 #include "model/Commands.h"
 #include "model/NameIndex.h"
 #include "model/NameText.h"
@@ -79,7 +80,8 @@ struct Device : Resource {
     // How long it takes to connect, and whether the device answers then.
     double connectSeconds = 0.0;
     bool reachable = true;
-    // While this is not none, calls that name the device or its parts are refused.
+    // While this is not none, calls that name the device or its parts are refused. Set by the
+    // Chassis.
     Absence absence = Absence::None;
 
     // Calls visit(Resource&) for the device itself and all its parts.
@@ -102,6 +104,19 @@ struct Device : Resource {
     void dropAllPending() noexcept;
 };
 
+// The names of the devices that are not removed.
+template <typename Devices>
+std::vector<std::string_view> presentNames(const Devices& devices) {
+    std::vector<std::string_view> names;
+    names.reserve(devices.size());
+    for (const auto& device : devices) {
+        if (device->absence != Absence::Removed) {
+            names.push_back(device->name);
+        }
+    }
+    return names;
+}
+
 // Refuses with connectionLost or deviceRemoved, unless `absence` is none.
 void expectPresent(const Device& device, Absence absence);
 
@@ -119,6 +134,8 @@ class Chassis {
     // Gives devices names, after which no two have the same. Does not count as a change.
     void rename(const std::map<Device*, std::string>& names);
 
+    void setAbsence(Device& device, Absence absence) noexcept;
+
     // Return null when there is no such resource.
     Device* findDevice(std::string_view name) const;
     Resource* findPart(const Device& device, std::string_view name) const;
@@ -132,6 +149,10 @@ class Chassis {
     NvmemArea& nvmemArea(std::string_view fullName) const;
 
     const std::vector<std::unique_ptr<Device>>& devices() const { return all; }
+    // The names of the devices that are not removed.
+    const SharedTexts& deviceNames() const {
+        return namesOfPresent.get([&] { return presentNames(all); });
+    }
 
     // The handle of the first session that is opened.
     std::uint32_t firstSessionHandle = 1;
@@ -148,6 +169,7 @@ class Chassis {
     std::vector<std::unique_ptr<Device>> all;
     // By their folded names.
     NameIndex<Device*> byName;
+    TextsOnDemand namesOfPresent;
 };
 
 }  // namespace simulator

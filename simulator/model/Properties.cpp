@@ -128,8 +128,18 @@ void PropertyStore::dropAllPending() noexcept {
 void Catalogue::add(Category category, const DefinitionPointer& definition) {
     Part& part = parts[static_cast<std::size_t>(category)];
     part.definitions.push_back(definition);
-    std::get<List<std::string>>(part.names).push_back(definition->name);
+    part.names.discard();
     part.byName.emplace(HashedName(definition->name), definition);
+}
+
+const SharedTexts& Catalogue::names(Category category) const {
+    return part(category).names.get([&] {
+        std::vector<std::string_view> names;
+        for (const DefinitionPointer& definition : definitions(category)) {
+            names.push_back(definition->name);
+        }
+        return names;
+    });
 }
 
 const DefinitionPointer& Catalogue::find(Category category, const HashedName& name) const {

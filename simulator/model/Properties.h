@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "Api.h"
+#include "lending/SharedTexts.h"
 #include "model/NameIndex.h"
 #include "model/Values.h"
 
@@ -140,7 +141,7 @@ class Catalogue {
         return part(category).definitions;
     }
     // The names of the definitions.
-    const Elements& names(Category category) const { return part(category).names; }
+    const SharedTexts& names(Category category) const;
     // Null when there is no such property.
     const DefinitionPointer& find(Category category, const HashedName& name) const;
     const DefinitionPointer& find(Category category, std::string_view name) const {
@@ -151,7 +152,7 @@ class Catalogue {
     struct Part {
         // In the order of addition, and to be found by name.
         std::vector<DefinitionPointer> definitions;
-        Elements names = List<std::string>();
+        TextsOnDemand names;
         NameIndex<DefinitionPointer> byName;
     };
 

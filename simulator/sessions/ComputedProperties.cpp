@@ -45,19 +45,6 @@ Value deviceNames(const std::vector<Device*>& devices) {
     return ReadValue(std::move(names));
 }
 
-// Removed devices are not in the lists of the system.
-template <typename Devices>
-Value presentNames(const Devices& devices) {
-    ReadValue::Names names;
-    names.reserve(devices.size());
-    for (const auto& device : devices) {
-        if (device->absence != Absence::Removed) {
-            names.push_back(device->name);
-        }
-    }
-    return ReadValue(std::move(names));
-}
-
 template <Category category>
 Value propertyNames(const Subject& subject) {
     return ReadValue(subject.simulator.chassis->catalogue.names(category));
@@ -85,7 +72,7 @@ Value modules(const Subject& subject) {
     if (subject.device().category != chassisCategory || isModule(subject.device())) {
         return std::nullopt;
     }
-    return presentNames(subject.device().modules);
+    return ReadValue(presentNames(subject.device().modules));
 }
 
 Value slotNumber(const Subject& subject) {
@@ -98,7 +85,7 @@ Value slotNumber(const Subject& subject) {
 constexpr Entry entries[] = {
     {Category::System, "Sys.Devices",
      [](const Subject& subject) -> Value {
-         return presentNames(subject.simulator.chassis->devices());
+         return ReadValue(subject.simulator.chassis->deviceNames());
      }},
     {Category::System, "Sys.ConfigChangeCount",
      [](const Subject& subject) -> Value {

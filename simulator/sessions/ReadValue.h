@@ -5,6 +5,7 @@
 #include <variant>
 #include <vector>
 
+#include "lending/SharedTexts.h"
 #include "model/Values.h"
 
 namespace simulator {
@@ -19,9 +20,14 @@ class ReadValue {
     explicit ReadValue(const Elements& stored) : value(&stored) {}
     explicit ReadValue(Elements&& computed) : value(std::move(computed)) {}
     explicit ReadValue(Names&& names) : value(std::move(names)) {}
+    explicit ReadValue(const SharedTexts& names) : value(&names) {}
 
-    // Null unless the value is a list of names.
+    // Null unless the value is such a list of names.
     const Names* names() const { return std::get_if<Names>(&value); }
+    const SharedTexts* sharedNames() const {
+        const auto* const* shared = std::get_if<const SharedTexts*>(&value);
+        return shared != nullptr ? *shared : nullptr;
+    }
     // The value unless it is a list of names.
     const Elements& elements() const {
         const auto* const* stored = std::get_if<const Elements*>(&value);
@@ -29,7 +35,7 @@ class ReadValue {
     }
 
   private:
-    std::variant<const Elements*, Elements, Names> value;
+    std::variant<const Elements*, Elements, Names, const SharedTexts*> value;
 };
 
 }  // namespace simulator

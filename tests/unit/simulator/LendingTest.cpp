@@ -118,6 +118,114 @@ TEST(GivingBack, FreeingThroughTheWrongFunctionIsReportedAndHasNoEffect) {
     EXPECT_EQ(outstanding().texts, before.texts - 1);
 }
 
+// The list of all devices, as the driver lends it.
+struct DeviceList {
+    explicit DeviceList(Handle session) {
+        Status status;
+        nQITRMCAPI100_getSystemPropertyStringArray(session, "Sys.Devices", &array, &count, &status);
+        EXPECT_EQ(status.code, 0) << status.text();
+    }
+    Names names() const { return Names(array, array + count); }
+    void giveBack() const { nQITRMCAPI100_freeStringArray(array, count); }
+
+    char** array = nullptr;
+    std::uint32_t count = 0;
+};
+
+void rename(Handle session, const char* device, const char* name) {
+    Status status;
+    nQITRMCAPI100_renameDevice(session, device, name, &status);
+    EXPECT_EQ(status.code, 0) << status.text();
+}
+
+const Names builtIn{"Bench", "Mod1", "Mod2", "Mod4", "Mod5"};
+
+// A copy for each call would take time in proportion to the devices.
+TEST(SharedLists, TheListOfDevicesIsLentToAllCallersWithoutACopy) {
+    const Session session;
+    const std::uint32_t before = outstanding().textArrays;
+    const DeviceList first(session);
+    const DeviceList second(session);
+    EXPECT_EQ(first.array, second.array);
+    EXPECT_EQ(outstanding().textArrays, before + 2);
+    first.giveBack();
+    EXPECT_EQ(outstanding().textArrays, before + 1);
+    EXPECT_EQ(second.names(), builtIn);
+    second.giveBack();
+    EXPECT_EQ(outstanding().textArrays, before);
+    EXPECT_EQ(DeviceList(session).array, first.array);
+    first.giveBack();
+}
+
+TEST(SharedLists, FreeingOneMoreOftenThanItIsLentIsReportedAndHarmless) {
+    const Session session;
+    const DeviceList list(session);
+    list.giveBack();
+    testing::internal::CaptureStderr();
+    list.giveBack();
+    EXPECT_EQ(testing::internal::GetCapturedStderr(),
+              "qitrmcapi: nQITRMCAPI100_freeStringArray was given what is not an array of texts "
+              "that is lent; it was left alone. Give each thing back once, through the function of "
+              "its kind.\n");
+    const DeviceList next(session);
+    EXPECT_EQ(next.names(), builtIn);
+    next.giveBack();
+}
+
+TEST(SharedLists, FreeingOneThroughTheWrongFunctionHasNoEffect) {
+    const Session session;
+    const DeviceList list(session);
+    const std::uint32_t before = outstanding().textArrays;
+    testing::internal::CaptureStderr();
+    nQITRMCAPI100_freeArray(list.array);
+    nQITRMCAPI100_freeString(reinterpret_cast<char*>(list.array));
+    EXPECT_NE(testing::internal::GetCapturedStderr().find("freeArray was given"),
+              std::string::npos);
+    EXPECT_EQ(outstanding().textArrays, before);
+    EXPECT_EQ(list.names(), builtIn);
+    list.giveBack();
+}
+
+TEST(SharedLists, AListThatIsLentOutlastsAChangeOfTheDevices) {
+    const Session session("Mod2");
+    const std::uint32_t before = outstanding().textArrays;
+    const DeviceList first(session);
+    const DeviceList second(session);
+    rename(session, "Mod2", "Renamed");
+    const DeviceList later(session);
+    EXPECT_EQ(later.names(), (Names{"Bench", "Mod1", "Renamed", "Mod4", "Mod5"}));
+    EXPECT_EQ(first.names(), builtIn);
+    first.giveBack();
+    EXPECT_EQ(second.names(), builtIn);
+    second.giveBack();
+    later.giveBack();
+    rename(session, "Renamed", "Mod2");
+    const DeviceList last(session);
+    EXPECT_EQ(last.names(), builtIn);
+    last.giveBack();
+    EXPECT_EQ(outstanding().textArrays, before);
+}
+
+TEST(SharedLists, TheListsOfPropertiesAreLentWithoutACopy) {
+    const Session session;
+    for (const char* list :
+         {"Sys.SystemProperties", "Sys.SessionProperties", "Sys.DeviceProperties",
+          "Sys.PhysChanProperties", "Sys.NVMEMAreaProperties"}) {
+        Status status;
+        char** arrays[2] = {};
+        std::uint32_t counts[2] = {};
+        for (int i = 0; i < 2; ++i) {
+            nQITRMCAPI100_getSystemPropertyStringArray(session, list, &arrays[i], &counts[i],
+                                                       &status);
+        }
+        EXPECT_EQ(arrays[0], arrays[1]) << list;
+        EXPECT_EQ(counts[0], counts[1]) << list;
+        EXPECT_GT(counts[0], 0u) << list;
+        nQITRMCAPI100_freeStringArray(arrays[0], counts[0]);
+        nQITRMCAPI100_freeStringArray(arrays[1], counts[1]);
+    }
+}
+
 TEST(Start, WritesASummaryOfTheChassisAndUsesNoSessionNumber) {
     Handle first = 0;
     {

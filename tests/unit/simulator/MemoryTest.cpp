@@ -53,6 +53,34 @@ TEST(MemoryTest, ReadingATextOfSeveralDevices) {
               0);
 }
 
+TEST(MemoryTest, MakingTheListOfDevicesAfterAChange) {
+    Session session("Mod2");
+    const char* names[] = {"Mod2", "Renamed"};
+    int current = 0;
+    const auto rename = [&] {
+        Status status;
+        nQITRMCAPI100_renameDevice(session, names[current], names[1 - current], &status);
+        EXPECT_EQ(status.code, 0) << status.text();
+        current = 1 - current;
+    };
+    EXPECT_GT(starve(0,
+                     [&](qierr_Status* status) {
+                         const long left = allowed.exchange(-1);
+                         rename();
+                         allowed = left;
+                         char** array = nullptr;
+                         std::uint32_t count = 0;
+                         nQITRMCAPI100_getSystemPropertyStringArray(session, "Sys.Devices", &array,
+                                                                    &count, status);
+                         EXPECT_EQ(count, status->code == 0 ? 5u : 0u);
+                         nQITRMCAPI100_freeStringArray(array, count);
+                     }),
+              0);
+    if (current != 0) {
+        rename();
+    }
+}
+
 TEST(MemoryTest, ListsOfManyDevicesDoNotAccumulateBeforeTheyAreRefused) {
     Session session;
     std::string devices = "Mod1";

@@ -106,4 +106,31 @@ TEST(SharedReadTest, ManyThreadsMayOpenAndClosePropertiesAtOnce) {
     EXPECT_EQ(outstanding().openProperties, before);
 }
 
+// The list of all devices is shared by its readers, and made again after each change.
+TEST(SharedReadTest, ListsStayWholeWhileADeviceIsRenamed) {
+    const std::uint32_t before = outstanding().textArrays;
+    std::atomic<bool> stopped{false};
+    const auto read = [&] {
+        Session session;
+        while (!stopped) {
+            const Names names = session.systemList("Sys.Devices");
+            ASSERT_EQ(names.size(), 5u);
+            EXPECT_TRUE(names[2] == "Mod2" || names[2] == "Renamed") << names[2];
+        }
+    };
+    std::thread first(read);
+    std::thread second(read);
+    Session session("Mod2");
+    for (int i = 0; i < 200; ++i) {
+        Status status;
+        nQITRMCAPI100_renameDevice(session, i % 2 == 0 ? "Mod2" : "Renamed",
+                                   i % 2 == 0 ? "Renamed" : "Mod2", &status);
+        EXPECT_EQ(status.code, 0) << status.text();
+    }
+    stopped = true;
+    first.join();
+    second.join();
+    EXPECT_EQ(outstanding().textArrays, before);
+}
+
 }  // namespace
