@@ -1,6 +1,7 @@
 #include "qitrmcwebsvc/RequestResource.h"
 
 #include <algorithm>
+#include <cstring>
 #include <optional>
 #include <utility>
 
@@ -45,14 +46,20 @@ class KnownNames {
                                                     names.outArray(), names.outCount(), &status);
     }
 
-    // Returns false for every name if the list could not be read.
+    // Returns false for every name if the list could not be read. Most names are spelled like the
+    // driver's, and comparing bytes takes a fraction of the time in a list of thousands.
     bool contains(const std::string& name) const {
-        return status.code >= 0 && std::any_of(names.begin(), names.end(), [&](const char* known) {
-                   return equalFolded(name, known);
-               });
+        return status.code >= 0 &&
+               (any([&](const char* known) { return std::strcmp(known, name.c_str()) == 0; }) ||
+                any([&](const char* known) { return equalFolded(name, known); }));
     }
 
   private:
+    template <typename Condition>
+    bool any(Condition condition) const {
+        return std::any_of(names.begin(), names.end(), condition);
+    }
+
     qierr::Status status;
     DriverStringArray names;
 };
