@@ -1,6 +1,7 @@
-// Measures calls of the simulated driver, without the service: qitrmc-bench-driver DEVICES [options
-// of the benchmark library]. The chassis has as many devices as the first argument says, each with
-// two channels; the library reads it once, so another number needs another process.
+// Measures calls of the simulated driver, and a whole request of the service with that driver:
+// qitrmc-bench-driver DEVICES [options of the benchmark library]. The chassis has as many devices
+// as the first argument says, each with two channels; the library reads it once, so another number
+// needs another process.
 
 #include <benchmark/benchmark.h>
 #include <unistd.h>
@@ -11,6 +12,7 @@
 #include <fstream>
 #include <string>
 
+#include "Service.h"
 #include "qierr_status.h"
 #include "qitrmcapi.h"
 
@@ -136,6 +138,19 @@ void openSession(benchmark::State& state) {
     expectSuccess(state, status);
 }
 
+void getProperty(benchmark::State& state) {
+    Service service;
+    const std::string request = Service::request(
+        "getProperty", R"("session_id":")" + service.openSession() + R"(","devices":[")" + device +
+                           R"("],"property":"Level.Set")");
+    if (!isSuccess(service.answer(request))) {
+        state.SkipWithError(service.answer(request).c_str());
+    }
+    for (auto _ : state) {
+        benchmark::DoNotOptimize(service.answer(request));
+    }
+}
+
 void registerBenchmarks(const std::string& devices) {
     const auto add = [&](const char* name, auto&&... arguments) {
         return benchmark::RegisterBenchmark(("driver/" + devices + "/" + name).c_str(),
@@ -153,6 +168,7 @@ void registerBenchmarks(const std::string& devices) {
     add("readDeviceNames", readNames, "Sys.Devices");
     add("readReservedNames", readReserved);
     add("openAndCloseSession", openSession);
+    add("getProperty", getProperty);
 }
 
 }  // namespace
