@@ -31,8 +31,8 @@ def microseconds(text):
     return float(number) * MICROSECONDS[unit]
 
 
-def load(server, script, body, connections):
-    """One run of wrk. A response other than HTTP 200 ends the measurement."""
+def load(name, server, script, body, connections):
+    """One run of wrk. A response other than HTTP 200 ends the measurement, with the name of the server."""
     before = server.used()
     report = subprocess.run(
         ["wrk", "-t1", f"-c{connections}", f"-d{SECONDS}s", "--latency", "-s", HERE / script,
@@ -40,7 +40,7 @@ def load(server, script, body, connections):
         env={**os.environ, "BODY": body}, check=True, capture_output=True, text=True).stdout
     after = server.used()
     if "Non-2xx" in report or "Socket errors" in report:
-        raise SystemExit(report)
+        raise SystemExit(f"{name}, {connections} connections:\n{report}")
     count = int(re.search(r"(\d+) requests in", report)[1])
     user, system, switches = (late - early for late, early in zip(after, before))
     percentile = dict(re.findall(r"(50|99)%\s+([\d.]+[mu]?s)", report))
@@ -63,7 +63,7 @@ def measure_kinds(kinds):
         runs = {kind: [] for kind in kinds}
         for _ in range(ROUNDS):
             for kind, (server, script, body) in kinds.items():
-                runs[kind].append(load(server, script, body, connections))
+                runs[kind].append(load(kind, server, script, body, connections))
         measured[connections] = {kind: summary(some) for kind, some in runs.items()}
     return measured
 

@@ -3,8 +3,8 @@
 import math
 from xml.sax.saxutils import escape
 
-WIDTH, HEIGHT = 640, 420
-LEFT, RIGHT, TOP, BOTTOM = 70, 210, 20, 50
+WIDTH, HEIGHT = 680, 420
+LEFT, RIGHT, TOP, BOTTOM = 70, 250, 20, 50
 COLOURS = ("#1b6ca8", "#c0392b", "#1e8449", "#7d3c98", "#b9770e", "#34495e", "#a04070", "#117a65",
            "#5d4037")
 
@@ -55,12 +55,25 @@ def axes(across, up, labels):
     yield text(16, middle, labels[1], "middle", f'transform="rotate(-90 16 {middle})"')
 
 
-def series(across, up, points, colour):
+def polyline(places, index):
+    """With the colours used up, the same colours again in dashes."""
+    dashes = ' stroke-dasharray="5 3"' if index >= len(COLOURS) else ""
+    return (f'<polyline fill="none" stroke="{COLOURS[index % len(COLOURS)]}" stroke-width="2"{dashes} '
+            'points="' + " ".join(f"{x},{y}" for x, y in places) + '"/>')
+
+
+def series(across, up, points, index):
     places = [(across.position(x), up.position(y)) for x, y in points]
-    yield (f'<polyline fill="none" stroke="{colour}" stroke-width="2" points="'
-           + " ".join(f"{x},{y}" for x, y in places) + '"/>')
+    yield polyline(places, index)
     for x, y in places:
-        yield f'<circle cx="{x}" cy="{y}" r="3" fill="{colour}"/>'
+        yield f'<circle cx="{x}" cy="{y}" r="3" fill="{COLOURS[index % len(COLOURS)]}"/>'
+
+
+def entry(name, index):
+    """A line's part of the legend."""
+    x, y = WIDTH - RIGHT + 12, TOP + 16 + 20 * index
+    yield polyline([(x, y - 4), (x + 26, y - 4)], index)
+    yield text(x + 34, y, name)
 
 
 def svg(lines, labels):
@@ -72,8 +85,5 @@ def svg(lines, labels):
              'font-family="sans-serif" font-size="12">',
              f'<rect width="{WIDTH}" height="{HEIGHT}" fill="white"/>', *axes(across, up, labels)]
     for index, (name, some) in enumerate(lines.items()):
-        colour = COLOURS[index % len(COLOURS)]
-        parts += series(across, up, some, colour)
-        parts.append(text(WIDTH - RIGHT + 12, TOP + 16 + 20 * index, name, "start",
-                          f'fill="{colour}"'))
+        parts += [*series(across, up, some, index), *entry(name, index)]
     return "\n".join([*parts, "</svg>", ""])

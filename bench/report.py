@@ -1,11 +1,12 @@
 #!/usr/bin/python3
 """Prints the tables of a benchmark run and, as its last lines, the important ratios:
 
-    report.py BENCHMARKS.json SERVICE.json HTTP_GROWTH.json [PICTURES]
+    report.py RESULTS
 
-Draws the growth as SVG pictures into the folder PICTURES. Each file may be missing, for example after
-a run with a filter. Times are medians of processor time, which is least affected by other work on the
-machine.
+RESULTS is the folder with what scripts/bench has measured: benchmarks.json, driver-4.json,
+driver-4000.json, service.json and http-growth.json. Each may be missing, for example after a run with a
+filter. The growth is drawn there as SVG pictures. Times are medians of processor time, which is least
+affected by other work on the machine.
 """
 
 import json
@@ -67,12 +68,41 @@ def report_requests(benchmarks):
         yield f"service to floor: {', '.join(ratios)} (goal for getProperty: at most 2.00)"
 
 
+FEW, MANY = "4", "4000"
+MOST_OF_MANY = 1.1
+
+
+def report_driver(few, many):
+    """Calls of the simulated driver on a chassis of FEW and of MANY devices."""
+    rows = [("calls of the simulated driver", f"{FEW} devices, ns", f"{MANY} devices, ns", "ratio")]
+    for name in few.rows:
+        case = name.removeprefix(f"driver/{FEW}/")
+        if (other := f"driver/{MANY}/{case}") in many.rows:
+            times = few.time(name) * 1e3, many.time(other) * 1e3
+            ratio = times[1] / times[0]
+            rows.append((case, *(f"{time:.0f}" for time in times), f"{ratio:.2f}"))
+            if case == SUBJECT:
+                yield (f"{SUBJECT} with the simulated driver, {MANY} devices to {FEW}: {ratio:.2f} "
+                       f"(goal: at most {MOST_OF_MANY}{missed(ratio <= MOST_OF_MANY)})")
+    if rows[1:]:
+        print_table("The simulated driver, and a whole request with it", rows)
+
+
 def exponent(series):
     """The power of the count with which the time grows, by least squares: 1 linear, 2 quadratic."""
     points = [(math.log(count), math.log(time)) for count, time in series]
     mean_x, mean_y = (sum(axis) / len(points) for axis in zip(*points))
     return (sum((x - mean_x) * (y - mean_y) for x, y in points)
             / sum((x - mean_x) ** 2 for x, _ in points))
+
+
+MOST_EXPONENT = 1.04
+
+
+def steepest(label, exponents):
+    most, case = max(exponents)
+    return (f"{label}, as an exponent: {most:.2f} ({case}; goal: at most {MOST_EXPONENT}"
+            f"{missed(most < MOST_EXPONENT + 0.005)})")
 
 
 def report_growth(benchmarks):
@@ -85,7 +115,7 @@ def report_growth(benchmarks):
                      f"{exponents[-1][0]:.2f}", benchmarks.fits.get(f"growth/{case}", "")))
     if exponents:
         print_table("Growing requests: exponent 1 is linear, 2 quadratic", rows)
-        yield "steepest growth, as an exponent: {:.2f} ({})".format(*max(exponents))
+        yield steepest("steepest growth", exponents)
 
 
 def report_http_growth(series_of):
@@ -98,7 +128,7 @@ def report_http_growth(series_of):
                      f"{exponents[-1][0]:.2f}"))
     if exponents:
         print_table("Growing requests over HTTP, processor time of the server", rows)
-        yield "steepest growth over HTTP, as an exponent: {:.2f} ({})".format(*max(exponents))
+        yield steepest("steepest growth over HTTP", exponents)
 
 
 def draw(folder, benchmarks, http_growth):
@@ -218,21 +248,26 @@ def read(path):
 
 
 def main():
-    benchmarks, service, http_growth = map(read, map(pathlib.Path, sys.argv[1:4]))
+    folder = pathlib.Path(sys.argv[1])
+    benchmarks, few, many, service, http_growth = (
+        read(folder / f"{name}.json")
+        for name in ("benchmarks", f"driver-{FEW}", f"driver-{MANY}", "service", "http-growth"))
     measured = Benchmarks(benchmarks)
     ratios = []
     for report in (report_requests, report_growth, report_sessions, report_failures,
                    report_doubles):
         ratios += report(measured)
+    drivers = Benchmarks(few), Benchmarks(many)
+    ratios += report_driver(*drivers)
     ratios += report_service(service)
     ratios += report_http_growth(http_growth)
-    if sys.argv[4:]:
-        draw(pathlib.Path(sys.argv[4]), measured, http_growth)
+    draw(folder, measured, http_growth)
     print("\nRatios")
     for line in ratios:
         print(line)
-    if measured.failed:
-        raise SystemExit(f"failed: {', '.join(measured.failed)}")
+    failed = [name for run in (measured, *drivers) for name in run.failed]
+    if failed:
+        raise SystemExit(f"failed: {', '.join(failed)}")
 
 
 if __name__ == "__main__":
