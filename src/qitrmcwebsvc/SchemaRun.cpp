@@ -5,12 +5,6 @@
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-// The depth of a request's root is 1, of a parameter 3, of an element of an array parameter 4. The
-// schemas do not allow an object or array as an element, and treat it like a null. For each value
-// the validator visits all open containers, so passing it a null for each container at this depth
-// keeps the cost of deeply nested requests linear.
-constexpr int depthPassedAsNull = 4;
-
 // The maximum number of bytes after the first one of a UTF-8 sequence.
 constexpr std::size_t mostFollowingBytes = 3;
 

@@ -7,6 +7,12 @@
 
 namespace nQITRMCWEBSVC100 {
 
+// The depth of a request's root is 1, of a parameter 3, of an element of an array parameter 4. The
+// schemas do not allow an object or array as an element, and treat it like a null. For each value
+// the validator visits all open containers, so passing it a null for each container at this depth
+// keeps the cost of deeply nested requests linear.
+constexpr int depthPassedAsNull = 4;
+
 // Where and why a request violates its schema. Both pointers are JSON pointers in URI fragment
 // form.
 struct SchemaFailure {

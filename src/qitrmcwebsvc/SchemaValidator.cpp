@@ -42,12 +42,16 @@ SchemaValidator::SchemaValidator(const char* schemaText, const char* definitions
     schemaDocument->AddMember("definitions", (*definitionsDocument)["definitions"],
                               schemaDocument->GetAllocator());
     compiledSchema = std::make_shared<JsonSchemaDocument>(*schemaDocument);
+    precheck.emplace(*schemaDocument);
 }
 
 void SchemaValidator::validate(const SingleRequest& request) {
     requireParamsObject(request);
-    if (!schemaDocument || !compiledSchema) {
+    if (!schemaDocument || !compiledSchema || !precheck) {
         throw InternalError("Fail to initialize validator.", QITRMC_HERE);
+    }
+    if (precheck->verdictOn(request.getRequest()) == SchemaPrecheck::Verdict::Valid) {
+        return;
     }
 
     std::unique_lock<std::mutex> lock(validationMutex);

@@ -4,6 +4,8 @@
 #include "embedded/EmbeddedFiles.h"
 #include "harnesses.h"
 #include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/SchemaPrecheck.h"
+#include "qitrmcwebsvc/SchemaRun.h"
 #include "qitrmcwebsvc/SchemaValidator.h"
 #include "qitrmcwebsvc/requestText.h"
 
@@ -12,14 +14,29 @@ namespace {
 using namespace nQITRMCWEBSVC100;
 using nQITRMCSHAREDCMN100::BasicError;
 
-// A schema as plain JSON, and its validator.
-struct Checked {
-    explicit Checked(const char* text) : validator(text) { schema.Parse(text); }
+// A schema with the definitions.
+struct Merged {
+    explicit Merged(const char* text) {
+        schema.Parse(text);
+        definitions.Parse(embeddedText("definitions.json"));
+        schema.AddMember("definitions", definitions["definitions"], schema.GetAllocator());
+    }
 
     const JsonValue& params() const { return schema["properties"]["params"]; }
 
-    SchemaValidator validator;
     JsonDocument schema;
+    JsonDocument definitions;
+};
+
+// A schema, its validator, and what that consists of.
+struct Checked {
+    explicit Checked(const char* text)
+        : validator(text), merged(text), precheck(merged.schema), compiled(merged.schema) {}
+
+    SchemaValidator validator;
+    Merged merged;
+    SchemaPrecheck precheck;
+    JsonSchemaDocument compiled;
 };
 
 std::map<std::string, Checked, std::less<>> checkedSchemas() {
@@ -52,6 +69,16 @@ void requireConformity(const JsonValue& params, const JsonValue& schema) {
     }
 }
 
+// Wherever the precheck decides, the JSON library agrees.
+void requireAgreement(const Checked& checked, const JsonValue& request) {
+    const SchemaPrecheck::Verdict verdict = checked.precheck.verdictOn(request);
+    const bool accepted = SchemaRun(checked.compiled).accepts(request);
+    fuzz::require(accepted || verdict != SchemaPrecheck::Verdict::Valid,
+                  "the precheck takes an invalid request for valid");
+    fuzz::require(!accepted || verdict != SchemaPrecheck::Verdict::Invalid,
+                  "the precheck takes a valid request for invalid");
+}
+
 void validate(Checked& checked, const SingleRequest& request) {
     try {
         checked.validator.validate(request);
@@ -60,7 +87,7 @@ void validate(Checked& checked, const SingleRequest& request) {
         fuzz::require(code == -32600 || code == -32602, "refused with a wrong code");
         return;
     }
-    requireConformity(request.getParams(), checked.params());
+    requireConformity(request.getParams(), checked.merged.params());
 }
 
 }  // namespace
@@ -82,5 +109,6 @@ void fuzz::validateSchema(std::string_view input) {
         require(code == -32600 || code == -32700, "refused with a wrong code");
         return;
     }
+    requireAgreement(checked->second, request->getRequest());
     validate(checked->second, *request);
 }

@@ -1,4 +1,5 @@
 #include <gtest/gtest.h>
+#include <pthread.h>
 
 #include <atomic>
 #include <functional>
@@ -9,6 +10,19 @@
 
 #include "embedded/EmbeddedFiles.h"
 #include "requests.h"
+
+namespace {
+
+thread_local int locksOfThread = 0;
+
+}  // namespace
+
+// The program is linked so that its own calls of pthread_mutex_lock come here.
+extern "C" int __real_pthread_mutex_lock(pthread_mutex_t* mutex);
+extern "C" int __wrap_pthread_mutex_lock(pthread_mutex_t* mutex) {
+    ++locksOfThread;
+    return __real_pthread_mutex_lock(mutex);
+}
 
 namespace nQITRMCWEBSVC100 {
 namespace {
@@ -66,6 +80,19 @@ TEST(SchemaValidator, HasTheSameResultsOnSeveralThreadsAsOnOne) {
         thread.join();
     }
     EXPECT_EQ(wrong, 0);
+}
+
+TEST(SchemaValidator, LocksItsMutexOnlyWhereTheLibraryMustDecide) {
+    SchemaValidator validator(embeddedText("procedure_read_register.json"));
+    const auto locksFor = [&](const std::string& members) {
+        const ParsedRequest request(
+            requestText("readRegister", R"({"session_id":"_session1","address":1,)" + members));
+        const int before = locksOfThread;
+        EXPECT_EQ(refusalOf([&] { validator.validate(*request); }), std::nullopt);
+        return locksOfThread - before;
+    };
+    EXPECT_EQ(locksFor(R"("size":8})"), 0);
+    EXPECT_EQ(locksFor(R"("size":8.0})"), 1);
 }
 
 TEST(SchemaValidator, OfSeveralMethodsWorkConcurrently) {
