@@ -22,12 +22,20 @@ local attributeUsages = {
     kUsageTypeUnspecifiedProperty = true,
 }
 
+-- Whether there is anything to try for this module. A failing require is slow, since it collects the
+-- names of all places where it has searched; without a search path it always fails.
+local function mayExist(name)
+    return package.loaded[name] or package.preload[name] or package.path ~= ""
+end
+
 -- The first of these modules that can be loaded, or nil.
 local function requireFirst(names)
     for _, name in ipairs(names) do
-        local success, module = pcall(require, name)
-        if success then
-            return module
+        if mayExist(name) then
+            local success, module = pcall(require, name)
+            if success then
+                return module
+            end
         end
     end
     return nil

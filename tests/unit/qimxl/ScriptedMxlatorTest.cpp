@@ -222,4 +222,30 @@ TEST_F(ScriptedMxlatorTest, SettingsKeepTheirFractionsUnderALocaleWithADecimalCo
     EXPECT_EQ(describe(), "[-0.15,0.25]");
 }
 
+// Without a search path a module that is neither loaded nor preloaded is not looked for.
+class UnsearchedMxlatorTest : public ScriptedMxlatorTest {
+  protected:
+    std::string describeAfter(const std::string& script) {
+        prepare(script + "\npackage.path = ''", "{\"qiSharedErrorsDir\":\"/nowhere\"}");
+        return describe();
+    }
+};
+
+constexpr const char* errorTable = "{ encoding = 'utf-8', getString = function() return 'a' end }";
+
+TEST_F(UnsearchedMxlatorTest, ALoadedErrorTableIsUsed) {
+    EXPECT_EQ(describeAfter(std::string("package.loaded.errors_eng = ") + errorTable), "a");
+}
+
+TEST_F(UnsearchedMxlatorTest, APreloadedErrorTableIsUsed) {
+    EXPECT_EQ(describeAfter(std::string("package.preload.errors_eng = function() return ") +
+                            errorTable + " end"),
+              "a");
+}
+
+TEST_F(UnsearchedMxlatorTest, AFailingErrorTableIsPassedOver) {
+    EXPECT_EQ(describeAfter("package.preload.errors_eng = function() error('x') end"),
+              "Error description not found");
+}
+
 }  // namespace
