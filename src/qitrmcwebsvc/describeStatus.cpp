@@ -38,14 +38,25 @@ void translate(qixlator::Session* session, const qierr_Status& status, qihtl::St
                                                  &failure);
 }
 
+std::size_t asciiLength(std::string_view text) {
+    const auto isOther = [](char byte) { return (byte & 0x80) != 0; };
+    return static_cast<std::size_t>(std::find_if(text.begin(), text.end(), isOther) - text.begin());
+}
+
 // A text may quote bytes of a request or a file that are not valid UTF-8, which JSON does not
 // allow. Each such byte is replaced by the replacement character.
 std::string withValidUtf8(std::string_view text) {
     std::string valid;
     valid.reserve(text.size());
     while (!text.empty()) {
-        const common::Utf8Character character = common::takeCharacter(text);
-        valid += character.isValid() ? character.bytes : "\xef\xbf\xbd";
+        // Nearly every text has no other characters.
+        const std::size_t length = asciiLength(text);
+        valid += text.substr(0, length);
+        text.remove_prefix(length);
+        if (!text.empty()) {
+            const common::Utf8Character character = common::takeCharacter(text);
+            valid += character.isValid() ? character.bytes : "\xef\xbf\xbd";
+        }
     }
     return valid;
 }
