@@ -10,6 +10,7 @@
 #include "qixlator/Registration.h"
 #include "qixlator/json1.h"
 #include "qixlator/qixlator.h"
+#include "qixlatorlua/BytecodeCache.h"
 #include "qixlatorlua/LuaXlator.h"
 #include "qixlatorlua/PreparedStates.h"
 #include "support/FaultyAllocator.h"
@@ -128,6 +129,27 @@ TEST_F(MemoryFaultTest, ATranslationNeedsLittleMemoryBeyondWhatIsKept) {
     const std::int64_t before = FaultyAllocator::liveBytes();
     translateWholly();
     EXPECT_LT(FaultyAllocator::peakBytes() - before, 300 * 1024);
+}
+
+// With two translations at the same time, the states of both are kept.
+TEST_F(MemoryFaultTest, WhatIsKeptBetweenFailuresIsAtMostOneMebibyte) {
+    qixlatorlua::PreparedStates& states = qixlatorlua::PreparedStates::ofProcess();
+    states.clear();
+    qierr::Status status;
+    XlatorInterface* xlators[2];
+    for (XlatorInterface*& xlator : xlators) {
+        xlator = qixlatorlua::createLuaXlator("mxlator_qitrmc",
+                                              qixlator::localRegistrations().next->registrationInfo,
+                                              LuaRuntime::Prepared, &status);
+        ASSERT_NE(xlator, nullptr) << status.json;
+    }
+    for (XlatorInterface* xlator : xlators) {
+        xlator->destroy(xlator);
+    }
+    EXPECT_GT(states.size(), 2u * 128 * 1024);
+    EXPECT_LE(states.size() + qixlatorlua::BytecodeCache::ofEmbeddedFiles()->size() +
+                  qixlator::KeptSearches::maximumSize,
+              1024u * 1024);
 }
 
 // The first translation of a process sets up the state that the others copy.
