@@ -55,6 +55,17 @@ def test_no_file_names_the_folder_that_it_was_built_in(packages):
             assert str(machine.ROOT).encode() not in path.read_bytes(), name
 
 
+def test_no_program_has_room_for_the_path_that_it_was_linked_with(packages):
+    """A run path that the installation removes leaves zero bytes in its place, so that packages that are
+    built in another folder would differ."""
+    for package in packages.values():
+        for name, path in package.programs().items():
+            sections = subprocess.run(["readelf", "-SW", path], check=True, capture_output=True, text=True)
+            found = re.search(r" \.dynstr +STRTAB +[0-9a-f]+ ([0-9a-f]+) ([0-9a-f]+) ", sections.stdout)
+            start, size = (int(number, 16) for number in found.groups())
+            assert b"\0\0" not in path.read_bytes()[start:start + size], name
+
+
 def test_the_plug_in_needs_the_documented_libraries(packages):
     path = packages["libqitrmcsvc"].files()["/usr/lib/qitrmc/plugin/libqitrmcsvc.so"]
     loader = re.compile(r"ld-linux.*")
