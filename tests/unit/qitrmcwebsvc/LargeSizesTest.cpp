@@ -78,6 +78,16 @@ TEST_F(LargeSizesTest, MoreElementsThanTheJsonLibraryCanCountAreNoMemoryInsteadO
     EXPECT_THROW(reserveElements(array, beyond32Bits + 1, jsonAllocator), std::bad_alloc);
 }
 
+// The bytes of so many elements are 0 in 32 bits. In 64 bits there may be memory for them.
+TEST(LargeArrays, ElementsWhoseBytesOverflow32BitsAreNoMemoryInsteadOfNone) {
+    if (beyond32Bits != 0) {
+        GTEST_SKIP() << "sizes have 64 bits here";
+    }
+    JsonAllocator jsonAllocator;
+    JsonValue array(rapidjson::kArrayType);
+    EXPECT_THROW(reserveElements(array, 1u << 28, jsonAllocator), std::bad_alloc);
+}
+
 // The text is far shorter than it claims: it must be refused before it is read.
 TEST(LargeTexts, ATextWhoseRoomOverflows32BitsIsNotWrittenBeyondTheBuffer) {
     constexpr rapidjson::SizeType length = 715827883;
