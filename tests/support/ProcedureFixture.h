@@ -50,6 +50,9 @@ class ProcedureFixture : public DriverTest {
     std::unique_ptr<nQITRMCWEBSVC100::ProcedureFactory> factory;
 };
 
+// The call that reads the names of all devices.
+inline const std::string readDevices = "getSystemPropertyStringArray(7, \"Sys.Devices\")";
+
 // The calls after the one that reads a property's data type.
 Texts afterOpening(const Texts& calls);
 

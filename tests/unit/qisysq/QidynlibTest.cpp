@@ -5,11 +5,9 @@
 
 #include <string>
 
-namespace {
+#include "contains.h"
 
-bool contains(const qierr::Status& status, const std::string& part) {
-    return std::string(status.json).find(part) != std::string::npos;
-}
+namespace {
 
 TEST(QidynlibTest, LoadsALibraryAndFindsASymbol) {
     qierr::Status status;

@@ -6,14 +6,11 @@
 #include <cstring>
 #include <string>
 
+#include "contains.h"
 #include "support/FaultyAllocator.h"
 #include "support/TestRoot.h"
 
 namespace {
-
-bool contains(const qierr::Status& status, const std::string& part) {
-    return std::string(status.json).find(part) != std::string::npos;
-}
 
 // While it exists, the C library has this text for every error.
 class ErrnoText {

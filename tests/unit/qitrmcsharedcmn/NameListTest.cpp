@@ -6,8 +6,8 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-constexpr NameKind plain = NameKind::Plain;
-constexpr NameKind path = NameKind::Path;
+using shared_test::path;
+using shared_test::plain;
 
 using Names = std::vector<std::string>;
 

@@ -4,8 +4,8 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-constexpr NameKind plain = NameKind::Plain;
-constexpr NameKind path = NameKind::Path;
+using shared_test::path;
+using shared_test::plain;
 
 void expectNumbered(const std::string& name, NameKind kind, const std::string& prefix,
                     std::uint32_t start, std::uint32_t end) {

@@ -9,6 +9,9 @@
 
 namespace shared_test {
 
+constexpr auto plain = nQITRMCSHAREDCMN100::NameKind::Plain;
+constexpr auto path = nQITRMCSHAREDCMN100::NameKind::Path;
+
 // Runs `call` and expects a name to be refused: code -250828 and the one detail.
 template <typename Call>
 void expectRefused(const std::string& escapedName, Call call) {

@@ -9,10 +9,10 @@ using namespace nQITRMCSHAREDCMN100;
 
 namespace {
 
-constexpr qierr_SourcePosition here{"driver.c", 1, nullptr, nullptr};
+constexpr qierr_SourcePosition inDriver{"driver.c", 1, nullptr, nullptr};
 
 void driverCall(std::int32_t code, qierr_Status* status) {
-    qierr_Status_setCodeAt(status, code, here);
+    qierr_Status_setCodeAt(status, code, inDriver);
 }
 
 }  // namespace

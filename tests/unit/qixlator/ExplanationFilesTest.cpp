@@ -11,22 +11,13 @@
 #include <utility>
 #include <vector>
 
+#include "documents.h"
 #include "qixlator/DirectoryWalker.h"
 #include "qixlator/qvErrorsParser.h"
 #include "support/FaultyAllocator.h"
 #include "support/TestRoot.h"
 
 namespace {
-
-constexpr const char* heading = "<?xml version=\"1.0\" encoding=\"UTF-8\"?>\n<qidocument>\n";
-
-std::string document(const std::string& body) {
-    return heading + body + "</qidocument>\n";
-}
-
-std::string block(const std::string& code, const std::string& text) {
-    return "<qierror code=\"" + code + "\">\n" + text + "</qierror>\n";
-}
 
 // The same directory under a path of this length.
 std::string lengthened(std::string path, std::size_t length) {

@@ -20,7 +20,7 @@ namespace {
 
 using qixlator::KeptSearches;
 
-std::string document(const std::string& text) {
+std::string explanation(const std::string& text) {
     return "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"-1\">\n" + text +
            "\n</qierror>\n</qidocument>\n";
 }
@@ -79,18 +79,18 @@ const std::vector<Change> changes = {
     {"nothing", "Old.", [](const TestRoot&, const std::string&) {}, "Old."},
     {"content of the same size", "Old.",
      [](const TestRoot& root, const std::string& directory) {
-         root.write(directory + "/a.txt", document("New."));
+         root.write(directory + "/a.txt", explanation("New."));
      },
      "New."},
     {"content of the same size and time", "Old.",
      [](const TestRoot& root, const std::string& directory) {
          replaceSecretly(root.locate(directory + "/a.txt"),
-                         [&] { root.write(directory + "/a.txt", document("New.")); });
+                         [&] { root.write(directory + "/a.txt", explanation("New.")); });
      },
      "New."},
     {"a file replaced", "Old.",
      [](const TestRoot& root, const std::string& directory) {
-         root.write(directory + "-new.txt", document("New."));
+         root.write(directory + "-new.txt", explanation("New."));
          rename(root, directory + "-new.txt", directory + "/a.txt");
      },
      "New."},
@@ -112,7 +112,7 @@ const std::vector<Change> changes = {
      [](const TestRoot& root, const std::string& directory) { root.remove(directory); }, "failed"},
     {"the directory replaced", "Old.",
      [](const TestRoot& root, const std::string& directory) {
-         root.write(directory + "-new/a.txt", document("New."));
+         root.write(directory + "-new/a.txt", explanation("New."));
          root.remove(directory);
          rename(root, directory + "-new", directory);
      },
@@ -134,10 +134,10 @@ class KeptSearchesTest : public testing::Test {
 };
 
 TEST_F(KeptSearchesTest, EveryChangeShowsInTheNextSearch) {
-    root.write("/other/a.txt", document("New."));
+    root.write("/other/a.txt", explanation("New."));
     const auto directoryOf = [](std::size_t index) { return "/errors" + std::to_string(index); };
     for (std::size_t index = 0; index < changes.size(); ++index) {
-        root.write(directoryOf(index) + "/a.txt", document("Old."));
+        root.write(directoryOf(index) + "/a.txt", explanation("Old."));
     }
     for (std::size_t index = 0; index < changes.size(); ++index) {
         searchUntilKept(root.locate(directoryOf(index)));
@@ -157,18 +157,18 @@ TEST_F(KeptSearchesTest, AnAddedFileShowsInTheNextSearch) {
     const std::string directory = root.locate("/errors");
     searchUntilKept(directory);
     EXPECT_EQ(search(directory), "");
-    root.write("/errors/b.txt", document("New."));
+    root.write("/errors/b.txt", explanation("New."));
     EXPECT_EQ(search(directory), "New.");
 }
 
 TEST_F(KeptSearchesTest, ALinkThatPointsElsewhereShowsInTheNextSearch) {
-    root.write("/old.txt", document("Old."));
-    root.write("/new.txt", document("New."));
+    root.write("/old.txt", explanation("Old."));
+    root.write("/new.txt", explanation("New."));
     root.makeDirectory("/errors");
     link(root, "/old.txt", "/step");
     link(root, "/step", "/errors/a.txt");
-    root.write("/one/a.txt", document("Old."));
-    root.write("/two/a.txt", document("New."));
+    root.write("/one/a.txt", explanation("Old."));
+    root.write("/two/a.txt", explanation("New."));
     link(root, "/one", "/linked");
     searchUntilKept(root.locate("/errors"));
     searchUntilKept(root.locate("/linked"));
@@ -179,8 +179,8 @@ TEST_F(KeptSearchesTest, ALinkThatPointsElsewhereShowsInTheNextSearch) {
 }
 
 TEST_F(KeptSearchesTest, AChangeOfPermissionsEndsTheKeeping) {
-    root.write("/one/a.txt", document("Old."));
-    root.write("/two/a.txt", document("Old."));
+    root.write("/one/a.txt", explanation("Old."));
+    root.write("/two/a.txt", explanation("Old."));
     searchUntilKept(root.locate("/one"));
     searchUntilKept(root.locate("/two"));
     ASSERT_EQ(chmod(root.locate("/one/a.txt").c_str(), 0), 0);
@@ -191,7 +191,7 @@ TEST_F(KeptSearchesTest, AChangeOfPermissionsEndsTheKeeping) {
 
 TEST_F(KeptSearchesTest, FilesThatHaveJustChangedAreReadEachTime) {
     for (const char* text : {"One.", "Two.", "Six."}) {
-        root.write("/errors/a.txt", document(text));
+        root.write("/errors/a.txt", explanation(text));
         EXPECT_EQ(search(root.locate("/errors")), text);
     }
     EXPECT_FALSE(isKept(root.locate("/errors")));
@@ -200,7 +200,7 @@ TEST_F(KeptSearchesTest, FilesThatHaveJustChangedAreReadEachTime) {
 
 TEST_F(KeptSearchesTest, AFailureIsNotKept) {
     root.write("/errors/a.txt", "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"x\">\n");
-    root.write("/good/a.txt", document("Old."));
+    root.write("/good/a.txt", explanation("Old."));
     EXPECT_EQ(search(root.locate("/errors")), "failed");
     searchUntilKept(root.locate("/good"));
     EXPECT_EQ(search(root.locate("/errors")), "failed");
@@ -208,7 +208,7 @@ TEST_F(KeptSearchesTest, AFailureIsNotKept) {
 }
 
 TEST_F(KeptSearchesTest, TheMemoryOfTheTableIsLimited) {
-    root.write("/errors/a.txt", document(std::string(2000, 'x')));
+    root.write("/errors/a.txt", explanation(std::string(2000, 'x')));
     const std::string directory = root.locate("/errors");
     searchUntilKept(directory);
     const std::size_t one = KeptSearches::ofProcess().size();
@@ -224,7 +224,7 @@ TEST_F(KeptSearchesTest, TheMemoryOfTheTableIsLimited) {
 }
 
 TEST_F(KeptSearchesTest, LackOfMemoryAtAnyAllocationGivesTheTextOrAFailure) {
-    root.write("/errors/a.txt", document("Old."));
+    root.write("/errors/a.txt", explanation("Old."));
     const std::string directory = root.locate("/errors");
     searchUntilKept(directory);
     for (const bool isFirst : {false, true}) {
@@ -245,7 +245,7 @@ TEST_F(KeptSearchesTest, LackOfMemoryAtAnyAllocationGivesTheTextOrAFailure) {
 }
 
 TEST_F(KeptSearchesTest, ThreadsFindTheTextWhileTheFilesChange) {
-    root.write("/errors/a.txt", document("Old."));
+    root.write("/errors/a.txt", explanation("Old."));
     const std::string directory = root.locate("/errors");
     searchUntilKept(directory);
     std::vector<std::thread> threads;
@@ -257,7 +257,7 @@ TEST_F(KeptSearchesTest, ThreadsFindTheTextWhileTheFilesChange) {
             }
         });
     }
-    root.write("/new.txt", document("New."));
+    root.write("/new.txt", explanation("New."));
     rename(root, "/new.txt", "/errors/a.txt");
     EXPECT_EQ(search(directory), "New.");
     for (std::thread& thread : threads) {

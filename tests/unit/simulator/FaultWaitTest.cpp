@@ -7,6 +7,7 @@
 #include <thread>
 
 #include "FaultsInForce.h"
+#include "Result.h"
 #include "Values.h"
 
 using namespace drivertest;
@@ -18,23 +19,8 @@ constexpr std::int32_t connectionLost = -250941;
 constexpr std::int32_t aborted = -250963;
 constexpr std::int32_t unknownSession = -250955;
 
-using Result = std::future<std::int32_t>;
-
 Result later(std::function<std::int32_t()> call) {
     return std::async(std::launch::async, std::move(call));
-}
-
-bool isReady(const Result& result) {
-    return result.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
-}
-
-// Calls `act` repeatedly until the call that it is meant for has returned.
-std::int32_t resultAfter(Result& result, const std::function<void()>& act) {
-    while (!isReady(result)) {
-        act();
-        std::this_thread::yield();
-    }
-    return result.get();
 }
 
 std::int32_t readTemperature(Handle session, const char* device) {

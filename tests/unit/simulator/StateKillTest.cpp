@@ -16,7 +16,7 @@ namespace {
 constexpr std::uint32_t areaSize = 65536;
 
 // Two areas on two devices, large enough that writing them takes a while.
-constexpr const char* description = R"({"devices": [
+constexpr const char* twoDevices = R"({"devices": [
     {"name": "A", "category": 2, "nvmem_areas": [{"name": "user", "size": 65536}]},
     {"name": "B", "category": 2, "nvmem_areas": [{"name": "user", "size": 65536}]}
 ]})";
@@ -94,7 +94,7 @@ Report killSoon(const StateFolder& state, bool mayCommit, std::chrono::microseco
 TEST(StateKillTest, AKilledProcessLeavesACompleteContentNotOlderThanItsLastCommit) {
     const char* wanted = std::getenv("QITRMC_KILLS");
     const int kills = wanted != nullptr ? std::atoi(wanted) : 50;
-    const ChassisFile file(description);
+    const ChassisFile file(twoDevices);
     StateFolder state;
     state.chassis = file.path;
     std::mt19937 random(testing::UnitTest::GetInstance()->random_seed());

@@ -7,6 +7,7 @@
 #include <thread>
 
 #include "Driver.h"
+#include "Result.h"
 
 using namespace drivertest;
 
@@ -19,19 +20,6 @@ std::future<std::int32_t> reserveLater(Session& session, const char* devices,
     return std::async(std::launch::async, [&session, devices, access, timeout] {
         return session.reserve(devices, access, "", timeout);
     });
-}
-
-bool isReady(const std::future<std::int32_t>& result) {
-    return result.wait_for(std::chrono::seconds(0)) == std::future_status::ready;
-}
-
-// Calls `act` repeatedly until the call that it is meant for has returned.
-std::int32_t resultAfter(std::future<std::int32_t>& result, const std::function<void()>& act) {
-    while (!isReady(result)) {
-        act();
-        std::this_thread::yield();
-    }
-    return result.get();
 }
 
 // Returns when a call waits to write to a device that another session reads: from then on a

@@ -2,7 +2,6 @@
 
 namespace {
 
-const std::string readDevices = "getSystemPropertyStringArray(7, \"Sys.Devices\")";
 const std::string noSingleDevice =
     failure(-32602, "kUsageTypeDetails", "You must specify none or only one device.");
 

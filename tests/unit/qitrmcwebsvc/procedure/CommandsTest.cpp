@@ -2,7 +2,6 @@
 
 namespace {
 
-const std::string readDevices = "getSystemPropertyStringArray(7, \"Sys.Devices\")";
 const std::string needsResource =
     failure(-32602, "kUsageTypeDetails",
             "You must specify at least one of the following parameters: device, physical_channel.");

@@ -2,7 +2,6 @@
 
 namespace {
 
-const std::string readDevices = "getSystemPropertyStringArray(7, \"Sys.Devices\")";
 const std::string freeDevices = "freeStringArray(4)";
 
 class DeviceProceduresTest : public ProcedureFixture {
