@@ -18,8 +18,9 @@ set(CMAKE_LIBRARY_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/lib")
 
 find_program(QITRMC_CCACHE ccache)
 if(QITRMC_CCACHE)
-  set(CMAKE_C_COMPILER_LAUNCHER "${QITRMC_CCACHE}")
-  set(CMAKE_CXX_COMPILER_LAUNCHER "${QITRMC_CCACHE}")
+  # With paths relative to the build folder the presets share what they compile alike.
+  set(CMAKE_C_COMPILER_LAUNCHER env "CCACHE_BASEDIR=${PROJECT_SOURCE_DIR}" "${QITRMC_CCACHE}")
+  set(CMAKE_CXX_COMPILER_LAUNCHER ${CMAKE_C_COMPILER_LAUNCHER})
 endif()
 
 # On a 32-bit target readdir and stat fail for a file whose inode number or directory offset needs
@@ -29,7 +30,9 @@ add_compile_definitions(_FILE_OFFSET_BITS=64 _TIME_BITS=64)
 add_compile_options(-Wall -Wextra -Werror)
 # File names in error reports are relative to the project, so they are the same on every build
 # machine.
-add_compile_options("-fmacro-prefix-map=${PROJECT_SOURCE_DIR}/=")
+file(RELATIVE_PATH source_from_build "${PROJECT_BINARY_DIR}" "${PROJECT_SOURCE_DIR}")
+add_compile_options("-fmacro-prefix-map=${PROJECT_SOURCE_DIR}/="
+                    "-fmacro-prefix-map=${source_from_build}=")
 
 set(QITRMC_SANITIZE "" CACHE STRING "Sanitizers to build with, for example address,undefined")
 if(QITRMC_SANITIZE)
