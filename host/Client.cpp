@@ -27,10 +27,11 @@ struct HeaderReader {
 };
 
 // No exception may pass the HTTP library, which calls this.
-MHD_Result takeHeader(void* context, MHD_ValueKind, const char* name, const char* value) {
+MHD_Result takeHeader(void* context, MHD_ValueKind, const char* name, std::size_t nameSize,
+                      const char* value, std::size_t valueSize) {
     auto& reader = *static_cast<HeaderReader*>(context);
     try {
-        reader.source.takeHeader(name, value == nullptr ? "" : value);
+        reader.source.takeHeader({name, nameSize}, {value, valueSize});
         return MHD_YES;
     } catch (const std::bad_alloc&) {
         reader.ranOutOfMemory = true;
@@ -43,12 +44,13 @@ std::string remoteAddressOf(MHD_Connection* connection) {
     return remoteAddress(info->connect_fd);
 }
 
+// The texts are valid as long as the request lasts.
 Source sourceOf(MHD_Connection* connection, const char* method, const std::string& localAddress) {
     Source source;
     source.method = method;
     source.localAddress = localAddress;
     HeaderReader reader{source};
-    MHD_get_connection_values(connection, MHD_HEADER_KIND, takeHeader, &reader);
+    MHD_get_connection_values_n(connection, MHD_HEADER_KIND, takeHeader, &reader);
     if (reader.ranOutOfMemory) {
         throw std::bad_alloc();
     }

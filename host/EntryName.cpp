@@ -14,6 +14,7 @@ constexpr std::uint32_t replacementCharacter = 0xFFFD;
 
 std::vector<std::uint32_t> charactersOf(std::string_view text) {
     std::vector<std::uint32_t> characters;
+    characters.reserve(text.size());
     while (!text.empty()) {
         const common::Utf8Character character = common::takeCharacter(text);
         characters.push_back(character.isValid() ? static_cast<std::uint32_t>(character.codePoint)

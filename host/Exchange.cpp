@@ -1,5 +1,6 @@
 #include "host/Exchange.h"
 
+#include <algorithm>
 #include <chrono>
 #include <cstdlib>
 #include <new>
@@ -25,7 +26,8 @@ bool isGet(std::string_view method) {
 
 bool isSendable(const ws_Request& response) {
     return !response.incomplete && response.code >= 200 && response.code <= 599 &&
-           response.type.find_first_of("\r\n\t") == std::string::npos;
+           std::none_of(response.type.begin(), response.type.end(),
+                        [](char c) { return c == '\r' || c == '\n' || c == '\t'; });
 }
 
 }  // namespace

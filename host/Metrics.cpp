@@ -25,9 +25,12 @@ ClientMetric counterOf(std::uint64_t value) {
     return metric;
 }
 
+// The value is less than zero when an end was added up, but not yet the beginning, which another
+// thread has counted.
 ClientMetric gaugeOf(std::uint64_t value) {
     ClientMetric metric;
-    metric.gauge.value = static_cast<double>(value);
+    metric.gauge.value =
+        static_cast<double>(std::max<std::int64_t>(static_cast<std::int64_t>(value), 0));
     return metric;
 }
 
@@ -92,19 +95,49 @@ MetricFamily timesFamily(const Bounds& bounds, const Counts& buckets, std::uint6
 
 void Metrics::countTime(Seconds time) noexcept {
     const auto bound = std::lower_bound(bounds.begin(), bounds.end(), time.count());
-    add(buckets[static_cast<std::size_t>(bound - bounds.begin())], 1);
-    add(nanoseconds, std::chrono::duration_cast<std::chrono::nanoseconds>(time).count());
+    Counts& some = own();
+    add(some.buckets[static_cast<std::size_t>(bound - bounds.begin())], 1);
+    add(some.nanoseconds, std::chrono::duration_cast<std::chrono::nanoseconds>(time).count());
+}
+
+std::size_t Metrics::threadNumber() noexcept {
+    static std::atomic<std::size_t> next{0};
+    thread_local const std::size_t number = next++;
+    return number;
+}
+
+void Metrics::addUp(Counts& total, const Counts& some) noexcept {
+    add(total.openConnections, some.openConnections.load());
+    add(total.allConnections, some.allConnections.load());
+    add(total.inFlight, some.inFlight.load());
+    add(total.receivedBytes, some.receivedBytes.load());
+    add(total.sentBytes, some.sentBytes.load());
+    for (std::size_t handler = 0; handler < some.ended.size(); ++handler) {
+        for (std::size_t outcome = 0; outcome < some.ended[handler].size(); ++outcome) {
+            add(total.ended[handler][outcome], some.ended[handler][outcome].load());
+        }
+    }
+    for (std::size_t i = 0; i < some.buckets.size(); ++i) {
+        add(total.buckets[i], some.buckets[i].load());
+    }
+    add(total.nanoseconds, some.nanoseconds.load());
 }
 
 std::string Metrics::text() const {
+    Counts total;
+    for (const Counts& some : counts) {
+        addUp(total, some);
+    }
     std::vector<MetricFamily> families = {
-        requestsFamily(ended),
-        timesFamily(bounds, buckets, nanoseconds),
-        gauge("qitrmc_requests_in_flight", "Requests that have begun and not ended", inFlight),
-        gauge("qitrmc_connections", "Open connections", openConnections),
-        counter("qitrmc_connections_total", "Connections so far", allConnections),
-        counter("qitrmc_request_bytes_total", "Bytes of request bodies received", receivedBytes),
-        counter("qitrmc_response_bytes_total", "Bytes of response bodies sent", sentBytes),
+        requestsFamily(total.ended),
+        timesFamily(bounds, total.buckets, total.nanoseconds),
+        gauge("qitrmc_requests_in_flight", "Requests that have begun and not ended",
+              total.inFlight),
+        gauge("qitrmc_connections", "Open connections", total.openConnections),
+        counter("qitrmc_connections_total", "Connections so far", total.allConnections),
+        counter("qitrmc_request_bytes_total", "Bytes of request bodies received",
+                total.receivedBytes),
+        counter("qitrmc_response_bytes_total", "Bytes of response bodies sent", total.sentBytes),
     };
     if (const std::optional<std::uint64_t> calls = driverCalls()) {
         families.push_back(

@@ -25,7 +25,7 @@ enum class Outcome {
 enum class Handler { Service, Host };
 
 // Counts what the host does. All functions may be called from any thread; those that count take a
-// few atomic additions.
+// few atomic additions, each thread in memory that few others use.
 class Metrics {
   public:
     using Seconds = std::chrono::duration<double>;
@@ -36,22 +36,22 @@ class Metrics {
     explicit Metrics(DriverCalls driverCalls) : driverCalls(std::move(driverCalls)) {}
 
     void countOpenedConnection() noexcept {
-        add(openConnections, 1);
-        add(allConnections, 1);
+        add(own().openConnections, 1);
+        add(own().allConnections, 1);
     }
-    void countClosedConnection() noexcept { add(openConnections, -1); }
+    void countClosedConnection() noexcept { add(own().openConnections, -1); }
 
-    void countBegunRequest() noexcept { add(inFlight, 1); }
+    void countBegunRequest() noexcept { add(own().inFlight, 1); }
     void countEndedRequest(Handler handler, Outcome outcome) noexcept {
-        add(inFlight, -1);
-        add(ended[static_cast<std::size_t>(handler)][static_cast<std::size_t>(outcome)], 1);
+        add(own().inFlight, -1);
+        add(own().ended[static_cast<std::size_t>(handler)][static_cast<std::size_t>(outcome)], 1);
     }
 
     // Of a request to the service: how long the plug-in took.
     void countTime(Seconds time) noexcept;
 
-    void countReceivedBytes(std::size_t size) noexcept { add(receivedBytes, size); }
-    void countSentBytes(std::size_t size) noexcept { add(sentBytes, size); }
+    void countReceivedBytes(std::size_t size) noexcept { add(own().receivedBytes, size); }
+    void countSentBytes(std::size_t size) noexcept { add(own().sentBytes, size); }
 
     // All counts in the text format of Prometheus.
     std::string text() const;
@@ -69,14 +69,26 @@ class Metrics {
         count.fetch_add(static_cast<std::uint64_t>(number), std::memory_order_relaxed);
     }
 
-    Count openConnections{0};
-    Count allConnections{0};
-    Count inFlight{0};
-    Count receivedBytes{0};
-    Count sentBytes{0};
-    std::array<std::array<Count, 4>, 2> ended{};     // by Handler and Outcome
-    std::array<Count, bounds.size() + 1> buckets{};  // each without those below it
-    Count nanoseconds{0};
+    // What some of the threads have counted. What one of them adds another one may subtract, so
+    // only the sums over all threads mean something.
+    struct alignas(64) Counts {
+        Count openConnections{0};
+        Count allConnections{0};
+        Count inFlight{0};
+        Count receivedBytes{0};
+        Count sentBytes{0};
+        std::array<std::array<Count, 4>, 2> ended{};     // by Handler and Outcome
+        std::array<Count, bounds.size() + 1> buckets{};  // each without those below it
+        Count nanoseconds{0};
+    };
+
+    // The counts that the calling thread adds to.
+    Counts& own() noexcept { return counts[threadNumber() % counts.size()]; }
+    static std::size_t threadNumber() noexcept;
+
+    static void addUp(Counts& total, const Counts& some) noexcept;
+
+    std::array<Counts, 8> counts;
     const DriverCalls driverCalls;
 };
 

@@ -12,9 +12,6 @@ namespace host {
 
 namespace {
 
-constexpr std::string_view letters = "abcdefghijklmnopqrstuvwxyz";
-constexpr std::string_view digits = "0123456789";
-
 // Whatever the locale says.
 std::string lowerCase(std::string_view text) {
     std::string lower(text);
@@ -24,10 +21,10 @@ std::string lowerCase(std::string_view text) {
     return lower;
 }
 
-bool consistsOf(std::string_view text, std::string_view set, std::string_view furtherSet) {
+// Whether there are only small letters, digits and these further characters.
+bool consistsOfLettersAnd(std::string_view further, std::string_view text) {
     return !text.empty() && std::all_of(text.begin(), text.end(), [&](char c) {
-        return set.find(c) != set.npos || digits.find(c) != digits.npos ||
-               furtherSet.find(c) != furtherSet.npos;
+        return (c >= 'a' && c <= 'z') || (c >= '0' && c <= '9') || further.find(c) != further.npos;
     });
 }
 
@@ -80,7 +77,7 @@ std::optional<std::string> canonicalHost(std::string_view text) {
     if (host.find(':') != host.npos) {
         return canonicalIpv6(host);
     }
-    return consistsOf(host, letters, "-._") ? std::optional(host) : std::nullopt;
+    return consistsOfLettersAnd("-._", host) ? std::optional(host) : std::nullopt;
 }
 
 std::optional<Authority> parseAuthority(std::string_view text, std::string_view scheme) {
@@ -108,7 +105,7 @@ std::optional<Origin> parseOrigin(std::string_view text) {
     }
     const std::string scheme = lowerCase(text.substr(0, end));
     const std::optional<Authority> authority = parseAuthority(text.substr(end + 3), scheme);
-    if (!authority || !consistsOf(scheme, letters, "+-.")) {
+    if (!authority || !consistsOfLettersAnd("+-.", scheme)) {
         return std::nullopt;
     }
     return Origin{scheme, *authority};

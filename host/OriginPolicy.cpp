@@ -16,7 +16,8 @@ bool contains(const std::vector<std::string>& list, const std::string& text) {
     return std::find(list.begin(), list.end(), text) != list.end();
 }
 
-std::string foreignOriginText(const std::string& origin) {
+std::string foreignOriginText(std::string_view text) {
+    const std::string origin(text);
     if (!parseOrigin(origin)) {
         return "Requests with the Origin \"" + origin +
                "\" are not taken. Serve the page from a web server, and start the host with "
@@ -26,14 +27,15 @@ std::string foreignOriginText(const std::string& origin) {
            " are not taken. To take them, start the host with --allow-origin " + origin + ".\n";
 }
 
-std::vector<Header> headersFor(const std::string& origin) {
-    return {{"Access-Control-Allow-Origin", origin}, {"Vary", "Origin"}};
+std::vector<Header> headersFor(std::string_view origin) {
+    return {{"Access-Control-Allow-Origin", std::string(origin)}, {"Vary", "Origin"}};
 }
 
 void addPreflightHeaders(std::vector<Header>& headers, const Source& source) {
     headers.push_back({"Access-Control-Allow-Methods", "POST"});
-    headers.push_back({"Access-Control-Allow-Headers",
-                       source.wantedHeaders.empty() ? "Content-Type" : source.wantedHeaders});
+    headers.push_back(
+        {"Access-Control-Allow-Headers",
+         std::string(source.wantedHeaders.empty() ? "Content-Type" : source.wantedHeaders)});
     headers.push_back({"Access-Control-Max-Age", preflightLifetime});
 }
 
@@ -46,8 +48,9 @@ Verdict refuse(const std::string& text) {
 }  // namespace
 
 void Source::takeHeader(std::string_view name, std::string_view value) {
-    const auto isNamed = [&](const char* other) {
-        return strcasecmp(std::string(name).c_str(), other) == 0;
+    const auto isNamed = [&](std::string_view other) {
+        return name.size() == other.size() &&
+               strncasecmp(name.data(), other.data(), other.size()) == 0;
     };
     if (isNamed("Host")) {
         hosts.emplace_back(value);
@@ -79,7 +82,7 @@ Verdict OriginPolicy::judge(const Source& source) const {
     if (source.origins.empty()) {
         return {};
     }
-    const std::string& origin = source.origins.front();
+    const std::string_view origin = source.origins.front();
     if (!isAllowed(origin)) {
         return isOwnOrigin(source, origin) ? Verdict() : refuse(foreignOriginText(origin));
     }
@@ -97,10 +100,9 @@ std::string OriginPolicy::refusalOfHost(const Source& source) const {
     if (source.hosts.empty()) {
         return "";
     }
-    const std::string& text = source.hosts.front();
-    const std::optional<Authority> authority = parseAuthority(text, scheme);
+    const std::optional<Authority> authority = parseAuthority(source.hosts.front(), scheme);
     if (!authority) {
-        return "The Host \"" + text +
+        return "The Host \"" + std::string(source.hosts.front()) +
                "\" is not a name or address. Send the one that stands in the URL.\n";
     }
     if (isOwnHost(source, authority->host)) {
@@ -117,13 +119,13 @@ bool OriginPolicy::isOwnHost(const Source& source, const std::string& host) cons
 }
 
 // The host of the request is known to be the own one.
-bool OriginPolicy::isOwnOrigin(const Source& source, const std::string& text) const {
+bool OriginPolicy::isOwnOrigin(const Source& source, std::string_view text) const {
     const std::optional<Origin> origin = parseOrigin(text);
     return origin && !source.hosts.empty() && origin->scheme == scheme &&
            origin->authority == parseAuthority(source.hosts.front(), scheme);
 }
 
-bool OriginPolicy::isAllowed(const std::string& text) const {
+bool OriginPolicy::isAllowed(std::string_view text) const {
     const std::optional<Origin> origin = parseOrigin(text);
     return origin &&
            std::find(allowedOrigins.begin(), allowedOrigins.end(), *origin) != allowedOrigins.end();

@@ -13,17 +13,18 @@ struct Header {
     std::string value;
 };
 
-// What the head of a request says of where it comes from.
+// What the head of a request says of where it comes from. The texts belong to the caller.
 struct Source {
     // Takes in the next header of the request.
     void takeHeader(std::string_view name, std::string_view value);
 
-    std::string method;
-    std::string localAddress;  // canonical, of the machine's end of the connection; may be empty
-    std::vector<std::string> hosts;    // each header "Host"
-    std::vector<std::string> origins;  // each header "Origin"
-    std::string wantedMethod;          // what a preflight asks for
-    std::string wantedHeaders;
+    std::string_view method;
+    std::string_view
+        localAddress;  // canonical, of the machine's end of the connection; may be empty
+    std::vector<std::string_view> hosts;    // each header "Host"
+    std::vector<std::string_view> origins;  // each header "Origin"
+    std::string_view wantedMethod;          // what a preflight asks for
+    std::string_view wantedHeaders;
 };
 
 struct Verdict {
@@ -49,8 +50,8 @@ class OriginPolicy {
   private:
     std::string refusalOfHost(const Source& source) const;
     bool isOwnHost(const Source& source, const std::string& host) const;
-    bool isOwnOrigin(const Source& source, const std::string& origin) const;
-    bool isAllowed(const std::string& origin) const;
+    bool isOwnOrigin(const Source& source, std::string_view origin) const;
+    bool isAllowed(std::string_view origin) const;
 
     const std::string scheme;
     const std::vector<std::string> hostNames;

@@ -7,8 +7,11 @@ namespace host {
 using common::hexDigit;
 
 std::string_view pathOfTarget(std::string_view target) {
+    if (target.empty() || target.front() == '/') {
+        return target;
+    }
     const std::size_t scheme = target.find("://");
-    if (target.empty() || target.front() == '/' || scheme == std::string_view::npos) {
+    if (scheme == std::string_view::npos) {
         return target;
     }
     const std::size_t path = target.find('/', scheme + 3);

@@ -48,9 +48,24 @@ class ErrorFinder : public rapidjson::BaseReaderHandler<rapidjson::UTF8<>, Error
 // Iterative, so that no nesting in a response can exhaust the stack.
 constexpr unsigned flags = rapidjson::kParseIterativeFlag | rapidjson::kParseNumbersAsStringsFlag;
 
+// Far more than stands before the result in most responses.
+constexpr std::size_t mostBeforeResult = 128;
+
+// Whether a response is a single one with a result, as far as that shows without a parse. A quote
+// within a text has a backslash before it, so the name of the member cannot stand in a text.
+bool beginsWithResult(std::string_view response) {
+    const std::string_view head = response.substr(0, mostBeforeResult);
+    const std::size_t result = head.find("\"result\":");
+    return result != head.npos && head.front() == '{' && head.find('{', 1) > result &&
+           head.find('[') > result && head.find("\"error\":") > result;
+}
+
 }  // namespace
 
 bool hasRpcError(const std::string& response) {
+    if (beginsWithResult(response)) {
+        return false;
+    }
     ErrorFinder finder;
     rapidjson::Reader reader;
     rapidjson::StringStream stream(response.c_str());

@@ -78,6 +78,42 @@ TEST(Metrics, ShowsWhatIsThereNowAndWhatWasThereInAll) {
     EXPECT_THAT(text, HasSubstr("\nqitrmc_response_bytes_total 20\n"));
 }
 
+TEST(Metrics, AddsUpWhatManyThreadsCount) {
+    Metrics metrics(noDriver);
+    metrics.countOpenedConnection();
+    metrics.countBegunRequest();
+    for (int i = 0; i < 20; ++i) {
+        std::thread([&metrics] {
+            metrics.countOpenedConnection();
+            metrics.countClosedConnection();
+            metrics.countBegunRequest();
+            metrics.countReceivedBytes(3);
+            metrics.countSentBytes(5);
+            metrics.countTime(std::chrono::seconds(1));
+            metrics.countEndedRequest(Handler::Host, Outcome::HttpError);
+        }).join();
+    }
+    std::thread([&metrics] { metrics.countClosedConnection(); }).join();
+    const std::string text = metrics.text();
+    for (const char* line :
+         {"qitrmc_connections 0", "qitrmc_connections_total 21", "qitrmc_requests_in_flight 1",
+          "qitrmc_request_bytes_total 60", "qitrmc_response_bytes_total 100",
+          "qitrmc_requests_total{handler=\"host\",outcome=\"http_error\"} 20",
+          "qitrmc_request_duration_seconds_bucket{le=\"1\"} 20",
+          "qitrmc_request_duration_seconds_sum 20"}) {
+        EXPECT_THAT(text, HasSubstr(std::string("\n") + line + "\n"));
+    }
+}
+
+// So it can be while the counts of the threads are added up one after another.
+TEST(Metrics, ShowNothingLessThanZero) {
+    Metrics metrics(noDriver);
+    metrics.countClosedConnection();
+    metrics.countEndedRequest(Handler::Service, Outcome::Ok);
+    EXPECT_THAT(metrics.text(), HasSubstr("\nqitrmc_connections 0\n"));
+    EXPECT_THAT(metrics.text(), HasSubstr("\nqitrmc_requests_in_flight 0\n"));
+}
+
 TEST(Metrics, HasCallsOfTheDriverOnlyWhenTheyAreKnown) {
     EXPECT_THAT(Metrics(noDriver).text(), Not(HasSubstr("driver")));
     const Metrics metrics([] { return std::optional<std::uint64_t>(7); });

@@ -9,8 +9,8 @@ using host::Source;
 using host::Verdict;
 using testing::HasSubstr;
 
-Source sourceOf(const std::vector<std::string>& hosts,
-                const std::vector<std::string>& origins = {}) {
+Source sourceOf(const std::vector<std::string_view>& hosts,
+                const std::vector<std::string_view>& origins = {}) {
     Source source;
     source.method = "POST";
     source.localAddress = "192.0.2.7";
@@ -184,8 +184,8 @@ TEST(Source, ReadsItsHeadersInAnyLetterCase) {
     source.takeHeader("access-control-request-method", "POST");
     source.takeHeader("Access-Control-Request-Headers", "x");
     source.takeHeader("X-Forwarded-Host", "c");
-    EXPECT_EQ(source.hosts, (std::vector<std::string>{"a", "b"}));
-    EXPECT_EQ(source.origins, (std::vector<std::string>{"null"}));
+    EXPECT_EQ(source.hosts, (std::vector<std::string_view>{"a", "b"}));
+    EXPECT_EQ(source.origins, (std::vector<std::string_view>{"null"}));
     EXPECT_EQ(source.wantedMethod, "POST");
     EXPECT_EQ(source.wantedHeaders, "x");
 }

@@ -24,6 +24,16 @@ TEST(RpcError, IsNotAMemberOfAResultNorATextInIt) {
     EXPECT_FALSE(hasRpcError(R"([{"id":1,"result":{"value":[{"error":1}]}}])"));
 }
 
+TEST(RpcError, IsFoundBehindIdsThatLookLikeAResult) {
+    EXPECT_TRUE(hasRpcError(R"({"id":"result","error":{}})"));
+    EXPECT_TRUE(hasRpcError(R"({"id":"\"result\":","error":{}})"));
+    EXPECT_TRUE(hasRpcError(R"({"id":{"result":1},"error":{}})"));
+    EXPECT_TRUE(hasRpcError(R"({"id":[{"result":1}],"error":{}})"));
+    EXPECT_TRUE(hasRpcError(R"({"error":{"data":{"result":1}},"id":1})"));
+    EXPECT_TRUE(hasRpcError(R"({"error":1,"result":1})"));
+    EXPECT_TRUE(hasRpcError(R"({"id":")" + std::string(1000, 'x') + R"(","error":{}})"));
+}
+
 TEST(RpcError, IsNotInWhatIsNoResponse) {
     EXPECT_FALSE(hasRpcError(""));
     EXPECT_FALSE(hasRpcError("error"));
