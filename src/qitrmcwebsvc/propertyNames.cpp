@@ -1,6 +1,7 @@
 #include "qitrmcwebsvc/propertyNames.h"
 
 #include <algorithm>
+#include <cstring>
 #include <iterator>
 #include <string_view>
 
@@ -71,7 +72,12 @@ std::set<std::string> propertyNames(nQITRMCAPI100_Session session, PropertyCateg
 bool isPropertyName(nQITRMCAPI100_Session session, PropertyCategory category,
                     const std::string& name) {
     const ListedNames listed(session, nameListOf(category));
-    return !isHidden(name) && std::find(listed.begin(), listed.end(), name) != listed.end();
+    // Most names differ within the first characters, so their lengths need not be known.
+    const bool isListed = std::any_of(listed.begin(), listed.end(), [&name](const char* other) {
+        return std::strcmp(other, name.c_str()) == 0;
+    });
+    // Behind a NUL, which the driver's names cannot contain, strcmp does not look.
+    return isListed && name.find('\0') == std::string::npos && !isHidden(name);
 }
 
 }  // namespace nQITRMCWEBSVC100

@@ -53,6 +53,13 @@ TEST_F(PropertyNamesTest, OmitTwelveNamesFromEveryList) {
     EXPECT_FALSE(isPropertyName(7, PropertyCategory::NvmemArea, "Dev.TCPIP.Hostname"));
 }
 
+TEST_F(PropertyNamesTest, DoNotEqualANameThatGoesOnBehindANul) {
+    give("getSystemPropertyStringArray(7, \"Sys.DeviceProperties\")", Texts{"Dev.Type", ""});
+    EXPECT_TRUE(isPropertyName(7, PropertyCategory::Device, "Dev.Type"));
+    EXPECT_FALSE(isPropertyName(7, PropertyCategory::Device, std::string("Dev.Type\0", 9)));
+    EXPECT_FALSE(isPropertyName(7, PropertyCategory::Device, std::string("\0Dev.Type", 9)));
+}
+
 TEST_F(PropertyNamesTest, AreReadAgainEachTime) {
     EXPECT_FALSE(isPropertyName(7, PropertyCategory::PhysChan, "PhysChan.New"));
     give("getSystemPropertyStringArray(7, \"Sys.PhysChanProperties\")", Texts{"PhysChan.New"});
