@@ -19,8 +19,8 @@ def read(host):
 
 
 class Growth:
-    """How much each count grows in a block. The host counts a request when its response is gone, so a
-    count is read until it is there."""
+    """How much each count grows in a block. The host counts a request when its response is gone, and the
+    end of a connection when it has seen it, so a count is read until it is right."""
 
     def __init__(self, host):
         self.host = host
@@ -29,7 +29,7 @@ class Growth:
     def expect(self, name, count):
         for _ in range(PATIENCE * 100):
             grown = read(self.host)[name] - self.before[name]
-            if grown >= count:
+            if grown == count:
                 break
         assert grown == count
 
