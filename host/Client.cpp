@@ -217,8 +217,8 @@ MHD_Daemon* Client::startDaemon(const Service& service, Client* client, bool inS
 }
 
 // Hands the socket over to an instance of the library. It takes the socket in at its first run.
-// An instance that is told what is ready makes fewer system calls than one that looks by itself,
-// but the type in which it is told holds small descriptors only.
+// Given an fd_set of what is ready, the library needs no epoll_wait of its own. An fd_set holds
+// only descriptors below FD_SETSIZE.
 bool Client::begin() noexcept {
     const bool inSet = socket >= FD_SETSIZE;
     daemon = startDaemon(service, this, inSet);
