@@ -1,9 +1,11 @@
 // A driver whose functions do almost nothing, linked in place of the real one so that only the
 // service is measured. It returns constants, in constant memory where the interface allows it.
 //
-// Its names: devices Mod1 to Mod18, channels Mod1/ch0 to Mod1/ch7, the NVMEM area Mod1/user, and
+// Its names: devices Mod1 and so on, channels Mod1/ch0 to Mod1/ch7, the NVMEM area Mod1/user, and
 // property lists as long as those of a real system. Every property is a Double of resources, or an
 // array with one Double for each resource. Each session opened gets the next handle.
+
+#include "FreeDriver.h"
 
 #include <qitrmcapi.h>
 
@@ -12,6 +14,8 @@
 #include <cstdlib>
 #include <cstring>
 #include <iterator>
+#include <string>
+#include <vector>
 
 namespace {
 
@@ -58,10 +62,6 @@ constexpr const char* deviceProperties[] = {
     "Dev.TCPIP.LastConnectedEthernetIP",
     "Dev.Temperature",
 };
-constexpr const char* devices[] = {
-    "Mod1",  "Mod2",  "Mod3",  "Mod4",  "Mod5",  "Mod6",  "Mod7",  "Mod8",  "Mod9",
-    "Mod10", "Mod11", "Mod12", "Mod13", "Mod14", "Mod15", "Mod16", "Mod17", "Mod18",
-};
 constexpr const char* channels[] = {
     "Mod1/ch0", "Mod1/ch1", "Mod1/ch2", "Mod1/ch3", "Mod1/ch4", "Mod1/ch5", "Mod1/ch6", "Mod1/ch7",
 };
@@ -78,8 +78,28 @@ constexpr List list(const char* name, const char* const (&texts)[count]) {
     return {name, texts, count};
 }
 
-constexpr List lists[] = {
-    list("Sys.Devices", devices),
+struct Devices {
+    explicit Devices(std::uint32_t count) {
+        for (std::uint32_t i = 1; i <= count; ++i) {
+            names.push_back("Mod" + std::to_string(i));
+        }
+        for (const std::string& name : names) {
+            texts.push_back(name.c_str());
+        }
+    }
+
+    std::vector<std::string> names;
+    std::vector<const char*> texts;
+};
+
+List listOf(const Devices& all) {
+    return {"Sys.Devices", all.texts.data(), all.texts.size()};
+}
+
+Devices devices(defaultDeviceCount);
+
+List lists[] = {
+    listOf(devices),
     list("Sys.SessionProperties", sessionProperties),
     list("Sys.SystemProperties", systemProperties),
     list("Sys.DeviceProperties", deviceProperties),
@@ -87,7 +107,7 @@ constexpr List lists[] = {
     list("Dev.NVMEM.Areas", areas),
 };
 
-// An unknown list is empty. The texts are constants, which the caller does not modify.
+// An unknown list is empty. The caller does not modify the texts.
 void lendList(const char* name, char*** array, std::uint32_t* count) {
     const auto found = std::find_if(std::begin(lists), std::end(lists), [&](const List& candidate) {
         return std::strcmp(candidate.name, name) == 0;
@@ -103,6 +123,11 @@ using Name = const char*;
 std::atomic<Session> lastSession{0};
 
 }  // namespace
+
+void setDeviceCount(std::uint32_t count) {
+    devices = Devices(count);
+    lists[0] = listOf(devices);
+}
 
 #define DEFINE(name, ...) void nQITRMCAPI100_##name(__VA_ARGS__, qierr_Status*)
 #define IDLE(name, ...) \

@@ -5,6 +5,7 @@
 
 #include <string>
 
+#include "FreeDriver.h"
 #include "Service.h"
 
 namespace {
@@ -39,6 +40,19 @@ std::string getTemperatures(const std::string& session, const std::string& resou
 
 std::string namesInDevices(const std::string& session, Count count) {
     return getTemperatures(session, R"("devices":)" + array("\"Mod9\"", count));
+}
+
+// The names of all devices from the last one of the driver's list to the first, in other letters,
+// and again from the last one.
+constexpr Count manyDevices = 4000;
+
+std::string namesOfManyDevices(const std::string& session, Count count) {
+    std::string names;
+    for (Count i = 0; i < count; ++i) {
+        names +=
+            (i == 0 ? "\"MOD" : ",\"MOD") + std::to_string(manyDevices - i % manyDevices) + '"';
+    }
+    return getTemperatures(session, R"("devices":[)" + names + "]");
 }
 
 std::string namesInOneText(const std::string& session, Count count) {
@@ -136,13 +150,16 @@ struct Case {
     Count first;
     Count last;
     bool succeeds;
+    std::uint32_t devices;
 };
 
-#define CASE(make, first, last, succeeds) \
-    { #make, make, first, last, succeeds }
+#define CASE_AMONG(devices, make, first, last, succeeds) \
+    { #make, make, first, last, succeeds, devices }
+#define CASE(...) CASE_AMONG(defaultDeviceCount, __VA_ARGS__)
 
 const Case cases[] = {
     CASE(namesInDevices, 1024, 65536, true),
+    CASE_AMONG(manyDevices, namesOfManyDevices, 1024, 65536, true),
     CASE(namesInOneText, 1024, 65536, true),
     CASE(namesInRanges, 1024, 65536, true),
     CASE(batchElements, 64, 4096, true),
@@ -163,6 +180,7 @@ const Case cases[] = {
 };
 
 void runGrowth(benchmark::State& state, const Case& measured) {
+    setDeviceCount(measured.devices);
     Service service;
     const std::string session = R"("session_id":")" + service.openSession("Mod1") + '"';
     const std::string request = measured.make(session, state.range(0));
@@ -173,6 +191,7 @@ void runGrowth(benchmark::State& state, const Case& measured) {
         benchmark::DoNotOptimize(service.answer(request));
     }
     state.SetComplexityN(state.range(0));
+    setDeviceCount(defaultDeviceCount);
 }
 
 const bool registered = [] {

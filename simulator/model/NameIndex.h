@@ -12,7 +12,9 @@ namespace simulator {
 struct HashedName {
     explicit HashedName(std::string_view text)
         : text(text), hash(std::hash<std::string_view>()(text)) {}
-    bool operator==(const HashedName& other) const { return text == other.text; }
+    bool operator==(const HashedName& other) const {
+        return hash == other.hash && text == other.text;
+    }
 
     std::string_view text;
     std::size_t hash;

@@ -49,8 +49,10 @@ class DriverStringArray {
     char*** outArray() { return &array; }
     std::uint32_t* outCount() { return &count; }
 
+    std::uint32_t size() const { return array != nullptr ? count : 0; }
+    const char* operator[](std::uint32_t position) const { return *Iterator(array + position); }
     Iterator begin() const { return Iterator(array); }
-    Iterator end() const { return Iterator(array + (array != nullptr ? count : 0)); }
+    Iterator end() const { return Iterator(array + size()); }
 
   private:
     char** array = nullptr;

@@ -1,15 +1,12 @@
 #include "qitrmcwebsvc/RequestResource.h"
 
-#include <algorithm>
-#include <cstring>
 #include <optional>
 #include <utility>
 
 #include "qitrmcsharedcmn/Exceptions.h"
 #include "qitrmcsharedcmn/parseUtilities.h"
-#include "qitrmcwebsvc/DriverOwners.h"
+#include "qitrmcwebsvc/KnownNames.h"
 #include "qitrmcwebsvc/findMember.h"
-#include "qitrmcwebsvc/foldedText.h"
 #include "qitrmcwebsvc/resourceTokens.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -33,36 +30,6 @@ constexpr std::pair<const char*, ResourceKind> resourceMembers[] = {
     addUsageString(error.details(), "kUsageTypeRequestedValue", name.c_str());
     throw error;
 }
-
-// A list of names that the constructor reads from the driver.
-class KnownNames {
-  public:
-    explicit KnownNames(nQITRMCAPI100_Session session) {
-        nQITRMCAPI100_getSystemPropertyStringArray(session, "Sys.Devices", names.outArray(),
-                                                   names.outCount(), &status);
-    }
-    KnownNames(nQITRMCAPI100_Session session, const std::string& device, const char* property) {
-        nQITRMCAPI100_getGenericPropertyStringArray(session, device.c_str(), property,
-                                                    names.outArray(), names.outCount(), &status);
-    }
-
-    // Returns false for every name if the list could not be read. Most names are spelled like the
-    // driver's, and comparing bytes takes a fraction of the time in a list of thousands.
-    bool contains(const std::string& name) const {
-        return status.code >= 0 &&
-               (any([&](const char* known) { return std::strcmp(known, name.c_str()) == 0; }) ||
-                any([&](const char* known) { return equalFolded(name, known); }));
-    }
-
-  private:
-    template <typename Condition>
-    bool any(Condition condition) const {
-        return std::any_of(names.begin(), names.end(), condition);
-    }
-
-    qierr::Status status;
-    DriverStringArray names;
-};
 
 }  // namespace
 

@@ -88,4 +88,19 @@ bool equalFolded(std::string_view left, std::string_view right) {
     return leftPoints.atEnd() && rightPoints.atEnd();
 }
 
+// FNV-1a of the folded code points.
+std::uint32_t hashFolded(std::string_view text) {
+    std::uint32_t hash = 2166136261U;
+    const auto add = [&hash](std::uint32_t codePoint) { hash = (hash ^ codePoint) * 16777619U; };
+    while (!text.empty() && isAscii(text.front())) {
+        add(static_cast<unsigned char>(foldAscii(text.front())));
+        text.remove_prefix(1);
+    }
+    FoldedCodePoints others(text);
+    while (!others.atEnd()) {
+        add(static_cast<std::uint32_t>(others.take()));
+    }
+    return hash;
+}
+
 }  // namespace nQITRMCWEBSVC100

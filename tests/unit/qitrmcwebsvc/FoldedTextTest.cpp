@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 using nQITRMCWEBSVC100::equalFolded;
+using nQITRMCWEBSVC100::hashFolded;
 
 namespace {
 
@@ -46,6 +47,21 @@ TEST(EqualFolded, ComparesBytesThatAreNotUtf8Unchanged) {
     EXPECT_FALSE(equalFolded("a\xff", "A\xfe"));
     EXPECT_FALSE(equalFolded("\xc3", "\u00c3"));
     EXPECT_TRUE(equalFolded("\xc3X", "\xc3x"));
+}
+
+TEST(HashFolded, IsTheSameForEqualTexts) {
+    EXPECT_EQ(hashFolded("Mod1/CH0"), hashFolded("mod1/ch0"));
+    EXPECT_EQ(hashFolded("10 \u212a"), hashFolded("10 k"));
+    EXPECT_EQ(hashFolded("MA\ufb03x"), hashFolded("maFFIX"));
+    EXPECT_EQ(hashFolded("\u0390"), hashFolded("\u03b9\u0308\u0301"));
+    EXPECT_EQ(hashFolded("A\xff"), hashFolded("a\xff"));
+}
+
+TEST(HashFolded, DiffersBetweenMostTexts) {
+    EXPECT_NE(hashFolded("Mod1"), hashFolded("Mod2"));
+    EXPECT_NE(hashFolded("Mod12"), hashFolded("Mod21"));
+    EXPECT_NE(hashFolded("\u00e4"), hashFolded("\u00eb"));
+    EXPECT_NE(hashFolded(""), hashFolded("M"));
 }
 
 }  // namespace

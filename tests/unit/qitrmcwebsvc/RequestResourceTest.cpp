@@ -115,6 +115,21 @@ TEST_F(RequestResourceTest, RefusesANameThatTheDriverDoesNotKnow) {
     EXPECT_EQ(failureOf([] { check("{\"nvmem_area\":\"Mod1\"}"); }), unknown + "Mod1");
 }
 
+TEST_F(RequestResourceTest, RefusesTheFirstOfSeveralUnknownNamesInALongList) {
+    Calls names;
+    std::string requested = "Mod0";
+    for (int i = 0; i < 100; ++i) {
+        names.push_back("Mod" + std::to_string(i));
+        requested += ",mod" + std::to_string(i);
+    }
+    driver.give("getSystemPropertyStringArray(7, \"Sys.Devices\")", names);
+    EXPECT_EQ(failureOf([&] { check("{\"devices\":\"" + requested + ",second,Mod1,first\"}"); }),
+              unknown + "second");
+    EXPECT_EQ(failureOf([&] { check("{\"devices\":\"first," + requested + ",second\"}"); }),
+              unknown + "first");
+    EXPECT_EQ(check("{\"devices\":\"" + requested + "\"}").joinedNames(), requested);
+}
+
 TEST_F(RequestResourceTest, ReportsAnUnreadableListAsAnUnknownName) {
     driver.fail("getGenericPropertyStringArray(7, \"Mod9\", \"Dev.PhysChans\")", -12);
     EXPECT_EQ(failureOf([] { check("{\"physical_channel\":\"Mod9/ch0\"}"); }),
