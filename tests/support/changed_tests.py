@@ -65,7 +65,7 @@ def changed_since(time):
 
 
 def is_test_file(name):
-    return re.fullmatch(r"tests/.*/test_\w+\.py", name) is not None
+    return re.fullmatch(r"tests/.*/(test_\w+\.py|\w+\.test\.mjs)", name) is not None
 
 
 def tests_near(name):
@@ -78,7 +78,8 @@ def files_of(tests):
     """The test files in the folders and files, without those that take too long."""
     for test in tests:
         path = ROOT / test
-        for file in sorted(path.rglob("test_*.py")) if path.is_dir() else [path]:
+        found = [*path.rglob("test_*.py"), *path.rglob("*.test.mjs")] if path.is_dir() else [path]
+        for file in sorted(found):
             name = str(file.relative_to(ROOT))
             if name == test or name not in TOO_LONG:
                 yield name
@@ -92,10 +93,8 @@ def chosen_files(changed):
 
 def built_since(build, time):
     """The names of the test programs that were built after the time."""
-    registered = build.rglob("*_tests.cmake")
-    programs = {re.sub(r"\[\d+\]_tests$", "", path.stem) for path in registered}
-    return sorted(name for name in programs
-                  if (build / "bin" / name).exists() and (build / "bin" / name).stat().st_mtime > time)
+    return sorted(path.name for path in (build / "bin").iterdir()
+                  if path.name.endswith(("_test", "_unit")) and path.stat().st_mtime > time)
 
 
 def main():

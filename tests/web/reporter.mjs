@@ -1,4 +1,4 @@
-// A line of JSON for each test, for test_page.py.
+// A line of JSON for each test, for browser.py.
 export default async function* report(events) {
   for await (const { type, data } of events) {
     if (type !== "test:pass" && type !== "test:fail") continue;
