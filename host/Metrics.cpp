@@ -100,12 +100,6 @@ void Metrics::countTime(Seconds time) noexcept {
     add(some.nanoseconds, std::chrono::duration_cast<std::chrono::nanoseconds>(time).count());
 }
 
-std::size_t Metrics::threadNumber() noexcept {
-    static std::atomic<std::size_t> next{0};
-    thread_local const std::size_t number = next++;
-    return number;
-}
-
 void Metrics::addUp(Counts& total, const Counts& some) noexcept {
     add(total.openConnections, some.openConnections.load());
     add(total.allConnections, some.allConnections.load());
@@ -125,9 +119,7 @@ void Metrics::addUp(Counts& total, const Counts& some) noexcept {
 
 std::string Metrics::text() const {
     Counts total;
-    for (const Counts& some : counts) {
-        addUp(total, some);
-    }
+    counts.forEach([&](const Counts& some) { addUp(total, some); });
     std::vector<MetricFamily> families = {
         requestsFamily(total.ended),
         timesFamily(bounds, total.buckets, total.nanoseconds),

@@ -9,6 +9,7 @@
 #include <optional>
 #include <string>
 
+#include "common/ThreadShares.h"
 #include "host/Site.h"
 
 namespace host {
@@ -71,7 +72,7 @@ class Metrics {
 
     // What some of the threads have counted. What one of them adds another one may subtract, so
     // only the sums over all threads mean something.
-    struct alignas(64) Counts {
+    struct Counts {
         Count openConnections{0};
         Count allConnections{0};
         Count inFlight{0};
@@ -83,12 +84,11 @@ class Metrics {
     };
 
     // The counts that the calling thread adds to.
-    Counts& own() noexcept { return counts[threadNumber() % counts.size()]; }
-    static std::size_t threadNumber() noexcept;
+    Counts& own() noexcept { return counts.own(); }
 
     static void addUp(Counts& total, const Counts& some) noexcept;
 
-    std::array<Counts, 8> counts;
+    common::ThreadShares<Counts> counts;
     const DriverCalls driverCalls;
 };
 

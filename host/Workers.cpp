@@ -58,7 +58,7 @@ bool setWatched(int readySet, int operation, Watched* watched) {
 
 Workers::Workers(std::uint32_t most)
     : most(most),
-      usual(std::min<std::size_t>(most, std::thread::hardware_concurrency() + 1)),
+      usual(std::min(most, std::max(2u, std::thread::hardware_concurrency()))),
       readySet(epoll_create1(EPOLL_CLOEXEC)),
       endEvent(eventfd(0, EFD_CLOEXEC)) {
     epoll_event event = {};

@@ -25,8 +25,9 @@ class Watched {
 };
 
 // Threads that serve what is ready, each of them one thing at a time. As many work as the
-// machine has processors, and one more. When a call of serve() lasts longer than a moment, another
-// thread takes the place of the one that is in it, so that a call that waits delays no other one.
+// machine has processors, but at least two. When a call of serve() lasts longer than a moment,
+// another thread takes the place of the one that is in it, so that a call that waits delays no
+// other one.
 class Workers {
   public:
     // most: how many threads there may be at once; when all of them wait, nothing else is served.
@@ -43,8 +44,9 @@ class Workers {
     bool watch(Watched* watched) noexcept;
 
   private:
-    // One thread. The number is odd while it serves something.
-    struct Worker {
+    // One thread. The number is odd while it serves something. In a cache line of its own, since
+    // its thread writes to it all the time.
+    struct alignas(64) Worker {
         explicit Worker(Workers& all) : all(all) {}
 
         Workers& all;

@@ -40,7 +40,7 @@ class Ledger {
     };
 
     // Several tables, so that threads seldom wait for each other.
-    struct Part {
+    struct alignas(64) Part {
         // Removes memory without a use. Returns whether there was none.
         bool removeUnused(std::unordered_map<const void*, Use>::iterator place) noexcept;
 

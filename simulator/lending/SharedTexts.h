@@ -7,6 +7,8 @@
 #include <string_view>
 #include <vector>
 
+#include "common/ThreadShares.h"
+
 namespace simulator {
 
 // An array of texts that is lent to any number of callers at the same time, who only read it.
@@ -28,32 +30,40 @@ class SharedTexts {
     const std::uint32_t size;
 };
 
-// Shared texts that are made when they are first needed, and again after a change.
+// Shared texts that are made when they are first needed, and again after a change. Several threads
+// get several copies, since each loan of the same memory is counted in the same place.
 class TextsOnDemand {
   public:
     // make() returns the texts. Throws what make() throws, and std::bad_alloc. Several threads may
     // call it at the same time.
     template <typename Make>
     const SharedTexts& get(Make make) const {
-        const SharedTexts* ready = made.load(std::memory_order_acquire);
+        Copy& copy = copies.own();
+        const SharedTexts* ready = copy.made.load(std::memory_order_acquire);
         if (ready == nullptr) {
-            const std::lock_guard<std::mutex> lock(mutex);
-            ready = texts ? &*texts : &texts.emplace(make());
-            made.store(ready, std::memory_order_release);
+            const std::lock_guard<std::mutex> lock(copy.mutex);
+            ready = copy.texts ? &*copy.texts : &copy.texts.emplace(make());
+            copy.made.store(ready, std::memory_order_release);
         }
         return *ready;
     }
     // Must not run beside get().
     void discard() noexcept {
-        made.store(nullptr, std::memory_order_relaxed);
-        texts.reset();
+        copies.forEach([](Copy& copy) {
+            copy.made.store(nullptr, std::memory_order_relaxed);
+            copy.texts.reset();
+        });
     }
 
   private:
-    mutable std::mutex mutex;
-    mutable std::optional<SharedTexts> texts;
-    // Null, or the texts.
-    mutable std::atomic<const SharedTexts*> made{nullptr};
+    struct Copy {
+        std::mutex mutex;
+        std::optional<SharedTexts> texts;
+        // Null, or the texts.
+        std::atomic<const SharedTexts*> made{nullptr};
+    };
+
+    mutable common::ThreadShares<Copy> copies;
 };
 
 }  // namespace simulator

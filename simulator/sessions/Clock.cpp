@@ -22,10 +22,16 @@ std::int64_t Clock::now() const {
 }
 
 void Clock::noteCall() {
-    begun.fetch_add(1, std::memory_order_relaxed);
+    begun.own().fetch_add(1, std::memory_order_relaxed);
     if (scale.byCalls) {
         stepped += callStep;
     }
+}
+
+std::uint64_t Clock::calls() const {
+    std::uint64_t sum = 0;
+    begun.forEach([&](const std::atomic<std::uint64_t>& some) { sum += some.load(); });
+    return sum;
 }
 
 void Clock::skip(double seconds) {

@@ -4,6 +4,7 @@
 #include <chrono>
 #include <cstdint>
 
+#include "common/ThreadShares.h"
 #include "description/Environment.h"
 
 namespace simulator {
@@ -20,7 +21,7 @@ class Clock {
     // A call of the driver begins: by calls, a millisecond has passed.
     void noteCall();
     // How many calls have begun.
-    std::uint64_t calls() const { return begun.load(std::memory_order_relaxed); }
+    std::uint64_t calls() const;
 
     // Whether what takes time is over at once, with the clock moved on by skip().
     bool goesByCalls() const { return scale.byCalls; }
@@ -36,7 +37,7 @@ class Clock {
     Real::time_point start = Real::now();
     // By calls, the time itself in microseconds.
     std::int64_t stepped = 0;
-    std::atomic<std::uint64_t> begun{0};
+    common::ThreadShares<std::atomic<std::uint64_t>> begun;
 };
 
 }  // namespace simulator

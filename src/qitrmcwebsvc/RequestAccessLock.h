@@ -1,5 +1,6 @@
 #pragma once
 
+#include <atomic>
 #include <condition_variable>
 #include <cstdint>
 #include <mutex>
@@ -26,13 +27,17 @@ class RequestAccessLock {
     void unlockExclusive();
 
   private:
-    void wakeWaiters();
+    // The parts of the number of holders. Neither the requests nor the batches under way at the
+    // same time come near 65,536: each has a thread.
+    static constexpr std::uint32_t reader = 1;        // a shared holder
+    static constexpr std::uint32_t writer = 1 << 16;  // an exclusive holder or waiting caller
+
+    bool addReader() noexcept;
 
     std::condition_variable readersCondition;
     std::condition_variable writersCondition;
-    std::int32_t readers = 0;  // shared holders
-    std::int32_t writers = 0;  // exclusive holder and waiting exclusive callers
-    std::mutex mutex;          // held only inside the four operations
+    std::atomic<std::uint32_t> holders{0};  // a shared caller needs nothing else without a writer
+    std::mutex mutex;                       // held only inside the four operations
 };
 
 // Holds the lock shared during its lifetime.

@@ -61,6 +61,11 @@ def test_a_path_longer_than_the_head_may_be_is_refused(host):
     assert host.request("GET", "/" + "a" * 200000)[0] in (414, 431)
 
 
+@pytest.mark.parametrize("size, code", [(15 * 1024, 404), (17 * 1024, 431)])
+def test_a_head_of_fifteen_kilobytes_is_read(host, size, code):
+    assert host.request("GET", "/nothing", headers={"X-Long": "a" * size})[0] == code
+
+
 def test_the_service_answers_beside_the_page_as_without_it(host):
     body = b'{"jsonrpc": "2.0", "id": 1, "method": "initializeSession"}'
     status, headers, answer = host.post(body)
