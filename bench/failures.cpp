@@ -30,8 +30,13 @@ constexpr const char* plainName = "plain_mxlator";
 
 // ---- Memory -------------------------------------------------------------------------------------
 
+bool isCounting = false;
 std::int64_t liveBytes = 0;
 std::int64_t peakBytes = 0;
+
+std::int64_t sizeOf(void* block) {
+    return static_cast<std::int64_t>(::malloc_usable_size(block));
+}
 
 void account(std::int64_t change) {
     liveBytes += change;
@@ -41,17 +46,18 @@ void account(std::int64_t change) {
 }  // namespace
 
 // Replaces the allocation function of the translation layers. Counts without a lock, for the single
-// thread of the benchmarks, since the cost of counting is added to each of the many allocations.
+// thread of the benchmarks, and only outside the measurement of time, to which counting would add
+// some cost with each of the many allocations.
 void* qihtl_realloc(void* block, std::size_t size) {
-    const auto oldSize = static_cast<std::int64_t>(::malloc_usable_size(block));
+    const std::int64_t oldSize = isCounting ? sizeOf(block) : 0;
+    void* moved = nullptr;
     if (size == 0) {
-        account(-oldSize);
         std::free(block);
-        return nullptr;
+    } else {
+        moved = std::realloc(block, size);
     }
-    void* const moved = std::realloc(block, size);
-    if (moved != nullptr) {
-        account(static_cast<std::int64_t>(::malloc_usable_size(moved)) - oldSize);
+    if (isCounting && (moved != nullptr || size == 0)) {
+        account(sizeOf(moved) - oldSize);
     }
     return moved;
 }
@@ -85,8 +91,11 @@ double systemNanoseconds() {
 
 template <typename Action>
 void measure(benchmark::State& state, Action action) {
+    isCounting = true;
     const std::int64_t before = liveBytes;
     peakBytes = before;
+    action();
+    isCounting = false;
     const double systemBefore = systemNanoseconds();
     for (auto _ : state) {
         action();

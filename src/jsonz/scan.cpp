@@ -20,6 +20,26 @@ const char* fail(jsonz_value* value, const char* position, jsonz_error error) {
 
 namespace {
 
+struct ByteSet {
+    bool contains[256];
+};
+
+// The bytes that stand for themselves in a string.
+constexpr ByteSet plainBytes = [] {
+    ByteSet set{};
+    for (int byte = 0x20; byte < 256; ++byte) {
+        set.contains[byte] = byte != '"' && byte != '\\';
+    }
+    return set;
+}();
+
+const char* skipPlain(const char* position) {
+    while (plainBytes.contains[static_cast<unsigned char>(*position)]) {
+        ++position;
+    }
+    return position;
+}
+
 const char* skipDigits(const char* position) {
     while (isDigit(*position)) {
         ++position;
@@ -96,14 +116,10 @@ const char* readString(const char* position, jsonz_value* value) {
     if (*position != '"') {
         return fail(value, position, jsonz_errorDoubleQuoteExpected);
     }
-    const char* p = position + 1;
-    while (*p != '"') {
-        if (static_cast<unsigned char>(*p) < 0x20) {
-            return fail(value, p, jsonz_errorDoubleQuoteExpected);
-        }
+    const char* p = skipPlain(position + 1);
+    for (; *p != '"'; p = skipPlain(p)) {
         if (*p != '\\') {
-            ++p;
-            continue;
+            return fail(value, p, jsonz_errorDoubleQuoteExpected);
         }
         bool valid = true;
         p = skipEscape(p + 1, &valid);

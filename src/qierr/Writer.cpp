@@ -23,7 +23,7 @@ bool isOpening(char c) {
 // ---- Escaping -----------------------------------------------------------------------------------
 
 // The letter of a character's two-character escape sequence, or 0 if it has none.
-char escapeLetter(char c) {
+constexpr char escapeLetter(char c) {
     switch (c) {
         case '\b':
             return 'b';
@@ -43,32 +43,47 @@ char escapeLetter(char c) {
     }
 }
 
-bool isControl(char c) {
-    const unsigned char byte = static_cast<unsigned char>(c);
-    return byte < 0x20 || byte == 0x7F;
+// How many bytes each byte becomes.
+struct EscapedSizes {
+    unsigned char of[256];
+};
+
+constexpr EscapedSizes escapedSizes = [] {
+    EscapedSizes sizes{};
+    for (int byte = 0; byte < 256; ++byte) {
+        const bool isShort = escapeLetter(static_cast<char>(byte)) != 0;
+        const bool isControl = byte < 0x20 || byte == 0x7F;
+        sizes.of[byte] = isShort ? 2 : isControl ? 6 : 1;
+    }
+    return sizes;
+}();
+
+unsigned escapedSize(char c) {
+    return escapedSizes.of[static_cast<unsigned char>(c)];
 }
 
 std::uint64_t escapedLength(const char* text) {
     std::uint64_t length = 0;
     for (; *text != '\0'; ++text) {
-        length += escapeLetter(*text) != 0 ? 2 : isControl(*text) ? 6 : 1;
+        length += escapedSize(*text);
     }
     return length;
 }
 
 char* writeEscaped(char* at, const char* text) {
     for (; *text != '\0'; ++text) {
-        if (const char letter = escapeLetter(*text)) {
-            *at++ = '\\';
-            *at++ = letter;
-        } else if (isControl(*text)) {
-            char sequence[8];
-            std::snprintf(sequence, sizeof sequence, "\\u%04x", static_cast<unsigned>(*text));
-            std::memcpy(at, sequence, 6);
-            at += 6;
+        const unsigned size = escapedSize(*text);
+        if (size == 1) {
+            *at = *text;
+        } else if (size == 2) {
+            at[0] = '\\';
+            at[1] = escapeLetter(*text);
         } else {
-            *at++ = *text;
+            char sequence[8];
+            std::snprintf(sequence, sizeof sequence, "\\u%04x", *text & 0xFFu);
+            std::memcpy(at, sequence, 6);
         }
+        at += size;
     }
     return at;
 }

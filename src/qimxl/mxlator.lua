@@ -22,37 +22,30 @@ local attributeUsages = {
     kUsageTypeUnspecifiedProperty = true,
 }
 
--- Whether there is anything to try for this module. A failing require is slow, since it collects the
--- names of all places where it has searched; without a search path it always fails.
-local function mayExist(name)
-    return package.loaded[name] or package.preload[name] or package.path ~= ""
-end
-
--- The first of these modules that can be loaded, or nil.
-local function requireFirst(names)
-    for _, name in ipairs(names) do
-        if mayExist(name) then
-            local success, module = pcall(require, name)
-            if success then
-                return module
-            end
-        end
+-- The module with this name, or nil if it cannot be loaded. A failing require is slow, since it
+-- collects the names of all places where it has searched; without a search path it always fails.
+local function find(name)
+    local module = package.loaded[name]
+    if module then
+        return module
+    end
+    if package.preload[name] or package.path ~= "" then
+        local success, loaded = pcall(require, name)
+        return success and loaded or nil
     end
     return nil
 end
 
-local function moduleNames(prefix, word)
-    local names = { prefix .. word }
-    if word ~= "eng" then
-        names[2] = prefix .. "eng"
-    end
-    return names
+-- The module for a language, or else for English.
+local function findFor(word, prefix, suffix)
+    return find(prefix .. word .. suffix)
+        or word ~= "eng" and find(prefix .. "eng" .. suffix) or nil
 end
 
 ---- Descriptions of codes -------------------------------------------------------------------------
 
 local function fromErrorTable(code, word)
-    local errors = requireFirst(moduleNames("errors_", word))
+    local errors = findFor(word, "errors_", "")
     if not errors then
         return nil
     end
@@ -104,22 +97,19 @@ end
 
 ---- Details of a status ---------------------------------------------------------------------------
 
-local function attributeTableNames(word, ade)
-    local names = {}
+local defaultAttributes = "qimxl_defaultAttrTable"
+
+-- The attribute table of the driver, or else the default one. Nil if it cannot be loaded.
+local function findAttributes(word, ade)
     local driver = qixlatorlua_settings.driverName
-    if driver then
-        local adeName = mxlator.Ades[ade + 1]
-        if ade ~= 0 and adeName then
-            for _, name in ipairs(moduleNames(driver .. "_attributes_", word)) do
-                names[#names + 1] = name .. "_" .. adeName
-            end
-        end
-        for _, name in ipairs(moduleNames(driver .. "_attributes_", word)) do
-            names[#names + 1] = name
-        end
+    if not driver then
+        return find(defaultAttributes)
     end
-    names[#names + 1] = "qimxl_defaultAttrTable"
-    return names
+    local prefix = driver .. "_attributes_"
+    local adeName = ade ~= 0 and mxlator.Ades[ade + 1]
+    return adeName and findFor(word, prefix, "_" .. adeName)
+        or findFor(word, prefix, "")
+        or find(defaultAttributes)
 end
 
 -- Up to this number, every whole number is exactly a number of the interpreter.
@@ -238,9 +228,10 @@ local function debugItems(errorContext, internalError)
     addDebugItem(items, "File", errorContext.file)
     addDebugItem(items, "Line", errorContext.line)
     addDebugItem(items, "internal_error_string", internalError)
-    for _, member in ipairs({ "translator_info", "component", "file", "line" }) do
-        errorContext[member] = nil
-    end
+    errorContext.translator_info = nil
+    errorContext.component = nil
+    errorContext.file = nil
+    errorContext.line = nil
     addDebugItem(items, "rest_of_input_json", cjson.encode(errorContext))
     return items
 end
@@ -252,13 +243,12 @@ function mxlator.getDynamicDesc(errjson, lang, ade, format)
     end
     local errorContext = cjson.decode(errjson)
     local word = mxlator.ThreeLetterLngStrings[lang + 1] or "zzz"
-    local attributeNames = attributeTableNames(word, ade)
-    local attributes = requireFirst(attributeNames)
+    local attributes = findAttributes(word, ade)
     local internalError
     if not attributes then
-        internalError = "Cannot load " .. attributeNames[#attributeNames] .. "\n"
+        internalError = "Cannot load " .. defaultAttributes .. "\n"
     end
-    local terms = requireFirst(moduleNames("commonTerms_", word))
+    local terms = findFor(word, "commonTerms_", "")
     local dynamicArray = dynamicItems(errorContext, terms, attributes)
     local debugArray = debugItems(errorContext, internalError)
     return cjson.encode({ dynamic = dynamicArray, debug = debugArray })

@@ -4,7 +4,7 @@
 #include <cstring>
 #include <mutex>
 
-#include "qisysq/FileIdentity.h"
+#include "qisysq/FileLooks.h"
 #include "qisysq/StandardDirectories.h"
 #include "qisysq/installRoot.h"
 #include "qisysq/stdpath_util.h"
@@ -16,7 +16,9 @@ namespace {
 constexpr const char* whiteSpace = " \t\n\v\f\r";
 
 void assignRooted(const char* path, qihtl::String* directory, qierr_Status* status) {
-    directory->assign(qisysq_installRoot(), status);
+    const char* root = qisysq_installRoot();
+    directory->reserve(static_cast<std::uint32_t>(std::strlen(root) + std::strlen(path)), status);
+    directory->assign(root, status);
     directory->append(path, status);
 }
 
@@ -75,12 +77,11 @@ void getSharedDir(qihtl::String* directory, qierr_Status* status) {
         return;
     }
     const timespec now = fileTime();
-    struct stat info;
-    if (stat(path.c_str(), &info) != 0) {
+    FileIdentity identity;
+    if (!lookAtFile(path.c_str(), &identity)) {
         assignRooted("/usr/local/qinstal/share", directory, status);
         return;
     }
-    const FileIdentity identity(info);
     if (kept.get(path.c_str(), identity, directory, status)) {
         return;
     }

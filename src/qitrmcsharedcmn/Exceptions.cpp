@@ -34,18 +34,14 @@ const char* InternalError::what() const noexcept {
     return status()->json;
 }
 
-void captureCurrentException(qierr_Status* status) {
-    try {
-        throw;
-    } catch (qierr::ExceptionBase& error) {
-        qierr_Status_take(status, error.status());
-    } catch (const std::bad_alloc&) {
+void captureCurrentException(const std::exception& caught, qierr_Status* status) {
+    if (const auto* const own = dynamic_cast<const qierr::ExceptionBase*>(&caught)) {
+        qierr_Status_take(status, own->status());
+    } else if (dynamic_cast<const std::bad_alloc*>(&caught) != nullptr) {
         qierr_Status_setCodeAt(status, qierr::codes::outOfMemory, capturePosition);
-    } catch (const std::exception& error) {
-        if (qierr_Status_setCodeAt(status, qierr::codes::internalError, capturePosition) != 0) {
-            qierr_Writer_addString(qierr_Status_writerAtEnd(status), "std_exception_what",
-                                   error.what());
-        }
+    } else if (qierr_Status_setCodeAt(status, qierr::codes::internalError, capturePosition) != 0) {
+        qierr_Writer_addString(qierr_Status_writerAtEnd(status), "std_exception_what",
+                               caught.what());
     }
 }
 

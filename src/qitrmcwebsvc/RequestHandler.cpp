@@ -48,10 +48,9 @@ JsonValue copyId(const JsonValue& requestValue, JsonAllocator& allocator) {
     return id == nullptr ? JsonValue() : JsonValue(*id, allocator);
 }
 
-// To be called in a catch block.
-void setErrorFromCurrentException(SingleResponse& response) {
+void setErrorFrom(const std::exception& error, SingleResponse& response) {
     qierr::Status status;
-    captureCurrentException(&status);
+    captureCurrentException(error, &status);
     response.setError(status);
 }
 
@@ -89,9 +88,9 @@ std::string RequestHandler::handleRequest(const std::string& body) {
     JsonDocument responseDocument(memory.get());
     try {
         answer(body, responseDocument);
-    } catch (const std::exception&) {
+    } catch (const std::exception& error) {
         SingleResponse response(&responseDocument.GetAllocator());
-        setErrorFromCurrentException(response);
+        setErrorFrom(error, response);
         static_cast<JsonValue&>(responseDocument) = response.getValue();
     }
     return compactJson(responseDocument);
@@ -130,8 +129,8 @@ bool RequestHandler::handleSingleRequest(JsonValue& requestValue, JsonValue& res
     try {
         SingleRequest request(requestValue);
         getProcedure(request.getMethod())->execute(request, response);
-    } catch (const std::exception&) {
-        setErrorFromCurrentException(response);
+    } catch (const std::exception& error) {
+        setErrorFrom(error, response);
         succeeded = false;
     }
     responseValue = response.getValue();

@@ -25,10 +25,10 @@ constexpr std::pair<const char*, ResourceKind> resourceMembers[] = {
     {"nvmem_area", ResourceKind::NvmemArea},
 };
 
-[[noreturn]] void refuseName(const std::string& name) {
+BasicError invalidName(const std::string& name) {
     BasicError error(qierr::codes::invalidResourceName, QITRMC_HERE);
     addUsageString(error.details(), "kUsageTypeRequestedValue", name.c_str());
-    throw error;
+    return error;
 }
 
 }  // namespace
@@ -45,18 +45,13 @@ RequestResource::RequestResource(const JsonValue& params) {
     }
 }
 
-RequestResource::RequestResource(const JsonValue& params, nQITRMCAPI100_Session driverSession,
-                                 ResourceKind defaultKind)
-    : RequestResource(params) {
-    if (resourceKind != ResourceKind::None) {
-        validateResourceNames(driverSession);
-    } else {
+void RequestResource::confirm(nQITRMCAPI100_Session driverSession, ResourceKind defaultKind) {
+    if (resourceKind == ResourceKind::None) {
         applyDefault(defaultKind);
+    } else if (const std::string* const name = firstUnknownName(driverSession)) {
+        throw invalidName(*name);
     }
 }
-
-RequestResource::RequestResource(const JsonValue& params, const SessionContext& session)
-    : RequestResource(params, session.driverSession, session.defaultResourceKind) {}
 
 std::string RequestResource::joinedNames() const {
     return compressNames(resourceNames, NameKind::Path);
@@ -67,7 +62,7 @@ void RequestResource::readNames(const JsonValue& value) {
         const std::string list(text.GetString(), text.GetStringLength());
         // The driver reads a list up to its first NUL, so the names after it would be ignored.
         if (list.find('\0') != std::string::npos) {
-            refuseName(list);
+            throw invalidName(list);
         }
         appendExpanded(resourceNames, list, NameKind::Path);
     };
@@ -82,7 +77,7 @@ void RequestResource::readNames(const JsonValue& value) {
     }
 }
 
-void RequestResource::validateResourceNames(nQITRMCAPI100_Session driverSession) const {
+const std::string* RequestResource::firstUnknownName(nQITRMCAPI100_Session driverSession) const {
     const bool areDevices = resourceKind == ResourceKind::Device;
     const char* property =
         resourceKind == ResourceKind::PhysicalChannel ? "Dev.PhysChans" : "Dev.NVMEM.Areas";
@@ -99,9 +94,10 @@ void RequestResource::validateResourceNames(nQITRMCAPI100_Session driverSession)
             known.emplace(driverSession, name.substr(0, name.find('/')), property);
         }
         if (!known->contains(name)) {
-            refuseName(name);
+            return &name;
         }
     }
+    return nullptr;
 }
 
 void RequestResource::applyDefault(ResourceKind defaultKind) {

@@ -23,11 +23,16 @@ class RequestResource {
 
     // Reads the names from the params and checks that the driver lists them. If the params name no
     // resources, uses the session's default resources of `defaultKind`.
+    // Inline, so that the exception for an unknown name passes one function less.
     RequestResource(const JsonValue& params, nQITRMCAPI100_Session driverSession,
-                    ResourceKind defaultKind);
+                    ResourceKind defaultKind)
+        : RequestResource(params) {
+        confirm(driverSession, defaultKind);
+    }
 
     // The same with the default kind of the session.
-    RequestResource(const JsonValue& params, const SessionContext& session);
+    RequestResource(const JsonValue& params, const SessionContext& session)
+        : RequestResource(params, session.driverSession, session.defaultResourceKind) {}
 
     virtual ~RequestResource() = default;
 
@@ -38,7 +43,9 @@ class RequestResource {
 
   private:
     void readNames(const JsonValue& value);
-    void validateResourceNames(nQITRMCAPI100_Session driverSession) const;
+    // The first name that the driver does not list; null if there is none.
+    const std::string* firstUnknownName(nQITRMCAPI100_Session driverSession) const;
+    void confirm(nQITRMCAPI100_Session driverSession, ResourceKind defaultKind);
     void applyDefault(ResourceKind defaultKind);
 
     ResourceKind resourceKind = ResourceKind::None;

@@ -6,6 +6,7 @@
 #include <utility>
 
 #include "qierr/Status.h"
+#include "qisysq/FileLooks.h"
 #include "qitrmcwebsvc/describeStatus.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -47,6 +48,7 @@ void SingleResponse::setEmptyResult() {
 }
 
 void SingleResponse::setError(const qierr_Status& status) {
+    const qisysq::FileLooks looks;
     JsonValue error(rapidjson::kObjectType);
     JsonValue data(rapidjson::kObjectType);
     const std::string text = describeStatus(status);

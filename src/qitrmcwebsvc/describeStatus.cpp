@@ -1,7 +1,7 @@
 #include "qitrmcwebsvc/describeStatus.h"
 
-#include <algorithm>
 #include <cstdint>
+#include <cstring>
 #include <memory>
 #include <string_view>
 
@@ -38,9 +38,21 @@ void translate(qixlator::Session* session, const qierr_Status& status, qihtl::St
                                                  &failure);
 }
 
+// Reads eight bytes at a time, since nearly every text is ASCII.
 std::size_t asciiLength(std::string_view text) {
-    const auto isOther = [](char byte) { return (byte & 0x80) != 0; };
-    return static_cast<std::size_t>(std::find_if(text.begin(), text.end(), isOther) - text.begin());
+    std::size_t length = 0;
+    std::uint64_t bytes = 0;
+    while (text.size() - length >= sizeof bytes) {
+        std::memcpy(&bytes, text.data() + length, sizeof bytes);
+        if ((bytes & 0x8080808080808080) != 0) {
+            break;
+        }
+        length += sizeof bytes;
+    }
+    while (length < text.size() && (text[length] & 0x80) == 0) {
+        ++length;
+    }
+    return length;
 }
 
 // A text may quote bytes of a request or a file that are not valid UTF-8, which JSON does not
@@ -49,7 +61,6 @@ std::string withValidUtf8(std::string_view text) {
     std::string valid;
     valid.reserve(text.size());
     while (!text.empty()) {
-        // Nearly every text has no other characters.
         const std::size_t length = asciiLength(text);
         valid += text.substr(0, length);
         text.remove_prefix(length);
@@ -71,7 +82,9 @@ std::string describeStatus(const qierr_Status& status) {
     qihtl::String text;
     translate(session.get(), status, &text);
     std::string line = withValidUtf8({text.c_str(), text.length()});
-    std::replace(line.begin(), line.end(), '\n', ' ');
+    for (std::size_t end = 0; (end = line.find('\n', end)) != std::string::npos;) {
+        line[end] = ' ';
+    }
     return line;
 }
 

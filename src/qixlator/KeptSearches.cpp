@@ -4,6 +4,8 @@
 #include <cstring>
 #include <new>
 
+#include "qisysq/FileLooks.h"
+
 namespace qixlator {
 
 namespace {
@@ -11,8 +13,8 @@ namespace {
 using Lock = std::lock_guard<std::mutex>;
 
 bool isNow(const char* path, const qisysq::FileIdentity& identity) {
-    struct stat info;
-    return stat(path, &info) == 0 && qisysq::FileIdentity(info) == identity;
+    qisysq::FileIdentity now;
+    return qisysq::lookAtFile(path, &now) && now == identity;
 }
 
 void destroy(Search* search) {

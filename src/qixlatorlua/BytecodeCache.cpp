@@ -42,7 +42,7 @@ BytecodeCache::BytecodeCache(EmbeddedFiles files, qierr_Status* status) {
 }
 
 void BytecodeCache::check(lua_State* L, const EmbeddedFile& file, qierr_Status* status) {
-    Script script{&file, {}, {}};
+    Script script{&file, moduleNameLength(file), {}, {}};
     const int result = luaL_loadbuffer(L, file.data, file.size, file.name);
     if (result == LUA_ERRMEM) {
         qihtl_reportMemoryFull(status);
@@ -72,7 +72,7 @@ const BytecodeCache* BytecodeCache::ofEmbeddedFiles() {
 
 BytecodeCache::Script* BytecodeCache::find(const char* module, std::size_t length) const {
     for (Script& script : scripts) {
-        if (script.failure.empty() && moduleNameLength(*script.file) == length &&
+        if (script.failure.empty() && script.nameLength == length &&
             std::memcmp(script.file->name, module, length) == 0) {
             return &script;
         }

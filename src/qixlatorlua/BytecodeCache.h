@@ -36,6 +36,8 @@ class BytecodeCache {
   private:
     struct Script {
         const EmbeddedFile* file;
+        // That of the module, without the extension of the file.
+        std::size_t nameLength;
         // Empty until a state has required the script.
         qihtl::String bytecode;
         // The compiler's error message; empty if there is bytecode.

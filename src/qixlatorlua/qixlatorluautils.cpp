@@ -10,10 +10,9 @@
 
 namespace {
 
-constexpr const char* outcomeType = "qixlatorluautils.outcome";
-
-// The working data of a native function. It is a Lua userdata, since any call into Lua may raise an
-// error that skips the destructors of the function; the garbage collector then destroys it.
+// The working data of the native functions, which they share as an upvalue. It is a Lua userdata,
+// since any call into Lua may raise an error that skips the destructors of a function; the next
+// function, or the garbage collector, then destroys what is left.
 struct Outcome {
     qihtl::String text;
     qierr::Status status;
@@ -29,10 +28,17 @@ int endOutcome(lua_State* L) {
     return 0;
 }
 
-Outcome* newOutcome(lua_State* L) {
-    auto* outcome = new (lua_newuserdata(L, sizeof(Outcome))) Outcome();
-    luaL_getmetatable(L, outcomeType);
+void pushOutcome(lua_State* L) {
+    new (lua_newuserdata(L, sizeof(Outcome))) Outcome();
+    lua_createtable(L, 0, 1);
+    lua_pushcfunction(L, endOutcome);
+    lua_setfield(L, -2, "__gc");
     lua_setmetatable(L, -2);
+}
+
+Outcome* newOutcome(lua_State* L) {
+    auto* outcome = static_cast<Outcome*>(lua_touserdata(L, lua_upvalueindex(1)));
+    outcome->reset();
     return outcome;
 }
 
@@ -125,10 +131,7 @@ extern "C" int luaopen_qixlatorluautils(lua_State* L) {
         {"findErrorDescriptionFromFile", findErrorDescriptionFromDir},
         {nullptr, nullptr},
     };
-    luaL_newmetatable(L, outcomeType);
-    lua_pushcfunction(L, endOutcome);
-    lua_setfield(L, -2, "__gc");
-    lua_pop(L, 1);
-    luaL_register(L, "qixlatorluautils", functions);
+    pushOutcome(L);
+    luaL_openlib(L, "qixlatorluautils", functions, 1);
     return 1;
 }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "qitrmcwebsvc/compactJson.h"
 #include "unit/qitrmcwebsvc/requests.h"
 
 using namespace nQITRMCWEBSVC100;
@@ -12,13 +13,6 @@ constexpr const char* dataTypeNames[] = {"Bool",        "Double",     "Int32",  
                                          "String",      "UInt32",     "UInt64",     "BoolArray",
                                          "DoubleArray", "Int32Array", "Int64Array", "StringArray",
                                          "UInt32Array", "UInt64Array"};
-
-std::string compact(const JsonValue& value) {
-    JsonBuffer buffer;
-    JsonWriter writer(buffer);
-    EXPECT_TRUE(value.Accept(writer));
-    return std::string(buffer.GetString(), buffer.GetSize());
-}
 
 // The source position of the failure is left out.
 std::string written(const qierr_Status& status) {
@@ -89,14 +83,14 @@ std::string ProcedureFixture::request(const std::string& method, const std::stri
     SingleResponse response(&answer.GetAllocator());
     try {
         make(*factory, method)->execute(*parsed, response);
-    } catch (const std::exception&) {
+    } catch (const std::exception& caught) {
         EXPECT_FALSE(response.getValue().HasMember("result"));
         qierr::Status status;
-        nQITRMCSHAREDCMN100::captureCurrentException(&status);
+        nQITRMCSHAREDCMN100::captureCurrentException(caught, &status);
         statusText = status.json != nullptr ? status.json : "";
         return written(status);
     }
-    return compact(response.getValue()["result"]);
+    return compactJson(response.getValue()["result"]);
 }
 
 void ProcedureFixture::give(const std::string& call, RecordingDriver::Value value) {
