@@ -5,6 +5,7 @@
 
 #include "qitrmcwebsvc/RequestResource.h"
 #include "qitrmcwebsvc/callDriver.h"
+#include "qitrmcwebsvc/compactJson.h"
 #include "qitrmcwebsvc/procedure/jsonValues.h"
 #include "qitrmcwebsvc/procedure/procedures.h"
 
@@ -43,13 +44,8 @@ void GetNvmemBytes::run(const JsonValue& params, SingleResponse& response) const
                address, buffer.get(), size);
 
     JsonAllocator& allocator = *response.getAllocator();
-    JsonValue data(rapidjson::kArrayType);
-    reserveElements(data, size, allocator);
-    for (std::uint32_t i = 0; i < size; ++i) {
-        appendElement(data, allocator).SetUint(buffer[i]);
-    }
     JsonValue result(rapidjson::kObjectType);
-    result.AddMember("data", data, allocator);
+    result.AddMember("data", byteArray(buffer.get(), size, allocator), allocator);
     result.AddMember("next_address", address + 1, allocator);
     response.setResult(std::move(result));
 }
