@@ -165,7 +165,7 @@ const Case cases[] = {
     CASE(batchElements, 64, 4096, true),
     CASE(valueNumbers, 1024, 65536, true),
     CASE(nvmemBytesRead, 16384, 1048576, true),
-    CASE(nvmemBytesWritten, 1024, 65536, true),
+    CASE(nvmemBytesWritten, 16384, 1048576, true),
     CASE(unknownMembers, 1024, 65536, true),
     CASE(nestedBrackets, 120, 960, true),
     CASE(siblingBrackets, 1024, 65536, true),

@@ -10,6 +10,7 @@
 #include <rapidjson/error/en.h>
 
 #include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/LongArrays.h"
 #include "qitrmcwebsvc/exponentGuard.h"
 
 namespace nQITRMCWEBSVC100 {
@@ -40,7 +41,10 @@ class GuardedDocument {
 
     // `read` is the stream of the reader; its text ends at `end`.
     GuardedDocument(JsonDocument& guarded, const rapidjson::StringStream& read, const char* end)
-        : document(guarded), stream(read), textEnd(end) {}
+        : document(guarded), longArrays(guarded), stream(read), textEnd(end) {}
+
+    // Completes the document after the text was parsed.
+    void finish() { longArrays.place(); }
 
     // The reader itself does not detect all literals that are too big, for example 10e308.
     bool numberTooBig() const { return sawInfinity; }
@@ -49,25 +53,28 @@ class GuardedDocument {
         // The reader advances its stream only after this function, so the literal begins there.
         const double value = nearestDouble(stream.src_, textEnd, approximation);
         sawInfinity = std::isinf(value);
-        return !sawInfinity && document.Double(value);
+        return !sawInfinity && add(value, &JsonDocument::Double);
     }
     bool StartObject() { return enter() && document.StartObject(); }
     bool EndObject(SizeType members) {
         --depth;
         return document.EndObject(members);
     }
-    bool StartArray() { return enter() && document.StartArray(); }
+    bool StartArray() {
+        return enter() && ((depth <= usualNesting && longArrays.begin(stream.src_, textEnd)) ||
+                           document.StartArray());
+    }
     bool EndArray(SizeType elements) {
         --depth;
-        return document.EndArray(elements);
+        return longArrays.isOpen() ? longArrays.finish() : document.EndArray(elements);
     }
 
-    bool Null() { return document.Null(); }
-    bool Bool(bool value) { return document.Bool(value); }
-    bool Int(int value) { return document.Int(value); }
-    bool Uint(unsigned value) { return document.Uint(value); }
-    bool Int64(std::int64_t value) { return document.Int64(value); }
-    bool Uint64(std::uint64_t value) { return document.Uint64(value); }
+    bool Null() { return longArrays.isOpen() ? longArrays.add(JsonValue()) : document.Null(); }
+    bool Bool(bool value) { return add(value, &JsonDocument::Bool); }
+    bool Int(int value) { return add(value, &JsonDocument::Int); }
+    bool Uint(unsigned value) { return add(value, &JsonDocument::Uint); }
+    bool Int64(std::int64_t value) { return add(value, &JsonDocument::Int64); }
+    bool Uint64(std::uint64_t value) { return add(value, &JsonDocument::Uint64); }
     bool RawNumber(const Ch* text, SizeType length, bool copy) {
         return document.RawNumber(text, length, copy);
     }
@@ -79,9 +86,18 @@ class GuardedDocument {
     }
 
   private:
+    // Deeper arrays are not searched for long ones, so that no byte is searched many times.
+    static constexpr int usualNesting = 8;
+
     bool enter() { return ++depth <= maxNesting; }
 
+    template <typename Scalar, typename AddToDocument>
+    bool add(Scalar value, AddToDocument addToDocument) {
+        return longArrays.isOpen() ? longArrays.add(value) : (document.*addToDocument)(value);
+    }
+
     JsonDocument& document;
+    LongArrays longArrays;
     const rapidjson::StringStream& stream;
     const char* const textEnd;
     int depth = 0;
@@ -104,6 +120,7 @@ void parseRequestText(const std::string& body, JsonDocument& document) {
     };
     document.Populate(parse);
     if (!reader.HasParseError()) {
+        handler.finish();
         return;
     }
     const auto code =

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "qitrmcsharedcmn/Exceptions.h"
+#include "qitrmcwebsvc/compactJson.h"
 #include "qitrmcwebsvc/describeStatus.h"
 
 using namespace nQITRMCWEBSVC100;
@@ -40,6 +41,12 @@ std::string nested(const std::string& open, int depth, const std::string& close)
         text += close;
     }
     return text;
+}
+
+void expectUnchanged(const std::string& text) {
+    JsonDocument document;
+    parseRequestText(text, document);
+    EXPECT_EQ(compactJson(document), text);
 }
 
 TEST(RequestText, ReportsWhatIsWrongAndWhere) {
@@ -156,6 +163,48 @@ TEST(RequestText, AnUncountableNumberOfDigitsIsNoMemoryInsteadOfACrash) {
     const std::string body = "[0." + std::string(300000000, '0') + "e2147483650]";
     JsonDocument document;
     EXPECT_THROW(parseRequestText(body, document), std::bad_alloc);
+}
+
+TEST(RequestText, ReadsLongArraysLikeShortOnes) {
+    std::string bytes;
+    std::string mixed;
+    for (int i = 0; i < 5000; ++i) {
+        bytes += (i == 0 ? "" : ",") + std::to_string(i % 256);
+        mixed += "-1,0.5,null,true,false,4294967296,-4294967296,18446744073709551615,";
+    }
+    mixed += "7";
+    for (const std::string& elements : {bytes, mixed}) {
+        const std::string array = "[" + elements + "]";
+        expectUnchanged(array);
+        expectUnchanged("{\"a\":" + array + ",\"b\":\"text\",\"c\":[]}");
+        expectUnchanged("[1,[" + array + ",2," + array + "],[" + elements + ",[3]]]");
+        expectUnchanged("[" + elements + ",\"a]\"," + elements + "]");
+        expectUnchanged("[" + elements + ",{\"a\":" + array + "}]");
+        for (const int depth : {7, 8, 9, 999}) {
+            expectUnchanged(std::string(depth, '[') + array + std::string(depth, ']'));
+        }
+    }
+}
+
+TEST(RequestText, ReportsWhatIsWrongInALongArray) {
+    std::string array = "[1";
+    for (int i = 0; i < 4000; ++i) {
+        array += ",1";
+    }
+    EXPECT_EQ(refusalOf(array), failure("Missing a comma or ']' after an array element.", 8002));
+    EXPECT_EQ(refusalOf(array + ",]"), failure("Invalid value.", 8003));
+    EXPECT_EQ(refusalOf(array + " 1]"),
+              failure("Missing a comma or ']' after an array element.", 8003));
+    EXPECT_EQ(refusalOf(array + ",nul]"), failure("Invalid value.", 8006));
+    EXPECT_EQ(refusalOf(array + ",1e999]"),
+              failure("Number too big to be stored in double.", 8003));
+    EXPECT_EQ(refusalOf(array + "}"),
+              failure("Missing a comma or ']' after an array element.", 8002));
+    EXPECT_EQ(refusalOf("[" + std::string(8000, ',') + "]"), failure("Invalid value.", 1));
+    EXPECT_EQ(refusalOf(array + "]]"),
+              failure("The document root must not be followed by other values.", 8003));
+    EXPECT_EQ(refusalOf(array + std::string(1, '\0') + "]"),
+              failure("Missing a comma or ']' after an array element.", 8002));
 }
 
 TEST(RequestText, RefusesNestingBeyondTheLimit) {
