@@ -98,6 +98,15 @@ std::optional<Authority> parseAuthority(std::string_view text, std::string_view 
     return Authority{*name, *number};
 }
 
+bool isPlainAddress(std::string_view text, std::string_view address) {
+    const bool isIpv4 = !address.empty() && address.find(':') == address.npos;
+    if (!isIpv4 || text.substr(0, address.size()) != address) {
+        return false;
+    }
+    const std::string_view port = text.substr(address.size());
+    return port.empty() || (port.front() == ':' && parsePort(port.substr(1)).has_value());
+}
+
 std::optional<Origin> parseOrigin(std::string_view text) {
     const std::size_t end = text.find("://");
     if (end == text.npos) {

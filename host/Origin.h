@@ -36,6 +36,10 @@ std::optional<std::string> canonicalHost(std::string_view text);
 // scheme has by default, 0 where that is unknown.
 std::optional<Authority> parseAuthority(std::string_view text, std::string_view scheme);
 
+// Whether an authority as text is this canonical IPv4 address, with or without a port: what the
+// programs on a network send. False tells nothing, other texts have to be parsed.
+bool isPlainAddress(std::string_view text, std::string_view address);
+
 // Takes SCHEME://HOST or SCHEME://HOST:PORT. "null" is no such origin.
 std::optional<Origin> parseOrigin(std::string_view text);
 

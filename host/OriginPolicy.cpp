@@ -97,7 +97,7 @@ Verdict OriginPolicy::judge(const Source& source) const {
 
 // Only clients of HTTP/1.0 that are no browsers send no host.
 std::string OriginPolicy::refusalOfHost(const Source& source) const {
-    if (source.hosts.empty()) {
+    if (source.hosts.empty() || isPlainAddress(source.hosts.front(), source.localAddress)) {
         return "";
     }
     const std::optional<Authority> authority = parseAuthority(source.hosts.front(), scheme);

@@ -56,8 +56,9 @@ constexpr std::size_t mostBeforeResult = 128;
 bool beginsWithResult(std::string_view response) {
     const std::string_view head = response.substr(0, mostBeforeResult);
     const std::size_t result = head.find("\"result\":");
-    return result != head.npos && head.front() == '{' && head.find('{', 1) > result &&
-           head.find('[') > result && head.find("\"error\":") > result;
+    const std::string_view before = head.substr(0, result);
+    return result != head.npos && before.rfind('{') == 0 && before.find('[') == before.npos &&
+           before.find("\"error\":") == before.npos;
 }
 
 }  // namespace

@@ -10,6 +10,7 @@ namespace {
 using host::Authority;
 using host::canonicalHost;
 using host::isLoopback;
+using host::isPlainAddress;
 using host::localAddress;
 using host::parseAuthority;
 using host::parseOrigin;
@@ -55,6 +56,22 @@ TEST(ParseAuthority, IsAbsentForWhatIsNotAnAuthority) {
           "a:80:80", "a:80 ",       " a:80", "user@a:80", "a/b:80", "[::1]80", "x[::1]:80"}) {
         EXPECT_EQ(parseAuthority(text, "http"), std::nullopt) << text;
     }
+}
+
+TEST(IsPlainAddress, RecognisesAnAddressWithAndWithoutAPort) {
+    for (const char* text : {"192.0.2.7", "192.0.2.7:1", "192.0.2.7:65535"}) {
+        EXPECT_TRUE(isPlainAddress(text, "192.0.2.7")) << text;
+    }
+}
+
+TEST(IsPlainAddress, LeavesEverythingElseToTheParser) {
+    for (const char* text : {"", "192.0.2.70", "192.0.2.7.example", "192.0.2.7:", "192.0.2.7:65536",
+                             "192.0.2.7:1a", "192.0.2.7@evil", "192.0.2", "[::ffff:192.0.2.7]"}) {
+        EXPECT_FALSE(isPlainAddress(text, "192.0.2.7")) << text;
+    }
+    EXPECT_FALSE(isPlainAddress("::1", "::1"));
+    EXPECT_FALSE(isPlainAddress("", ""));
+    EXPECT_FALSE(isPlainAddress(":80", ""));
 }
 
 TEST(ParseOrigin, ComparesEqualForOneOriginInTwoForms) {
