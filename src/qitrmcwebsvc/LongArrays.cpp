@@ -51,6 +51,11 @@ bool LongArrays::beginFlat(const char* text, const char* textEnd) {
     return true;
 }
 
+bool LongArrays::add(JsonValue&& scalar) {
+    arrays.back().PushBack(scalar, document.GetAllocator());
+    return true;
+}
+
 bool LongArrays::finish() {
     open = false;
     return document.String(placeholder, static_cast<rapidjson::SizeType>(arrays.size() - 1), false);

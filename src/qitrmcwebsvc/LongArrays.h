@@ -30,10 +30,7 @@ class LongArrays {
     bool add(Scalar scalar) {
         return add(JsonValue(scalar));
     }
-    bool add(JsonValue&& scalar) {
-        arrays.back().PushBack(scalar, document.GetAllocator());
-        return true;
-    }
+    bool add(JsonValue&& scalar);
     bool finish();
 
     // Puts all arrays into the document, which is complete by now.
