@@ -1,48 +1,51 @@
 #include "qitrmcwebsvc/httpRequest.h"
 
 #include <algorithm>
+#include <array>
 #include <cstdint>
+#include <cstring>
 #include <limits>
 #include <utility>
 
 namespace nQITRMCWEBSVC100 {
 namespace {
 
-constexpr std::uint32_t firstVariableSize = 32;
-constexpr std::uint32_t firstBodySize = 256;
+constexpr std::size_t firstVariableSize = 32;
+constexpr std::size_t firstBodySize = 256;
 constexpr std::size_t mostOutput = std::numeric_limits<std::uint32_t>::max();
 
 // `read` takes a buffer and a pointer to its size. A completely filled buffer has no NUL.
-template <typename Read>
-int readText(std::uint32_t firstSize, std::string& out, Read read) {
-    std::string buffer(firstSize, '\0');
+template <std::size_t firstSize, typename Read>
+int readText(std::string& out, Read read) {
+    std::array<char, firstSize> first{};
     std::uint32_t size = firstSize;
-    int result = read(buffer.data(), &size);
-    if (result != 0 && size == 0) {
+    int result = read(first.data(), &size);
+    if (result == 0) {
+        out.assign(first.data(), strnlen(first.data(), firstSize));
+        return 0;
+    }
+    if (size == 0) {
         return result;
     }
-    if (result != 0) {
-        buffer.resize(size);
-        result = read(buffer.data(), &size);
-        if (result != 0) {
-            return result;
-        }
+    std::string buffer(size, '\0');
+    result = read(buffer.data(), &size);
+    if (result == 0) {
+        buffer.resize(strnlen(buffer.data(), buffer.size()));
+        out = std::move(buffer);
     }
-    buffer.erase(std::find(buffer.begin(), buffer.end(), '\0'), buffer.end());
-    out = std::move(buffer);
-    return 0;
+    return result;
 }
 
 }  // namespace
 
 int readRequestVariable(ws_Request* request, const char* name, std::string& out) {
-    return readText(firstVariableSize, out, [&](char* buffer, std::uint32_t* size) {
+    return readText<firstVariableSize>(out, [&](char* buffer, std::uint32_t* size) {
         return ReadRequestVariable_C_REST_QI_QVWS_(request, name, buffer, size);
     });
 }
 
 int readPostBody(ws_Request* request, std::string& out) {
-    return readText(firstBodySize, out, [&](char* buffer, std::uint32_t* size) {
+    return readText<firstBodySize>(out, [&](char* buffer, std::uint32_t* size) {
         return ReadPostData_C_REST_QI_QVWS_(request, buffer, size);
     });
 }
