@@ -144,21 +144,22 @@ std::vector<std::string> expandNames(const std::string& names, NameKind kind) {
 }
 
 std::string compressNames(const std::vector<std::string>& names, NameKind kind) {
-    std::vector<ParsedName> entries;
-    for (const std::string& name : names) {
-        ParsedName parsed = parseName(name, kind);
-        if (!entries.empty() && continues(entries.back(), parsed)) {
-            ++entries.back().end;
-        } else {
-            entries.push_back(std::move(parsed));
-        }
-    }
     std::string text;
-    const char* separator = "";
-    for (const ParsedName& entry : entries) {
-        text += separator;
-        append(text, entry);
-        separator = ",";
+    ParsedName last{};
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        ParsedName parsed = parseName(names[i], kind);
+        if (i != 0 && continues(last, parsed)) {
+            ++last.end;
+            continue;
+        }
+        if (i != 0) {
+            append(text, last);
+            text += ',';
+        }
+        last = std::move(parsed);
+    }
+    if (!names.empty()) {
+        append(text, last);
     }
     return text;
 }

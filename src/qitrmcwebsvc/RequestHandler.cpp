@@ -15,7 +15,7 @@ using namespace nQITRMCSHAREDCMN100;
 namespace {
 
 void addDefaultParamsToObject(JsonValue& value, JsonAllocator& allocator) {
-    if (value.IsObject() && !value.HasMember("params")) {
+    if (value.IsObject() && findMember(value, "params") == nullptr) {
         value.AddMember("params", JsonValue(rapidjson::kObjectType), allocator);
     }
 }
@@ -39,7 +39,8 @@ class DocumentMemory {
     JsonAllocator allocator{first, sizeof first};
 };
 
-// The id of a request, of whatever type, or null if there is none.
+// The id of a request, of whatever type, or null if there is none. It refers to texts of the
+// request.
 JsonValue copyId(const JsonValue& requestValue, JsonAllocator& allocator) {
     if (!requestValue.IsObject()) {
         return JsonValue();
@@ -84,11 +85,14 @@ RequestHandler::RequestHandler() {
 }
 
 std::string RequestHandler::handleRequest(const std::string& body) {
-    DocumentMemory memory;
-    JsonDocument responseDocument(memory.get());
+    DocumentMemory requestMemory;  // The response contains the id, which may be a text in here.
+    DocumentMemory responseMemory;
+    JsonDocument requestDocument(requestMemory.get());
+    JsonDocument responseDocument(responseMemory.get());
     try {
-        answer(body, responseDocument);
+        answer(body, requestDocument, responseDocument);
     } catch (const std::exception& error) {
+        requestMemory.get()->Clear();  // Memory may be what was missing.
         SingleResponse response(&responseDocument.GetAllocator());
         setErrorFrom(error, response);
         static_cast<JsonValue&>(responseDocument) = response.getValue();
@@ -96,9 +100,8 @@ std::string RequestHandler::handleRequest(const std::string& body) {
     return compactJson(responseDocument);
 }
 
-void RequestHandler::answer(const std::string& body, JsonDocument& responseDocument) {
-    DocumentMemory memory;
-    JsonDocument requestDocument(memory.get());
+void RequestHandler::answer(const std::string& body, JsonDocument& requestDocument,
+                            JsonDocument& responseDocument) {
     parseRequestText(body, requestDocument);
     addDefaultParams(requestDocument, requestDocument.GetAllocator());
     if (requestDocument.IsObject()) {

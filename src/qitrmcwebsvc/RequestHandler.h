@@ -29,7 +29,8 @@ class RequestHandler {
     std::string handleRequest(const std::string& body);
 
   private:
-    void answer(const std::string& body, JsonDocument& responseDocument);
+    void answer(const std::string& body, JsonDocument& requestDocument,
+                JsonDocument& responseDocument);
     void addDefaultParams(JsonValue& value, JsonAllocator& allocator) const;
     bool handleSingleRequest(JsonValue& requestValue, JsonValue& responseValue,
                              JsonAllocator& allocator);

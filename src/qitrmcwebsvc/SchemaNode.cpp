@@ -139,7 +139,7 @@ bool readProperties(const JsonValue& value, Place place, SchemaNode& node) {
     }
     node.properties.reserve(value.MemberCount());
     for (const auto& member : value.GetObject()) {
-        node.properties.push_back({&member.name, compile(member.value, place.below())});
+        node.properties.push_back({textOf(member.name), compile(member.value, place.below())});
     }
     return true;
 }
@@ -150,9 +150,16 @@ bool readAdditionalProperties(const JsonValue& value, Place /*place*/, SchemaNod
 }
 
 bool readRequired(const JsonValue& value, Place /*place*/, SchemaNode& node) {
-    node.required = &value;
-    return value.IsArray() && std::all_of(value.Begin(), value.End(),
-                                          [](const JsonValue& name) { return name.IsString(); });
+    if (!value.IsArray()) {
+        return false;
+    }
+    for (const JsonValue& name : value.GetArray()) {
+        if (!name.IsString()) {
+            return false;
+        }
+        node.required.push_back(textOf(name));
+    }
+    return true;
 }
 
 bool readOneOf(const JsonValue& value, Place place, SchemaNode& node) {

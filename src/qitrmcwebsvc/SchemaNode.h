@@ -29,13 +29,13 @@ struct SchemaNode {
     rapidjson::SizeType minItems = 0;
     std::vector<SchemaNode> items;  // one or none
     bool additionalProperties = true;
-    const JsonValue* required = nullptr;  // an array of strings, or null
+    std::vector<std::string_view> required;
     std::vector<SchemaProperty> properties;
     std::vector<SchemaNode> oneOf;
 };
 
 struct SchemaProperty {
-    const JsonValue* name;
+    std::string_view name;
     SchemaNode schema;
 };
 

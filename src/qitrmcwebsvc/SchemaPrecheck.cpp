@@ -53,26 +53,29 @@ Verdict checkArray(const SchemaNode& schema, const JsonValue& array) {
 
 // An unknown member that is not allowed is Undecided, as the library knows the names in `required`
 // too.
-Verdict checkMember(const SchemaNode& schema, const JsonValue& name, const JsonValue& value) {
+Verdict checkMember(const SchemaNode& schema, std::string_view name, const JsonValue& value) {
     for (const SchemaProperty& property : schema.properties) {
-        if (textOf(*property.name) == textOf(name)) {
+        if (property.name == name) {
             return check(property.schema, value);
         }
     }
     return schema.additionalProperties ? Verdict::Valid : Verdict::Undecided;
 }
 
+bool hasMember(const JsonValue& object, std::string_view name) {
+    return std::any_of(object.MemberBegin(), object.MemberEnd(),
+                       [name](const auto& member) { return textOf(member.name) == name; });
+}
+
 // Of members with the same name each one is checked, as the library does.
 Verdict checkObject(const SchemaNode& schema, const JsonValue& object) {
-    if (schema.required != nullptr) {
-        for (const JsonValue& name : schema.required->GetArray()) {
-            if (!object.HasMember(name)) {
-                return Verdict::Invalid;
-            }
+    for (const std::string_view name : schema.required) {
+        if (!hasMember(object, name)) {
+            return Verdict::Invalid;
         }
     }
     for (const auto& member : object.GetObject()) {
-        const Verdict verdict = checkMember(schema, member.name, member.value);
+        const Verdict verdict = checkMember(schema, textOf(member.name), member.value);
         if (verdict != Verdict::Valid) {
             return verdict;
         }

@@ -1,5 +1,6 @@
 #include "qitrmcwebsvc/SessionProperty.h"
 
+#include <algorithm>
 #include <utility>
 
 #include "qitrmcsharedcmn/parseUtilities.h"
@@ -108,6 +109,12 @@ bool SessionProperty::isOnResources() const {
 
 // The driver would accept tokens, but the number of resources must be known.
 void SessionProperty::expandTokens() {
+    const auto isName = [](const std::string& resource) {
+        return !resource.empty() && propertyOfToken(resource) == nullptr;
+    };
+    if (std::all_of(resources.begin(), resources.end(), isName)) {
+        return;
+    }
     std::vector<std::string> expanded;
     for (std::string& resource : resources) {
         if (resource.empty()) {

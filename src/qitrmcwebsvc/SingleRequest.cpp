@@ -17,7 +17,8 @@ using nQITRMCSHAREDCMN100::BasicError;
     throw error;
 }
 
-void checkEnvelope(const JsonValue& value) {
+// Returns the method.
+const JsonValue& checkEnvelope(const JsonValue& value) {
     if (!value.IsObject() || value.ObjectEmpty()) {
         throw BasicError(qierr::codes::invalidRequest, QITRMC_HERE);
     }
@@ -36,19 +37,18 @@ void checkEnvelope(const JsonValue& value) {
     if (!method || !method->IsString()) {
         throwInvalidMember("method", QITRMC_HERE);
     }
+    return *method;
 }
 
 }  // namespace
 
-SingleRequest::SingleRequest(JsonValue& value) {
-    checkEnvelope(value);
-    method = value["method"].GetString();
+SingleRequest::SingleRequest(JsonValue& value)
+    : method(checkEnvelope(value).GetString()), params(findMember(value, "params")) {
     request = std::move(value);
 }
 
 const JsonValue& SingleRequest::getParams() const {
     static const JsonValue absent;
-    const JsonValue* const params = findMember(request, "params");
     return params ? *params : absent;
 }
 

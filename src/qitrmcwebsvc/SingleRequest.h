@@ -28,6 +28,7 @@ class SingleRequest {
   private:
     JsonValue request;
     std::string method;
+    const JsonValue* params;  // in the request, or null
 };
 
 }  // namespace nQITRMCWEBSVC100

@@ -15,7 +15,8 @@ class SingleResponse {
   public:
     // With a null id.
     explicit SingleResponse(JsonAllocator* allocator);
-    // With a deep copy of the id, of whatever type.
+    // With a copy of the id, of whatever type. Texts that the id only refers to are not copied, so
+    // they must outlive the response.
     SingleResponse(const JsonValue& id, JsonAllocator* allocator);
     virtual ~SingleResponse() = default;
     SingleResponse(const SingleResponse&) = delete;

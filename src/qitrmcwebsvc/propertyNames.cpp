@@ -73,8 +73,9 @@ bool isPropertyName(nQITRMCAPI100_Session session, PropertyCategory category,
                     const std::string& name) {
     const ListedNames listed(session, nameListOf(category));
     // Most names differ in the first character, which costs much less than a call.
-    const bool isListed = std::any_of(listed.begin(), listed.end(), [&name](const char* other) {
-        return *other == *name.c_str() && std::strcmp(other, name.c_str()) == 0;
+    const char* const text = name.c_str();
+    const bool isListed = std::any_of(listed.begin(), listed.end(), [text](const char* other) {
+        return *other == *text && std::strcmp(other, text) == 0;
     });
     // Behind a NUL, which the driver's names cannot contain, strcmp does not look.
     return isListed && name.find('\0') == std::string::npos && !isHidden(name);

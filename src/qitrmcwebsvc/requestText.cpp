@@ -2,6 +2,7 @@
 
 #include <charconv>
 #include <cmath>
+#include <cstring>
 #include <limits>
 #include <new>
 #include <optional>
@@ -32,6 +33,8 @@ double nearestDouble(const char* text, const char* textEnd, double approximation
     return std::copysign(tooBig ? std::numeric_limits<double>::infinity() : 0.0, approximation);
 }
 
+using JsonStream = rapidjson::GenericInsituStringStream<JsonEncoding>;
+
 // Receives the values that the reader parses and adds them to the document. It rejects values that
 // the reader accepts but the rest of the service cannot process or print.
 class GuardedDocument {
@@ -40,7 +43,7 @@ class GuardedDocument {
     using SizeType = rapidjson::SizeType;
 
     // `read` is the stream of the reader; its text ends at `end`.
-    GuardedDocument(JsonDocument& guarded, const rapidjson::StringStream& read, const char* end)
+    GuardedDocument(JsonDocument& guarded, const JsonStream& read, const char* end)
         : document(guarded), longArrays(guarded), stream(read), textEnd(end) {}
 
     // Completes the document after the text was parsed.
@@ -98,11 +101,17 @@ class GuardedDocument {
 
     JsonDocument& document;
     LongArrays longArrays;
-    const rapidjson::StringStream& stream;
+    const JsonStream& stream;
     const char* const textEnd;
     int depth = 0;
     bool sawInfinity = false;
 };
+
+char* copyOf(const std::string& text, JsonAllocator& allocator) {
+    auto* const copy = static_cast<char*>(allocator.Malloc(text.size() + 1));
+    std::memcpy(copy, text.c_str(), text.size() + 1);
+    return copy;
+}
 
 }  // namespace
 
@@ -111,12 +120,12 @@ void parseRequestText(const std::string& body, JsonDocument& document) {
         throw std::bad_alloc();
     }
     const std::optional<std::string> guardedBody = withSafeExponents(body.c_str());
-    const std::string& text = guardedBody ? *guardedBody : body;
-    rapidjson::StringStream stream(text.c_str());
+    char* const text = copyOf(guardedBody ? *guardedBody : body, document.GetAllocator());
+    JsonStream stream(text);
     JsonReader reader;
-    GuardedDocument handler(document, stream, text.c_str() + text.size());
+    GuardedDocument handler(document, stream, text + body.size());
     auto parse = [&](JsonDocument&) {
-        return !reader.Parse<rapidjson::kParseDefaultFlags>(stream, handler).IsError();
+        return !reader.Parse<rapidjson::kParseInsituFlag>(stream, handler).IsError();
     };
     document.Populate(parse);
     if (!reader.HasParseError()) {

@@ -83,6 +83,15 @@ TEST_F(RequestHandlerTest, EchoesAnIdOfTheWrongType) {
     }
 }
 
+TEST_F(RequestHandlerTest, EchoesLongTextsInIds) {
+    const std::string text = "\"" + std::string(100000, 'x') + "\\n\"";
+    const std::string wrong = "{" + text + ":[" + text + "," + text + "]}";
+    EXPECT_EQ(answer("{\"jsonrpc\":\"2.0\",\"method\":\"\",\"id\":" + text + "}"),
+              refusal(text, "-32601", " kUsageTypeMethod="));
+    EXPECT_EQ(answer("{\"jsonrpc\":\"2.0\",\"method\":\"m\",\"id\":" + wrong + "}"),
+              invalid(wrong, "id"));
+}
+
 TEST_F(RequestHandlerTest, AcceptsIdsOfTheSigned32BitRangeAndTexts) {
     for (const char* id : {"2147483647", "-2147483648", "0", "\"\"", "\"a\\\"b\\u0001\""}) {
         EXPECT_EQ(answer(std::string("{\"jsonrpc\":\"2.0\",\"method\":\"\",\"id\":") + id + "}"),

@@ -69,6 +69,35 @@ TEST(RequestText, ReportsWhatIsWrongAndWhere) {
     EXPECT_EQ(refusalOf("[1e309]"), failure("Number too big to be stored in double.", 1));
 }
 
+TEST(RequestText, CountsOffsetsInTheBodyAsItWasSent) {
+    EXPECT_EQ(refusalOf("[\"\\u0041\\n\\ud83d\\ude00\",x]"), failure("Invalid value.", 24));
+    EXPECT_EQ(refusalOf("[\"\\u0041\\n\\q\"]"), failure("Invalid escape character in string.", 10));
+    EXPECT_EQ(refusalOf("{\"\\u0061\":\"\\n"),
+              failure("Missing a closing quotation mark in string.", 13));
+    EXPECT_EQ(refusalOf("[\"\\u0041\",10e308]"),
+              failure("Number too big to be stored in double.", 10));
+}
+
+TEST(RequestText, ReadsTextsAndNamesWithTheirEscapes) {
+    std::string body =
+        "{\"\\u0061b\":\"\\\"\\\\\\/\\b\\f\\n\\r\\t\", \"\":\"\",\"n\":\"x\\u0000y\","
+        "\"\\ud83d\\ude00\":[\"\\u00e9\",-0.5,\"\\u20ac\"],\"long\":\"" +
+        std::string(10000, 'x') + "\\n\"}";
+    JsonDocument document;
+    parseRequestText(body, document);
+    body.assign(body.size(), '?');
+    const auto textOf = [](const JsonValue& value) {
+        return std::string(value.GetString(), value.GetStringLength());
+    };
+    EXPECT_EQ(textOf(document["ab"]), "\"\\/\b\f\n\r\t");
+    EXPECT_EQ(textOf(document[""]), "");
+    EXPECT_EQ(textOf(document["n"]), std::string("x\0y", 3));
+    EXPECT_EQ(textOf(document["\U0001f600"][0]), "\u00e9");
+    EXPECT_EQ(document["\U0001f600"][1].GetDouble(), -0.5);
+    EXPECT_EQ(textOf(document["\U0001f600"][2]), "\u20ac");
+    EXPECT_EQ(textOf(document["long"]), std::string(10000, 'x') + "\n");
+}
+
 TEST(RequestText, EndsAtTheFirstNul) {
     EXPECT_EQ(refusalOf(std::string("{}\0garbage", 10)), "parsed");
     EXPECT_EQ(refusalOf(std::string("{\0}", 3)), failure("Missing a name for object member.", 1));
