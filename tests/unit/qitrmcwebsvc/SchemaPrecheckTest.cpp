@@ -140,12 +140,28 @@ TEST(SchemaPrecheck, MatchesALiteralAlone) {
                "\"closeSession\\u0000\""});
 }
 
+TEST(SchemaPrecheck, MatchesLiteralsOfAllPlainCharactersAndNoOthers) {
+    expectAll(valid, R"({"pattern":"^AZaz09_$"})", {"\"AZaz09_\""});
+    for (const char c : {'@', '[', '`', '{', '/', ':', '^', '-'}) {
+        expectAll(undecided, std::string(R"({"pattern":"^)") + c + "$\"}",
+                  {std::string("\"") + c + '"'});
+    }
+}
+
+TEST(SchemaPrecheck, MatchesPatternsWithoutALiteral) {
+    expectAll(valid, R"({"pattern":"^$"})", {"\"\""});
+    expectAll(undecided, R"({"pattern":"^$"})", {"\"a\"", "\"1\""});
+    expectAll(valid, R"({"pattern":"^[0-9]+$"})", {"\"7\""});
+    expectAll(undecided, R"({"pattern":"^[0-9]+$"})", {"\"\"", "\"a\""});
+}
+
 TEST(SchemaPrecheck, LeavesOtherPatternsUndecided) {
     for (const char* pattern : {"^a.c$", "abc", "^abc", "abc$", "^a|b$", "^a[0-9]*$", "^[0-9]+a$",
                                 "^a[0-9]+[0-9]+$", "^", "$", "", "^a\\\\$", "^a$$"}) {
         expectAll(undecided, std::string(R"({"pattern":")") + pattern + "\"}",
                   {"\"a\"", "\"abc\"", "\"a1\"", "\"\""});
     }
+    expectAll(undecided, R"({"pattern":"abc$"})", {"\"bc\""});
     expectAll(undecided, R"({"pattern":5})", {"\"a\""});
 }
 
@@ -205,6 +221,8 @@ TEST(SchemaPrecheck, RequiresThatExactlyOneAlternativeIsValid) {
     expectAll(invalid, schema, {"5", "5.5", "\"\"", "[]", R"([null,""])", "[1]"});
     expectAll(undecided, R"({"oneOf":[{"type":"integer"},{"multipleOf":2}]})", {"1", "2"});
     expectAll(undecided, R"({"oneOf":[{"multipleOf":2},{"type":"integer"}]})", {"1", "2"});
+    expectAll(invalid, R"({"minimum":5,"oneOf":[{"type":"integer"}]})", {"4"});
+    expectAll(undecided, R"({"pattern":"^a$","oneOf":[{"type":"string"}]})", {"\"b\""});
     expectAll(undecided, R"({"oneOf":[]})", {"1"});
     expectAll(undecided, R"({"oneOf":[5]})", {"1"});
 }
@@ -218,6 +236,7 @@ TEST(SchemaPrecheck, AcceptsNoneOrOneOfExclusiveMembers) {
 
 TEST(SchemaPrecheck, NegatesOnlyTheEmptySchema) {
     expectAll(invalid, R"({"not":{}})", {"null", "1", "{}", "[[[]]]"});
+    expectAll(invalid, R"({"not":{},"type":"integer"})", {"1"});
     expectAll(undecided, R"({"not":{"type":"null"}})", {"null", "1"});
     expectAll(undecided, R"({"not":5})", {"1"});
 }
