@@ -3,6 +3,7 @@
 
 #include "ServiceTest.h"
 #include "support/allocationFaults.h"
+#include "support/emulator.h"
 #include "support/sanitizers.h"
 
 #if defined(QITRMC_ADDRESS_SANITIZER)
@@ -38,7 +39,7 @@ class StartAllocationTest : public ServiceTest,
 
     // The next allocation to fail. The validators of all methods are built alike, so the later
     // allocations are tried at increasing intervals.
-    static int after(int successes) { return successes + 1 + successes / 50; }
+    static int after(int successes) { return successes + failureStep * (1 + successes / 50); }
 
     const std::string open = call("initializeSession", "{}");
 };

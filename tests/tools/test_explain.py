@@ -58,6 +58,7 @@ def codes():
             for row in rows(f"statuses/{table}.tsv") if int(row["code"]) < 0]
 
 
+@pytest.mark.same_in_each_build
 @pytest.mark.parametrize("language", LANGUAGES)
 def test_every_code_has_a_text_in_every_language_from_both_translators(language):
     catalogue = {int(row["code"]): row for row in rows("statuses/catalogue.tsv")}

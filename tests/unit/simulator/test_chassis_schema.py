@@ -11,6 +11,7 @@ import pytest
 from hypothesis import HealthCheck, given, settings
 from hypothesis import strategies as st
 
+from examples import examples
 from load_probe import CHASSIS, REPOSITORY, LoadProbe
 
 sys.path.insert(0, str(REPOSITORY / "tests" / "support"))
@@ -320,14 +321,14 @@ def test_some_rules_are_left_to_the_loader(probe, rule):
     assert re.search(BEYOND_A_SCHEMA[rule], " ".join(probe.load(description)))
 
 
-@settings(SETTINGS, max_examples=40)
+@settings(SETTINGS, max_examples=examples(40))
 @given(description=descriptions(moving=True))
 def test_any_valid_description_loads(probe, description):
     assert probe.load(description) is None
     VALIDATOR.validate(description)
 
 
-@settings(SETTINGS, max_examples=150)
+@settings(SETTINGS, max_examples=examples(150))
 @given(description=edited())
 def test_both_agree_on_any_edited_description(probe, description):
     assert_agreement(probe, description)
@@ -337,7 +338,7 @@ def test_both_agree_on_any_edited_description(probe, description):
 def test_both_agree_on_edits_of_a_shipped_description(probe, name):
     shipped = json.loads((CHASSIS / f"{name}.json").read_text(encoding="utf-8"))
 
-    @settings(SETTINGS, max_examples=20)
+    @settings(SETTINGS, max_examples=examples(20))
     @given(description=edited(st.just(shipped)))
     def agree(description):
         assert_agreement(probe, description)

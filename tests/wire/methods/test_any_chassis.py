@@ -10,6 +10,7 @@ import sys
 
 from hypothesis import HealthCheck, Phase, given, settings
 
+from examples import examples
 from hostlib import clean_host
 from jsonrpc import Client
 from walker import (Resource, Walker, areas_of, channels_of, content_of, devices_of, expected_value,
@@ -19,8 +20,8 @@ sys.path.insert(0, str(pathlib.Path(__file__).resolve().parents[2] / "support"))
 from chassis_descriptions import BOUNDS, descriptions  # noqa: E402
 
 # Failures are reported as found, without shrinking: each attempt to shrink one would start a host.
-SETTINGS = settings(max_examples=40, phases=[Phase.generate], deadline=None, database=None, derandomize=True,
-                    suppress_health_check=list(HealthCheck))
+SETTINGS = settings(max_examples=examples(40), phases=[Phase.generate], deadline=None, database=None,
+                    derandomize=True, suppress_health_check=list(HealthCheck))
 
 
 def another_value(about, enums):

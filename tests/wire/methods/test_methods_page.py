@@ -17,6 +17,8 @@ import make_methods  # from the folder of the page
 TABLE = json.loads((DOCS / "methods.json").read_text(encoding="utf-8"))
 EXCHANGES = json.loads((DOCS / "exchanges.json").read_text(encoding="utf-8"))
 
+pytestmark = pytest.mark.same_in_each_build
+
 
 @pytest.fixture
 def sources(monkeypatch, tmp_path):

@@ -7,9 +7,10 @@ from hypothesis import HealthCheck, given, settings
 from hypothesis import strategies as st
 
 import methods
+from examples import examples
 from jsonrpc import STANDING_CODES, call
 
-SETTINGS = settings(max_examples=200, deadline=None, database=None, derandomize=True,
+SETTINGS = settings(max_examples=examples(200), deadline=None, database=None, derandomize=True,
                     suppress_health_check=[HealthCheck.function_scoped_fixture,
                                            HealthCheck.too_slow])
 
