@@ -1,10 +1,12 @@
+#!/usr/bin/python3
 """A small Debian machine for the tests of the packages: a root folder of its own with its own network.
 
 The base system is made once and kept in build/package-root, with all that was downloaded. Root is
-needed, as for every chroot.
+needed, as for every chroot. Run as a program, it makes the base system.
 """
 
 import contextlib
+import fcntl
 import os
 import pathlib
 import shutil
@@ -45,14 +47,23 @@ def packages(architecture):
     return {path.name.split("_")[0]: path for path in (PACKAGES / architecture).glob("*.deb")}
 
 
+@contextlib.contextmanager
+def alone():
+    """Held while files in CACHE may change, since several tests run at the same time."""
+    CACHE.mkdir(parents=True, exist_ok=True)
+    with open(CACHE / "lock", "w", encoding="ascii") as lock:
+        fcntl.flock(lock, fcntl.LOCK_EX)
+        yield
+
+
 def make_base():
     base = CACHE / "base.tar"
-    if not base.exists():
-        CACHE.mkdir(parents=True, exist_ok=True)
-        unfinished = CACHE / "unfinished.tar"
-        subprocess.run(["mmdebstrap", "--quiet", "--variant=minbase", f"--include={INCLUDED}",
-                        "bookworm", unfinished, *SOURCES], check=True)
-        unfinished.rename(base)
+    with alone():
+        if not base.exists():
+            unfinished = CACHE / "unfinished.tar"
+            subprocess.run(["mmdebstrap", "--quiet", "--variant=minbase", f"--include={INCLUDED}",
+                            "bookworm", unfinished, *SOURCES], check=True)
+            unfinished.rename(base)
     return base
 
 
@@ -76,6 +87,10 @@ class Machine:
         Debian in `names` depend on, so that apt needs no network."""
         for path in paths:
             shutil.copy(path, self.root / "packages")
+        with alone():
+            self.download(*paths, *names)
+
+    def download(self, *packages):
         archives = CACHE / "archives"
         (archives / "partial").mkdir(parents=True, exist_ok=True)
         state = CACHE / "state"
@@ -89,7 +104,7 @@ class Machine:
             subprocess.run(["apt-get", *options, "update"], check=True)
             (state / "updated").touch()
         subprocess.run(["apt-get", *options, "install", "-y", "--download-only",
-                        "--no-install-recommends", *paths, *names], check=True, stdout=subprocess.DEVNULL)
+                        "--no-install-recommends", *packages], check=True, stdout=subprocess.DEVNULL)
         for path in archives.glob("*.deb"):
             shutil.copy(path, self.root / "var/cache/apt/archives")
         shutil.copytree(state / "lists", self.root / "var/lib/apt/lists", dirs_exist_ok=True)
@@ -132,3 +147,7 @@ def machine():
     with tempfile.TemporaryDirectory(prefix="qitrmc-machine-") as folder:
         os.chmod(folder, 0o755)
         yield Machine(pathlib.Path(folder))
+
+
+if __name__ == "__main__":
+    make_base()

@@ -181,8 +181,11 @@ def test_names_that_are_not_configured_are_refused(proxied):
 
 
 def test_a_body_of_unknown_length_does_not_pass_the_limit(proxied):
-    answers = proxied("""
-      head -c 16777217 /dev/zero | tr '\\0' ' ' >/tmp/more
+    # HAProxy refuses any length that it does not know, and then closes: a client that is still sending may
+    # not see why.
+    size = {"nginx": 16777217, "haproxy": 100}[proxied.name]
+    answers = proxied(f"""
+      head -c {size} /dev/zero | tr '\\0' ' ' >/tmp/more
       call rack.example/rack1/qitrmc/Call $known -H Expect: -H 'Transfer-Encoding: chunked' --data-binary @/tmp/more
     """)  # noqa: E501
     assert answers == [{"nginx": "413", "haproxy": "411"}[proxied.name]]
