@@ -69,7 +69,7 @@ TEST_F(StdpathTest, AChangeOfAnOldFileShowsAtTheNextCall) {
     ASSERT_EQ(stat(root.locate("/etc/qinstal/share/share.dir").c_str(), &info), 0);
     const qisysq::FileIdentity identity(info);
     while (!identity.isSettled(qisysq::fileTime())) {
-        std::this_thread::yield();
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
     }
     EXPECT_EQ(get(qisysq::getSharedDir), "/one");
     EXPECT_EQ(get(qisysq::getSharedDir), "/one") << "the kept text";

@@ -38,12 +38,13 @@ bool isKept(const std::string& directory, std::int32_t code = -1) {
     return KeptSearches::ofProcess().find(directory.c_str(), code, &output, &status);
 }
 
-// A search is kept as soon as nothing that it looks at was changed in the last seconds.
+// A search is kept as soon as nothing that it looks at was changed in the last seconds. The pauses
+// leave the processor to other tests.
 void searchUntilKept(const std::string& directory, std::int32_t code = -1) {
     const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
     while (search(directory, code), !isKept(directory, code)) {
         ASSERT_LT(std::chrono::steady_clock::now(), end) << directory;
-        std::this_thread::yield();
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
     }
 }
 

@@ -181,11 +181,14 @@ TEST(FaultWaitTest, FaultsMayChangeWhileManyThreadsCall) {
         event("Mod2", "\"pulled\",\"lasts\":0.001"),
         event("Mod2", "\"connection_lost\""),
     };
+    constexpr int count = 6;
+    std::atomic<int> opened{0};
     std::atomic<bool> isEnough{false};
     std::vector<std::thread> threads;
-    for (int i = 0; i < 6; ++i) {
+    for (int i = 0; i < count; ++i) {
         threads.emplace_back([&] {
             Session session;
+            ++opened;
             while (!isEnough) {
                 for (const char* device : {"Mod1", "Mod2"}) {
                     const auto label = getText(session, device, "Dev.ProductName");
@@ -201,6 +204,10 @@ TEST(FaultWaitTest, FaultsMayChangeWhileManyThreadsCall) {
             // A fault may prevent the session from being closed by its destructor.
             FaultsInForce("{}");
         });
+    }
+    // A fault in force could prevent a session from being opened.
+    while (opened < count) {
+        std::this_thread::yield();
     }
     for (int round = 0; round < 200; ++round) {
         EXPECT_EQ(setFaults(plans[round % 7]).code, 0);
