@@ -120,10 +120,11 @@ void parseRequestText(const std::string& body, JsonDocument& document) {
         throw std::bad_alloc();
     }
     const std::optional<std::string> guardedBody = withSafeExponents(body.c_str());
-    char* const text = copyOf(guardedBody ? *guardedBody : body, document.GetAllocator());
+    const std::string& wholeText = guardedBody ? *guardedBody : body;
+    char* const text = copyOf(wholeText, document.GetAllocator());
     JsonStream stream(text);
     JsonReader reader;
-    GuardedDocument handler(document, stream, text + body.size());
+    GuardedDocument handler(document, stream, text + wholeText.size());
     auto parse = [&](JsonDocument&) {
         return !reader.Parse<rapidjson::kParseInsituFlag>(stream, handler).IsError();
     };

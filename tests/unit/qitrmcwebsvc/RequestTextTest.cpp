@@ -101,6 +101,10 @@ TEST(RequestText, ReadsTextsAndNamesWithTheirEscapes) {
 TEST(RequestText, EndsAtTheFirstNul) {
     EXPECT_EQ(refusalOf(std::string("{}\0garbage", 10)), "parsed");
     EXPECT_EQ(refusalOf(std::string("{\0}", 3)), failure("Missing a name for object member.", 1));
+    // Far behind the end, where no memory of the request is.
+    const std::string behind(1'000'000, 'x');
+    EXPECT_EQ(refusalOf("[1e-99999999999" + std::string(1, '\0') + behind),
+              failure("Missing a comma or ']' after an array element.", 15));
 }
 
 TEST(RequestText, AcceptsBlanksAroundAnyRoot) {
