@@ -18,7 +18,8 @@ set(CMAKE_LIBRARY_OUTPUT_DIRECTORY "${PROJECT_BINARY_DIR}/lib")
 
 find_program(QITRMC_CCACHE ccache)
 if(QITRMC_CCACHE)
-  # With paths relative to the build folder the presets share what they compile alike.
+  # With paths relative to the build folder the presets and copies of the repository share what they
+  # compile alike.
   set(CMAKE_C_COMPILER_LAUNCHER env "CCACHE_BASEDIR=${PROJECT_SOURCE_DIR}" "${QITRMC_CCACHE}")
   set(CMAKE_CXX_COMPILER_LAUNCHER ${CMAKE_C_COMPILER_LAUNCHER})
 endif()
@@ -33,12 +34,17 @@ add_compile_options(-Wall -Wextra -Werror)
 file(RELATIVE_PATH source_from_build "${PROJECT_BINARY_DIR}" "${PROJECT_SOURCE_DIR}")
 add_compile_options("-fmacro-prefix-map=${PROJECT_SOURCE_DIR}/="
                     "-fmacro-prefix-map=${source_from_build}=")
+# Those of debug information too, or the compiler cache would keep it apart for each folder.
+add_compile_options("-fdebug-prefix-map=${PROJECT_SOURCE_DIR}/=")
 
 set(QITRMC_SANITIZE "" CACHE STRING "Sanitizers to build with, for example address,undefined")
 if(QITRMC_SANITIZE)
   add_compile_options("-fsanitize=${QITRMC_SANITIZE}" -fno-sanitize-recover=all
                       -fno-omit-frame-pointer)
   add_link_options("-fsanitize=${QITRMC_SANITIZE}")
+  # The older name of -fsanitize-ignorelist, the only one whose file the compiler cache reads.
+  add_compile_options(
+    "$<$<CXX_COMPILER_ID:Clang>:-fsanitize-blacklist=${source_from_build}cmake/sanitizer-ignored.txt>")
 endif()
 
 # Generated headers, included as those of src/ are.

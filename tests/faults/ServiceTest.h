@@ -7,6 +7,7 @@
 #include "support/DriverTest.h"
 #include "support/FakeWebRuntime.h"
 #include "support/ModelledSessions.h"
+#include "support/TestPaths.h"
 #include "support/TestRoot.h"
 #include "support/responseFault.h"
 
@@ -32,7 +33,7 @@ class ServiceTest : public DriverTest {
     void SetUp() override {
         DriverTest::SetUp();
         sessions.answerCalls();
-        root.showDirectory("/usr/local/qinstal/share", QITRMC_SHARED);
+        root.showDirectory("/usr/local/qinstal/share", explanationFiles);
         root.write("/etc/qinstal/share/qitrmc.ini", "[WebService]\nEnable=1\n");
         qitrmcInit();
     }

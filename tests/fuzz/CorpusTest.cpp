@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "harnesses.h"
+#include "support/TestPaths.h"
 
 namespace {
 
@@ -27,9 +28,9 @@ const std::map<std::string, void (*)(std::string_view)> harnesses = {
 // The inputs of all harnesses, each as "<harness>/<file>".
 std::vector<std::string> inputs() {
     std::vector<std::string> all;
-    for (const auto& entry : files::recursive_directory_iterator(QITRMC_CORPUS)) {
+    for (const auto& entry : files::recursive_directory_iterator(corpusFolder)) {
         if (entry.is_regular_file()) {
-            all.push_back(files::relative(entry.path(), QITRMC_CORPUS).string());
+            all.push_back(files::relative(entry.path(), corpusFolder).string());
         }
     }
     std::sort(all.begin(), all.end());
@@ -37,7 +38,7 @@ std::vector<std::string> inputs() {
 }
 
 std::string contentOf(const std::string& input) {
-    std::ifstream stream(files::path(QITRMC_CORPUS) / input, std::ios::binary);
+    std::ifstream stream(files::path(corpusFolder) / input, std::ios::binary);
     return {std::istreambuf_iterator<char>(stream), std::istreambuf_iterator<char>()};
 }
 

@@ -11,6 +11,8 @@
 #include <string>
 #include <vector>
 
+#include "support/TestPaths.h"
+
 namespace {
 
 // In byte order of the method names, except that names in lower case come first.
@@ -59,7 +61,8 @@ TEST(EmbeddedFiles, HoldEachSchemaExactlyAsInItsSourceFile) {
         if (!isJson(file.name)) {
             continue;
         }
-        const std::string source = contentOf(EMBEDDED_SOURCES "/schemas/" + std::string(file.name));
+        const std::string source =
+            contentOf(std::string(embeddedSources) + "/schemas/" + file.name);
         ASSERT_FALSE(source.empty()) << file.name;
         EXPECT_EQ(std::string(file.data, file.size), source) << file.name;
     }

@@ -9,6 +9,8 @@
 #include <regex>
 #include <string>
 
+#include "support/TestPaths.h"
+
 // The built plug-in as another program uses it: through one symbol and the headers of the platform.
 // Nothing of this system is linked, so the status and the allocation are this program's own.
 
@@ -92,7 +94,7 @@ class LentXlatorTest : public testing::Test {
         std::string pattern =
             (std::filesystem::temp_directory_path() / "qitrmc-lent-XXXXXX").string();
         directory = mkdtemp(pattern.data());
-        plugin = dlopen(PLUGIN, RTLD_NOW | RTLD_LOCAL);
+        plugin = dlopen(pluginFile, RTLD_NOW | RTLD_LOCAL);
         EXPECT_NE(plugin, nullptr) << dlerror();
         create = reinterpret_cast<qixlator_exported_create_fn>(
             dlsym(plugin, "qixlator_exported_create"));

@@ -6,12 +6,13 @@
 #include <string>
 
 #include "contains.h"
+#include "support/TestPaths.h"
 
 namespace {
 
 TEST(QidynlibTest, LoadsALibraryAndFindsASymbol) {
     qierr::Status status;
-    void* handle = qidynlib_load(RELOCATIONS_COMPLETE, &status);
+    void* handle = qidynlib_load(completeRelocations, &status);
     EXPECT_NE(qidynlib_symbol(handle, "get_relocated_dir", &status), nullptr);
     EXPECT_EQ(status.code, 0);
     dlclose(handle);
@@ -32,7 +33,7 @@ TEST(QidynlibTest, AMissingLibraryIsReportedWithTheLoadersText) {
 
 TEST(QidynlibTest, AMissingSymbolIsReportedWithTheLoadersText) {
     qierr::Status status;
-    void* handle = qidynlib_load(RELOCATIONS_LACKING, &status);
+    void* handle = qidynlib_load(lackingRelocations, &status);
     EXPECT_EQ(qidynlib_symbol(handle, "get_relocated_dir", &status), nullptr);
     EXPECT_EQ(status.code, -52005);
     EXPECT_TRUE(contains(status,
@@ -48,7 +49,7 @@ TEST(QidynlibTest, TheSymbolsOfALibraryAreVisibleToTheWholeProcess) {
     ASSERT_EQ(dlsym(RTLD_DEFAULT, "another_function"), nullptr);
     qierr::Status status;
     // A library of its own, since finding the symbol keeps it loaded.
-    void* handle = qidynlib_load(SHARED_SYMBOLS, &status);
+    void* handle = qidynlib_load(sharedSymbols, &status);
     ASSERT_NE(handle, nullptr);
     EXPECT_NE(dlsym(RTLD_DEFAULT, "another_function"), nullptr);
     dlclose(handle);
@@ -56,7 +57,7 @@ TEST(QidynlibTest, TheSymbolsOfALibraryAreVisibleToTheWholeProcess) {
 
 TEST(QidynlibTest, AnUnresolvedFunctionFailsTheLoadAtOnce) {
     qierr::Status status;
-    EXPECT_EQ(qidynlib_load(RELOCATIONS_UNRESOLVED, &status), nullptr);
+    EXPECT_EQ(qidynlib_load(unresolvedRelocations, &status), nullptr);
     EXPECT_EQ(status.code, -52005);
     EXPECT_TRUE(contains(status, "function_of_no_library")) << status.json;
 }
@@ -64,7 +65,7 @@ TEST(QidynlibTest, AnUnresolvedFunctionFailsTheLoadAtOnce) {
 TEST(QidynlibTest, NothingIsDoneWhenTheStatusIsNegative) {
     qierr::Status status;
     status.code = -1;
-    EXPECT_EQ(qidynlib_load(RELOCATIONS_COMPLETE, &status), nullptr);
+    EXPECT_EQ(qidynlib_load(completeRelocations, &status), nullptr);
     EXPECT_EQ(qidynlib_symbol(nullptr, "get_relocated_dir", &status), nullptr);
     EXPECT_EQ(status.code, -1);
     EXPECT_EQ(status.json, nullptr);

@@ -9,6 +9,7 @@
 #include "qisysq/installRoot.h"
 #include "qisysq/stdpath.h"
 #include "support/FaultyAllocator.h"
+#include "support/TestPaths.h"
 
 namespace {
 
@@ -51,27 +52,27 @@ TEST(StandardDirectoriesTest, WithoutTheLibraryEveryKeyHasItsDefaultBelowTheRoot
 }
 
 TEST(StandardDirectoriesTest, ALibraryWithoutTheFunctionRelocatesNothing) {
-    const qisysq::StandardDirectories table(RELOCATIONS_LACKING);
+    const qisysq::StandardDirectories table(lackingRelocations);
     EXPECT_EQ(lookUp(table, "bindir"), std::string(qisysq_installRoot()) + "/usr/bin");
 }
 
 TEST(StandardDirectoriesTest, ARelocatedDirectoryIsUsedUnchanged) {
-    const qisysq::StandardDirectories table(RELOCATIONS_COMPLETE);
+    const qisysq::StandardDirectories table(completeRelocations);
     EXPECT_EQ(lookUp(table, "bindir"), "/moved/bin");
     EXPECT_EQ(lookUp(table, "docdir"), std::string(255, 'd'));
     EXPECT_EQ(lookUp(table, "sbindir"), std::string(qisysq_installRoot()) + "/usr/sbin");
 }
 
 TEST(StandardDirectoriesTest, AFailedRelocationIsReportedForItsKeyOnly) {
-    const qisysq::StandardDirectories table(RELOCATIONS_COMPLETE);
+    const qisysq::StandardDirectories table(completeRelocations);
     EXPECT_EQ(lookUp(table, "libdir"), "failed with -52006");
     EXPECT_EQ(lookUp(table, "libdir"), "failed with -52006");
     EXPECT_EQ(lookUp(table, "bindir"), "/moved/bin");
 }
 
 TEST(StandardDirectoriesTest, TheLibraryIsUnloadedAgain) {
-    const qisysq::StandardDirectories table(RELOCATIONS_COMPLETE);
-    EXPECT_EQ(dlopen(RELOCATIONS_COMPLETE, RTLD_NOW | RTLD_NOLOAD), nullptr);
+    const qisysq::StandardDirectories table(completeRelocations);
+    EXPECT_EQ(dlopen(completeRelocations, RTLD_NOW | RTLD_NOLOAD), nullptr);
 }
 
 TEST(StandardDirectoriesTest, AnUnknownKeyIsAnErrorWithoutDetails) {
@@ -84,7 +85,7 @@ TEST(StandardDirectoriesTest, AnUnknownKeyIsAnErrorWithoutDetails) {
 
 TEST(StandardDirectoriesTest, TheProcessWideTableFindsTheLibraryByItsName) {
     // A loaded library is found by its name wherever it was loaded from.
-    void* library = dlopen(RELOCATIONS_COMPLETE, RTLD_NOW);
+    void* library = dlopen(completeRelocations, RTLD_NOW);
     ASSERT_NE(library, nullptr) << dlerror();
     const qisysq::StandardDirectories table("libqirelocations.so.0");
     EXPECT_EQ(lookUp(table, "bindir"), "/moved/bin");

@@ -9,6 +9,7 @@
 #include "qixlator/exported.h"
 #include "qixlator/qixlator.h"
 #include "support/FaultyAllocator.h"
+#include "support/TestPaths.h"
 #include "support/TestRoot.h"
 
 namespace {
@@ -213,7 +214,7 @@ TEST_F(SessionTest, WithoutTheManagerAnUnknownNameReportsTheLoadersFailure) {
 
 TEST_F(SessionTest, AFailedLoadIsNotRepeatedInTheSession) {
     EXPECT_EQ(describe("known", -1, &status), "(null)");
-    const Manager manager(MANAGER_COMPLETE);
+    const Manager manager(completeManager);
     qierr::Status second;
     EXPECT_EQ(describe("known", -1, &second), "(null)");
     EXPECT_EQ(second.code, -52005);
@@ -222,7 +223,7 @@ TEST_F(SessionTest, AFailedLoadIsNotRepeatedInTheSession) {
 }
 
 TEST_F(SessionTest, TheManagerProvidesUnknownNames) {
-    const Manager manager(MANAGER_COMPLETE);
+    const Manager manager(completeManager);
     EXPECT_EQ(describe("known", -7, &status), "managed -7");
     EXPECT_EQ(describe("known", -8, &status), "managed -8");
     EXPECT_EQ(status.code, 0);
@@ -236,7 +237,7 @@ TEST_F(SessionTest, TheManagerProvidesUnknownNames) {
 }
 
 TEST_F(SessionTest, AManagersTranslatorThatCannotBeStoredIsReturnedAtOnce) {
-    const Manager manager(MANAGER_COMPLETE);
+    const Manager manager(completeManager);
     FaultyAllocator::failAt(0);
     EXPECT_EQ(describe("known", -7, &status), "(null)");
     FaultyAllocator::succeed();
@@ -246,19 +247,19 @@ TEST_F(SessionTest, AManagersTranslatorThatCannotBeStoredIsReturnedAtOnce) {
 
 TEST_F(SessionTest, AManagerThatLacksAFunctionIsUnloaded) {
     {
-        const Manager manager(MANAGER_LACKING);
+        const Manager manager(lackingManager);
         EXPECT_EQ(describe("known", -7, &status), "(null)");
         EXPECT_EQ(status.code, -52005);
         EXPECT_TRUE(reported(status, "\"qidynlib_symbol\":\"qixlatormgr_destroyXlator\""))
             << status.json;
         EXPECT_EQ(manager.calls(), "");
     }
-    EXPECT_EQ(dlopen(MANAGER_LACKING, RTLD_NOW | RTLD_NOLOAD), nullptr);
+    EXPECT_EQ(dlopen(lackingManager, RTLD_NOW | RTLD_NOLOAD), nullptr);
 }
 
 TEST_F(SessionTest, AManagerWithoutASessionIsUnloadedAndNotUsedAgain) {
     {
-        const Manager manager(MANAGER_FAILING);
+        const Manager manager(failingManager);
         EXPECT_EQ(describe("known", -7, &status), "(null)");
         EXPECT_EQ(status.code, -5);
         qierr::Status second;
@@ -266,7 +267,7 @@ TEST_F(SessionTest, AManagerWithoutASessionIsUnloadedAndNotUsedAgain) {
         EXPECT_EQ(second.code, -5);
         EXPECT_EQ(manager.calls(), "createSession;destroySession;");
     }
-    EXPECT_EQ(dlopen(MANAGER_FAILING, RTLD_NOW | RTLD_NOLOAD), nullptr);
+    EXPECT_EQ(dlopen(failingManager, RTLD_NOW | RTLD_NOLOAD), nullptr);
 }
 
 // ---- What this program lends --------------------------------------------------------------------

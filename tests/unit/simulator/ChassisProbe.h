@@ -2,8 +2,9 @@
 
 #include "ChassisFile.h"
 #include "Driver.h"
+#include "support/TestPaths.h"
 
-// The result of loading a chassis file in a new process. OPEN_PROBE names the program.
+// The result of loading a chassis file in a new process. openProbe is its command.
 namespace drivertest {
 
 struct Probe {
@@ -21,7 +22,7 @@ inline std::string contentOf(const std::string& path) {
 inline Probe openWith(const std::string& path, const std::string& variables = "") {
     const ChassisFile output("");
     const ChassisFile errors("");
-    const std::string command = variables + " QITRMC_SIM_CHASSIS='" + path + "' " + OPEN_PROBE +
+    const std::string command = variables + " QITRMC_SIM_CHASSIS='" + path + "' " + openProbe +
                                 " >" + output.path + " 2>" + errors.path;
     EXPECT_EQ(std::system(command.c_str()), 0) << contentOf(errors.path);
     return {contentOf(output.path), contentOf(errors.path)};

@@ -3,6 +3,7 @@
 
 #include "ChassisFile.h"
 #include "Values.h"
+#include "support/TestPaths.h"
 
 using namespace drivertest;
 
@@ -155,7 +156,7 @@ TEST_F(DescribedCommandTest, AResetComesBeforeTheOtherEffects) {
 // The random outcomes in a new process: a digit for each execution.
 std::string decisions(const std::string& arguments) {
     const ChassisFile output("");
-    EXPECT_EQ(std::system((std::string(CHANCE_PROBE) + arguments + " >" + output.path).c_str()), 0);
+    EXPECT_EQ(std::system((std::string(chanceProbe) + arguments + " >" + output.path).c_str()), 0);
     std::ifstream file(output.path);
     return std::string(std::istreambuf_iterator<char>(file), {});
 }
