@@ -15,7 +15,7 @@ from hostlib import BUILD_DIR, ROOT
 
 HERE = pathlib.Path(__file__).resolve().parent
 PAGE = BUILD_DIR / "page"
-CHROMIUM = pathlib.Path("/usr/bin/chromium")
+CHROMIUM = pathlib.Path("/usr/bin/chromium-headless-shell")
 PATIENCE = 400
 # Shared by the processes that run the tests side by side.
 RUN = os.environ.get("PYTEST_XDIST_TESTRUNUID", str(os.getpid()))

@@ -29,7 +29,7 @@ class BrowserFile(pytest.File):
 class BrowserTest(pytest.Item):
     def runtest(self):
         if not browser.CHROMIUM.exists():
-            pytest.skip("chromium is not installed")
+            pytest.skip("chromium-headless-shell is not installed")
         browser.built_page()
         results, stderr = browser.results_of(self.path)
         assert self.name in results, stderr
