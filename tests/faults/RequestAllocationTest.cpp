@@ -5,8 +5,8 @@
 #include "qitrmcwebsvc/IProcedureFactory.h"
 #include "support/allocationFaults.h"
 #include "support/cjsonLeak.h"
-#include "support/emulator.h"
 #include "support/knownChassis.h"
+#include "support/series.h"
 
 namespace {
 

@@ -3,8 +3,8 @@
 
 #include "ServiceTest.h"
 #include "support/allocationFaults.h"
-#include "support/emulator.h"
 #include "support/sanitizers.h"
+#include "support/series.h"
 
 #if defined(QITRMC_ADDRESS_SANITIZER)
 #include <sanitizer/lsan_interface.h>

@@ -10,7 +10,7 @@
 #include "qixlator/qixlator.h"
 #include "qixlatorlua/LuaXlator.h"
 #include "support/TestRoot.h"
-#include "support/emulator.h"
+#include "support/series.h"
 
 namespace {
 
@@ -71,9 +71,12 @@ TEST_F(RuntimesTest, GiveTheSameDescriptionsOfCodes) {
 }
 
 TEST_F(RuntimesTest, GiveTheSameDetailsInEveryLanguage) {
+    int number = 0;
     for (const std::string& json : statusTexts::ofEveryKind()) {
         for (const std::uint32_t attributes : {0x200u, 1u, 2u, 3u, 4u, 5u, 9u, 0xF00u}) {
-            compare(0, json.c_str(), attributes);
+            if (number++ % failureStep == 0) {
+                compare(0, json.c_str(), attributes);
+            }
         }
     }
     compare(0, "{}", 0, "json2");

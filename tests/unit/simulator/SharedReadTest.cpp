@@ -5,7 +5,7 @@
 
 #include "Values.h"
 #include "qitrmcsim.h"
-#include "support/emulator.h"
+#include "support/series.h"
 
 using namespace drivertest;
 

@@ -6,7 +6,7 @@
 #include <sys/stat.h>
 
 #include "StateFolder.h"
-#include "support/emulator.h"
+#include "support/series.h"
 
 using namespace drivertest;
 
