@@ -7,6 +7,7 @@
 
 #include "embedded/preload.h"
 #include "qixlatorlua/LuaMemory.h"
+#include "qixlatorlua/LuaState.h"
 
 namespace qixlatorlua {
 
@@ -119,6 +120,7 @@ int BytecodeCache::load(lua_State* L) {
     if (script == nullptr) {
         return 0;
     }
+    expectAnyChange(L);
     if (cache->push(L, script) != 0) {
         return lua_error(L);
     }

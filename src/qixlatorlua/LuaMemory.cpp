@@ -1,10 +1,22 @@
 #include "qixlatorlua/LuaMemory.h"
 
+#include <cassert>
 #include <cstring>
 
 #include "qihtl/Allocator.h"
 
 namespace qixlatorlua {
+
+namespace {
+
+// Builds with assertions check after each translation what those without rely on.
+#ifdef NDEBUG
+constexpr bool checksConstants = false;
+#else
+constexpr bool checksConstants = true;
+#endif
+
+}  // namespace
 
 void* allocatePlainly(void*, void* block, std::size_t oldSize, std::size_t newSize) {
     void* moved = qihtl_realloc(block, newSize);
@@ -36,7 +48,8 @@ LuaArena::Piece* LuaArena::getPiece(Piece* old, std::size_t size) {
     if (old == nullptr) {
         piece->next = pieces;
         piece->prev = nullptr;
-        piece->kept = false;
+        piece->keptSize = 0;
+        piece->constant = false;
     }
     piece->size = size;
     (piece->prev == nullptr ? pieces : piece->prev->next) = piece;
@@ -94,13 +107,17 @@ void LuaArena::give(void* block, std::size_t size) {
         return;
     }
     if (size <= largestSmall) {
+        isChanged = isChanged || isKept(block);
         auto* freed = static_cast<FreeBlock*>(block);
         freed->next = freeBlocks(size);
         freeBlocks(size) = freed;
         return;
     }
     Piece* piece = static_cast<Piece*>(block) - 1;
-    if (!piece->kept) {
+    if (piece->keptSize != 0) {
+        // Perhaps the table of strings, and all strings are linked anew.
+        isChanged = true;
+    } else {
         removePiece(piece);
     }
 }
@@ -108,7 +125,7 @@ void LuaArena::give(void* block, std::size_t size) {
 void* LuaArena::resize(void* block, std::size_t oldSize, std::size_t newSize) {
     if (oldSize > largestSmall && newSize > largestSmall) {
         Piece* old = static_cast<Piece*>(block) - 1;
-        if (!old->kept) {
+        if (old->keptSize == 0) {
             Piece* piece = getPiece(old, newSize);
             return piece != nullptr ? piece + 1 : newSize <= oldSize ? block : nullptr;
         }
@@ -138,6 +155,16 @@ std::size_t LuaArena::usedSize() const {
     return size;
 }
 
+bool LuaArena::isKept(const void* smallBlock) const {
+    const auto address = reinterpret_cast<std::uintptr_t>(smallBlock);
+    for (const Piece* piece = isKept() ? pieces : nullptr; piece != nullptr; piece = piece->next) {
+        if (address - reinterpret_cast<std::uintptr_t>(piece + 1) < piece->keptSize) {
+            return true;
+        }
+    }
+    return false;
+}
+
 bool LuaArena::keep() {
     copySize = usedSize();
     copy = static_cast<char*>(qihtl_realloc(nullptr, copySize));
@@ -146,26 +173,44 @@ bool LuaArena::keep() {
     }
     char* to = copy;
     for (Piece* piece = pieces; piece != nullptr; piece = piece->next) {
-        std::memcpy(to, piece + 1, usedSize(piece));
-        to += usedSize(piece);
-        piece->kept = true;
+        piece->keptSize = static_cast<std::uint32_t>(usedSize(piece));
+        std::memcpy(to, piece + 1, piece->keptSize);
+        to += piece->keptSize;
     }
-    keptSmall = small;
+    keptSmall = {small.room, small.roomSize, {}};
+    small = keptSmall;
+    isChanged = false;
     return true;
 }
 
 std::size_t LuaArena::keptSize() const {
     std::size_t size = copySize;
     for (const Piece* piece = pieces; piece != nullptr; piece = piece->next) {
-        size += piece->kept ? sizeof(Piece) + piece->size : 0;
+        size += piece->keptSize == 0 ? 0 : sizeof(Piece) + piece->size;
     }
     return size;
 }
 
+void LuaArena::findConstants() {
+    const char* content = copy;
+    for (Piece* piece = pieces; piece != nullptr; piece = piece->next) {
+        const bool isUnchanged = std::memcmp(piece + 1, content, piece->keptSize) == 0;
+        assert(isUnchanged || !piece->constant);
+        if (!hasConstants) {
+            piece->constant = isUnchanged && piece->keptSize >= smallestConstant;
+        }
+        content += piece->keptSize;
+    }
+    hasConstants = true;
+}
+
 void LuaArena::release() {
     // New pieces are added at the front, so all of them are before the kept ones.
-    while (pieces != nullptr && !pieces->kept) {
+    while (pieces != nullptr && pieces->keptSize == 0) {
         removePiece(pieces);
+    }
+    if (!isChanged && (!hasConstants || checksConstants)) {
+        findConstants();
     }
 }
 
@@ -173,9 +218,12 @@ void LuaArena::restore() {
     small = keptSmall;
     const char* from = copy;
     for (Piece* piece = pieces; piece != nullptr; piece = piece->next) {
-        std::memcpy(piece + 1, from, usedSize(piece));
-        from += usedSize(piece);
+        if (isChanged || !piece->constant) {
+            std::memcpy(piece + 1, from, piece->keptSize);
+        }
+        from += piece->keptSize;
     }
+    isChanged = false;
 }
 
 }  // namespace qixlatorlua

@@ -2,6 +2,7 @@
 
 #include <csetjmp>
 #include <cstddef>
+#include <cstdint>
 
 // Allocators for Lua states. Both functions follow the rules of lua_Alloc; in particular, shrinking
 // a block never fails.
@@ -17,6 +18,10 @@ void* allocatePlainly(void* context, void* block, std::size_t oldSize, std::size
 // A state contains the addresses of its own blocks and nothing else that changes, so a copy of all
 // its memory that is written back to the same addresses is the same state again. `keep` makes such
 // a copy, and `restore` writes it back.
+//
+// Blocks that are added after `keep` get memory of their own, so a translation changes few of the
+// kept pieces. The large ones that the first translation leaves unchanged are not written back
+// after further ones, unless those do something that may change any block (see mayChangeAll).
 class LuaArena {
   public:
     LuaArena() noexcept = default;
@@ -33,10 +38,14 @@ class LuaArena {
     // arena is destroyed, even if they are freed. Returns false if memory runs out. Called at most
     // once.
     bool keep();
+    // To be called before anything but a translation by the scripts that are loaded: the kept
+    // blocks are then all written back by the next `restore`.
+    void mayChangeAll() { isChanged = true; }
     bool isKept() const { return copy != nullptr; }
     // The memory of the kept blocks and of their copy, in bytes.
     std::size_t keptSize() const;
-    // Releases the memory that was added since `keep`. The kept blocks are invalid until `restore`.
+    // Ends a translation: releases the memory that was added since `keep`. The kept blocks are
+    // invalid until `restore`.
     void release();
     // Gives the kept blocks the content that they had at `keep`.
     void restore();
@@ -51,14 +60,19 @@ class LuaArena {
         Piece* next;
         Piece* prev;
         std::size_t size;
-        bool kept;
+        // How many bytes are in the copy; 0 if the piece is not kept.
+        std::uint32_t keptSize;
+        // Whether no translation changes it.
+        bool constant;
     };
     struct FreeBlock {
         FreeBlock* next;
     };
     static constexpr std::size_t grain = 8;
     static constexpr std::size_t largestSmall = 512;
-    static constexpr std::size_t chunkSize = 32 * 1024;
+    static constexpr std::size_t chunkSize = 4 * 1024;
+    // Smaller pieces are always written back: the stacks and the tables of globals and modules.
+    static constexpr std::size_t smallestConstant = 4 * 1024;
     // Where the next small block comes from.
     struct SmallBlocks {
         char* room;
@@ -74,6 +88,8 @@ class LuaArena {
     void removePiece(Piece* piece);
     bool addChunk();
     std::size_t usedSize(const Piece* piece) const;
+    bool isKept(const void* smallBlock) const;
+    void findConstants();
     FreeBlock*& freeBlocks(std::size_t size) { return small.freeLists[(size - 1) / grain]; }
 
     Piece* pieces = nullptr;
@@ -82,6 +98,9 @@ class LuaArena {
     char* copy = nullptr;
     std::size_t copySize = 0;
     SmallBlocks keptSmall = {};
+    // Whether any kept block may have changed, not only those that a translation changes.
+    bool isChanged = false;
+    bool hasConstants = false;
 };
 
 }  // namespace qixlatorlua

@@ -132,6 +132,13 @@ LuaArena* arenaOf(lua_State* L) {
     return static_cast<LuaArena*>(context);
 }
 
+void expectAnyChange(lua_State* L) {
+    LuaArena* arena = arenaOf(L);
+    if (arena != nullptr) {
+        arena->mayChangeAll();
+    }
+}
+
 qierr_Writer reportLuaFailure(lua_State* L, int result, const char* what, qierr_Status* status) {
     if (!qierr_Status_setCodeNamed(
             status, qiapalerr_softwareFaultAPALInternalUseOnly,

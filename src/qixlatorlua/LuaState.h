@@ -16,6 +16,10 @@ void closeState(lua_State* L);
 // The arena of a state; null for LuaRuntime::Plain.
 LuaArena* arenaOf(lua_State* L);
 
+// To be called before anything happens in a state but the calls of its translator's functions: code
+// is loaded or run, or garbage is collected.
+void expectAnyChange(lua_State* L);
+
 // Sets qiapalerr_softwareFaultAPALInternalUseOnly for an error of the interpreter. `result` is the
 // result of the protected call; the message is on top of the stack. Begins the object
 // `qixlatorlua_debug` with the member `debug` and returns a writer for further details. If the

@@ -128,6 +128,7 @@ void callScript(lua_State* L, const Description& description) {
 int describeProtected(lua_State* L) {
     auto* description = static_cast<Description*>(lua_touserdata(L, 1));
     if (lua_gc(L, LUA_GCCOUNT, 0) > collectionLimit) {
+        expectAnyChange(L);
         lua_gc(L, LUA_GCCOLLECT, 0);
     }
     callScript(L, *description);

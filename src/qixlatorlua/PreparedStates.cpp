@@ -81,6 +81,12 @@ int prepareProtected(lua_State* L) {
     return 0;
 }
 
+// To as many elements as a translation needs. A collection makes the stack smaller again.
+int enlargeStackProtected(lua_State* L) {
+    luaL_checkstack(L, 100, "");
+    return 0;
+}
+
 // Calls a function with an unchanged stack afterwards.
 bool call(lua_State* L, lua_CFunction function, void* argument) {
     const int top = lua_gettop(L);
@@ -147,7 +153,8 @@ bool PreparedStates::keep(lua_State* L, LuaArena* arena) {
     }
     lua_gc(L, LUA_GCCOLLECT, 0);
     lua_gc(L, LUA_GCSTOP, 0);
-    const bool isKept = arena->usedSize() <= maximumSize && arena->keep();
+    const bool isKept = call(L, enlargeStackProtected, nullptr) &&
+                        arena->usedSize() <= maximumSize && arena->keep();
     call(L, addJsonBufferProtected, nullptr);
     return isKept;
 }

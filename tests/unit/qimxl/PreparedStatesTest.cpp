@@ -6,15 +6,20 @@
 #include <string>
 #include <vector>
 
+#include "StatusTexts.h"
 #include "qixlator/Registration.h"
 #include "qixlator/qixlator.h"
+#include "qixlatorlua/LuaState.h"
 #include "qixlatorlua/LuaXlator.h"
 #include "support/TestRoot.h"
+#include "unit/qixlatorlua/ScriptHost.h"
 
 namespace {
 
 using qixlatorlua::LuaRuntime;
 using qixlatorlua::PreparedStates;
+using statusTexts::usage;
+using statusTexts::withEntries;
 
 constexpr const char* name = "mxlator_qitrmc";
 
@@ -32,7 +37,9 @@ XlatorInterface* create() {
 }
 
 lua_State* stateOf(XlatorInterface* xlator) {
-    return static_cast<qixlatorlua::LuaXlator*>(xlator)->L;
+    lua_State* const L = static_cast<qixlatorlua::LuaXlator*>(xlator)->L;
+    qixlatorlua::expectAnyChange(L);
+    return L;
 }
 
 // The text that a chunk returns in the state of a translator.
@@ -173,6 +180,37 @@ TEST_F(PreparedStatesTest, NoScriptLeavesATraceForTheNextTranslation) {
         runOnce(chunk);
         EXPECT_EQ(runOnce(describeAll), fresh) << "after " << chunk;
         EXPECT_EQ(runOnce("return collectgarbage('count')"), memory) << "after " << chunk;
+    }
+}
+
+// Only through the functions of a translator, as the service does.
+void translateOnce(const std::string& json, std::uint32_t attributes) {
+    XlatorInterface* xlator = create();
+    qierr::Status status;
+    ScriptHost::taken(
+        xlator->getStaticDesc(xlator, -250833, attributes, qixlator_realloc, nullptr, &status));
+    ScriptHost::taken(xlator->getDynamicDesc(xlator, json.c_str(), attributes, "json1",
+                                             qixlator_realloc, nullptr, &status));
+    xlator->destroy(xlator);
+}
+
+TEST_F(PreparedStatesTest, NoTranslationLeavesATraceForTheNext) {
+    const std::string fresh = runOnce(describeAll);
+    const std::string memory = runOnce("return collectgarbage('count')");
+    std::vector<std::string> texts = statusTexts::ofEveryKind();
+    // More strings than the state has room for in its table of strings.
+    std::string many = "\"0\"";
+    for (int number = 1; number < 10000; ++number) {
+        many += ",\"value " + std::to_string(number) + "\"";
+    }
+    texts.insert(texts.begin() + 3, withEntries(usage("kUsageTypeName", "[" + many + "]", "1")));
+    for (const std::uint32_t language : {0u, 2u, 9u}) {
+        for (const std::string& json : texts) {
+            translateOnce(json, language | 0x200);
+            translateOnce(json, language);
+            EXPECT_EQ(runOnce(describeAll), fresh) << "after " << json;
+            EXPECT_EQ(runOnce("return collectgarbage('count')"), memory) << "after " << json;
+        }
     }
 }
 

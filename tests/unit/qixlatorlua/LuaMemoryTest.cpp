@@ -6,6 +6,7 @@
 #include <cstring>
 #include <memory>
 #include <random>
+#include <string>
 #include <vector>
 
 #include "support/FaultyAllocator.h"
@@ -114,6 +115,85 @@ TEST_F(LuaMemoryTest, ShrinkingNeverFails) {
     }
     FaultyAllocator::succeed();
     EXPECT_EQ(FaultyAllocator::liveBlocks(), before);
+}
+
+// Blocks in an arena that keeps them: a small one, and three so large that they are not written
+// back after translations that leave them unchanged.
+class KeptBlocks {
+  public:
+    KeptBlocks() {
+        for (std::size_t index = 0; index < count; ++index) {
+            blocks[index] =
+                static_cast<char*>(LuaArena::allocate(&arena, nullptr, 0, sizes[index]));
+            std::memset(blocks[index], 'k', sizes[index]);
+        }
+        EXPECT_TRUE(arena.keep());
+        // The first translation changes the last large block.
+        translate([this] { std::memset(blocks[3], 'x', sizes[3]); });
+    }
+
+    // Expects that the blocks are as they were after a translation that does this.
+    template <typename Action>
+    void translate(Action action) {
+        action();
+        arena.release();
+        arena.restore();
+        for (std::size_t index = 0; index < count; ++index) {
+            EXPECT_EQ(std::string(blocks[index], sizes[index]), std::string(sizes[index], 'k'))
+                << "block " << index;
+        }
+    }
+
+    void changeAll() {
+        for (std::size_t index = 0; index < count; ++index) {
+            std::memset(blocks[index], 'x', sizes[index]);
+        }
+    }
+
+    static constexpr std::size_t count = 4;
+    static constexpr std::size_t sizes[count] = {100, 10000, 10000, 10000};
+    LuaArena arena;
+    char* blocks[count];
+};
+
+TEST_F(LuaMemoryTest, WhatATranslationChangesIsWrittenBack) {
+    KeptBlocks kept;
+    for (int round = 0; round < 3; ++round) {
+        kept.translate([&] {
+            std::memset(kept.blocks[0], 'x', KeptBlocks::sizes[0]);
+            std::memset(kept.blocks[3], 'x', KeptBlocks::sizes[3]);
+        });
+    }
+}
+
+TEST_F(LuaMemoryTest, EverythingIsWrittenBackAfterWhatMayChangeAll) {
+    KeptBlocks kept;
+    kept.translate([&] {
+        kept.arena.mayChangeAll();
+        kept.changeAll();
+    });
+}
+
+TEST_F(LuaMemoryTest, EverythingIsWrittenBackAfterAKeptBlockWasFreed) {
+    for (std::size_t index = 0; index < KeptBlocks::count; ++index) {
+        KeptBlocks kept;
+        kept.translate([&] {
+            kept.changeAll();
+            LuaArena::allocate(&kept.arena, kept.blocks[index], KeptBlocks::sizes[index], 0);
+        });
+        kept.translate([&] {
+            kept.changeAll();
+            LuaArena::allocate(&kept.arena, kept.blocks[index], KeptBlocks::sizes[index],
+                               KeptBlocks::sizes[index] + 2000);
+        });
+    }
+}
+
+TEST_F(LuaMemoryTest, ABlockOfATranslationIsReusedWithinIt) {
+    KeptBlocks kept;
+    void* block = LuaArena::allocate(&kept.arena, nullptr, 0, 100);
+    LuaArena::allocate(&kept.arena, block, 100, 0);
+    EXPECT_EQ(LuaArena::allocate(&kept.arena, nullptr, 0, 100), block);
 }
 
 TEST_F(LuaMemoryTest, ThePlainRuntimeAllocatesEachBlockByItself) {
