@@ -20,14 +20,11 @@ constexpr bool hasAddressSanitizer = false;
 // long, the address sanitizer three times: they get one in seven and one in five, and all if
 // QITRMC_SERIES is "whole". The numbers have no common factor with the lengths of rows of cases, so
 // each column is tried.
-inline int stepOfSeries() {
+inline bool isSeriesWhole() {
     const char* series = std::getenv("QITRMC_SERIES");
-    if (series != nullptr && std::string(series) == "whole") {
-        return 1;
-    }
-    return isEmulated ? 7 : hasAddressSanitizer ? 5 : 1;
+    return series != nullptr && std::string(series) == "whole";
 }
 
 // By how many allocations, or other places to fail, a test moves on that lets one after another
 // fail.
-inline const int failureStep = stepOfSeries();
+inline const int failureStep = isSeriesWhole() ? 1 : isEmulated ? 7 : hasAddressSanitizer ? 5 : 1;

@@ -202,10 +202,9 @@ TEST_F(MemoryFaultTest, AStateThatCannotBeMadeIsReported) {
 }
 
 // Every block of the interpreter is a request in the plain runtime, which the service does not use:
-// thousands, so in several parts, and in longer steps where there are steps; our own requests are
-// among those above.
-constexpr int parts = 8;
-const int plainStep = failureStep == 1 ? 1 : 4 * failureStep;
+// thousands, so in several parts, and in longer steps; our own requests are among those above.
+constexpr int parts = 4;
+const int plainStep = isSeriesWhole() ? 1 : 4 * failureStep;
 class PlainMemoryFaultTest : public MemoryFaultTest, public testing::WithParamInterface<int> {};
 
 INSTANTIATE_TEST_SUITE_P(Parts, PlainMemoryFaultTest, testing::Range(0, parts));

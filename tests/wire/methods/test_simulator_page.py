@@ -9,9 +9,13 @@ import json
 import pathlib
 import subprocess
 
+import pytest
+
 from hostlib import BUILD_DIR, clean_host
 from jsonrpc import Client
 from pages import blocks_of, compact, id_of
+
+pytestmark = pytest.mark.same_in_each_build
 
 PAGE = pathlib.Path(__file__).resolve().parents[3] / "docs" / "simulator.md"
 

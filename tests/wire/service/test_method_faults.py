@@ -12,6 +12,8 @@ from hostlib import ROOT, clean_host
 from jsonrpc import Client, call
 from method_calls import CHASSIS, REQUESTS
 
+pytestmark = pytest.mark.same_in_each_build
+
 with (ROOT / "simulator" / "faults" / "methods.tsv").open(encoding="utf-8") as _file:
     ROWS = [(row["method"], row["function"], row["part"])
             for row in csv.DictReader(_file, delimiter="\t")]
