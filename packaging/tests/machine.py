@@ -1,8 +1,9 @@
 #!/usr/bin/python3
 """A small Debian machine for the tests of the packages: a root folder of its own with its own network.
 
-The base system is made once and kept in build/package-root, with all that was downloaded. Root is
-needed, as for every chroot. Run as a program, it makes the base system.
+The base system is made once a week and kept in the user's cache folder, with all that was downloaded, for
+all copies of the repository. Root is needed, as for every chroot. Run as a program, it makes the base
+system.
 """
 
 import contextlib
@@ -12,14 +13,17 @@ import pathlib
 import shutil
 import subprocess
 import tempfile
+import time
 
 ROOT = pathlib.Path(__file__).resolve().parents[2]
-CACHE = ROOT / "build" / "package-root"
+USERS_CACHE = pathlib.Path(os.environ.get("XDG_CACHE_HOME") or pathlib.Path.home() / ".cache")
+KEPT = USERS_CACHE / "qitrmc-package-root"
 PACKAGES = ROOT / "build" / "packages"
 SOURCES = sorted(pathlib.Path("/etc/apt/sources.list.d").glob("*.sources"))
 
 # systemd brings the checker of the units; it does not run here.
 INCLUDED = "curl,openssl,systemd"
+CACHE = KEPT / f"{time.strftime('%G-%V')}-{INCLUDED}"
 
 # Starts the program of a unit as systemctl does, with its settings, but without the hardening.
 SYSTEMCTL = r"""#!/bin/bash
@@ -60,6 +64,8 @@ def make_base():
     base = CACHE / "base.tar"
     with alone():
         if not base.exists():
+            for older in set(KEPT.iterdir()) - {CACHE}:
+                shutil.rmtree(older)
             unfinished = CACHE / "unfinished.tar"
             subprocess.run(["mmdebstrap", "--quiet", "--variant=minbase", f"--include={INCLUDED}",
                             "bookworm", unfinished, *SOURCES], check=True)
@@ -100,11 +106,12 @@ class Machine:
                    "-o", f"Dir::State::status={self.root}/var/lib/dpkg/status",
                    "-o", "APT::Sandbox::User=root", "-o", "APT::Keep-Downloaded-Packages=true"]
         (CACHE / "cache").mkdir(exist_ok=True)
-        if not (state / "updated").exists():
+        install = ["apt-get", *options, "install", "-y", "--download-only", "--no-install-recommends",
+                   *packages]
+        # At first there are no lists; later they may name versions that are gone.
+        if subprocess.run(install, capture_output=True).returncode != 0:
             subprocess.run(["apt-get", *options, "update"], check=True)
-            (state / "updated").touch()
-        subprocess.run(["apt-get", *options, "install", "-y", "--download-only",
-                        "--no-install-recommends", *packages], check=True, stdout=subprocess.DEVNULL)
+            subprocess.run(install, check=True, stdout=subprocess.DEVNULL)
         for path in archives.glob("*.deb"):
             shutil.copy(path, self.root / "var/cache/apt/archives")
         shutil.copytree(state / "lists", self.root / "var/lib/apt/lists", dirs_exist_ok=True)
