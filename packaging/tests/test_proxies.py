@@ -133,7 +133,8 @@ def test_a_body_of_unknown_length_does_not_pass_the_limit(proxied):
 def test_an_answer_is_waited_for_longer_than_an_hour_and_then_504_is_sent(proxied):
     """With a second in place of the 3700 of the example."""
     restart = {"nginx": "nginx -s stop; while [ -e /run/nginx.pid ]; do :; done; nginx",
-               "haproxy": "kill $(pidof haproxy); while pidof haproxy; do :; done; haproxy -D -f $file"}
+               "haproxy": "kill $(pidof haproxy); while pidof haproxy >/dev/null; do :; done; "
+                          "haproxy -D -f $file"}
     file = {"nginx": "/etc/nginx/conf.d/qitrmc.conf", "haproxy": "/etc/haproxy/haproxy.cfg"}[proxied.name]
     assert proxied(f"""
       file={file}
