@@ -36,11 +36,12 @@ class Pair {
     int ends[2] = {-1, -1};
 };
 
+using Clock = std::chrono::steady_clock;
+
 // Closes overdue connections, as the host does all the time, until `condition` holds. Returns how
-// many seconds that took.
-double shutOverdueUntil(Connections& connections, const std::function<bool()>& condition) {
-    using Clock = std::chrono::steady_clock;
-    const Clock::time_point begin = Clock::now();
+// many seconds that took since `begin`.
+double shutOverdueUntil(Connections& connections, const std::function<bool()>& condition,
+                        Clock::time_point begin = Clock::now()) {
     const Clock::time_point giveUp = begin + std::chrono::minutes(1);
     while (!condition() && Clock::now() < giveUp) {
         connections.shutOverdue();
@@ -52,10 +53,12 @@ double shutOverdueUntil(Connections& connections, const std::function<bool()>& c
 TEST(Connections, CloseAConnectionThatIsIdleLongerThanTheTimeout) {
     const Pair pair;
     Connections connections(10, 1);
+    const Clock::time_point begin = Clock::now();
     connections.add(pair.host());
     connections.shutOverdue();
     EXPECT_FALSE(pair.isShut());
-    const double seconds = shutOverdueUntil(connections, [&] { return pair.isShut(); });
+    const double seconds = shutOverdueUntil(
+        connections, [&] { return pair.isShut(); }, begin);
     EXPECT_GE(seconds, 1.0);
 }
 
@@ -86,9 +89,11 @@ TEST(Connections, CloseAnIdleConnectionSoonerWhenAllSlotsAreTaken) {
     const Pair first;
     const Pair second;
     Connections connections(2, 86400);
+    const Clock::time_point begin = Clock::now();
     connections.add(first.host());
     connections.add(second.host())->workForClient();
-    const double seconds = shutOverdueUntil(connections, [&] { return first.isShut(); });
+    const double seconds = shutOverdueUntil(
+        connections, [&] { return first.isShut(); }, begin);
     EXPECT_GE(seconds, 2.0);
     EXPECT_FALSE(second.isShut());
 }
