@@ -5,6 +5,7 @@
 extern const char* const corpusFolder;
 extern const char* const embeddedSources;
 extern const char* const explanationFiles;
+extern const char* const localesFolder;
 extern const char* const pluginFile;
 
 // Commands of the shell.
