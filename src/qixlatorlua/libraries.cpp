@@ -35,7 +35,7 @@ int openFiles(lua_State* L) {
 }  // namespace
 
 const LuaLibrary libraries[] = {
-    {"", luaopen_base, nullptr},
+    {"", luaopen_base, reportLoading},
     {LUA_LOADLIBNAME, luaopen_package, disableNativeModules},
     {LUA_TABLIBNAME, luaopen_table, nullptr},
     {LUA_IOLIBNAME, openFiles, disablePrograms},

@@ -4,6 +4,8 @@
 #include <cstring>
 #include <lua.hpp>
 
+#include "qixlatorlua/LuaState.h"
+
 // These functions must not own resources: a Lua error is a longjmp that skips destructors.
 
 namespace qixlatorlua {
@@ -100,6 +102,7 @@ int prompt(lua_State* L) {
         if (std::fgets(line, sizeof line, stdin) == nullptr || std::strcmp(line, "cont\n") == 0) {
             return 0;
         }
+        expectAnyChange(L);
         if (luaL_loadbuffer(L, line, std::strlen(line), "=(debug command)") != 0 ||
             lua_pcall(L, 0, 0, 0) != 0) {
             const char* message = lua_tostring(L, -1);
@@ -118,12 +121,32 @@ void setLoader(lua_State* L, int index, lua_CFunction loader) {
     lua_rawseti(L, -2, index);
 }
 
+// Runs the function that is its upvalue, in its place.
+int loadCode(lua_State* L) {
+    expectAnyChange(L);
+    return lua_tocfunction(L, lua_upvalueindex(1))(L);
+}
+
 }  // namespace
+
+void reportLoading(lua_State* L) {
+    for (const char* name : {"dofile", "load", "loadfile", "loadstring"}) {
+        lua_getfield(L, -1, name);
+        lua_pushcclosure(L, loadCode, 1);
+        lua_setfield(L, -2, name);
+    }
+}
 
 void disableNativeModules(lua_State* L) {
     lua_pushcfunction(L, loadLibrary);
     lua_setfield(L, -2, "loadlib");
     lua_getfield(L, -1, "loaders");
+    // That of scripts in directories.
+    lua_rawgeti(L, -1, 2);
+    lua_pushcclosure(L, loadCode, 1);
+    lua_pushvalue(L, -3);
+    lua_setfenv(L, -2);
+    lua_rawseti(L, -2, 2);
     setLoader(L, 3, loadNativeModule);
     setLoader(L, 4, loadFromRootModule);
     lua_pop(L, 1);

@@ -6,6 +6,12 @@ struct lua_State;
 // function expects the table of its library on top of the stack and leaves it there.
 namespace qixlatorlua {
 
+// Makes the functions that load code call expectAnyChange first; the loader of scripts in
+// directories gets the same from disableNativeModules. With that of embedded scripts
+// (BytecodeCache) these are all ways in which other code than that of the translator gets into a
+// state.
+void reportLoading(lua_State* L);
+
 // Makes package.loadlib and the loaders of native modules behave as in an interpreter without
 // dynamic loading.
 void disableNativeModules(lua_State* L);
