@@ -85,6 +85,7 @@ void getSharedDir(qihtl::String* directory, qierr_Status* status) {
     if (kept.get(path.c_str(), identity, directory, status)) {
         return;
     }
+    FileLooks::setIncomplete();
     qierr::Status fileStatus;
     qihtl::String text;
     readFileToBuffer(path.c_str(), &text, &fileStatus);

@@ -6,6 +6,7 @@
 #include <iterator>
 #include <new>
 
+#include "qisysq/FileLooks.h"
 #include "qisysq/stdpath_util.h"
 #include "qixlator/DirectoryWalker.h"
 #include "qixlator/ExplanationFile.h"
@@ -125,6 +126,7 @@ void findErrorDescriptionFromDir(const char* directory, std::int32_t code, qihtl
     if (status->code < 0 || KeptSearches::ofProcess().find(directory, code, output, status)) {
         return;
     }
+    qisysq::FileLooks::setIncomplete();
     OnHeap<DirectoryWalker> walker;
     OnHeap<FileEntry> entry;
     if (walker.get() == nullptr || entry.get() == nullptr) {

@@ -36,7 +36,11 @@ void* LuaArena::allocate(void* arena, void* block, std::size_t oldSize, std::siz
         self->give(block, oldSize);
         return nullptr;
     }
-    return block == nullptr ? self->get(newSize) : self->resize(block, oldSize, newSize);
+    void* const result =
+        block == nullptr ? self->get(newSize) : self->resize(block, oldSize, newSize);
+    // A script may handle the failure and go on in another way than usual.
+    self->isChanged = self->isChanged || result == nullptr;
+    return result;
 }
 
 // Allocates a piece and adds it to the list, or resizes `old`, which may move.

@@ -41,6 +41,8 @@ class LuaArena {
     // To be called before anything but a translation by the scripts that are loaded: the kept
     // blocks are then all written back by the next `restore`.
     void mayChangeAll() { isChanged = true; }
+    // Whether that or the like has happened since `keep` or `restore`.
+    bool isAnythingChanged() const { return isChanged; }
     bool isKept() const { return copy != nullptr; }
     // The memory of the kept blocks and of their copy, in bytes.
     std::size_t keptSize() const;

@@ -176,11 +176,32 @@ char* describe(XlatorInterface* self, Description* description, const char* fail
     return description->text;
 }
 
+char* copyText(const char* text, qixlator_Alloc alloc, void* allocContext, qierr_Status* status) {
+    const std::size_t size = std::strlen(text) + 1;
+    auto* copy =
+        static_cast<char*>(alloc(nullptr, static_cast<std::uint32_t>(size), allocContext, status));
+    return copy == nullptr ? nullptr : static_cast<char*>(std::memcpy(copy, text, size));
+}
+
+// In a kept state the result depends on files alone, so it is kept too.
 char* getStaticDesc(XlatorInterface* self, std::int32_t code, std::uint32_t attributes,
                     qixlator_Alloc alloc, void* allocContext, qierr_Status* status) {
+    lua_State* const L = static_cast<LuaXlator*>(self)->L;
+    PreparedStates& states = PreparedStates::ofProcess();
+    const KeptTexts* const kept = status->code < 0 ? nullptr : states.textsOf(L);
+    const char* const known = kept == nullptr ? nullptr : kept->find(code, attributes);
+    if (known != nullptr) {
+        return copyText(known, alloc, allocContext, status);
+    }
     Description description{"getStaticDesc", code,         nullptr, nullptr, attributes,
                             alloc,           allocContext, status,  nullptr, 0};
-    return describe(self, &description, "failed to get static desc");
+    char* const text = describe(self, &description, "failed to get static desc");
+    const qisysq::LookList* const looks = qisysq::FileLooks::current();
+    KeptTexts* const texts = text == nullptr || looks == nullptr ? nullptr : states.textsOf(L);
+    if (texts != nullptr) {
+        texts->add(code, attributes, *looks, text);
+    }
+    return text;
 }
 
 char* getDynamicDesc(XlatorInterface* self, const char* json, std::uint32_t attributes,

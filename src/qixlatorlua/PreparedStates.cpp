@@ -204,6 +204,20 @@ void PreparedStates::empty(Slot* slot) {
     new (slot) Slot();
 }
 
+KeptTexts* PreparedStates::textsOf(lua_State* L) {
+    const LuaArena* arena = arenaOf(L);
+    if (arena == nullptr || !arena->isKept() || arena->isAnythingChanged()) {
+        return nullptr;
+    }
+    const Lock lock(mutex);
+    for (Slot& slot : slots) {
+        if (slot.L == L) {
+            return &slot.texts;
+        }
+    }
+    return nullptr;
+}
+
 void PreparedStates::close(lua_State* L, LuaArena* arena) {
     closeWithoutFreeing(L);
     if (!arena->isKept()) {

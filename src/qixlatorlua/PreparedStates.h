@@ -6,6 +6,7 @@
 #include <mutex>
 
 #include "qihtl/String.h"
+#include "qixlatorlua/KeptTexts.h"
 #include "qixlatorlua/LuaMemory.h"
 
 struct lua_State;
@@ -40,6 +41,10 @@ class PreparedStates {
     // is closed like any other.
     void add(lua_State* L, const char* name, const char* registrationInfo);
 
+    // The descriptions of codes by a state that is in use; null if nothing is known of them, since
+    // the state is not kept or may have been changed by something else than its translator.
+    KeptTexts* textsOf(lua_State* L);
+
     // Closes a state with an arena, whether it was added or not, and releases the arena unless it
     // is kept.
     void close(lua_State* L, LuaArena* arena);
@@ -63,6 +68,7 @@ class PreparedStates {
         bool isUsed = false;
         qihtl::String name;
         qihtl::String registrationInfo;
+        KeptTexts texts;
     };
 
     Slot* findIdle(const char* name, const char* registrationInfo);

@@ -5,6 +5,7 @@
 #include <new>
 
 #include "qihtl/String.h"
+#include "qisysq/FileLooks.h"
 #include "qixlator/qvErrorsParser.h"
 #include "qixlatorlua/pathVariables.h"
 
@@ -46,6 +47,7 @@ Outcome* newOutcome(lua_State* L) {
 int finish(lua_State* L, Outcome* outcome) {
     const bool failed = outcome->status.code < 0;
     if (failed) {
+        qisysq::FileLooks::setIncomplete();
         lua_pushstring(L, outcome->status.json == nullptr ? "{}" : outcome->status.json);
     } else {
         lua_pushlstring(L, outcome->text.c_str(), outcome->text.length());

@@ -2,14 +2,18 @@
 
 #include <gtest/gtest.h>
 
+#include <chrono>
+#include <filesystem>
 #include <lua.hpp>
 #include <string>
+#include <thread>
+#include <utility>
 #include <vector>
 
 #include "StatusTexts.h"
+#include "qisysq/FileLooks.h"
 #include "qixlator/Registration.h"
 #include "qixlator/qixlator.h"
-#include "qixlatorlua/LuaState.h"
 #include "qixlatorlua/LuaXlator.h"
 #include "support/TestRoot.h"
 #include "unit/qixlatorlua/ScriptHost.h"
@@ -37,15 +41,17 @@ XlatorInterface* create() {
 }
 
 lua_State* stateOf(XlatorInterface* xlator) {
-    lua_State* const L = static_cast<qixlatorlua::LuaXlator*>(xlator)->L;
-    qixlatorlua::expectAnyChange(L);
-    return L;
+    return static_cast<qixlatorlua::LuaXlator*>(xlator)->L;
 }
 
-// The text that a chunk returns in the state of a translator.
+// The text that a chunk returns in the state of a translator, where it is loaded as scripts load
+// code.
 std::string run(XlatorInterface* xlator, const char* chunk) {
     lua_State* L = stateOf(xlator);
-    const bool failed = luaL_dostring(L, chunk) != 0;
+    lua_getglobal(L, "loadstring");
+    lua_pushstring(L, chunk);
+    lua_call(L, 1, 1);
+    const bool failed = lua_pcall(L, 0, 1, 0) != 0;
     const char* text = lua_tostring(L, -1);
     const std::string result =
         (failed ? "failed: " : "") + std::string(text == nullptr ? "" : text);
@@ -212,6 +218,68 @@ TEST_F(PreparedStatesTest, NoTranslationLeavesATraceForTheNext) {
             EXPECT_EQ(runOnce("return collectgarbage('count')"), memory) << "after " << json;
         }
     }
+}
+
+std::string explanation(const std::string& text) {
+    return "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"-1\">\n" + text +
+           "\n</qierror>\n</qidocument>\n";
+}
+
+// The description of code -1 as a failure of a request gets it, and whether it was kept before.
+std::pair<std::string, bool> description() {
+    const qisysq::FileLooks looks;
+    XlatorInterface* xlator = create();
+    const qixlatorlua::KeptTexts* texts = PreparedStates::ofProcess().textsOf(stateOf(xlator));
+    const bool wasKept = texts != nullptr && texts->find(-1, 0x200) != nullptr;
+    qierr::Status status;
+    const std::string text = ScriptHost::taken(
+        xlator->getStaticDesc(xlator, -1, 0x200, qixlator_realloc, nullptr, &status));
+    xlator->destroy(xlator);
+    return {text, wasKept};
+}
+
+// Texts are kept as soon as nothing that they depend on was changed in the last seconds. The pauses
+// leave the processor to other tests.
+void describeUntilKept(const std::string& expected) {
+    const auto end = std::chrono::steady_clock::now() + std::chrono::seconds(30);
+    for (bool isKept = false; !isKept;) {
+        const auto [text, wasKept] = description();
+        ASSERT_EQ(text, expected);
+        ASSERT_LT(std::chrono::steady_clock::now(), end);
+        isKept = wasKept;
+        std::this_thread::sleep_for(std::chrono::milliseconds(20));
+    }
+}
+
+TEST_F(PreparedStatesTest, EachChangeOfAFileShowsInTheNextDescription) {
+    const std::string ofDriver = "/usr/local/qinstal/share/mierrors/qitrmc/English/";
+    root.write(ofDriver + "a.txt", explanation("Old."));
+    describeUntilKept("Old.");
+    root.write(ofDriver + "a.txt", explanation("New."));
+    EXPECT_EQ(description().first, "New.");
+    std::filesystem::remove(root.locate(ofDriver + "a.txt"));
+    EXPECT_EQ(description().first, "Error description not found");
+    root.write(ofDriver + "b.txt", explanation("Added."));
+    describeUntilKept("Added.");
+    root.write("/other/mierrors/qitrmc/English/a.txt", explanation("Elsewhere."));
+    root.write("/etc/qinstal/share/share.dir", root.locate("/other"));
+    EXPECT_EQ(description().first, "Elsewhere.");
+}
+
+TEST_F(PreparedStatesTest, ADescriptionByChangedScriptsIsNotKept) {
+    root.write("/usr/local/qinstal/share/mierrors/qitrmc/English/a.txt", explanation("Found."));
+    describeUntilKept("Found.");
+    const qisysq::FileLooks looks;
+    for (int round = 0; round < 2; ++round) {
+        XlatorInterface* xlator = create();
+        run(xlator, "qixlatorlua_xlator.getStaticDesc = function() return 'changed' end");
+        qierr::Status status;
+        EXPECT_EQ(ScriptHost::taken(
+                      xlator->getStaticDesc(xlator, -1, 0x200, qixlator_realloc, nullptr, &status)),
+                  "changed");
+        xlator->destroy(xlator);
+    }
+    EXPECT_EQ(description().first, "Found.");
 }
 
 TEST_F(PreparedStatesTest, AStateThatIsUsedAgainIsLikeOneThatWasSetUp) {
