@@ -131,7 +131,7 @@ bool RequestHandler::handleSingleRequest(JsonValue& requestValue, JsonValue& res
     bool succeeded = true;
     try {
         SingleRequest request(requestValue);
-        getProcedure(request.getMethod())->execute(request, response);
+        getProcedure(request.getMethod()).execute(request, response);
     } catch (const std::exception& error) {
         setErrorFrom(error, response);
         succeeded = false;
@@ -159,14 +159,15 @@ void RequestHandler::handleBatchRequest(JsonValue& requests, JsonValue& response
     }
 }
 
-std::shared_ptr<IProcedure> RequestHandler::getProcedure(const std::string& method) const {
+// Not an owner: all requests would write to the same count of owners.
+IProcedure& RequestHandler::getProcedure(const std::string& method) const {
     const auto found = procedures.find(method);
     if (found == procedures.end()) {
         BasicError error(qierr::codes::unknownMethod, QITRMC_HERE);
         addUsageString(error.details(), "kUsageTypeMethod", method.c_str());
         throw error;
     }
-    return found->second;
+    return *found->second;
 }
 
 }  // namespace nQITRMCWEBSVC100

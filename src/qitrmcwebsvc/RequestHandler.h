@@ -36,7 +36,7 @@ class RequestHandler {
                              JsonAllocator& allocator);
     void handleBatchRequest(JsonValue& requests, JsonValue& responseValue,
                             JsonAllocator& allocator);
-    std::shared_ptr<IProcedure> getProcedure(const std::string& method) const;
+    IProcedure& getProcedure(const std::string& method) const;
 
     ProcedureFactory procedureFactory;
     std::map<std::string, std::shared_ptr<IProcedure>> procedures;
