@@ -1,5 +1,6 @@
 #include "host/Workers.h"
 
+#include <sched.h>
 #include <sys/epoll.h>
 #include <sys/eventfd.h>
 #include <unistd.h>
@@ -37,6 +38,10 @@ constexpr bool canModify = false;
 #else
 constexpr bool canModify = true;
 #endif
+
+// How often a thread looks for more work before it sleeps, some 50 us. It takes longer to wake a
+// sleeping processor than to serve most requests.
+constexpr int mostLooks = 100;
 
 bool startThread(pthread_t& thread, void* (*function)(void*), void* argument) {
     pthread_attr_t attributes;
@@ -105,7 +110,7 @@ void* Workers::run(void* argument) {
 void Workers::serveUntilEnd(Worker& worker) noexcept {
     epoll_event event = {};
     while (!isSurplus()) {
-        if (epoll_wait(readySet, &event, 1, -1) != 1) {
+        if (!waitFor(event)) {
             continue;
         }
         auto* watched = static_cast<Watched*>(event.data.ptr);
@@ -119,6 +124,27 @@ void Workers::serveUntilEnd(Worker& worker) noexcept {
         serve(watched);
         ++worker.progress;
     }
+}
+
+// False when there is nothing to do after all.
+bool Workers::waitFor(epoll_event& event) noexcept {
+    return epoll_wait(readySet, &event, 1, 0) == 1 || lookFor(event) ||
+           epoll_wait(readySet, &event, 1, -1) == 1;
+}
+
+// Looks some times whether something is ready, and gives way to other threads and programs while
+// nothing is. Only one thread at a time does so: one is enough to find what comes.
+bool Workers::lookFor(epoll_event& event) noexcept {
+    if (isLooking.exchange(true)) {
+        return false;
+    }
+    bool found = false;
+    for (int looks = 0; looks < mostLooks && !found; ++looks) {
+        sched_yield();
+        found = epoll_wait(readySet, &event, 1, 0) == 1;
+    }
+    isLooking = false;
+    return found;
 }
 
 void Workers::serve(Watched* watched) noexcept {

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <pthread.h>
+#include <sys/epoll.h>
 
 #include <atomic>
 #include <condition_variable>
@@ -61,6 +62,8 @@ class Workers {
     static void* run(void* worker);
     static void* runSupervisor(void* workers);
     void serveUntilEnd(Worker& worker) noexcept;
+    bool waitFor(epoll_event& event) noexcept;
+    bool lookFor(epoll_event& event) noexcept;
     void serve(Watched* watched) noexcept;
     bool isSurplus() noexcept;
     void supervise();
@@ -75,6 +78,7 @@ class Workers {
     const int readySet;  // of epoll
     const int endEvent;  // readable from the end on
     std::list<Worker> workers;
+    std::atomic<bool> isLooking{false};
     pthread_t supervisor = {};
 
     std::atomic<std::size_t> surplus{0};

@@ -7,8 +7,11 @@
 
 #include <atomic>
 #include <chrono>
+#include <filesystem>
+#include <fstream>
 #include <functional>
 #include <future>
+#include <string>
 #include <thread>
 #include <utility>
 #include <vector>
@@ -200,6 +203,37 @@ TEST(Workers, NoticeCallsThatLastAfterAnIdleTime) {
     }
     EXPECT_EQ(waiting, most);
     release.set_value();
+}
+
+// The state of each other thread of the process, as the system has it: S for one that sleeps.
+std::string statesOfOtherThreads() {
+    std::string states;
+    for (const auto& task : std::filesystem::directory_iterator("/proc/self/task")) {
+        std::string line;
+        std::getline(std::ifstream(task.path() / "stat"), line);
+        const std::size_t state = line.rfind(") ");
+        if (task.path().filename() != std::to_string(gettid()) && state != line.npos) {
+            states += line[state + 2];
+        }
+    }
+    return states;
+}
+
+// Threads look for more work only for a moment.
+TEST(Workers, SleepWhenThereIsNoMoreWork) {
+    Workers workers(most);
+    std::promise<void> served;
+    Receivers receivers(workers);
+    receivers.add([&] { served.set_value(); }).send();
+    EXPECT_EQ(served.get_future().wait_for(patience), std::future_status::ready);
+    const auto giveUp = std::chrono::steady_clock::now() + patience;
+    std::string states;
+    do {
+        states = statesOfOtherThreads();
+    } while (states.find_first_not_of('S') != states.npos &&
+             std::chrono::steady_clock::now() < giveUp);
+    EXPECT_EQ(states.find_first_not_of('S'), states.npos) << states;
+    EXPECT_GE(states.size(), 3u);  // two and the supervisor
 }
 
 }  // namespace
