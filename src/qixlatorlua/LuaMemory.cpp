@@ -213,7 +213,7 @@ void LuaArena::release() {
     while (pieces != nullptr && pieces->keptSize == 0) {
         removePiece(pieces);
     }
-    if (!isChanged && (!hasConstants || checksConstants)) {
+    if (!isChanged && (hasConstants ? checksConstants : isComplete)) {
         findConstants();
     }
 }
@@ -228,6 +228,7 @@ void LuaArena::restore() {
         from += piece->keptSize;
     }
     isChanged = false;
+    isComplete = false;
 }
 
 }  // namespace qixlatorlua

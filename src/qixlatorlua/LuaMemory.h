@@ -20,8 +20,8 @@ void* allocatePlainly(void* context, void* block, std::size_t oldSize, std::size
 // a copy, and `restore` writes it back.
 //
 // Blocks that are added after `keep` get memory of their own, so a translation changes few of the
-// kept pieces. The large ones that the first translation leaves unchanged are not written back
-// after further ones, unless those do something that may change any block (see mayChangeAll).
+// kept pieces. The large ones that the first complete translation leaves unchanged are not written
+// back after further ones, unless those do something that may change any block (see mayChangeAll).
 class LuaArena {
   public:
     LuaArena() noexcept = default;
@@ -41,7 +41,10 @@ class LuaArena {
     // To be called before anything but a translation by the scripts that are loaded: the kept
     // blocks are then all written back by the next `restore`.
     void mayChangeAll() { isChanged = true; }
-    // Whether that or the like has happened since `keep` or `restore`.
+    // To be called after all that translations do. What the first one left unchanged is then what
+    // none changes; less than that, such as a translator that was never used, does not show it.
+    void noteCompleteTranslation() { isComplete = true; }
+    // Whether mayChangeAll or the like has happened since `keep` or `restore`.
     bool isAnythingChanged() const { return isChanged; }
     bool isKept() const { return copy != nullptr; }
     // The memory of the kept blocks and of their copy, in bytes.
@@ -102,6 +105,7 @@ class LuaArena {
     SmallBlocks keptSmall = {};
     // Whether any kept block may have changed, not only those that a translation changes.
     bool isChanged = false;
+    bool isComplete = false;
     bool hasConstants = false;
 };
 

@@ -139,6 +139,13 @@ void expectAnyChange(lua_State* L) {
     }
 }
 
+void noteCompleteTranslation(lua_State* L) {
+    LuaArena* arena = arenaOf(L);
+    if (arena != nullptr) {
+        arena->noteCompleteTranslation();
+    }
+}
+
 qierr_Writer reportLuaFailure(lua_State* L, int result, const char* what, qierr_Status* status) {
     if (!qierr_Status_setCodeNamed(
             status, qiapalerr_softwareFaultAPALInternalUseOnly,

@@ -20,6 +20,9 @@ LuaArena* arenaOf(lua_State* L);
 // is loaded or run, or garbage is collected.
 void expectAnyChange(lua_State* L);
 
+// To be called when a translator has done in a state all that translators do.
+void noteCompleteTranslation(lua_State* L);
+
 // Sets qiapalerr_softwareFaultAPALInternalUseOnly for an error of the interpreter. `result` is the
 // result of the protected call; the message is on top of the stack. Begins the object
 // `qixlatorlua_debug` with the member `debug` and returns a writer for further details. If the

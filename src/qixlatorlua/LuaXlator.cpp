@@ -164,7 +164,8 @@ char* describe(XlatorInterface* self, Description* description, const char* fail
     if (description->status->code < 0) {
         return nullptr;
     }
-    lua_State* L = static_cast<LuaXlator*>(self)->L;
+    auto* xlator = static_cast<LuaXlator*>(self);
+    lua_State* L = xlator->L;
     const int top = lua_gettop(L);
     const int result = lua_cpcall(L, describeProtected, description);
     if (result != 0) {
@@ -173,6 +174,8 @@ char* describe(XlatorInterface* self, Description* description, const char* fail
         reportScriptCode(description->failure, description->status);
     }
     lua_settop(L, top);
+    const bool isCode = description->json == nullptr;
+    (isCode ? xlator->describedCode : xlator->describedStatus) |= description->text != nullptr;
     return description->text;
 }
 
@@ -214,6 +217,9 @@ char* getDynamicDesc(XlatorInterface* self, const char* json, std::uint32_t attr
 
 void destroy(XlatorInterface* self) {
     auto* xlator = static_cast<LuaXlator*>(self);
+    if (xlator->describedCode && xlator->describedStatus) {
+        noteCompleteTranslation(xlator->L);
+    }
     closeState(xlator->L);
     qihtl_realloc(xlator, 0);
 }
@@ -230,7 +236,8 @@ XlatorInterface* createLuaXlator(const char* name, const char* registrationInfo,
         qihtl_reportMemoryFull(status);
         return nullptr;
     }
-    auto* xlator = new (memory) LuaXlator{{16, destroy, getStaticDesc, getDynamicDesc}, nullptr};
+    auto* xlator =
+        new (memory) LuaXlator{{16, destroy, getStaticDesc, getDynamicDesc}, nullptr, false, false};
     xlator->L = findState({name, registrationInfo}, runtime, status);
     if (xlator->L == nullptr) {
         destroy(xlator);

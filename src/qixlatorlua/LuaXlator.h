@@ -11,6 +11,9 @@ namespace qixlatorlua {
 struct LuaXlator : XlatorInterface {
     // Null until the state is completely set up.
     lua_State* L;
+    // Whether it has described a code and a status.
+    bool describedCode;
+    bool describedStatus;
 };
 
 // How a Lua state loads its scripts and allocates its memory. Results, failures and the output on

@@ -220,6 +220,42 @@ TEST_F(PreparedStatesTest, NoTranslationLeavesATraceForTheNext) {
     }
 }
 
+// The details of a status as a translator of its own gives them.
+std::string detailsOnce(const std::string& json) {
+    XlatorInterface* xlator = create();
+    qierr::Status status;
+    const std::string text = ScriptHost::taken(xlator->getDynamicDesc(
+        xlator, json.c_str(), 0x200, "json1", qixlator_realloc, nullptr, &status));
+    xlator->destroy(xlator);
+    return text;
+}
+
+// What the first use leaves unchanged says what need not be written back, if it does all that a
+// translation does.
+TEST_F(PreparedStatesTest, AFirstUseThatDoesLessLeavesNoTrace) {
+    const std::string json = withEntries(usage("kUsageTypeName", "\"text\"", "1"));
+    const std::string fresh = runOnce(describeAll);
+    const std::string expected = detailsOnce(json);
+    const auto describeCode = [](XlatorInterface* xlator) {
+        qierr::Status status;
+        ScriptHost::taken(
+            xlator->getStaticDesc(xlator, -250833, 0x200, qixlator_realloc, nullptr, &status));
+    };
+    for (const bool describesCode : {false, true}) {
+        PreparedStates::ofProcess().clear();
+        XlatorInterface* xlator = create();
+        if (describesCode) {
+            describeCode(xlator);
+        }
+        xlator->destroy(xlator);
+        for (int round = 0; round < 3; ++round) {
+            EXPECT_EQ(detailsOnce(json), expected);
+            translateOnce(json, 0x200);
+        }
+        EXPECT_EQ(runOnce(describeAll), fresh);
+    }
+}
+
 std::string explanation(const std::string& text) {
     return "<?xml version=\"1.0\"?>\n<qidocument>\n<qierror code=\"-1\">\n" + text +
            "\n</qierror>\n</qidocument>\n";

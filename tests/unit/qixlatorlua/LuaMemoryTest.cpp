@@ -128,8 +128,14 @@ class KeptBlocks {
             std::memset(blocks[index], 'k', sizes[index]);
         }
         EXPECT_TRUE(arena.keep());
-        // The first translation changes the last large block.
-        translate([this] { std::memset(blocks[3], 'x', sizes[3]); });
+    }
+
+    // The first complete translation changes the last large block.
+    void translateFirst() {
+        translate([this] {
+            std::memset(blocks[3], 'x', sizes[3]);
+            arena.noteCompleteTranslation();
+        });
     }
 
     // Expects that the blocks are as they were after a translation that does this.
@@ -139,7 +145,7 @@ class KeptBlocks {
         arena.release();
         arena.restore();
         for (std::size_t index = 0; index < count; ++index) {
-            EXPECT_EQ(std::string(blocks[index], sizes[index]), std::string(sizes[index], 'k'))
+            EXPECT_TRUE(std::string(blocks[index], sizes[index]) == std::string(sizes[index], 'k'))
                 << "block " << index;
         }
     }
@@ -158,6 +164,7 @@ class KeptBlocks {
 
 TEST_F(LuaMemoryTest, WhatATranslationChangesIsWrittenBack) {
     KeptBlocks kept;
+    kept.translateFirst();
     for (int round = 0; round < 3; ++round) {
         kept.translate([&] {
             std::memset(kept.blocks[0], 'x', KeptBlocks::sizes[0]);
@@ -166,8 +173,16 @@ TEST_F(LuaMemoryTest, WhatATranslationChangesIsWrittenBack) {
     }
 }
 
+TEST_F(LuaMemoryTest, EverythingIsWrittenBackUntilATranslationWasComplete) {
+    KeptBlocks kept;
+    kept.translate([] {});
+    kept.translate([&] { kept.changeAll(); });
+    kept.translateFirst();
+}
+
 TEST_F(LuaMemoryTest, EverythingIsWrittenBackAfterWhatMayChangeAll) {
     KeptBlocks kept;
+    kept.translateFirst();
     kept.translate([&] {
         kept.arena.mayChangeAll();
         kept.changeAll();
@@ -177,6 +192,7 @@ TEST_F(LuaMemoryTest, EverythingIsWrittenBackAfterWhatMayChangeAll) {
 TEST_F(LuaMemoryTest, EverythingIsWrittenBackAfterAKeptBlockWasFreed) {
     for (std::size_t index = 0; index < KeptBlocks::count; ++index) {
         KeptBlocks kept;
+        kept.translateFirst();
         kept.translate([&] {
             kept.changeAll();
             LuaArena::allocate(&kept.arena, kept.blocks[index], KeptBlocks::sizes[index], 0);
