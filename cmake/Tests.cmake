@@ -57,7 +57,7 @@ function(qitrmc_unit_test name)
   target_include_directories(${name} PRIVATE "${PROJECT_SOURCE_DIR}/tests")
   target_link_libraries(${name} PRIVATE ${test_LIBRARIES} GTest::gmock GTest::gtest_main)
   # In half of the time that the usual linker takes. What is shipped is linked by that one.
-  target_link_options(${name} PRIVATE -fuse-ld=gold)
+  target_link_options(${name} PRIVATE -fuse-ld=$<IF:$<CXX_COMPILER_ID:Clang>,lld,gold>)
   if(test_LABELS)
     add_dependencies(concurrent_tests ${name})
   else()
