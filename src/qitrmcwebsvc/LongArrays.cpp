@@ -9,7 +9,7 @@ namespace nQITRMCWEBSVC100 {
 namespace {
 
 // A text at this address stands for an array. Its length is the number of the array.
-constexpr char placeholder[] = "array";
+constexpr char arrayMark[] = "array";
 
 bool contains(const char* text, std::size_t length, char wanted) {
     return std::memchr(text, wanted, length) != nullptr;
@@ -58,11 +58,11 @@ bool LongArrays::add(JsonValue&& scalar) {
 
 bool LongArrays::finish() {
     open = false;
-    return document.String(placeholder, static_cast<rapidjson::SizeType>(arrays.size() - 1), false);
+    return document.String(arrayMark, static_cast<rapidjson::SizeType>(arrays.size() - 1), false);
 }
 
 void LongArrays::placeIn(JsonValue& value) {
-    if (value.IsString() && value.GetString() == placeholder) {
+    if (value.IsString() && value.GetString() == arrayMark) {
         value = std::move(arrays[value.GetStringLength()]);
     } else if (value.IsArray()) {
         for (JsonValue& element : value.GetArray()) {

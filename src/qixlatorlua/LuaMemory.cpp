@@ -119,7 +119,8 @@ void LuaArena::give(void* block, std::size_t size) {
     }
     Piece* piece = static_cast<Piece*>(block) - 1;
     if (piece->keptSize != 0) {
-        // Perhaps the table of strings, and all strings are linked anew.
+        // It may be the interpreter's table of strings. When that grows, each string, in whatever
+        // piece it lies, gets another link to the next one.
         isChanged = true;
     } else {
         removePiece(piece);
